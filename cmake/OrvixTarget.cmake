@@ -1,0 +1,34 @@
+# What every target of the tree has in common.
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+
+# All run-time files together, under the same names from every tool chain.
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
+foreach(configuration RELEASE DEBUG)
+  set(CMAKE_RUNTIME_OUTPUT_DIRECTORY_${configuration} ${CMAKE_BINARY_DIR}/bin)
+endforeach()
+set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+set(CMAKE_SHARED_LIBRARY_PREFIX "")
+set(CMAKE_SHARED_MODULE_PREFIX "")
+
+# One C++ run-time inside each module for GCC, so that a DLL needs only Windows and its companions.
+add_library(orvix_build INTERFACE)
+target_compile_definitions(orvix_build INTERFACE UNICODE _UNICODE NOMINMAX WIN32_LEAN_AND_MEAN _WIN32_WINNT=0x0A00)
+if(MSVC)
+  # C4251: exported records hold standard containers; host and library share one tool chain.
+  target_compile_options(orvix_build INTERFACE /W4 /WX /wd4251 /utf-8 /permissive- /EHsc)
+  target_compile_definitions(orvix_build INTERFACE _CRT_SECURE_NO_WARNINGS)
+else()
+  target_compile_options(orvix_build INTERFACE -Wall -Wextra -Wshadow -Wconversion -Werror)
+  target_link_options(orvix_build INTERFACE -static -static-libgcc -static-libstdc++)
+endif()
+
+# orvix_windows_path(<variable> <path>): the path as a Windows program sees it. Wine maps "/" to drive Z.
+function(orvix_windows_path variable path)
+  if(CMAKE_HOST_WIN32)
+    set(${variable} ${path} PARENT_SCOPE)
+  else()
+    set(${variable} Z:${path} PARENT_SCOPE)
+  endif()
+endfunction()

@@ -1,0 +1,54 @@
+#pragma once
+
+#include <windows.h>
+
+#include <comdef.h>
+#include <oleauto.h>
+
+#include <exception>
+
+/// A VARIANT that clears itself. Throws `_com_error` when memory is exhausted and when it cannot be cleared
+/// (unless an exception is under way already).
+class ComVariant
+{
+public:
+    ComVariant() { VariantInit(&m_value); }
+    explicit ComVariant(const wchar_t* text) : ComVariant()
+    {
+        V_BSTR(&m_value) = SysAllocString(text);
+        if (text && !V_BSTR(&m_value))
+            throw _com_error(E_OUTOFMEMORY);
+        V_VT(&m_value) = VT_BSTR;
+    }
+    explicit ComVariant(long number) : ComVariant()
+    {
+        V_VT(&m_value) = VT_I4;
+        V_I4(&m_value) = number;
+    }
+    explicit ComVariant(IDispatch* object) : ComVariant()
+    {
+        V_VT(&m_value) = VT_DISPATCH;
+        V_DISPATCH(&m_value) = object;
+        if (object)
+            object->AddRef();
+    }
+    ComVariant(const ComVariant&) = delete;
+    ComVariant& operator=(const ComVariant&) = delete;
+    ~ComVariant() noexcept(false)
+    {
+        const HRESULT result = VariantClear(&m_value);
+        if (FAILED(result) && std::uncaught_exceptions() == 0)
+            throw _com_error(result);
+    }
+
+    const VARIANT& Get() const { return m_value; }
+
+    /// Where an operation stores a value that the object then owns.
+    VARIANT* Out() { return &m_value; }
+
+    /// The string, owned by the object; null when the value is anything else.
+    BSTR String() const { return V_VT(&m_value) == VT_BSTR ? V_BSTR(&m_value) : nullptr; }
+
+private:
+    VARIANT m_value;
+};

@@ -1,0 +1,235 @@
+#include "OrvixFileIO.h"
+
+#include "ComString.h"
+#include "ComVariant.h"
+
+#include <io.h>
+
+#include <memory>
+
+using Microsoft::WRL::ComPtr;
+
+namespace
+{
+
+// MSXML's version-independent document class and the interfaces used, as its published headers give them.
+constexpr CLSID ClassDOMDocument = {0xF6D90F11, 0x9C73, 0x11D3, {0xB3, 0x2E, 0x00, 0xC0, 0x4F, 0x99, 0x0B, 0xB4}};
+constexpr IID InterfaceDocument = {0x2933BF81, 0x7B36, 0x11D2, {0xB2, 0x0E, 0x00, 0xC0, 0x4F, 0x98, 0x3E, 0x60}};
+constexpr IID InterfaceNode = {0x2933BF80, 0x7B36, 0x11D2, {0xB2, 0x0E, 0x00, 0xC0, 0x4F, 0x98, 0x3E, 0x60}};
+constexpr IID InterfaceElement = {0x2933BF86, 0x7B36, 0x11D2, {0xB2, 0x0E, 0x00, 0xC0, 0x4F, 0x98, 0x3E, 0x60}};
+
+constexpr int ReadPermission = 4; // mode of _waccess
+constexpr long ElementType = 1;   // NODE_ELEMENT of createNode
+
+ComPtr<IXMLDOMElement> AsElement(IXMLDOMNode* node)
+{
+    ComPtr<IXMLDOMElement> element;
+    if (node)
+        node->QueryInterface(InterfaceElement, reinterpret_cast<void**>(element.GetAddressOf()));
+    return element;
+}
+
+/// The text with every code unit that XML 1.0 cannot carry replaced by U+FFFD.
+std::wstring XmlText(const wchar_t* text)
+{
+    const auto isHigh = [](wchar_t c) { return c >= 0xD800 && c <= 0xDBFF; };
+    const auto isLow = [](wchar_t c) { return c >= 0xDC00 && c <= 0xDFFF; };
+    std::wstring result(text);
+    for (std::size_t i = 0; i < result.size(); ++i)
+    {
+        const wchar_t c = result[i];
+        if (isHigh(c) && i + 1 < result.size() && isLow(result[i + 1]))
+            ++i;
+        else if ((c < 0x20 && c != L'\t' && c != L'\n' && c != L'\r') || (c >= 0xD800 && c <= 0xDFFF) || c >= 0xFFFE)
+            result[i] = 0xFFFD;
+    }
+    return result;
+}
+
+} // namespace
+
+OrvixFileIO::OrvixFileIO() = default;
+
+OrvixFileIO::~OrvixFileIO()
+{
+    m_documentNode.Reset();
+    m_document.Reset();
+    m_rootNode.Reset();
+}
+
+/// Initialises COM and makes an empty document.
+bool OrvixFileIO::MakeDocument()
+{
+    return SUCCEEDED(CoInitialize(nullptr)) &&
+           SUCCEEDED(CoCreateInstance(ClassDOMDocument, nullptr, CLSCTX_INPROC_SERVER, InterfaceDocument,
+                                      reinterpret_cast<void**>(m_document.ReleaseAndGetAddressOf())));
+}
+
+bool OrvixFileIO::CreateDocument()
+{
+    if (!MakeDocument() || FAILED(m_document->QueryInterface(
+                               InterfaceNode, reinterpret_cast<void**>(m_documentNode.ReleaseAndGetAddressOf()))))
+        return false;
+    ComPtr<IXMLDOMProcessingInstruction> declaration;
+    if (FAILED(m_document->createProcessingInstruction(
+            ComString(L"xml").Get(), ComString(L"version=\"1.0\" standalone=\"yes\"").Get(), &declaration)))
+        return false;
+    m_documentNode->appendChild(declaration.Get(), nullptr);
+    return true;
+}
+
+bool OrvixFileIO::OpenDocument(const wchar_t* path)
+{
+    if (!MakeDocument())
+        return false;
+    m_document->put_async(VARIANT_FALSE);
+    m_document->put_validateOnParse(VARIANT_FALSE);
+    m_document->put_resolveExternals(VARIANT_FALSE);
+    if (path && _waccess(path, ReadPermission) == 0)
+    {
+        VARIANT_BOOL ignored = VARIANT_FALSE;
+        m_document->load(ComVariant(path).Get(), &ignored);
+    }
+    if (FAILED(m_document->QueryInterface(InterfaceNode,
+                                          reinterpret_cast<void**>(m_documentNode.ReleaseAndGetAddressOf()))))
+        return false;
+    m_rootNode = m_documentNode;
+    return true;
+}
+
+bool OrvixFileIO::SaveDocument(const wchar_t* path)
+{
+    return m_document && SUCCEEDED(m_document->save(ComVariant(path).Get()));
+}
+
+bool OrvixFileIO::CloseDocument()
+{
+    // All three before COM goes: the root node is the document as well.
+    m_rootNode.Reset();
+    m_documentNode.Reset();
+    m_document.Reset();
+    CoUninitialize();
+    return true;
+}
+
+OrvixFileIO::Node* OrvixFileIO::GetDocumentRoot()
+{
+    return m_rootNode ? std::addressof(m_rootNode) : nullptr;
+}
+
+long OrvixFileIO::NumChildNodes(IXMLDOMNode* node)
+{
+    ComPtr<IXMLDOMNodeList> children;
+    long length = 0;
+    if (SUCCEEDED(node->get_childNodes(&children)) && children)
+        children->get_length(&length);
+    return length;
+}
+
+bool OrvixFileIO::GetChildNode(IXMLDOMNode* parent, long index, Node& child)
+{
+    IXMLDOMNode* node = ParentOrDocument(parent);
+    ComPtr<IXMLDOMNodeList> children;
+    long length = 0;
+    if (!node || FAILED(node->get_childNodes(&children)) || !children)
+        return false;
+    children->get_length(&length);
+    return index >= 0 && index < length && SUCCEEDED(children->get_item(index, child.ReleaseAndGetAddressOf()));
+}
+
+bool OrvixFileIO::GetFirstChild(IXMLDOMNode* parent, Node& child)
+{
+    IXMLDOMNode* node = ParentOrDocument(parent);
+    return node && SUCCEEDED(node->get_firstChild(child.ReleaseAndGetAddressOf())) && child;
+}
+
+bool OrvixFileIO::GetNextSibling(Node& node)
+{
+    Node next;
+    node->get_nextSibling(&next);
+    node = std::move(next);
+    return node != nullptr;
+}
+
+bool OrvixFileIO::GetNodeName(IXMLDOMNode* node, std::wstring& name)
+{
+    const ComPtr<IXMLDOMElement> element = AsElement(node);
+    ComString text;
+    if (!element || FAILED(element->get_nodeName(text.Out())) || !text.Get())
+        return false;
+    name = text.View();
+    return true;
+}
+
+bool OrvixFileIO::GetNodeText(IXMLDOMNode* node, std::wstring& text)
+{
+    // An element may declare a data type: its typed value is then no string.
+    ComVariant value;
+    if (FAILED(node->get_nodeTypedValue(value.Out())) || !value.String())
+        return false;
+    text.assign(value.String(), SysStringLen(value.String()));
+    return true;
+}
+
+bool OrvixFileIO::FindChildText(IXMLDOMNode* node, const wchar_t* name, std::wstring& text)
+{
+    return FindChildTexts(node, {&name, 1}, {&text, 1});
+}
+
+bool OrvixFileIO::FindChildTexts(IXMLDOMNode* node, std::span<const wchar_t* const> names,
+                                 std::span<std::wstring> texts)
+{
+    std::uint32_t missing = static_cast<std::uint32_t>((std::uint64_t{1} << names.size()) - 1);
+    Node child;
+    for (bool more = GetFirstChild(node, child); more && missing; more = GetNextSibling(child))
+    {
+        ComString name;
+        if (FAILED(child->get_nodeName(name.Out())))
+            continue;
+        for (std::size_t i = 0; i < names.size(); ++i)
+        {
+            if ((missing >> i & 1) && name.View() == names[i] && GetNodeText(child.Get(), texts[i]))
+                missing &= ~(1U << i);
+        }
+    }
+    return missing == 0;
+}
+
+bool OrvixFileIO::AddElement(IXMLDOMNode* parent, const wchar_t* name, Node& element, bool insertFirst)
+{
+    IXMLDOMNode* node = ParentOrDocument(parent);
+    Node created;
+    m_document->createNode(ComVariant(ElementType).Get(), ComString(name).Get(), nullptr, &created);
+    Node first;
+    if (insertFirst && GetFirstChild(node, first))
+        node->insertBefore(created.Get(), ComVariant(first.Get()).Get(), element.ReleaseAndGetAddressOf());
+    else
+        node->appendChild(created.Get(), element.ReleaseAndGetAddressOf());
+    return true;
+}
+
+bool OrvixFileIO::AddTextElement(IXMLDOMNode* parent, const wchar_t* name, const wchar_t* text)
+{
+    Node element;
+    AddElement(parent, name, element, false);
+    return AppendText(element.Get(), text);
+}
+
+bool OrvixFileIO::AppendText(IXMLDOMNode* element, const wchar_t* text)
+{
+    if (!AsElement(element))
+        return false;
+    ComPtr<IXMLDOMText> textNode;
+    m_document->createTextNode(ComString(XmlText(text).c_str()).Get(), &textNode);
+    element->appendChild(textNode.Get(), nullptr);
+    return true;
+}
+
+bool OrvixFileIO::SetAttribute(IXMLDOMNode* node, const wchar_t* name, const wchar_t* value)
+{
+    const ComPtr<IXMLDOMElement> element = AsElement(node);
+    if (!element)
+        return false;
+    element->setAttribute(ComString(name).Get(), ComVariant(value).Get());
+    return true;
+}

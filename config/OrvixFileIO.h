@@ -1,0 +1,107 @@
+#pragma once
+
+#include <windows.h>
+
+#include <msxml.h>
+#include <wrl/client.h>
+
+#include <span>
+#include <string>
+
+/// Reads or writes one XML file through the MSXML document object model.
+///
+/// Used on one thread, for one file: `OpenDocument` or `CreateDocument`, then the node operations, then
+/// `CloseDocument` (an `OpenedDocument` sees to that). Both starting operations initialise COM on the thread;
+/// `CloseDocument` is the only place that uninitialises it, so it is called after a success only, and no node
+/// may be held across it. A failed start leaves COM as it is.
+///
+/// A node argument may not be null, save a parent: null means the document node. Operations report failure by
+/// false. When memory for a string is exhausted `_com_error` is thrown.
+class OrvixFileIO
+{
+public:
+    using Node = Microsoft::WRL::ComPtr<IXMLDOMNode>;
+
+    OrvixFileIO();
+    OrvixFileIO(const OrvixFileIO&) = delete;
+    OrvixFileIO& operator=(const OrvixFileIO&) = delete;
+
+    /// Releases what is still held; leaves COM initialised when `CloseDocument` was not called.
+    virtual ~OrvixFileIO();
+
+    /// Starts a new document that holds an XML declaration (version 1.0, standalone) and nothing else.
+    bool CreateDocument();
+
+    /// Loads a file. A file that is missing, unreadable or not well-formed gives an empty document and true:
+    /// the reader notices it by not finding its root element.
+    bool OpenDocument(const wchar_t* path);
+
+    /// Saves to `path`; false without a document and when MSXML reports a failure.
+    bool SaveDocument(const wchar_t* path);
+
+    /// Releases the document and uninitialises COM once; always true.
+    bool CloseDocument();
+
+    /// The document node of an opened document; null otherwise. Owned by this object.
+    Node* GetDocumentRoot();
+
+    /// Number of child nodes; 0 when they cannot be read.
+    long NumChildNodes(IXMLDOMNode* node);
+
+    /// The child at `index`; false when it is out of range. Linear in the index: to walk all children use
+    /// `GetFirstChild` and `GetNextSibling`.
+    bool GetChildNode(IXMLDOMNode* parent, long index, Node& child);
+
+    /// The first child; false when there is none.
+    bool GetFirstChild(IXMLDOMNode* parent, Node& child);
+
+    /// Steps from `node` to its next sibling; false, with a null node, behind the last.
+    bool GetNextSibling(Node& node);
+
+    /// Name of an element; false for every other kind of node.
+    bool GetNodeName(IXMLDOMNode* node, std::wstring& name);
+
+    /// Text value of a node; false when it has none that is a string.
+    bool GetNodeText(IXMLDOMNode* node, std::wstring& text);
+
+    /// Text of the first child with this name (compared exactly) whose text can be read.
+    bool FindChildText(IXMLDOMNode* node, const wchar_t* name, std::wstring& text);
+
+    /// `FindChildText` for several names in one walk: `texts[i]` receives the text for `names[i]`. True when
+    /// all were found. At most 32 names.
+    bool FindChildTexts(IXMLDOMNode* node, std::span<const wchar_t* const> names, std::span<std::wstring> texts);
+
+    /// Adds an element under a parent, in front of its first child or behind its last; always true.
+    bool AddElement(IXMLDOMNode* parent, const wchar_t* name, Node& element, bool insertFirst);
+
+    /// Adds an element whose only child is a text node.
+    bool AddTextElement(IXMLDOMNode* parent, const wchar_t* name, const wchar_t* text);
+
+    /// Appends a text node to an element; false when the node is no element. Characters that XML cannot carry
+    /// become U+FFFD, since one of them would make the whole saved file unreadable.
+    bool AppendText(IXMLDOMNode* element, const wchar_t* text);
+
+    /// Sets an attribute; false when the node is no element.
+    bool SetAttribute(IXMLDOMNode* node, const wchar_t* name, const wchar_t* value);
+
+private:
+    bool MakeDocument();
+    IXMLDOMNode* ParentOrDocument(IXMLDOMNode* parent) const { return parent ? parent : m_documentNode.Get(); }
+
+    Microsoft::WRL::ComPtr<IXMLDOMDocument> m_document;
+    Node m_documentNode;
+    Node m_rootNode;
+};
+
+/// Closes a document at the end of a scope, also when an exception leaves it. Declared before any node.
+class OpenedDocument
+{
+public:
+    explicit OpenedDocument(OrvixFileIO& file) : m_file(file) {}
+    OpenedDocument(const OpenedDocument&) = delete;
+    OpenedDocument& operator=(const OpenedDocument&) = delete;
+    ~OpenedDocument() { m_file.CloseDocument(); }
+
+private:
+    OrvixFileIO& m_file;
+};

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+class ProviderFilters;
+
+/// The administrator's settings for one provider. The consumers read the fields.
+///
+/// Made once per initialisation of a services object and alive until the process ends, deliberately: callers
+/// hold plain pointers to it. The filters are not owned and live as long.
+class OrvixProviderConfig
+{
+public:
+    virtual ~OrvixProviderConfig() = default;
+
+    /// True when one of the filters excludes the file; `filterName` may be null and receives the name of the
+    /// first such filter. A null path gives false.
+    bool IsFileExcluded(const wchar_t* path, std::wstring* filterName) const;
+
+    std::wstring m_name;   ///< in upper case
+    bool m_enabled = true; ///< false switches the provider off
+    std::wstring m_fixedProjectRoot;
+    std::wstring m_altProviderExecutable;
+    std::wstring m_msSccProjectFile;
+    std::wstring m_msSccDllSearchPath;
+    std::wstring m_msSccDllFullPath;
+
+    /// In list order. A filter stands here once for its name and once more for every element behind the name.
+    std::vector<ProviderFilters*> m_filters;
+};

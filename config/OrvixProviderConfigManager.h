@@ -1,0 +1,28 @@
+#pragma once
+
+#include <vector>
+
+class OrvixProviderConfig;
+
+/// The administrator's settings from "OrvixProviders.xml". The file is only read.
+class OrvixProviderConfigManager
+{
+public:
+    OrvixProviderConfigManager();
+    OrvixProviderConfigManager(const OrvixProviderConfigManager&) = delete;
+    OrvixProviderConfigManager& operator=(const OrvixProviderConfigManager&) = delete;
+
+    /// Frees the list only: configurations live until the process ends.
+    virtual ~OrvixProviderConfigManager();
+
+    /// Appends the configurations of a file; false with nothing added when the path is null, the file has no
+    /// "OrvixProviders" element (a missing or broken file has none) or memory is exhausted.
+    bool LoadConfig(const wchar_t* path);
+
+    /// The first configuration whose name occurs anywhere in `providerName`, letter case aside; null when
+    /// there is none, the name is null or memory is exhausted.
+    OrvixProviderConfig* FindConfig(const wchar_t* providerName) const;
+
+private:
+    std::vector<OrvixProviderConfig*> m_configs;
+};

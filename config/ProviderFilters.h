@@ -1,0 +1,24 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+/// One file filter of a provider, as "OrvixProviders.xml" gives it. The consumers read the fields.
+class ProviderFilters
+{
+public:
+    virtual ~ProviderFilters() = default;
+
+    /// True when the filter excludes the file. An exclude filter excludes by folder or by type; an include
+    /// filter excludes what lies outside its folders, and inside them what has another type. A path without
+    /// any dot has no type and is never excluded by it. Null gives false, and so does exhausted memory.
+    bool Excludes(const wchar_t* path) const;
+
+    /// As `Excludes`, for a path in upper case already.
+    bool ExcludesUpperCase(const std::wstring& path) const;
+
+    std::wstring m_name;                   ///< as written
+    bool m_exclude = true;                 ///< false: the lists name what is included
+    std::vector<std::wstring> m_fileTypes; ///< extensions without the dot, in upper case
+    std::vector<std::wstring> m_folders;   ///< path prefixes in upper case, compared character by character
+};

@@ -1,0 +1,16 @@
+#include "BraeSDKUtil.h"
+#include "LibraryModule.h"
+
+#include <windows.h>
+
+/// Start and stop of the library. What it holds for the whole process frees itself when it is unloaded.
+extern "C" BOOL WINAPI DllMain(HINSTANCE module, DWORD reason, LPVOID)
+{
+    if (reason == DLL_PROCESS_ATTACH)
+    {
+        BraeSDK::Util::UseLanguagePackLocale(module);
+        RememberLibraryModule(module);
+        DisableThreadLibraryCalls(module);
+    }
+    return TRUE;
+}

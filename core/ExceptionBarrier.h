@@ -1,0 +1,24 @@
+#pragma once
+
+#include <comdef.h>
+
+#include <utility>
+
+/// The barrier at the exported edge: runs `body` and gives its result, or `onFailure` when anything is thrown.
+/// Only a COM error of the XML layer (`_com_error`) travels on to the host.
+template <class Result, class Body>
+Result WithBarrier(Result onFailure, Body&& body)
+{
+    try
+    {
+        return std::forward<Body>(body)();
+    }
+    catch (const _com_error&)
+    {
+        throw;
+    }
+    catch (...)
+    {
+        return onFailure;
+    }
+}

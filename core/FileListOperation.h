@@ -1,0 +1,47 @@
+#pragma once
+
+#include <cstdint>
+
+class IOrvixProvider;
+class OrvixFileList;
+class OrvixFileListDialogParams;
+class OrvixServices;
+
+/// One run of `IOrvixServices::RunFileListOperation`: source-control operations on the active entries of a
+/// file list. Lives for that call; owns nothing.
+class FileListOperation
+{
+public:
+    FileListOperation(OrvixServices& services, void* dialogArgument, OrvixFileListDialogParams& params,
+                      OrvixFileList& list, IOrvixProvider* provider, std::uint32_t operations);
+
+    /// Runs all steps; the result is that of `RunFileListOperation`.
+    std::int32_t Run(bool callProviderFirst, std::uint32_t flagsOutMask);
+
+private:
+    /// A result of 0 means cancelled; `run` whether the provider is to be called.
+    struct Confirmation
+    {
+        std::int32_t result;
+        bool run;
+    };
+
+    bool KeepFittingEntries(std::uint32_t flagsOutMask);
+    void RemoveUntickedEntries();
+    Confirmation Confirm();
+    Confirmation ShowDialog(bool locked);
+    void StoreAnswers(std::int32_t result);
+    void CallProvider();
+    bool NotifyBefore(bool cancelled);
+    void NotifyAfter();
+
+    OrvixServices& m_services;
+    void* m_dialogArgument;
+    OrvixFileListDialogParams& m_params;
+    OrvixFileList& m_list;
+    IOrvixProvider* m_provider;
+    std::uint32_t m_operations;
+    std::uint32_t m_dialogPrompt;
+    std::uint32_t m_optionPrompt;
+    std::uint32_t m_mode = 0; ///< options of the provider calls; bit 0x1 keeps the files checked out
+};

@@ -1,0 +1,75 @@
+#pragma once
+
+#include "IOrvixCoreUIClientAccess.h"
+#include "IOrvixServices.h"
+#include "OrvixPromptTable.h"
+#include "OrvixProviderConfigManager.h"
+#include "OrvixProviderEntry.h"
+
+#include <memory>
+#include <vector>
+
+class IOrvixClientAccess;
+class IOrvixCoreUI;
+
+/// The services object. The operations' contracts stand in `IOrvixServices` and `IOrvixCoreUIClientAccess`.
+class OrvixServices final : public IOrvixServices, public IOrvixCoreUIClientAccess
+{
+public:
+    OrvixServices() = default;
+    OrvixServices(const OrvixServices&) = delete;
+    OrvixServices& operator=(const OrvixServices&) = delete;
+
+    bool Initialize(OrvixClientInfo* info, std::uint32_t sources) override;
+    void Shutdown() override;
+    std::uint32_t GetProviderCount() override;
+    const wchar_t* GetProviderName(std::uint32_t index) override;
+    IOrvixProvider* GetProvider(std::uint32_t index) override;
+    std::int32_t ShowPrompt(void* a, void* b, void* c, std::uint32_t options, std::uint32_t promptID,
+                            bool* dontAskAgain) override;
+    std::int32_t ShowFileListDialog(void* a, OrvixFileListDialogParams* params) override;
+    std::int32_t RunFileListOperation(void* a, OrvixFileListDialogParams* params, bool callProviderFirst,
+                                      IOrvixProvider* provider, std::uint32_t operations,
+                                      std::uint32_t flagsOutMask) override;
+    std::uint32_t GetPromptAction(std::uint32_t promptID) override;
+    bool SetPromptAction(std::uint32_t promptID, std::uint32_t action) override;
+    bool RegisterPrompt(std::uint32_t promptID, const wchar_t* text, std::uint32_t action, std::uint32_t actionOpts,
+                        bool overwriteSettings) override;
+    std::int32_t EditPrompts(void* a, void* b) override;
+    const wchar_t* GetProviderFixedProjectRoot(std::uint32_t index) override;
+    const wchar_t* GetProviderAltExecutable(std::uint32_t index) override;
+    bool IsFileExcludedByProvider(std::uint32_t index, const wchar_t* fileName, std::wstring* filterName) override;
+
+    /// Shuts down when initialised; an error in saving is dropped here, since a destructor does not throw.
+    ~OrvixServices() override;
+
+    std::intptr_t ClientRelayA(void* a, void* b, void* c, void* d) override;
+    std::uint32_t GetColor(std::int32_t index) override;
+    std::intptr_t ClientRelayB(void* a, void* b, void* c, void* d) override;
+
+    /// Whether the first row with this ID is locked; false when there is none.
+    bool IsPromptLocked(std::uint32_t promptID);
+
+    /// Whether the host says that nobody can answer.
+    bool IsUnattended();
+
+private:
+    bool DiscoverPlugins(OrvixClientInfo* info);
+    std::unique_ptr<OrvixProviderEntry> LoadPlugin(const wchar_t* path);
+    bool DiscoverMSSCCIProviders();
+    void ReleaseProviders();
+    bool LoadPrompts();
+    bool SavePrompts();
+    int FirstPrompt(std::uint32_t promptID);
+    int LastPrompt(std::uint32_t promptID);
+    OrvixProviderConfig* ConfigOf(std::uint32_t index);
+    IOrvixCoreUI& CoreUI();
+
+    bool m_initialized = false;
+    std::vector<std::unique_ptr<OrvixProviderEntry>> m_providers;
+    std::wstring m_configFolder;
+    IOrvixCoreUI* m_coreUI = nullptr;
+    OrvixPromptTable m_prompts;
+    OrvixProviderConfigManager m_config;
+    IOrvixClientAccess* m_clientAccess = nullptr;
+};

@@ -1,0 +1,57 @@
+#pragma once
+
+#include "BraeHeapOperators.h"
+#include "OrvixExport.h"
+
+#include <string>
+
+class IOrvixClientAccess;
+struct HWND__;
+
+/// Who the client is and where its files lie; the argument of `IOrvixServices::Initialize`.
+///
+/// Created and owned by the host; the library does not keep it. Texts are copied in: a setter given null
+/// (or without memory left) leaves the old text. A getter's text is never null and is valid until the
+/// field is set again or the record is destroyed. Nothing is checked. All operations: [library, main-thread].
+class ORVIX_API OrvixClientInfo : public BraeHeapOperators
+{
+public:
+    OrvixClientInfo();
+    OrvixClientInfo(const OrvixClientInfo&) = delete;
+    OrvixClientInfo& operator=(const OrvixClientInfo&) = delete;
+    virtual ~OrvixClientInfo();
+
+    /// Name of the client program, as providers show it; empty by default.
+    virtual const wchar_t* GetClientName();
+    virtual void SetClientName(const wchar_t* name);
+
+    /// Login name of the user; empty by default. The name ends in W so that no header's macro changes it.
+    virtual const wchar_t* GetUserNameW();
+    virtual void SetUserName(const wchar_t* name);
+
+    /// Window that providers' dialogs belong to; null by default. Not owned.
+    virtual HWND__* GetParentWindow();
+    virtual void SetParentWindow(HWND__* window);
+
+    /// Folder that is searched for provider plug-ins. "*.dll" is put directly behind it, so it ends in a
+    /// backslash; the whole path of a plug-in must fit 260 characters, terminator included.
+    virtual const wchar_t* GetProviderPluginPath();
+    virtual void SetProviderPluginPath(const wchar_t* path);
+
+    /// Folder of "OrvixProviders.xml" and "OrvixPrompts.xml", without a backslash at its end: one is always
+    /// added.
+    virtual const wchar_t* GetConfigFilePath();
+    virtual void SetConfigFilePath(const wchar_t* path);
+
+    /// The host's call-back interface; null by default. Not owned; it must outlive the services object.
+    virtual IOrvixClientAccess* GetIOrvixClientAccess();
+    virtual void SetIOrvixClientAccess(IOrvixClientAccess* access);
+
+private:
+    std::wstring m_clientName;
+    std::wstring m_userName;
+    std::wstring m_providerPluginPath;
+    std::wstring m_configFilePath;
+    HWND__* m_parentWindow = nullptr;
+    IOrvixClientAccess* m_clientAccess = nullptr;
+};

@@ -1,0 +1,51 @@
+#pragma once
+
+#include "BraeHeapOperators.h"
+#include "OrvixExport.h"
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+/// How a provider's browse dialog behaves, with its file-type filters.
+///
+/// Created and owned by the host. Texts are copied in: a setter given null (or without memory left) leaves
+/// the old text. A getter's text is valid until the field is set again, a filter is added or the record is
+/// destroyed. Nothing is checked. All operations: [library, main-thread].
+class ORVIX_API OrvixExploreProviderParams : public BraeHeapOperators
+{
+public:
+    OrvixExploreProviderParams();
+    OrvixExploreProviderParams(const OrvixExploreProviderParams&) = delete;
+    OrvixExploreProviderParams& operator=(const OrvixExploreProviderParams&) = delete;
+    virtual ~OrvixExploreProviderParams();
+
+    /// Title of the dialog; empty by default.
+    virtual const wchar_t* GetTitle();
+    virtual void SetTitle(const wchar_t* title);
+
+    /// Whether several files may be chosen; false by default.
+    virtual bool GetMultipleSelections();
+    virtual void SetMultipleSelections(bool allowed);
+
+    /// Whether the chosen files are downloaded; true by default.
+    virtual bool GetDownloadFiles();
+    virtual void SetDownloadFiles(bool download);
+
+    /// Appends a file-type filter; both texts are copied unchanged. Returns the new number of filters, or 0
+    /// with nothing added when a text is null or memory is exhausted.
+    virtual std::uint32_t AddFilter(const wchar_t* name, const wchar_t* extensions);
+
+    /// Number of filters.
+    virtual std::uint32_t NumFilters();
+
+    /// Name or extensions of the filter at `index`; null when `index` is not below `NumFilters()`.
+    virtual const wchar_t* GetFilterName(std::uint32_t index);
+    virtual const wchar_t* GetFilterExtensions(std::uint32_t index);
+
+private:
+    std::wstring m_title;
+    std::uint32_t m_flags = 2;
+    std::vector<std::wstring> m_filterNames;
+    std::vector<std::wstring> m_filterExtensions;
+};

@@ -1,0 +1,87 @@
+#pragma once
+
+#include "BraeHeapOperators.h"
+#include "OrvixExport.h"
+
+#include <string>
+#include <vector>
+
+/// One file: its path, its flags, its place in a tree of files, and its attachments (secondary files that
+/// belong to it).
+///
+/// Created by an `OrvixFileList` (which then owns it), by an entry as an attachment (which then owns it),
+/// or by the host. An entry never owns its children or its parent. Indexes run from 0; a getter given an
+/// index out of range returns null. All operations: [library, main-thread].
+class ORVIX_API OrvixFileEntry : public BraeHeapOperators
+{
+public:
+    OrvixFileEntry();
+    OrvixFileEntry(const OrvixFileEntry&) = delete;
+    OrvixFileEntry& operator=(const OrvixFileEntry&) = delete;
+
+    /// Deletes the attachments; leaves the children alone.
+    virtual ~OrvixFileEntry();
+
+    /// The path; never null, empty by default, of any length. Valid until it is set again.
+    virtual const wchar_t* GetFile();
+
+    /// Copies the path; null (or exhausted memory) leaves the old one. A path longer than two characters
+    /// that starts with two forward slashes gets two backslashes in their place; nothing else is changed.
+    virtual void SetFile(const wchar_t* file);
+
+    /// Flags set by the host, on which `OrvixFileList::BuildActiveList` selects; 0 by default.
+    virtual unsigned long GetFlagsIn();
+    virtual void SetFlagsIn(unsigned long flags);
+
+    /// A value that the host keeps with the entry; never interpreted, 0 by default.
+    virtual long long GetClientPtr();
+    virtual void SetClientPtr(long long value);
+
+    /// State flags written by a provider (see `IOrvixProvider::QueryStatus`); 0 by default.
+    virtual unsigned long GetFlagsOut();
+    virtual void SetFlagsOut(unsigned long flags);
+
+    /// Appends a child, which is not owned; its parent link is not touched and duplicates are not looked
+    /// for. Returns `NumChildren()`, or 0 with nothing changed for null and when memory is exhausted.
+    virtual unsigned int AddChild(OrvixFileEntry* child);
+    virtual unsigned int NumChildren();
+    virtual OrvixFileEntry* GetChild(unsigned int index);
+
+    /// Unlinks a child without deleting it or touching its parent link; false for an index out of range.
+    virtual bool RemoveChild(unsigned int index);
+
+    /// Unlinks every child; always true.
+    virtual bool RemoveAllChildren();
+
+    /// Two ways to append an attachment, a new entry that this entry owns: a copy of `source`'s path, flags,
+    /// client value and parent link (not of its children and attachments), or an entry made from a path and
+    /// values. `parent` is stored as given; this entry does not become the attachment's parent.
+    /// Returns `NumAttachments()`, or 0 with nothing changed when the first argument is null or memory is
+    /// exhausted.
+    ORVIX_OVERLOADS_IN_SLOT_ORDER(virtual unsigned int AddAttachment(OrvixFileEntry* source),
+                                  virtual unsigned int AddAttachment(const wchar_t* file, OrvixFileEntry* parent,
+                                                                     unsigned long flagsIn, long long clientPtr));
+    virtual unsigned int NumAttachments();
+
+    /// The attachment at `index`, owned by this entry.
+    virtual OrvixFileEntry* GetAttachment(unsigned int index);
+
+    /// Deletes one attachment; false for an index out of range.
+    virtual bool RemoveAttachment(unsigned int index);
+
+    /// Deletes every attachment; always true.
+    virtual bool RemoveAllAttachments();
+
+    /// The parent link; not owned, null by default. Setting it does not change the parent's children.
+    virtual void SetParent(OrvixFileEntry* parent);
+    virtual OrvixFileEntry* GetParent();
+
+private:
+    std::wstring m_file;
+    unsigned long m_flagsIn = 0;
+    unsigned long m_flagsOut = 0;
+    long long m_clientPtr = 0;
+    std::vector<OrvixFileEntry*> m_children;
+    OrvixFileEntry* m_parent = nullptr;
+    std::vector<OrvixFileEntry*> m_attachments;
+};

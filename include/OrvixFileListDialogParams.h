@@ -1,0 +1,61 @@
+#pragma once
+
+#include "BraeHeapOperators.h"
+#include "OrvixExport.h"
+
+#include <cstdint>
+#include <string>
+
+class OrvixFileList;
+
+/// What a file-list dialog shows and what it brings back.
+///
+/// Created and owned by the host. Texts are copied in: a setter given null (or without memory left) leaves
+/// the old text. A getter's text is never null and is valid until the field is set again or the record is
+/// destroyed. Nothing is checked. All operations: [library, main-thread].
+class ORVIX_API OrvixFileListDialogParams : public BraeHeapOperators
+{
+public:
+    OrvixFileListDialogParams();
+    OrvixFileListDialogParams(const OrvixFileListDialogParams&) = delete;
+    OrvixFileListDialogParams& operator=(const OrvixFileListDialogParams&) = delete;
+    virtual ~OrvixFileListDialogParams();
+
+    /// Bit set read and written by the dialog and by `IOrvixServices::RunFileListOperation`; 0 by default.
+    /// The setter stands first: that order is part of the published table.
+    virtual void SetOptions(std::uint32_t options);
+    virtual std::uint32_t GetOptions();
+
+    /// Title of the dialog; empty by default.
+    virtual const wchar_t* GetTitle();
+    virtual void SetTitle(const wchar_t* title);
+
+    /// Message above the files; empty by default. The name ends in W so that no header's macro changes it.
+    virtual const wchar_t* GetMessageW();
+    virtual void SetMessage(const wchar_t* message);
+
+    /// The files; the dialog shows the active entries. Null by default. Not owned.
+    virtual OrvixFileList* GetOrvixFileList();
+    virtual void SetOrvixFileList(OrvixFileList* list);
+
+    /// Comment for the operation; empty by default.
+    virtual const wchar_t* GetComment();
+    virtual void SetComment(const wchar_t* comment);
+
+    /// Prompt whose stored answer may replace the dialog; -1 (no prompt) by default.
+    virtual std::int32_t GetDialogPromptID();
+    virtual void SetDialogPromptID(std::int32_t id);
+
+    /// Prompt whose stored answer stands for the dialog's option; -1 (no prompt) by default.
+    virtual std::int32_t GetOptionPromptID();
+    virtual void SetOptionPromptID(std::int32_t id);
+
+private:
+    std::wstring m_title;
+    std::wstring m_message;
+    OrvixFileList* m_fileList = nullptr;
+    std::uint32_t m_options = 0;
+    std::wstring m_comment;
+    std::int32_t m_dialogPromptID = -1;
+    std::int32_t m_optionPromptID = -1;
+};

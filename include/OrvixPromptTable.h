@@ -1,0 +1,60 @@
+#pragma once
+
+#include "OrvixExport.h"
+
+#include <string>
+#include <vector>
+
+/// The stored answers to prompts: per prompt its ID, its text, the options that go with the answer, the
+/// answer (an action bit set) and whether the answer is locked.
+///
+/// Rows are addressed by index from 0 in the order added. IDs need not be unique. The services object owns
+/// the table of a session and hands it to the user-interface library for editing; a host may also make
+/// tables of its own. All operations: [library, main-thread].
+class ORVIX_API OrvixPromptTable
+{
+public:
+    OrvixPromptTable();
+    OrvixPromptTable(const OrvixPromptTable&) = delete;
+    OrvixPromptTable& operator=(const OrvixPromptTable&) = delete;
+    virtual ~OrvixPromptTable();
+
+    /// Appends a row with a copy of `text`; returns the new number of rows, or -1 with nothing changed when
+    /// `text` is null or memory is exhausted.
+    virtual int AddPrompt(int id, const wchar_t* text, unsigned long options, unsigned long prompt, bool locked);
+
+    /// Number of rows.
+    virtual int NumPrompts();
+
+    /// Removes every row.
+    virtual void RemoveAll();
+
+    /// ID of a row; -1 for an index not below `NumPrompts()`.
+    virtual int GetPromptID(unsigned int index);
+    /// Setters give false and change nothing for an index not below `NumPrompts()`.
+    virtual bool SetPromptID(unsigned int index, int id);
+
+    /// Text of a row, valid until it is set or removed; null for an index out of range.
+    virtual const wchar_t* GetPromptText(unsigned int index);
+    /// Replaces the text by a copy. A null `text`, and exhausted memory, give false and change nothing.
+    virtual bool SetPromptText(unsigned int index, const wchar_t* text);
+
+    /// Options stored with the answer; 0 for an index out of range.
+    virtual unsigned long GetPromptOptions(unsigned int index);
+    virtual bool SetPromptOptions(unsigned int index, unsigned long options);
+
+    /// Stored answer, an action bit set; 0 for an index out of range.
+    virtual unsigned long GetPrompt(unsigned int index);
+    virtual bool SetPrompt(unsigned int index, unsigned long prompt);
+
+    /// Whether the answer is locked against `IOrvixServices::SetPromptAction`; false out of range.
+    virtual bool GetLocked(unsigned int index);
+    virtual bool SetLocked(unsigned int index, bool locked);
+
+private:
+    std::vector<int> m_ids;
+    std::vector<std::wstring> m_texts;
+    std::vector<unsigned long> m_options;
+    std::vector<unsigned long> m_prompts;
+    std::vector<bool> m_locked;
+};

@@ -1,0 +1,41 @@
+#pragma once
+
+#include "BraeHeapOperators.h"
+#include "OrvixExport.h"
+
+#include <string>
+
+/// A user: login name and person.
+///
+/// Created by an `OrvixUserList` (which then owns it) or by the host. Texts are copied in whole: a setter
+/// given null (or without memory left) leaves the old text. A getter's text is never null, empty by
+/// default, and valid until the field is set again or the entry is destroyed.
+/// All operations: [library, main-thread].
+class ORVIX_API OrvixUserEntry : public BraeHeapOperators
+{
+public:
+    OrvixUserEntry();
+    OrvixUserEntry(const OrvixUserEntry&) = delete;
+    OrvixUserEntry& operator=(const OrvixUserEntry&) = delete;
+    virtual ~OrvixUserEntry();
+
+    /// Login name. The getter's name ends in W so that no header's macro changes it.
+    virtual const wchar_t* GetUserNameW();
+    virtual void SetUserName(const wchar_t* name);
+
+    virtual const wchar_t* GetFirstName();
+    virtual void SetFirstName(const wchar_t* name);
+
+    virtual const wchar_t* GetLastName();
+    virtual void SetLastName(const wchar_t* name);
+
+    /// E-mail address; stored as given.
+    virtual const wchar_t* GetEmail();
+    virtual void SetEmail(const wchar_t* email);
+
+private:
+    std::wstring m_userName;
+    std::wstring m_firstName;
+    std::wstring m_lastName;
+    std::wstring m_email;
+};

@@ -1,0 +1,14 @@
+#pragma once
+
+#include "ExceptionBarrier.h"
+
+#include <string>
+
+/// Copies `text` into a record's field. Null, and exhausted memory, leave the old value and give false.
+inline bool AssignText(std::wstring& field, const wchar_t* text)
+{
+    return text && WithBarrier(false, [&] {
+               field = text;
+               return true;
+           });
+}
