@@ -173,15 +173,16 @@ bool OrvixFileIO::GetNodeText(IXMLDOMNode* node, std::wstring& text)
 
 bool OrvixFileIO::FindChildText(IXMLDOMNode* node, const wchar_t* name, std::wstring& text)
 {
-    return FindChildTexts(node, {&name, 1}, {&text, 1});
+    const std::wstring_view wanted = name;
+    return FindChildTexts(node, {&wanted, 1}, {&text, 1});
 }
 
-bool OrvixFileIO::FindChildTexts(IXMLDOMNode* node, std::span<const wchar_t* const> names,
+bool OrvixFileIO::FindChildTexts(IXMLDOMNode* node, std::span<const std::wstring_view> names,
                                  std::span<std::wstring> texts)
 {
     std::uint32_t missing = static_cast<std::uint32_t>((std::uint64_t{1} << names.size()) - 1);
     Node child;
-    for (bool more = GetFirstChild(node, child); more && missing; more = GetNextSibling(child))
+    for (bool more = GetFirstChild(node, child); more; more = missing && GetNextSibling(child))
     {
         ComString name;
         if (FAILED(child->get_nodeName(name.Out())))

@@ -7,6 +7,7 @@
 
 #include <span>
 #include <string>
+#include <string_view>
 
 /// Reads or writes one XML file through the MSXML document object model.
 ///
@@ -69,7 +70,7 @@ public:
 
     /// `FindChildText` for several names in one walk: `texts[i]` receives the text for `names[i]`. True when
     /// all were found. At most 32 names.
-    bool FindChildTexts(IXMLDOMNode* node, std::span<const wchar_t* const> names, std::span<std::wstring> texts);
+    bool FindChildTexts(IXMLDOMNode* node, std::span<const std::wstring_view> names, std::span<std::wstring> texts);
 
     /// Adds an element under a parent, in front of its first child or behind its last; always true.
     bool AddElement(IXMLDOMNode* parent, const wchar_t* name, Node& element, bool insertFirst);

@@ -2,14 +2,13 @@
 
 #include "ExceptionBarrier.h"
 #include "ProviderFilters.h"
-#include "UpperCase.h"
 
 bool OrvixProviderConfig::IsFileExcluded(const wchar_t* path, std::wstring* filterName) const
 {
     if (!path)
         return false;
     return WithBarrier(false, [&] {
-        const std::wstring upperPath = UpperCase(path);
+        const FilteredPath filteredPath(path);
         const ProviderFilters* previous = nullptr;
         for (const ProviderFilters* filter : m_filters)
         {
@@ -17,7 +16,7 @@ bool OrvixProviderConfig::IsFileExcluded(const wchar_t* path, std::wstring* filt
             if (filter == previous)
                 continue;
             previous = filter;
-            if (filter->ExcludesUpperCase(upperPath))
+            if (filter->Excludes(filteredPath))
             {
                 if (filterName)
                     *filterName = filter->m_name;

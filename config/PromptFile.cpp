@@ -23,7 +23,7 @@ enum Field
     NumFields
 };
 
-constexpr std::array<const wchar_t*, NumFields> FieldNames = {L"Text", L"ID", L"Locked", L"ActionOpts", L"Action"};
+constexpr std::array<std::wstring_view, NumFields> FieldNames = {L"Text", L"ID", L"Locked", L"ActionOpts", L"Action"};
 
 bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path)
 {
@@ -95,7 +95,7 @@ bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
             table.GetPromptText(i), std::to_wstring(table.GetPromptID(i)), table.GetLocked(i) ? L"true" : L"false",
             Decimal(table.GetPromptOptions(i)), Decimal(table.GetPrompt(i))};
         for (std::size_t field = 0; field < NumFields; ++field)
-            file.AddTextElement(prompt.Get(), FieldNames[field], values[field].c_str());
+            file.AddTextElement(prompt.Get(), FieldNames[field].data(), values[field].c_str());
     }
     file.SaveDocument(path);
     return true;

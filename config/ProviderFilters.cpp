@@ -6,27 +6,57 @@
 #include <algorithm>
 #include <cwchar>
 
-bool ProviderFilters::Excludes(const wchar_t* path) const
+namespace
 {
-    return path && WithBarrier(false, [&] { return ExcludesUpperCase(UpperCase(path)); });
+
+/// Folders share their beginnings: the last character tells most of them apart without a comparison.
+bool StartsWith(std::wstring_view path, std::wstring_view folder)
+{
+    return folder.empty() ||
+           (path.size() >= folder.size() && path[folder.size() - 1] == folder.back() && path.starts_with(folder));
 }
 
-bool ProviderFilters::ExcludesUpperCase(const std::wstring& path) const
+bool IsAscii(std::wstring_view text)
+{
+    return std::all_of(text.begin(), text.end(), [](wchar_t c) { return c < 0x80; });
+}
+
+/// Equal without regard to letter case. Both are in upper case from a to z; only letters beyond need the C
+/// library. `type` and `pathType` end with a null character.
+bool IsSameType(std::wstring_view type, std::wstring_view pathType)
+{
+    if (type.size() != pathType.size())
+        return false;
+    return type == pathType || (!(IsAscii(type) && IsAscii(pathType)) && _wcsicmp(type.data(), pathType.data()) == 0);
+}
+
+} // namespace
+
+FilteredPath::FilteredPath(const wchar_t* path) : text(UpperCase(path))
+{
+    const std::size_t dot = text.rfind(L'.');
+    hasType = dot != std::wstring::npos;
+    if (hasType)
+        type = std::wstring_view(text).substr(dot + 1);
+}
+
+bool ProviderFilters::Excludes(const wchar_t* path) const
+{
+    return path && WithBarrier(false, [&] { return Excludes(FilteredPath(path)); });
+}
+
+bool ProviderFilters::Excludes(const FilteredPath& path) const
 {
     if (!m_folders.empty())
     {
         const bool inFolder = std::any_of(m_folders.begin(), m_folders.end(),
-                                          [&](const std::wstring& folder) { return path.starts_with(folder); });
+                                          [&](const std::wstring& folder) { return StartsWith(path.text, folder); });
         if (inFolder == m_exclude)
             return true;
     }
-    const std::size_t dot = path.rfind(L'.');
-    if (m_fileTypes.empty() || dot == std::wstring::npos)
+    if (m_fileTypes.empty() || !path.hasType)
         return false;
-    const wchar_t* type = path.c_str() + dot + 1;
-    const std::size_t length = path.size() - dot - 1;
-    const bool hasType = std::any_of(m_fileTypes.begin(), m_fileTypes.end(), [&](const std::wstring& entry) {
-        return entry.size() == length && _wcsicmp(entry.c_str(), type) == 0;
-    });
+    const bool hasType = std::any_of(m_fileTypes.begin(), m_fileTypes.end(),
+                                     [&](const std::wstring& type) { return IsSameType(type, path.type); });
     return hasType == m_exclude;
 }

@@ -1,7 +1,21 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 #include <vector>
+
+/// A path in upper case with what stands behind its last dot, made once for all filters.
+struct FilteredPath
+{
+    explicit FilteredPath(const wchar_t* path);
+
+    std::wstring text;
+    bool hasType;           ///< whether there is any dot
+    std::wstring_view type; ///< lies in `text` and reaches to its end
+
+    FilteredPath(const FilteredPath&) = delete;
+    FilteredPath& operator=(const FilteredPath&) = delete;
+};
 
 /// One file filter of a provider, as "OrvixProviders.xml" gives it. The consumers read the fields.
 class ProviderFilters
@@ -14,8 +28,7 @@ public:
     /// any dot has no type and is never excluded by it. Null gives false, and so does exhausted memory.
     bool Excludes(const wchar_t* path) const;
 
-    /// As `Excludes`, for a path in upper case already.
-    bool ExcludesUpperCase(const std::wstring& path) const;
+    bool Excludes(const FilteredPath& path) const;
 
     std::wstring m_name;                   ///< as written
     bool m_exclude = true;                 ///< false: the lists name what is included

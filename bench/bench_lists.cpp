@@ -1,0 +1,161 @@
+#include "IOrvixProvider.h"
+#include "IOrvixServices.h"
+#include "Measure.h"
+#include "OrvixFileEntry.h"
+#include "OrvixFileList.h"
+#include "OrvixFileListDialogParams.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace
+{
+
+constexpr unsigned long Mask = 0x4;
+
+std::wstring FileName(unsigned int index)
+{
+    return L"C:\\project\\folder " + std::to_wstring(index / 100) + L"\\file " + std::to_wstring(index) + L".txt";
+}
+
+/// Every eleventh entry is a root; the ten behind it are its children. All are selected.
+std::unique_ptr<OrvixFileList> MakeTree(unsigned int count)
+{
+    std::unique_ptr<OrvixFileList> list(new OrvixFileList);
+    OrvixFileEntry* root = nullptr;
+    for (unsigned int i = 0; i < count; ++i)
+    {
+        OrvixFileEntry* entry = list->CreateEntry(FileName(i).c_str(), i % 11 ? root : nullptr, Mask, 0);
+        if (i % 11 == 0)
+            root = entry;
+    }
+    return list;
+}
+
+/// The calls that any implementation makes, in the order of the flat form.
+void FloorFlat(OrvixFileList& list, std::vector<OrvixFileEntry*>& active)
+{
+    active.clear();
+    for (unsigned int i = 0; i < list.NumEntries(); ++i)
+    {
+        OrvixFileEntry* entry = list.GetFileEntry(i);
+        if (entry && (entry->GetFlagsIn() & Mask))
+            active.push_back(entry);
+    }
+}
+
+void FloorVisit(OrvixFileEntry* entry, std::vector<OrvixFileEntry*>& active)
+{
+    for (unsigned int i = 0; i < entry->NumChildren(); ++i)
+    {
+        if (OrvixFileEntry* child = entry->GetChild(i))
+            FloorVisit(child, active);
+    }
+    if (entry->GetFlagsIn() & Mask)
+        active.push_back(entry);
+}
+
+void FloorTree(OrvixFileList& list, std::vector<OrvixFileEntry*>& active)
+{
+    active.clear();
+    for (unsigned int i = 0; i < list.NumRootEntries(); ++i)
+    {
+        if (OrvixFileEntry* root = list.GetRootEntry(i))
+            FloorVisit(root, active);
+    }
+}
+
+/// A provider that does nothing and changes no state.
+class IdleProvider final : public IOrvixProvider
+{
+public:
+    const wchar_t* GetName() override { return L"Idle"; }
+    int ReservedA() override { return 0; }
+    bool IsInitialized() override { return true; }
+    bool IsProjectOpen() override { return true; }
+    int Initialize(OrvixClientInfo*) override { return 0; }
+    int Uninitialize() override { return 0; }
+    int OpenProject(const wchar_t*, const wchar_t*) override { return 0; }
+    int CloseProject() override { return 0; }
+    int ReservedB() override { return 0; }
+    int ReservedC() override { return -2; }
+    int CheckIn(OrvixFileList*, const wchar_t*, unsigned long) override { return 0; }
+    int CheckOut(OrvixFileList*, const wchar_t*, unsigned long) override { return 0; }
+    int UndoCheckOut(OrvixFileList*, unsigned long) override { return 0; }
+    int GetLatest(OrvixFileList*, unsigned long) override { return 0; }
+    int ReservedD(void*, unsigned long* first, unsigned long* second) override
+    {
+        *first = *second = 0;
+        return -2;
+    }
+    int ReservedE() override { return -2; }
+    int Add(OrvixFileList*, const wchar_t*, unsigned long) override { return 0; }
+    int ShowHistory(OrvixFileList*) override { return 0; }
+    int ShowProperties(OrvixFileList*) override { return 0; }
+    int QueryStatus(OrvixFileList*, unsigned long) override { return 0; }
+    int ReservedF() override { return -2; }
+    int ReservedG() override { return -2; }
+    int ShowOptions() override { return 0; }
+    int RunProviderClient() override { return 0; }
+    int ReservedH() override { return -2; }
+    bool ReservedI() override { return true; }
+};
+
+/// Milliseconds per entry of a run on `count` entries of which every second one is dropped. Small lists are
+/// run several times, so that the time is well above the clock's step.
+double CostPerEntry(unsigned int count, unsigned int lists, bool fromRoots)
+{
+    constexpr std::uint32_t Prompt = 1;
+    constexpr std::uint32_t CheckOut = 0x10;
+    constexpr std::uint32_t Fits = 0x2;
+    const std::unique_ptr<IOrvixServices, void (*)(IOrvixServices*)> services(GetIOrvixServices(),
+                                                                              ReleaseIOrvixServices);
+    services->RegisterPrompt(Prompt, L"Check out?", 0x2, 0, true);
+    IdleProvider provider;
+
+    std::vector<std::unique_ptr<OrvixFileList>> all;
+    for (unsigned int l = 0; l < lists; ++l)
+    {
+        all.push_back(MakeTree(count));
+        for (unsigned int i = 0; i < count; ++i)
+            all.back()->GetFileEntry(i)->SetFlagsOut(i % 2 ? Fits : 0);
+    }
+    OrvixFileListDialogParams params;
+    params.SetDialogPromptID(Prompt);
+    const double time = BestTime(
+        [&] {
+            for (const auto& list : all)
+            {
+                params.SetOrvixFileList(list.get());
+                services->RunFileListOperation(nullptr, &params, true, &provider, CheckOut, Fits);
+            }
+        },
+        [&] {
+            for (const auto& list : all)
+                list->BuildActiveList(Mask, fromRoots);
+        });
+    return time / count / lists;
+}
+
+} // namespace
+
+void BenchLists(MeasureTable& table)
+{
+    {
+        constexpr unsigned int Million = 1000000;
+        const auto list = MakeTree(Million);
+        std::vector<OrvixFileEntry*> active;
+        active.reserve(Million);
+        table.Print(Compare(
+            "BuildActiveList, 1,000,000 entries in order of creation", 1.3, [&] { list->BuildActiveList(Mask, false); },
+            [&] { FloorFlat(*list, active); }));
+        table.Print(Compare(
+            "BuildActiveList, 1,000,000 entries from the roots", 1.3, [&] { list->BuildActiveList(Mask, true); },
+            [&] { FloorTree(*list, active); }));
+    }
+    table.Print({"RunFileListOperation, time per entry: 100,000 against 1,000 entries", CostPerEntry(100000, 1, false),
+                 CostPerEntry(1000, 10, false), 2.0});
+    table.Print({"the same with an active list built from the roots", CostPerEntry(100000, 1, true),
+                 CostPerEntry(1000, 10, true), 2.0});
+}

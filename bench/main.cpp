@@ -1,0 +1,11 @@
+#include "Measure.h"
+
+/// Prints the table of measures; a row above its figure is marked "missed".
+int main()
+{
+    MeasureTable table;
+    BenchLists(table);
+    BenchFiles(table);
+    BenchNotifications(table);
+    return 0;
+}
