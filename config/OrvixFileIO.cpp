@@ -134,7 +134,8 @@ bool OrvixFileIO::GetChildNode(IXMLDOMNode* parent, long index, Node& child)
     if (!node || FAILED(node->get_childNodes(&children)) || !children)
         return false;
     children->get_length(&length);
-    return index >= 0 && index < length && SUCCEEDED(children->get_item(index, child.ReleaseAndGetAddressOf()));
+    return index >= 0 && index < length && SUCCEEDED(children->get_item(index, child.ReleaseAndGetAddressOf())) &&
+           child;
 }
 
 bool OrvixFileIO::GetFirstChild(IXMLDOMNode* parent, Node& child)

@@ -155,13 +155,11 @@ OrvixProviderConfig* OrvixProviderConfigManager::FindConfig(const wchar_t* provi
 {
     if (!providerName)
         return nullptr;
-    return WithBarrier(static_cast<OrvixProviderConfig*>(nullptr), [&]() -> OrvixProviderConfig* {
-        const std::wstring name = UpperCase(providerName);
-        for (OrvixProviderConfig* config : m_configs)
-        {
-            if (name.find(config->m_name) != std::wstring::npos)
-                return config;
-        }
-        return nullptr;
-    });
+    const std::wstring name = UpperCase(providerName);
+    for (OrvixProviderConfig* config : m_configs)
+    {
+        if (name.find(config->m_name) != std::wstring::npos)
+            return config;
+    }
+    return nullptr;
 }

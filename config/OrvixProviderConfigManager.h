@@ -20,7 +20,7 @@ public:
     bool LoadConfig(const wchar_t* path);
 
     /// The first configuration whose name occurs anywhere in `providerName`, letter case aside; null when
-    /// there is none, the name is null or memory is exhausted.
+    /// there is none or the name is null. Throws std::bad_alloc, since null would mean "not switched off".
     OrvixProviderConfig* FindConfig(const wchar_t* providerName) const;
 
 private:

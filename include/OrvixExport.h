@@ -1,5 +1,8 @@
 #pragma once
 
+// Before any exported class: without it GCC exports the type information of the base class along with the class.
+#include <typeinfo>
+
 /// Marks what OrvixCore.dll exports. The library defines ORVIXCORE_BUILD; programs that link its
 /// object files directly (its own unit tests) define ORVIXCORE_STATIC; everybody else imports.
 #if defined(ORVIXCORE_BUILD)

@@ -1,8 +1,5 @@
 #include "OrvixNotifyParams.h"
 
-// Without it GCC exports the type information of the base class too.
-#include <typeinfo>
-
 OrvixNotifyParams::OrvixNotifyParams() = default;
 OrvixNotifyParams::~OrvixNotifyParams() = default;
 
