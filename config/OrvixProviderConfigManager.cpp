@@ -126,7 +126,7 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path)
 {
     if (!path)
         return false;
-    return WithBarrier(false, [&] {
+    return WithXmlBarrier(false, [&] {
         OrvixFileIO file;
         if (!file.OpenDocument(path))
             return false;

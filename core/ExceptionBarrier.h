@@ -5,9 +5,22 @@
 #include <utility>
 
 /// The barrier at the exported edge: runs `body` and gives its result, or `onFailure` when anything is thrown.
-/// Only a COM error of the XML layer (`_com_error`) travels on to the host.
 template <class Result, class Body>
 Result WithBarrier(Result onFailure, Body&& body)
+{
+    try
+    {
+        return std::forward<Body>(body)();
+    }
+    catch (...)
+    {
+        return onFailure;
+    }
+}
+
+/// The barrier around what reads or writes an XML file: a COM error (`_com_error`) travels on to the host.
+template <class Result, class Body>
+Result WithXmlBarrier(Result onFailure, Body&& body)
 {
     try
     {

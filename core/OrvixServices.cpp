@@ -15,6 +15,7 @@
 #include <windows.h>
 
 #include <new>
+#include <string_view>
 
 namespace
 {
@@ -59,13 +60,13 @@ bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
 {
     if (!info)
         return false;
-    return WithBarrier(false, [&] {
+    return WithXmlBarrier(false, [&] {
         if (const wchar_t* configPath = info->GetConfigFilePath())
             m_configFolder = std::wstring(configPath) + L'\\';
-        m_config.LoadConfig((m_configFolder + L"OrvixProviders.xml").c_str());
+        WithXmlBarrier(false, [&] { return m_config.LoadConfig((m_configFolder + L"OrvixProviders.xml").c_str()); });
         m_clientAccess = info->GetIOrvixClientAccess();
         LoadPrompts();
-        const bool pluginsAdded = (sources & Plugins) && DiscoverPlugins(info);
+        const bool pluginsAdded = (sources & Plugins) && WithBarrier(false, [&] { return DiscoverPlugins(info); });
         const bool registryRead = (sources & InstalledMSSCCI) && DiscoverMSSCCIProviders();
         m_initialized = true;
         return pluginsAdded || registryRead;
@@ -208,7 +209,7 @@ bool OrvixServices::RegisterPrompt(std::uint32_t promptID, const wchar_t* text, 
 
 std::int32_t OrvixServices::EditPrompts(void* a, void* b)
 {
-    return WithBarrier(std::int32_t{0}, [&] {
+    return WithXmlBarrier(std::int32_t{0}, [&] {
         const std::int32_t result = CoreUI().EditPrompts(a, b, &m_prompts);
         if (result == 1)
             SavePrompts();
@@ -280,7 +281,7 @@ bool OrvixServices::DiscoverPlugins(OrvixClientInfo* info)
     bool added = false;
     do
     {
-        const std::wstring name = found.cFileName;
+        const std::wstring_view name = found.cFileName;
         if (name == L"." || name == L"..")
             continue;
         added |= WithBarrier(false, [&] {
@@ -303,23 +304,26 @@ std::unique_ptr<OrvixProviderEntry> OrvixServices::LoadPlugin(const wchar_t* pat
         return nullptr;
     auto entry = std::make_unique<OrvixProviderEntry>();
     entry->module = std::move(module);
-    const HMODULE plugin = entry->module.get();
-
-    const auto getVersion = Export<std::int32_t (*)()>(plugin, "GetOrvixVersion");
-    if (!getVersion || getVersion() != ORVIX_PLUGIN_CONTRACT_VERSION)
-        return nullptr;
-    entry->getProvider = Export<IOrvixProvider* (*)()>(plugin, "GetIOrvixProvider");
-    entry->releaseProvider = Export<void (*)(IOrvixProvider*)>(plugin, "ReleaseIOrvixProvider");
-    const auto getName = Export<const wchar_t* (*)()>(plugin, "GetOrvixProviderName");
-    if (getName)
-    {
-        // A null name stays the empty name, to which no configuration belongs.
-        const wchar_t* name = getName();
-        entry->name = name ? name : L"";
-        entry->config = m_config.FindConfig(name);
-    }
-    const bool complete = entry->getProvider && entry->releaseProvider && getName;
-    return complete && (!entry->config || entry->config->m_enabled) ? std::move(entry) : nullptr;
+    // Within the life of the entry: what a plug-in throws is destroyed by the plug-in's own code.
+    const bool accepted = WithBarrier(false, [&] {
+        const HMODULE plugin = entry->module.get();
+        const auto getVersion = Export<std::int32_t (*)()>(plugin, "GetOrvixVersion");
+        if (!getVersion || getVersion() != ORVIX_PLUGIN_CONTRACT_VERSION)
+            return false;
+        entry->getProvider = Export<IOrvixProvider* (*)()>(plugin, "GetIOrvixProvider");
+        entry->releaseProvider = Export<void (*)(IOrvixProvider*)>(plugin, "ReleaseIOrvixProvider");
+        const auto getName = Export<const wchar_t* (*)()>(plugin, "GetOrvixProviderName");
+        if (getName)
+        {
+            // A null name stays the empty name, to which no configuration belongs.
+            const wchar_t* name = getName();
+            entry->name = name ? name : L"";
+            entry->config = m_config.FindConfig(name);
+        }
+        const bool complete = entry->getProvider && entry->releaseProvider && getName;
+        return complete && (!entry->config || entry->config->m_enabled);
+    });
+    return accepted ? std::move(entry) : nullptr;
 }
 
 /// Installed MSSCCI libraries are not adapted yet: as if their registry key could not be opened.
@@ -330,14 +334,14 @@ bool OrvixServices::DiscoverMSSCCIProviders()
 
 bool OrvixServices::LoadPrompts()
 {
-    return WithBarrier(false,
-                       [&] { return ReadPromptFile(m_prompts, (m_configFolder + L"OrvixPrompts.xml").c_str()); });
+    return WithXmlBarrier(false,
+                          [&] { return ReadPromptFile(m_prompts, (m_configFolder + L"OrvixPrompts.xml").c_str()); });
 }
 
 bool OrvixServices::SavePrompts()
 {
-    return WithBarrier(false,
-                       [&] { return WritePromptFile(m_prompts, (m_configFolder + L"OrvixPrompts.xml").c_str()); });
+    return WithXmlBarrier(false,
+                          [&] { return WritePromptFile(m_prompts, (m_configFolder + L"OrvixPrompts.xml").c_str()); });
 }
 
 /// Index of the first row with this ID; -1 when there is none.
