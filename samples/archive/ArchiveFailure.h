@@ -1,0 +1,36 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+/// Why a command of the archive could not be carried out.
+enum class ArchiveError
+{
+    NotOpen,           ///< no project is open
+    InvalidPath,       ///< not a file that a project may hold
+    NoSuchFile,        ///< the file is not on disk
+    NotControlled,     ///< the archive does not know the file
+    AlreadyControlled, ///< the file was added before
+    CheckedOutByOther, ///< another user holds the file
+    NotCheckedOut,     ///< the user does not hold the file
+    OutOfDate,         ///< the file on disk is missing or an older version
+    Modified,          ///< changed on disk without a check-out; it would be overwritten
+    Damaged,           ///< something in the archive is not as it was written
+    Access,            ///< Windows refused an operation on a file
+    Busy,              ///< another program kept the archive locked
+};
+
+/// One thing that went wrong.
+struct ArchiveFailure
+{
+    ArchiveError error;
+
+    /// One line for people; does not name the file.
+    std::wstring reason;
+
+    /// The file as the caller named it; empty when the failure concerns the whole command.
+    std::wstring file;
+};
+
+/// The result of a command: empty when everything was done.
+using ArchiveFailures = std::vector<ArchiveFailure>;

@@ -1,0 +1,129 @@
+#include "ArchiveFolder.h"
+
+#include "ArchiveLock.h"
+#include "ArchiveText.h"
+
+namespace
+{
+
+constexpr std::string_view Format = "orvix-archive 1\n";
+constexpr std::string_view LinkFormat = "orvix-archive-link 1\n";
+constexpr std::size_t MaxLinkSize = 1 << 17;
+constexpr std::size_t MaxRecordSize = 16 << 20;
+
+constexpr wchar_t Records[] = L"files";
+constexpr wchar_t Versions[] = L"contents";
+
+[[noreturn]] void ThrowDamaged(const wchar_t* reason)
+{
+    throw ArchiveFailure{ArchiveError::Damaged, reason, {}};
+}
+
+/// The archive folder that a link file names.
+std::wstring ReadLink(const std::wstring& file)
+{
+    const std::string text = ArchiveFiles::ReadText(file, MaxLinkSize).value_or("");
+    std::string_view path = text;
+    if (!path.starts_with(LinkFormat))
+        ThrowDamaged(L"The project's link to its archive cannot be read");
+    path.remove_prefix(LinkFormat.size());
+    path = path.substr(0, path.find_first_of("\r\n"));
+    const std::optional<std::wstring> target = ArchiveText::FromUtf8(path);
+    if (!target)
+        ThrowDamaged(L"The project's link to its archive cannot be read");
+    return *target;
+}
+
+} // namespace
+
+ArchiveFolder::ArchiveFolder(const std::wstring& projectFolder, std::chrono::milliseconds lockWait)
+{
+    const std::wstring path = projectFolder + L'\\' + std::wstring(ArchivePaths::ArchiveName);
+    const std::optional<ArchiveFiles::Facts> facts = ArchiveFiles::Find(path);
+    if (!facts)
+        ArchiveFiles::MakeFolder(path);
+    m_path = ArchivePaths::FindFolder(facts && !facts->IsFolder() ? ReadLink(path) : path);
+    if (!HasFormat())
+        Prepare(lockWait);
+}
+
+bool ArchiveFolder::HasFormat() const
+{
+    const std::optional<std::string> format = ArchiveFiles::ReadText(FormatFile(), MaxLinkSize);
+    if (format && format != Format)
+        ThrowDamaged(L"The archive has a format that is not known here");
+    return format.has_value();
+}
+
+void ArchiveFolder::Prepare(std::chrono::milliseconds lockWait) const
+{
+    const ArchiveLock lock(LockFile(), lockWait);
+    if (HasFormat())
+        return; // somebody else was faster
+    ArchiveFiles::MakeFolder(m_path + L'\\' + Versions);
+    ArchiveFiles::MakeFolder(m_path + L'\\' + Records);
+    ArchiveFiles::WriteText(FormatFile(), TemporaryFile(), Format);
+}
+
+std::wstring ArchiveFolder::Place(const wchar_t* kind, const std::string& name) const
+{
+    const std::wstring wide(name.begin(), name.end());
+    return m_path + L'\\' + kind + L'\\' + wide.substr(0, 2) + L'\\' + wide;
+}
+
+std::optional<ArchiveRecord> ArchiveFolder::Load(const ArchiveTarget& target) const
+{
+    const std::optional<std::string> text = ArchiveFiles::ReadText(Place(Records, target.key), MaxRecordSize);
+    if (!text)
+        return std::nullopt;
+    std::optional<ArchiveRecord> record = ArchiveRecord::Parse(*text);
+    if (!record || ArchiveText::Fold(record->path) != ArchiveText::Fold(target.relative))
+        ThrowDamaged(L"The file's record in the archive is damaged");
+    return record;
+}
+
+void ArchiveFolder::Save(const ArchiveTarget& target, const ArchiveRecord& record) const
+{
+    const std::string text = record.Format();
+    if (text.size() > MaxRecordSize)
+        throw ArchiveFailure{ArchiveError::Access, L"The file's record in the archive would become too large", {}};
+    const std::wstring path = Place(Records, target.key);
+    ArchiveFiles::MakeFolder(path.substr(0, path.rfind(L'\\')));
+    ArchiveFiles::WriteText(path, TemporaryFile(), text);
+}
+
+ArchiveFiles::Contents ArchiveFolder::Store(HANDLE source) const
+{
+    const ArchiveFiles::TemporaryFile temporary(TemporaryFile());
+    ArchiveFiles::Contents contents = ArchiveFiles::Copy(source, temporary.Path());
+    const auto isWhole = [&](const std::wstring& path) {
+        const ArchiveFiles::UniqueHandle file = ArchiveFiles::Open(path, GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING);
+        return file && ArchiveFiles::Read(file.get()).sha256 == contents.sha256;
+    };
+    if (!isWhole(temporary.Path()))
+        ThrowDamaged(L"The stored contents are not what was written");
+
+    // Equal contents are kept once; a damaged copy is replaced by the good one.
+    const std::wstring path = Place(Versions, contents.sha256);
+    if (!isWhole(path))
+    {
+        ArchiveFiles::MakeFolder(path.substr(0, path.rfind(L'\\')));
+        ArchiveFiles::Replace(temporary.Path(), path);
+    }
+    return contents;
+}
+
+void ArchiveFolder::Fetch(const ArchiveVersion& version, const std::wstring& copy) const
+{
+    const ArchiveFiles::UniqueHandle source =
+        ArchiveFiles::Open(Place(Versions, version.sha256), GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING);
+    if (!source)
+    {
+        if (ArchiveFiles::IsMissing(GetLastError()))
+            ThrowDamaged(L"The version's contents are missing in the archive");
+        ArchiveFiles::ThrowLastError(L"The version's contents cannot be opened");
+    }
+    const ArchiveFiles::Contents contents = ArchiveFiles::Copy(source.get(), copy, version.lastWrite);
+    if (contents.sha256 != version.sha256 || contents.size != version.size)
+        ThrowDamaged(L"The version's contents in the archive are damaged");
+}

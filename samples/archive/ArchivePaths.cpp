@@ -1,0 +1,207 @@
+#include "ArchivePaths.h"
+
+#include "ArchiveText.h"
+#include "Sha256.h"
+
+#include <algorithm>
+
+namespace
+{
+
+constexpr std::size_t MaxPathLength = 32767;
+constexpr std::wstring_view LongPrefix = L"\\\\?\\";
+constexpr wchar_t LinkReason[] = L"Links are not taken";
+constexpr wchar_t Outside[] = L"The file lies outside the project folder";
+
+[[noreturn]] void Refuse(const wchar_t* reason)
+{
+    throw ArchiveFailure{ArchiveError::InvalidPath, reason, {}};
+}
+
+bool TakePrefix(std::wstring_view& text, std::wstring_view prefix)
+{
+    if (!text.starts_with(prefix))
+        return false;
+    text.remove_prefix(prefix.size());
+    return true;
+}
+
+void CheckName(std::wstring_view name)
+{
+    if (name == L"..")
+        Refuse(L"Paths with \"..\" are not taken");
+    const bool hasBadCharacter = std::any_of(
+        name.begin(), name.end(), [](wchar_t character) { return character < L' ' || wcschr(L"<>:\"|?*", character); });
+    if (hasBadCharacter || name.back() == L'.' || name.back() == L' ')
+        Refuse(L"Not a file name that can be used");
+}
+
+/// The form of a full path in which Windows neither limits the length nor changes a name.
+std::wstring LongForm(const std::wstring& given)
+{
+    if (given.size() > MaxPathLength || !ArchiveText::IsValid(given))
+        Refuse(L"Not a path that can be used");
+    std::wstring path = given;
+    std::replace(path.begin(), path.end(), L'/', L'\\');
+
+    std::wstring_view rest = path;
+    const bool isLongShare = TakePrefix(rest, L"\\\\?\\UNC\\");
+    const bool isLong = !isLongShare && TakePrefix(rest, LongPrefix);
+    std::wstring result;
+    if (isLongShare || (!isLong && !rest.starts_with(L"\\\\.\\") && TakePrefix(rest, L"\\\\")))
+        result = L"\\\\?\\UNC";
+    else if (rest.size() >= 3 && ((rest[0] | 0x20) >= L'a' && (rest[0] | 0x20) <= L'z') && rest[1] == L':' &&
+             rest[2] == L'\\')
+    {
+        result.append(LongPrefix).append(rest.substr(0, 2));
+        rest.remove_prefix(3);
+    }
+    else
+        Refuse(L"Not a full path");
+
+    while (!rest.empty())
+    {
+        const std::wstring_view name = rest.substr(0, rest.find(L'\\'));
+        rest.remove_prefix(std::min(rest.size(), name.size() + 1));
+        if (name.empty() || name == L".")
+            continue;
+        CheckName(name);
+        result.append(1, L'\\').append(name);
+    }
+    return result;
+}
+
+/// The system's own name of an existing folder, without a separator at its end; empty on failure, with the
+/// reason in `error`.
+std::wstring FinalPath(const std::wstring& folder, DWORD& error)
+{
+    std::wstring path(MAX_PATH, L'\0');
+    DWORD length = 0;
+    // The separator lets the root of a drive be opened too.
+    const ArchiveFiles::UniqueHandle handle =
+        ArchiveFiles::Open(folder + L'\\', FILE_READ_ATTRIBUTES, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                           OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS);
+    while (handle && (length = GetFinalPathNameByHandleW(handle.get(), path.data(), static_cast<DWORD>(path.size()),
+                                                         FILE_NAME_NORMALIZED)) > path.size())
+        path.resize(length);
+    error = GetLastError();
+    path.resize(length);
+    if (path.ends_with(L'\\'))
+        path.pop_back();
+    return path;
+}
+
+/// Where a folder lies, or would lie, with links and short names on the way resolved; empty on failure, with the
+/// reason in `error`. The nearest folder above decides that is there and whose name the system can tell, which some
+/// cannot for a long one; below it links are refused.
+std::wstring FindPlace(const std::wstring& path, DWORD& error)
+{
+    std::size_t end = path.size();
+    std::wstring place;
+    while ((place = FinalPath(path.substr(0, end), error)).empty())
+    {
+        end = path.rfind(L'\\', end - 1);
+        if (end < LongPrefix.size())
+            return {};
+    }
+    while (end < path.size())
+    {
+        const std::size_t begin = end + 1;
+        end = std::min(path.find(L'\\', begin), path.size());
+        const std::wstring name = path.substr(begin, end - begin);
+        const std::optional<ArchiveFiles::Facts> facts = ArchiveFiles::Find(place + L'\\' + name);
+        if (facts && facts->isLink)
+            Refuse(LinkReason);
+        place.append(1, L'\\').append(facts ? facts->name : name);
+    }
+    return place;
+}
+
+bool IsInside(const std::wstring& foldedPath, const std::wstring& foldedFolder)
+{
+    return foldedPath.starts_with(foldedFolder) &&
+           (foldedPath.size() == foldedFolder.size() || foldedPath[foldedFolder.size()] == L'\\');
+}
+
+} // namespace
+
+ArchivePaths::ArchivePaths(const std::wstring& projectFolder, const std::wstring& archiveFolder)
+    : m_project(projectFolder), m_foldedProject(ArchiveText::Fold(projectFolder)),
+      m_foldedArchive(ArchiveText::Fold(archiveFolder))
+{
+}
+
+std::wstring ArchivePaths::FindFolder(const std::wstring& path)
+{
+    const std::wstring longForm = LongForm(path);
+    DWORD error = GetFileAttributesW((longForm + L'\\').c_str()) == INVALID_FILE_ATTRIBUTES ? GetLastError() : 0;
+    std::wstring place = error == 0 ? FindPlace(longForm, error) : L"";
+    if (place.empty())
+        ArchiveFiles::ThrowError(L"The folder cannot be opened", error);
+    return place;
+}
+
+bool ArchivePaths::IsReserved(std::wstring_view path)
+{
+    static const std::wstring archiveName = ArchiveText::Fold(ArchiveName);
+    static const std::wstring temporaryName = ArchiveText::Fold(TemporaryName);
+    const std::wstring folded = ArchiveText::Fold(path);
+    for (std::wstring_view rest = folded; !rest.empty();)
+    {
+        const std::wstring_view name = rest.substr(0, rest.find(L'\\'));
+        if (name == archiveName || name == temporaryName)
+            return true;
+        rest.remove_prefix(std::min(rest.size(), name.size() + 1));
+    }
+    return false;
+}
+
+ArchiveTarget ArchivePaths::Resolve(const std::wstring& path)
+{
+    const std::wstring longForm = LongForm(path);
+    const std::size_t separator = longForm.rfind(L'\\');
+    const std::wstring& folder = ResolveFolder(longForm.substr(0, separator));
+
+    ArchiveTarget target;
+    const std::wstring name = longForm.substr(separator + 1);
+    target.facts = ArchiveFiles::Find(folder + L'\\' + name);
+    target.path = folder + L'\\' + (target.facts ? target.facts->name : name);
+    if (target.facts && target.facts->IsFolder())
+        Refuse(L"A folder is not a file");
+    if (target.facts && target.facts->isLink)
+        Refuse(LinkReason);
+
+    target.relative = target.path.substr(m_project.size() + 1);
+    if (IsReserved(target.relative))
+        Refuse(L"The name is reserved for the archive");
+    std::replace(target.relative.begin(), target.relative.end(), L'\\', L'/');
+    const std::string identity = ArchiveText::ToUtf8(ArchiveText::Fold(target.relative));
+    Sha256 sha256;
+    sha256.Add(identity.data(), identity.size());
+    target.key = sha256.Finish();
+    return target;
+}
+
+void ArchivePaths::MakeFolders(const ArchiveTarget& target) const
+{
+    for (std::size_t end = m_project.size(); (end = target.path.find(L'\\', end + 1)) != std::wstring::npos;)
+        ArchiveFiles::MakeFolder(target.path.substr(0, end));
+}
+
+const std::wstring& ArchivePaths::ResolveFolder(const std::wstring& path)
+{
+    const auto known = m_folders.find(path);
+    if (known != m_folders.end())
+        return known->second;
+
+    DWORD error = 0;
+    const std::wstring place = FindPlace(path, error);
+    if (place.empty() && IsInside(ArchiveText::Fold(path), m_foldedProject))
+        ArchiveFiles::ThrowError(L"The file's folder cannot be opened", error);
+    const std::wstring foldedPlace = ArchiveText::Fold(place);
+    if (!IsInside(foldedPlace, m_foldedProject))
+        Refuse(Outside);
+    if (IsInside(foldedPlace, m_foldedArchive))
+        Refuse(L"The file lies in the archive");
+    return m_folders.emplace(path, place).first->second;
+}

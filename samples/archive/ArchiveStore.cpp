@@ -1,0 +1,369 @@
+#include "ArchiveStore.h"
+
+#include "ArchiveLock.h"
+#include "ArchivePaths.h"
+#include "ArchiveText.h"
+
+#include <algorithm>
+#include <unordered_set>
+
+namespace
+{
+
+/// How the contents on disk stand to a record.
+enum class Local
+{
+    Missing,
+    Latest,
+    Older,
+    Other,
+};
+
+/// Whether an equal size and time are proof enough of equal contents.
+enum class Proof
+{
+    SizeAndTime,
+    Contents,
+};
+
+ArchiveFailure Failure(ArchiveError error, const std::wstring& reason)
+{
+    return {error, reason, {}};
+}
+
+bool IsSameUser(const std::wstring& one, const std::wstring& other)
+{
+    return ArchiveText::Fold(one) == ArchiveText::Fold(other);
+}
+
+} // namespace
+
+/// One command: the project and the paths that were resolved so far.
+class ArchiveStore::Session
+{
+public:
+    explicit Session(const Project& project) : m_project(project), m_paths(project.folder, project.archive.Path()) {}
+
+    ArchiveTarget Resolve(const std::wstring& file) { return m_paths.Resolve(file); }
+
+    std::optional<ArchiveRecord> Find(const ArchiveTarget& target) const { return m_project.archive.Load(target); }
+
+    ArchiveRecord Load(const ArchiveTarget& target) const
+    {
+        if (std::optional<ArchiveRecord> record = Find(target))
+            return *record;
+        throw Failure(ArchiveError::NotControlled, L"Not under control");
+    }
+
+    void Save(const ArchiveTarget& target, const ArchiveRecord& record) const
+    {
+        m_project.archive.Save(target, record);
+    }
+
+    bool IsMine(const ArchiveRecord& record) const
+    {
+        return record.checkOut && IsSameUser(record.checkOut->user, m_project.user);
+    }
+
+    bool IsOthers(const ArchiveRecord& record) const { return record.checkOut && !IsMine(record); }
+
+    void RefuseOthers(const ArchiveRecord& record) const
+    {
+        if (IsOthers(record))
+            throw Failure(ArchiveError::CheckedOutByOther, L"Checked out by " + record.checkOut->user);
+    }
+
+    void RequireMine(const ArchiveRecord& record) const
+    {
+        RefuseOthers(record);
+        if (!record.checkOut)
+            throw Failure(ArchiveError::NotCheckedOut, L"Not checked out");
+    }
+
+    ArchiveCheckOut NewCheckOut(const std::wstring& comment) const
+    {
+        return {ArchiveText::Now(), m_project.user, comment};
+    }
+
+    /// Keeps the contents on disk as a new version.
+    ArchiveVersion StoreVersion(const ArchiveTarget& target, const std::wstring& comment) const
+    {
+        if (!target.facts)
+            throw Failure(ArchiveError::NoSuchFile, L"There is no such file");
+        const ArchiveFiles::UniqueHandle file =
+            ArchiveFiles::Open(target.path, GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING);
+        if (!file)
+            ArchiveFiles::ThrowLastError(L"The file cannot be opened");
+        const ArchiveFiles::Contents contents = m_project.archive.Store(file.get());
+        return {ArchiveText::Now(), m_project.user, contents.sha256, contents.size, contents.lastWrite, comment};
+    }
+
+    /// Puts the latest version in the place of what is on disk.
+    void Bring(ArchiveTarget& target, const ArchiveRecord& record, bool readOnly) const
+    {
+        if (!target.facts)
+            m_paths.MakeFolders(target);
+        const std::size_t separator = target.path.rfind(L'\\');
+        const ArchiveFiles::TemporaryFile copy(
+            target.path.substr(0, separator + 1).append(ArchivePaths::TemporaryName));
+        m_project.archive.Fetch(record.Latest(), copy.Path());
+        ArchiveFiles::Replace(copy.Path(), target.path);
+        ArchiveFiles::SetReadOnly(target.path, readOnly);
+        target.facts = ArchiveFiles::Find(target.path);
+    }
+
+    void GetLatest(ArchiveTarget& target, const ArchiveRecord& record) const;
+
+    static Local Compare(const ArchiveTarget& target, const ArchiveRecord& record, Proof proof);
+
+private:
+    const Project& m_project;
+    ArchivePaths m_paths;
+};
+
+Local ArchiveStore::Session::Compare(const ArchiveTarget& target, const ArchiveRecord& record, Proof proof)
+{
+    if (!target.facts)
+        return Local::Missing;
+    const ArchiveFiles::Facts& facts = *target.facts;
+
+    const auto findNewest = [&](auto isEqual) {
+        const auto found = std::find_if(record.versions.rbegin(), record.versions.rend(), isEqual);
+        if (found == record.versions.rend())
+            return Local::Other;
+        return found == record.versions.rbegin() ? Local::Latest : Local::Older;
+    };
+    const auto hasSize = [&](const ArchiveVersion& version) { return version.size == facts.size; };
+    const Local byTime = findNewest(
+        [&](const ArchiveVersion& version) { return hasSize(version) && version.lastWrite == facts.lastWrite; });
+    if (proof == Proof::SizeAndTime && byTime != Local::Other)
+        return byTime;
+    if (findNewest(hasSize) == Local::Other)
+        return Local::Other;
+
+    const ArchiveFiles::UniqueHandle file = ArchiveFiles::Open(
+        target.path, GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, OPEN_EXISTING);
+    if (!file)
+        ArchiveFiles::ThrowLastError(L"The file cannot be opened");
+    const std::string sha256 = ArchiveFiles::Read(file.get()).sha256;
+    return findNewest([&](const ArchiveVersion& version) { return version.sha256 == sha256; });
+}
+
+void ArchiveStore::Session::GetLatest(ArchiveTarget& target, const ArchiveRecord& record) const
+{
+    Local local = Compare(target, record, Proof::SizeAndTime);
+    if (local == Local::Missing)
+        return Bring(target, record, !IsMine(record));
+    if (IsMine(record))
+        return;
+
+    const bool mayBeOthersCopy = IsOthers(record) && !target.facts->IsReadOnly();
+    if (local == Local::Latest)
+    {
+        if (!mayBeOthersCopy)
+            ArchiveFiles::SetReadOnly(target.path, true);
+        return;
+    }
+    if (local == Local::Older)
+        local = Compare(target, record, Proof::Contents);
+    if (local == Local::Other || mayBeOthersCopy)
+        throw Failure(ArchiveError::Modified, L"Changed on disk without a check-out, so it is not overwritten");
+    Bring(target, record, true);
+}
+
+ArchiveFailures ArchiveStore::Open(const std::wstring& projectFolder, const std::wstring& user)
+{
+    Close();
+    try
+    {
+        if (user.empty() || !ArchiveText::IsValid(user))
+            throw Failure(ArchiveError::Access, L"The user has no name that can be used");
+        const std::wstring folder = ArchivePaths::FindFolder(projectFolder);
+        if (ArchivePaths::IsReserved(folder))
+            throw Failure(ArchiveError::InvalidPath, L"An archive is not a project");
+        m_project = Project{folder, ArchiveFolder(folder, m_lockWait), user};
+    }
+    catch (const ArchiveFailure& failure)
+    {
+        return {failure};
+    }
+    return {};
+}
+
+template <typename Work>
+ArchiveFailures ArchiveStore::ForEachFile(std::span<const std::wstring> files, bool withLock, Work work) const
+{
+    ArchiveFailures failures;
+    try
+    {
+        if (!m_project)
+            throw Failure(ArchiveError::NotOpen, L"No project is open");
+        std::optional<ArchiveLock> lock;
+        if (withLock)
+            lock.emplace(m_project->archive.LockFile(), m_lockWait);
+
+        Session session(*m_project);
+        std::unordered_set<std::string> done;
+        for (const std::wstring& file : files)
+        {
+            try
+            {
+                ArchiveTarget target = session.Resolve(file);
+                if (done.insert(target.key).second)
+                    work(session, target);
+            }
+            catch (ArchiveFailure& failure)
+            {
+                failure.file = file;
+                failures.push_back(std::move(failure));
+            }
+        }
+    }
+    catch (ArchiveFailure& failure)
+    {
+        failures.push_back(std::move(failure));
+    }
+    return failures;
+}
+
+ArchiveFailures ArchiveStore::Add(std::span<const std::wstring> files, const std::wstring& comment, bool keepCheckedOut)
+{
+    return ForEachFile(files, true, [&](Session& session, ArchiveTarget& target) {
+        if (session.Find(target))
+            throw Failure(ArchiveError::AlreadyControlled, L"Already under control");
+        ArchiveRecord record;
+        record.path = target.relative;
+        record.versions.push_back(session.StoreVersion(target, comment));
+        if (keepCheckedOut)
+            record.checkOut = session.NewCheckOut(comment);
+        session.Save(target, record);
+        ArchiveFiles::SetReadOnly(target.path, !keepCheckedOut);
+    });
+}
+
+ArchiveFailures ArchiveStore::CheckOut(std::span<const std::wstring> files, const std::wstring& comment, bool getLatest)
+{
+    return ForEachFile(files, true, [&](Session& session, ArchiveTarget& target) {
+        ArchiveRecord record = session.Load(target);
+        session.RefuseOthers(record);
+
+        ArchiveFailure outOfDate =
+            Failure(ArchiveError::OutOfDate, L"Not the latest version on disk; get the latest version first");
+        if (getLatest)
+        {
+            try
+            {
+                session.GetLatest(target, record);
+            }
+            catch (const ArchiveFailure& failure)
+            {
+                outOfDate = failure;
+            }
+        }
+
+        const bool isMine = session.IsMine(record);
+        const Local local = Session::Compare(target, record, Proof::SizeAndTime);
+        if (local == Local::Missing || (local == Local::Older && !isMine))
+            throw outOfDate;
+        if (!isMine)
+        {
+            record.checkOut = session.NewCheckOut(comment);
+            session.Save(target, record);
+        }
+        ArchiveFiles::SetReadOnly(target.path, false);
+    });
+}
+
+ArchiveFailures ArchiveStore::CheckIn(std::span<const std::wstring> files, const std::wstring& comment,
+                                      bool keepCheckedOut)
+{
+    return ForEachFile(files, true, [&](Session& session, ArchiveTarget& target) {
+        ArchiveRecord record = session.Load(target);
+        session.RequireMine(record);
+        record.versions.push_back(session.StoreVersion(target, comment));
+        if (!keepCheckedOut)
+            record.checkOut.reset();
+        session.Save(target, record);
+        ArchiveFiles::SetReadOnly(target.path, !keepCheckedOut);
+    });
+}
+
+ArchiveFailures ArchiveStore::UndoCheckOut(std::span<const std::wstring> files)
+{
+    return ForEachFile(files, true, [](Session& session, ArchiveTarget& target) {
+        ArchiveRecord record = session.Load(target);
+        session.RequireMine(record);
+
+        // Nobody else can have stored a version since, so the latest is the one checked out.
+        if (Session::Compare(target, record, Proof::Contents) == Local::Latest)
+            ArchiveFiles::SetReadOnly(target.path, true);
+        else
+            session.Bring(target, record, true);
+        record.checkOut.reset();
+        session.Save(target, record);
+    });
+}
+
+ArchiveFailures ArchiveStore::GetLatest(std::span<const std::wstring> files)
+{
+    return ForEachFile(
+        files, true, [](Session& session, ArchiveTarget& target) { session.GetLatest(target, session.Load(target)); });
+}
+
+ArchiveFailures ArchiveStore::History(std::span<const std::wstring> files, std::vector<ArchiveRecord>& records) const
+{
+    records.clear();
+    return ForEachFile(files, false,
+                       [&](Session& session, ArchiveTarget& target) { records.push_back(session.Load(target)); });
+}
+
+ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::vector<ArchiveStatus>& statuses) const
+{
+    statuses.clear();
+    if (!m_project)
+        return {Failure(ArchiveError::NotOpen, L"No project is open")};
+
+    Session session(*m_project);
+    const auto statusOf = [&](const ArchiveTarget& target) {
+        ArchiveStatus status;
+        const std::optional<ArchiveRecord> record = session.Find(target);
+        if (!record)
+            return status;
+        status.controlled = true;
+        status.checkedOut = session.IsMine(*record);
+        status.checkedOutByOther = session.IsOthers(*record);
+
+        Local local = Local::Other;
+        try
+        {
+            local = Session::Compare(target, *record, Proof::SizeAndTime);
+        }
+        catch (const ArchiveFailure&)
+        {
+            // A program keeps the file for itself, and its size or time has changed.
+        }
+        status.outOfDate = local == Local::Missing || (local == Local::Older && !status.checkedOut);
+        status.modified = local == Local::Other || (local == Local::Older && status.checkedOut);
+        return status;
+    };
+
+    ArchiveFailures failures;
+    for (const std::wstring& file : files)
+    {
+        try
+        {
+            statuses.push_back(statusOf(session.Resolve(file)));
+        }
+        catch (ArchiveFailure& failure)
+        {
+            statuses.emplace_back();
+            if (failure.error == ArchiveError::InvalidPath)
+                continue;
+            failure.file = file;
+            failures.push_back(std::move(failure));
+        }
+    }
+    if (!failures.empty())
+        statuses.clear();
+    return failures;
+}

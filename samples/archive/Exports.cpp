@@ -1,0 +1,43 @@
+// The four functions of the plug-in contract; archive.def exports them under their plain names.
+
+#include "ArchiveProvider.h"
+#include "OrvixVersion.h"
+
+#include <cstdint>
+#include <memory>
+
+namespace
+{
+
+/// The one provider of this module: a host asks for it again and again and expects the same session. It is
+/// deleted by as many releases as requests, or when the module is unloaded, since hosts need not release it.
+std::unique_ptr<ArchiveProvider> theProvider;
+int requests = 0;
+
+} // namespace
+
+extern "C" std::int32_t GetOrvixVersion()
+{
+    return ORVIX_PLUGIN_CONTRACT_VERSION;
+}
+
+extern "C" const wchar_t* GetOrvixProviderName()
+{
+    return ArchiveProvider::Name;
+}
+
+/// Null when the host's heap is exhausted.
+extern "C" IOrvixProvider* GetIOrvixProvider()
+{
+    if (!theProvider)
+        theProvider.reset(new ArchiveProvider);
+    if (theProvider)
+        ++requests;
+    return theProvider.get();
+}
+
+extern "C" void ReleaseIOrvixProvider(IOrvixProvider* provider)
+{
+    if (provider && provider == theProvider.get() && --requests == 0)
+        theProvider.reset();
+}
