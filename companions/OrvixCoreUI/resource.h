@@ -1,0 +1,16 @@
+#pragma once
+
+#define IDD_PROMPT 101
+#define IDD_FILE_LIST 102
+#define IDD_PROMPT_EDITOR 103
+
+#define IDC_MESSAGE 1001
+#define IDC_DO_NOT_ASK 1002
+#define IDC_YES_TO_ALL 1003
+#define IDC_NO_TO_ALL 1004
+#define IDC_FILES 1005
+#define IDC_COMMENT 1006
+#define IDC_OPTION 1007
+#define IDC_REMEMBER 1008
+#define IDC_PROMPTS 1009
+#define IDC_ANSWER 1010
