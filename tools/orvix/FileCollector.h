@@ -1,0 +1,38 @@
+#pragma once
+
+#include <string>
+#include <unordered_set>
+#include <vector>
+
+/// Finds the files of a command: those that the user names, and those below the folders that the user names.
+///
+/// Below a folder, folders that are hidden or system, or whose name starts with a dot (.git), are skipped and
+/// counted, links to folders are not followed, and what is named ".archive" (the sample provider's archive, or the
+/// link to it) is left out. A file that is met twice is taken once.
+class FileCollector
+{
+public:
+    struct File
+    {
+        std::wstring path;
+        bool named; ///< named by the user, not found in a folder
+    };
+
+    /// Takes what the user named, which need not exist. Throws `ToolError` when the text is no path.
+    void Add(const std::wstring& named);
+
+    const std::vector<File>& Files() const { return m_files; }
+    unsigned int NumSkippedFolders() const { return m_skippedFolders; }
+
+    /// Folders that could not be read.
+    const std::vector<std::wstring>& UnreadableFolders() const { return m_unreadableFolders; }
+
+private:
+    void AddFile(std::wstring path, bool named);
+    void AddFolder(const std::wstring& folder);
+
+    std::vector<File> m_files;
+    unsigned int m_skippedFolders = 0;
+    std::vector<std::wstring> m_unreadableFolders;
+    std::unordered_set<std::wstring> m_seen;
+};

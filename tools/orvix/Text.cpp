@@ -1,0 +1,48 @@
+#include "Text.h"
+
+#include <windows.h>
+
+#include <algorithm>
+
+namespace
+{
+std::string WithoutControls(std::wstring_view text, std::wstring_view kept)
+{
+    std::wstring safe(text);
+    const auto isControl = [kept](wchar_t c) {
+        return (c < 0x20 || (c >= 0x7F && c < 0xA0)) && kept.find(c) == std::wstring_view::npos;
+    };
+    std::replace_if(safe.begin(), safe.end(), isControl, L'\xFFFD');
+    return Utf8(safe);
+}
+} // namespace
+
+std::string Utf8(std::wstring_view text)
+{
+    const int length = static_cast<int>(text.size());
+    std::string bytes(
+        static_cast<std::size_t>(WideCharToMultiByte(CP_UTF8, 0, text.data(), length, nullptr, 0, nullptr, nullptr)),
+        '\0');
+    WideCharToMultiByte(CP_UTF8, 0, text.data(), length, bytes.data(), static_cast<int>(bytes.size()), nullptr,
+                        nullptr);
+    return bytes;
+}
+
+std::wstring Wide(std::string_view text)
+{
+    const int length = static_cast<int>(text.size());
+    std::wstring wide(static_cast<std::size_t>(MultiByteToWideChar(CP_UTF8, 0, text.data(), length, nullptr, 0)),
+                      L'\0');
+    MultiByteToWideChar(CP_UTF8, 0, text.data(), length, wide.data(), static_cast<int>(wide.size()));
+    return wide;
+}
+
+std::string Printable(std::wstring_view text)
+{
+    return WithoutControls(text, L"");
+}
+
+std::string PrintableLines(std::wstring_view text)
+{
+    return WithoutControls(text, L"\t\r\n");
+}
