@@ -1,0 +1,46 @@
+#include "OperationTest.h"
+
+#include <sstream>
+
+OperationTest::OperationTest()
+{
+    m_params.SetOrvixFileList(&m_list);
+    m_params.SetComment(L"comment");
+    m_script.onFileList = [this](const CoreUIScript::FileList& call) {
+        OrvixFileListDialogParams& params = *call.params;
+        OrvixFileList& list = *params.GetOrvixFileList();
+        std::ostringstream line;
+        line << "Dialog " << ActiveNames(&list) << " " << std::hex << params.GetOptions();
+        m_log.push_back(line.str());
+        for (unsigned int i = 0; i < list.NumActiveEntries(); ++i)
+        {
+            OrvixFileEntry* entry = list.GetActiveFileEntry(i);
+            if (!entry)
+                continue;
+            const bool ticked = m_unticked.count(Narrow(entry->GetFile())) == 0;
+            entry->SetFlagsOut(ticked ? entry->GetFlagsOut() | 0x2 : entry->GetFlagsOut() & ~0x2UL);
+        }
+        if (m_onDialog)
+            m_onDialog(params);
+        return m_dialogResult;
+    };
+}
+
+OrvixFileEntry& OperationTest::AddFile(const wchar_t* name, unsigned long flagsOut)
+{
+    OrvixFileEntry* entry = m_list.CreateEntry(name, nullptr, 0, 0);
+    entry->SetFlagsOut(flagsOut);
+    m_list.AddActiveEntry(entry);
+    return *entry;
+}
+
+void OperationTest::UsePrompts()
+{
+    m_params.SetDialogPromptID(DialogPrompt);
+    m_params.SetOptionPromptID(OptionPrompt);
+}
+
+std::int32_t OperationTest::Run(std::uint32_t operations, std::uint32_t flagsOutMask)
+{
+    return m_services->RunFileListOperation(nullptr, &m_params, false, &m_provider, operations, flagsOutMask);
+}

@@ -1,0 +1,235 @@
+#include "ServicesTest.h"
+
+#include <psapi.h>
+
+#include <functional>
+#include <ostream>
+
+namespace
+{
+
+std::string Repeated(std::string_view text, std::size_t count)
+{
+    std::string result;
+    result.reserve(text.size() * count);
+    for (; count > 0; --count)
+        result += text;
+    return result;
+}
+
+std::string Utf16(std::u16string_view text)
+{
+    return "\xFF\xFE" + std::string(reinterpret_cast<const char*>(text.data()), text.size() * sizeof(char16_t));
+}
+
+/// Entities that name each other, each ten times the one before.
+std::string NestedEntities()
+{
+    std::string dtd = "<!DOCTYPE a [<!ENTITY e0 \"lol\">";
+    for (int i = 1; i < 12; ++i)
+        dtd += "<!ENTITY e" + std::to_string(i) + " \"" + Repeated("&e" + std::to_string(i - 1) + ";", 10) + "\">";
+    return dtd + "]>";
+}
+
+/// One long entity, to be named often.
+std::string LongEntity()
+{
+    return "<!DOCTYPE a [<!ENTITY e \"" + std::string(1000000, 'x') + "\">]>";
+}
+
+const std::string Declaration = "<?xml version=\"1.0\"?>";
+
+/// Bytes that are no XML document: both files answer as if they were missing.
+struct Malformed
+{
+    const char* name;
+    std::function<std::string()> bytes;
+};
+
+void PrintTo(const Malformed& file, std::ostream* stream)
+{
+    *stream << file.name;
+}
+
+class MalformedFile : public ServicesTest, public testing::WithParamInterface<Malformed>
+{
+};
+
+/// Well-formed files that mean to exhaust the reader.
+class HostileFile : public ServicesTest
+{
+protected:
+    void TearDown() override
+    {
+        PROCESS_MEMORY_COUNTERS memory{};
+        memory.cb = sizeof memory;
+        GetProcessMemoryInfo(GetCurrentProcess(), &memory, sizeof memory);
+        RecordProperty("peak_megabytes", static_cast<int>(memory.PeakWorkingSetSize >> 20));
+        EXPECT_LT(memory.PeakWorkingSetSize, std::size_t{512} << 20);
+    }
+};
+
+} // namespace
+
+TEST_P(MalformedFile, OfPromptsIsAnEmptyTableAndStaysAsItIs)
+{
+    const std::string bytes = GetParam().bytes();
+    WritePrompts({{.id = "1", .action = "2"}});
+    Initialize(0);
+    ASSERT_EQ(m_services->GetPromptAction(1), 2u);
+    WriteBytes(PromptsFile(), bytes);
+    EXPECT_FALSE(Initialize(0));
+    EXPECT_EQ(m_services->GetPromptAction(1), 0u);
+    m_services->Shutdown();
+    EXPECT_EQ(ReadBytes(PromptsFile()), bytes);
+}
+
+TEST_P(MalformedFile, OfProvidersLeavesEveryProviderEnabledAndUnfiltered)
+{
+    AddPlugin(L"good");
+    WriteBytes(m_config.Path() / L"OrvixProviders.xml", GetParam().bytes());
+    EXPECT_TRUE(Initialize());
+    EXPECT_EQ(ProviderNames(), Names{L"Fake Depot"});
+    EXPECT_EQ(m_services->GetProviderFixedProjectRoot(0), nullptr);
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Bytes, MalformedFile,
+    testing::Values(
+        Malformed{"Empty", [] { return std::string(); }},
+        Malformed{"BlanksOnly", [] { return std::string(" \r\n\t "); }},
+        Malformed{"ByteOrderMarkOnly", [] { return std::string("\xEF\xBB\xBF"); }},
+        Malformed{"Truncated",
+                  [] {
+                      const std::string whole = PromptsXml({{.id = "1", .action = "2"}});
+                      return whole.substr(0, whole.size() - 3);
+                  }},
+        Malformed{"TruncatedProviders",
+                  [] { return Declaration + "<OrvixProviders><a><Name>Depot</Name><Enabled>false</Enabled></a>"; }},
+        Malformed{"Binary", [] { return ReadBytes(std::filesystem::path(ORVIX_FAKE_PLUGINS) / L"good.dll"); }},
+        Malformed{"NulBytes", [] { return std::string(4096, '\0'); }},
+        Malformed{"NulInText",
+                  [] { return Declaration + "<OrvixProviders>a" + std::string(1, '\0') + "</OrvixProviders>"; }},
+        Malformed{"InvalidUtf8", [] { return Declaration + "<OrvixProviders>\xC3\x28\xFF</OrvixProviders>"; }},
+        Malformed{"OddUtf16", [] { return Utf16(u"<?xml version=\"1.0\"?><a>text</a") + "x"; }},
+        Malformed{"ControlCharacter", [] { return Declaration + "<OrvixProviders>\x01</OrvixProviders>"; }},
+        Malformed{"TwoRoots", [] { return Declaration + "<OrvixProviders/><OrvixProviders/>"; }},
+        Malformed{"UnknownEntity", [] { return Declaration + "<OrvixProviders>&nothing;</OrvixProviders>"; }},
+        Malformed{"OpenElements", [] { return Declaration + Repeated("<n>", 100000); }},
+        Malformed{"EntitiesOfEntities",
+                  [] {
+                      return Declaration + NestedEntities() + "<OrvixProviders><a><Name>&e11;</Name></a>" +
+                             "</OrvixProviders>";
+                  }},
+        Malformed{"EntityOfItself",
+                  [] {
+                      return Declaration + "<!DOCTYPE a [<!ENTITY e \"&e;\">]><OrvixProviders><a><Name>&e;</Name>" +
+                             "</a></OrvixProviders>";
+                  }}),
+    [](const testing::TestParamInfo<Malformed>& test) { return std::string(test.param.name); });
+
+TEST_F(HostileFile, InUtf16IsReadLikeAnyOther)
+{
+    AddPlugin(L"good");
+    WriteBytes(PromptsFile(), Utf16(u"<?xml version=\"1.0\" encoding=\"UTF-16\"?><r><p><Text>\u5009</Text><ID>1</ID>"
+                                    u"<Locked>false</Locked><ActionOpts>0</ActionOpts><Action>2</Action></p></r>"));
+    WriteBytes(m_config.Path() / L"OrvixProviders.xml",
+               Utf16(u"<?xml version=\"1.0\" encoding=\"UTF-16\"?><OrvixProviders><a><Name>Depot</Name>"
+                     u"<FixedProjectRoot>\u5009</FixedProjectRoot></a></OrvixProviders>"));
+    EXPECT_TRUE(Initialize());
+    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+    EXPECT_STREQ(m_services->GetProviderFixedProjectRoot(0), L"\u5009");
+    m_services->Shutdown();
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.text = "\xE5\x80\x89", .action = "2"}}));
+}
+
+TEST_F(HostileFile, WithTenMegabytesOfTextKeepsTheOtherRows)
+{
+    AddPlugin(L"good");
+    const std::string text(10 << 20, 'x');
+    WritePrompts({{.text = text, .id = "1", .action = "2"}, {.id = "2", .action = "4"}});
+    WriteProviders("<a><Name>Depot</Name><FixedProjectRoot>" + text + "</FixedProjectRoot></a>");
+    EXPECT_TRUE(Initialize());
+    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+    EXPECT_EQ(m_services->GetPromptAction(2), 4u);
+    EXPECT_EQ(std::wcslen(m_services->GetProviderFixedProjectRoot(0)), text.size());
+    m_services->Shutdown();
+    EXPECT_EQ(SavedPrompts(),
+              PromptsXml({{.text = std::string(1024, 'x'), .id = "1", .action = "2"}, {.id = "2", .action = "4"}}));
+}
+
+TEST_F(HostileFile, WithAVeryLongProviderNameMatchesNothing)
+{
+    AddPlugin(L"good");
+    WriteProviders("<a><Name>" + std::string(1 << 20, 'x') + "</Name><Enabled>false</Enabled></a>");
+    EXPECT_TRUE(Initialize());
+}
+
+TEST_F(HostileFile, WithAHugeAttributeIsRead)
+{
+    std::string xml = PromptsXml({{.id = "1", .action = "2"}});
+    xml.replace(xml.find("1.0\"", xml.find("<OrvixPrompts")), 3, std::string(5 << 20, 'x'));
+    WriteBytes(PromptsFile(), xml);
+    Initialize(0);
+    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+}
+
+TEST_F(HostileFile, WithManyRowsIsReadWhole)
+{
+    std::vector<StoredPrompt> prompts(20000);
+    for (std::size_t i = 0; i < prompts.size(); ++i)
+        prompts[i].id = std::to_string(i);
+    prompts.back().action = "2";
+    WritePrompts(prompts);
+    Initialize(0);
+    EXPECT_EQ(m_services->GetPromptAction(19999), 2u);
+}
+
+TEST_F(HostileFile, NestedTooDeepDoesNoHarm)
+{
+    AddPlugin(L"good");
+    const std::string deep = Repeated("<n>", 100000) + Repeated("</n>", 100000);
+    WriteBytes(PromptsFile(), Declaration + deep);
+    WriteBytes(m_config.Path() / L"OrvixProviders.xml", Declaration + "<OrvixProviders>" + deep + "</OrvixProviders>");
+    EXPECT_TRUE(Initialize());
+    EXPECT_EQ(ProviderNames(), Names{L"Fake Depot"});
+    EXPECT_EQ(m_services->GetProviderFixedProjectRoot(0), nullptr);
+    EXPECT_EQ(m_services->GetPromptAction(0), 0u);
+    m_services->Shutdown();
+    EXPECT_EQ(ReadBytes(PromptsFile()), Declaration + deep);
+}
+
+TEST_F(HostileFile, WhoseDocumentTypeNamesOtherFilesDoesNotReadThem)
+{
+    AddPlugin(L"good");
+    WriteBytes(m_config.Path() / L"secret.txt", "false");
+    WriteBytes(m_config.Path() / L"OrvixProviders.xml",
+               Declaration + "<!DOCTYPE OrvixProviders [<!ENTITY e SYSTEM \"secret.txt\">]>"
+                             "<OrvixProviders><a><Name>Depot</Name><Enabled>&e;</Enabled></a></OrvixProviders>");
+    EXPECT_TRUE(Initialize());
+    EXPECT_EQ(ProviderNames(), Names{L"Fake Depot"});
+}
+
+TEST_F(HostileFile, WithADocumentTypeHasNoPromptsWhereTheRootIsLookedFor)
+{
+    std::string xml = PromptsXml({{.id = "1", .action = "2"}});
+    xml.insert(xml.find("<OrvixPrompts"), "<!DOCTYPE OrvixPrompts>");
+    WriteBytes(PromptsFile(), xml);
+    Initialize(0);
+    EXPECT_EQ(m_services->GetPromptAction(1), 0u);
+    m_services->Shutdown();
+    EXPECT_EQ(ReadBytes(PromptsFile()), xml);
+}
+
+TEST_F(HostileFile, OfALongEntityNamedOftenIsAnsweredInBoundedTimeAndMemory)
+{
+    AddPlugin(L"good");
+    const std::string references = Repeated("&e;", 1000);
+    WriteBytes(PromptsFile(), Declaration + LongEntity() + "<p>" + references + "</p>");
+    WriteBytes(m_config.Path() / L"OrvixProviders.xml", Declaration + LongEntity() +
+                                                            "<OrvixProviders><a><Name>Depot</Name><FixedProjectRoot>" +
+                                                            references + "</FixedProjectRoot></a></OrvixProviders>");
+    EXPECT_TRUE(Initialize());
+    EXPECT_EQ(ProviderNames(), Names{L"Fake Depot"});
+    EXPECT_EQ(m_services->GetPromptAction(0), 0u);
+}

@@ -1,0 +1,598 @@
+#include "ArchiveProject.h"
+
+#include "BraeDiagnostics.h"
+#include "IOrvixClientAccess.h"
+#include "IOrvixProvider.h"
+#include "OrvixClientInfo.h"
+#include "OrvixFileEntry.h"
+#include "OrvixFileList.h"
+
+#include <gtest/gtest.h>
+
+#include <windows.h>
+
+#include <cstring>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace
+{
+
+/// A loaded copy of the plug-in: what one host process has of it.
+class Plugin
+{
+public:
+    explicit Plugin(const std::filesystem::path& file)
+        : m_module(LoadLibraryW(file.c_str())), version(Export<std::int32_t (*)()>("GetOrvixVersion")),
+          get(Export<IOrvixProvider* (*)()>("GetIOrvixProvider")),
+          release(Export<void (*)(IOrvixProvider*)>("ReleaseIOrvixProvider")),
+          name(Export<const wchar_t* (*)()>("GetOrvixProviderName"))
+    {
+    }
+    Plugin(const Plugin&) = delete;
+    Plugin& operator=(const Plugin&) = delete;
+    ~Plugin() { Unload(); }
+
+    bool IsLoaded() const { return version && get && release && name; }
+    HMODULE Module() const { return m_module; }
+
+    void Unload()
+    {
+        if (m_module)
+            FreeLibrary(m_module);
+        m_module = nullptr;
+    }
+
+private:
+    template <typename Function>
+    Function Export(const char* exportName) const
+    {
+        return m_module ? reinterpret_cast<Function>(reinterpret_cast<void*>(GetProcAddress(m_module, exportName)))
+                        : nullptr;
+    }
+
+    HMODULE m_module;
+
+public:
+    std::int32_t (*version)();
+    IOrvixProvider* (*get)();
+    void (*release)(IOrvixProvider*);
+    const wchar_t* (*name)();
+};
+
+/// A host that keeps the lines it is shown.
+class Client final : public IOrvixClientAccess
+{
+public:
+    void OutputText(const wchar_t* text, int kind) override
+    {
+        EXPECT_EQ(kind, 0);
+        lines.emplace_back(text);
+    }
+    std::intptr_t RelayA(void*, void*, void*, void*) override { return 0; }
+    std::uint32_t GetColor(std::int32_t) override { return 0; }
+    bool IsUnattended() override { return true; }
+    std::intptr_t RelayB(void*, void*, void*, void*) override { return 0; }
+
+    bool Shows(const std::wstring& text) const
+    {
+        for (const std::wstring& line : lines)
+        {
+            if (line.find(text) != std::wstring::npos)
+                return true;
+        }
+        return false;
+    }
+
+    std::vector<std::wstring> lines;
+};
+
+constexpr unsigned long Selected = 0x1;
+
+/// A list of files, all of them active.
+class Files
+{
+public:
+    Files(std::initializer_list<std::wstring> files)
+    {
+        for (const std::wstring& file : files)
+            m_list.CreateEntry(file.c_str(), nullptr, Selected, 0);
+        m_list.BuildActiveList(Selected, false);
+    }
+
+    OrvixFileList* Get() { return &m_list; }
+    unsigned long Flags(unsigned int index) { return m_list.GetActiveFileEntry(index)->GetFlagsOut(); }
+
+private:
+    OrvixFileList m_list;
+};
+
+/// One host with a user, its own copy of the plug-in, and a project open.
+class Host
+{
+public:
+    Host(const std::filesystem::path& plugin, const wchar_t* user) : m_plugin(plugin)
+    {
+        m_info.SetUserName(user);
+        m_info.SetIOrvixClientAccess(&client);
+        provider = m_plugin.get();
+    }
+    Host(const Host&) = delete;
+    Host& operator=(const Host&) = delete;
+    ~Host() { m_plugin.release(provider); }
+
+    int Start() { return provider->Initialize(&m_info); }
+
+    int Open(const ArchiveProject& project)
+    {
+        return Start() == 0 ? provider->OpenProject(project.Text().c_str(), L"") : -1;
+    }
+
+    unsigned long Status(const std::wstring& file)
+    {
+        Files files{file};
+        EXPECT_EQ(provider->QueryStatus(files.Get(), 0), 0);
+        return files.Flags(0);
+    }
+
+    Client client;
+    IOrvixProvider* provider = nullptr;
+
+private:
+    Plugin m_plugin;
+    OrvixClientInfo m_info;
+};
+
+/// Anna's and Ben's hosts on one project. Ben's process is played by a second copy of the plug-in.
+class ArchivePlugin : public testing::Test
+{
+protected:
+    void SetUp() override
+    {
+        std::filesystem::copy_file(ARCHIVE_PLUGIN, m_copy.Path() / L"zweite Kopie.dll");
+        m_anna = std::make_unique<Host>(ARCHIVE_PLUGIN, L"anna");
+        m_ben = std::make_unique<Host>(m_copy.Path() / L"zweite Kopie.dll", L"ben");
+        ASSERT_EQ(m_anna->Open(m_project), 0);
+        ASSERT_EQ(m_ben->Open(m_project), 0);
+    }
+
+    void TearDown() override
+    {
+        m_anna.reset();
+        m_ben.reset();
+    }
+
+    std::wstring Added(std::wstring_view name, std::string_view bytes)
+    {
+        std::wstring file = m_project.Write(name, bytes);
+        Files files{file};
+        EXPECT_EQ(m_anna->provider->Add(files.Get(), L"added", 0), 0);
+        return file;
+    }
+
+    std::wstring CheckedOut(std::wstring_view name, std::string_view bytes)
+    {
+        std::wstring file = Added(name, bytes);
+        Files files{file};
+        EXPECT_EQ(m_anna->provider->CheckOut(files.Get(), L"", 0), 0);
+        return file;
+    }
+
+    TempFolder m_copy;
+    ArchiveProject m_project;
+    std::unique_ptr<Host> m_anna;
+    std::unique_ptr<Host> m_ben;
+};
+
+/// The names in the module's export table.
+std::vector<std::string> ExportedNames(HMODULE module)
+{
+    const auto* base = reinterpret_cast<const char*>(module);
+    const auto* dos = reinterpret_cast<const IMAGE_DOS_HEADER*>(base);
+    const auto* headers = reinterpret_cast<const IMAGE_NT_HEADERS*>(base + dos->e_lfanew);
+    const auto& directory = headers->OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_EXPORT];
+    const auto* exports = reinterpret_cast<const IMAGE_EXPORT_DIRECTORY*>(base + directory.VirtualAddress);
+    const auto* names = reinterpret_cast<const DWORD*>(base + exports->AddressOfNames);
+    std::vector<std::string> result;
+    for (DWORD i = 0; i < exports->NumberOfNames; ++i)
+        result.emplace_back(base + names[i]);
+    EXPECT_EQ(exports->NumberOfFunctions, exports->NumberOfNames);
+    return result;
+}
+
+} // namespace
+
+// The contract
+
+TEST(ArchivePluginContract, ExportsItsFourFunctionsAndNothingElse)
+{
+    const Plugin plugin(ARCHIVE_PLUGIN);
+    ASSERT_TRUE(plugin.IsLoaded());
+
+    EXPECT_EQ(ExportedNames(plugin.Module()), (std::vector<std::string>{"GetIOrvixProvider", "GetOrvixProviderName",
+                                                                        "GetOrvixVersion", "ReleaseIOrvixProvider"}));
+    EXPECT_EQ(plugin.version(), 200);
+    EXPECT_STREQ(plugin.name(), L"Archive");
+}
+
+TEST(ArchivePluginContract, HandsOutOneProviderUntilEveryRequestIsReleased)
+{
+    const Plugin plugin(ARCHIVE_PLUGIN);
+    ASSERT_TRUE(plugin.IsLoaded());
+    const long before = BraeDiagnostics::LiveBlocks();
+
+    IOrvixProvider* provider = plugin.get();
+    ASSERT_NE(provider, nullptr);
+    EXPECT_EQ(plugin.get(), provider);
+    EXPECT_STREQ(provider->GetName(), L"Archive");
+    EXPECT_EQ(BraeDiagnostics::LiveBlocks(), before + 1);
+
+    plugin.release(nullptr);
+    plugin.release(provider);
+    EXPECT_FALSE(provider->IsInitialized());
+    plugin.release(provider);
+    EXPECT_EQ(BraeDiagnostics::LiveBlocks(), before);
+    EXPECT_EQ(BraeDiagnostics::ForeignFrees(), 0);
+}
+
+TEST(ArchivePluginContract, DeletesTheProviderWhenItIsUnloaded)
+{
+    const long before = BraeDiagnostics::LiveBlocks();
+    Plugin plugin(ARCHIVE_PLUGIN);
+    ASSERT_TRUE(plugin.IsLoaded());
+    ASSERT_NE(plugin.get(), nullptr);
+
+    plugin.Unload();
+
+    EXPECT_EQ(BraeDiagnostics::LiveBlocks(), before);
+}
+
+TEST(ArchivePluginContract, GivesNoProviderWhenTheHostsHeapIsExhausted)
+{
+    const Plugin plugin(ARCHIVE_PLUGIN);
+    ASSERT_TRUE(plugin.IsLoaded());
+
+    BraeDiagnostics::FailAllocation(1, false);
+    EXPECT_EQ(plugin.get(), nullptr);
+    BraeDiagnostics::FailAllocation(0, false);
+
+    IOrvixProvider* provider = plugin.get();
+    EXPECT_NE(provider, nullptr);
+    plugin.release(provider);
+}
+
+TEST_F(ArchivePlugin, AnswersReservedAndNotOfferedOperationsAsTheInterfaceSays)
+{
+    IOrvixProvider* provider = m_anna->provider;
+    unsigned long first = 1;
+    unsigned long second = 2;
+    EXPECT_EQ(provider->ReservedA(), 0);
+    EXPECT_EQ(provider->ReservedB(), 0);
+    EXPECT_EQ(provider->ReservedC(), -2);
+    EXPECT_EQ(provider->ReservedD(nullptr, &first, &second), -2);
+    EXPECT_EQ(first, 0u);
+    EXPECT_EQ(second, 0u);
+    EXPECT_EQ(provider->ReservedE(), -2);
+    EXPECT_EQ(provider->ReservedF(), -2);
+    EXPECT_EQ(provider->ReservedG(), -2);
+    EXPECT_EQ(provider->ReservedH(), -2);
+    EXPECT_TRUE(provider->ReservedI());
+    EXPECT_EQ(provider->ShowOptions(), -2);
+    EXPECT_EQ(provider->RunProviderClient(), -2);
+}
+
+// The session
+
+TEST_F(ArchivePlugin, GoesThroughItsStates)
+{
+    IOrvixProvider* provider = m_anna->provider;
+    EXPECT_TRUE(provider->IsInitialized());
+    EXPECT_TRUE(provider->IsProjectOpen());
+    EXPECT_EQ(provider->CloseProject(), 0);
+    EXPECT_FALSE(provider->IsProjectOpen());
+    EXPECT_EQ(provider->CloseProject(), -1);
+    EXPECT_EQ(provider->OpenProject(m_project.Text().c_str(), nullptr), 0);
+    EXPECT_EQ(provider->Uninitialize(), 0);
+    EXPECT_FALSE(provider->IsInitialized());
+    EXPECT_FALSE(provider->IsProjectOpen());
+    EXPECT_EQ(provider->Uninitialize(), -1);
+    EXPECT_EQ(provider->OpenProject(m_project.Text().c_str(), nullptr), -1);
+    EXPECT_EQ(provider->Initialize(nullptr), -1);
+    EXPECT_FALSE(provider->IsInitialized());
+}
+
+TEST_F(ArchivePlugin, SaysWhyAProjectCannotBeOpened)
+{
+    EXPECT_EQ(m_anna->provider->OpenProject(nullptr, L""), -1);
+    EXPECT_EQ(m_anna->provider->OpenProject(m_project.File(L"nowhere").c_str(), L""), -1);
+
+    EXPECT_FALSE(m_anna->provider->IsProjectOpen());
+    EXPECT_EQ(m_anna->client.lines.size(), 1u);
+}
+
+TEST_F(ArchivePlugin, BeginsANewSessionWithASecondInitialize)
+{
+    const std::wstring file = CheckedOut(L"a.txt", "one");
+    Client second;
+    OrvixClientInfo info;
+    info.SetUserName(L"clara");
+    info.SetIOrvixClientAccess(&second);
+
+    ASSERT_EQ(m_anna->provider->Initialize(&info), 0);
+
+    EXPECT_FALSE(m_anna->provider->IsProjectOpen());
+    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), 0);
+    EXPECT_EQ(m_anna->Status(file) & 0xC, 0x8u);
+    EXPECT_EQ(m_anna->Start(), 0);
+}
+
+TEST_F(ArchivePlugin, TakesTheWindowsUserWhenTheClientNamesNone)
+{
+    wchar_t user[257] = L"";
+    DWORD size = 257;
+    ASSERT_TRUE(::GetUserNameW(user, &size));
+    OrvixClientInfo info;
+    info.SetIOrvixClientAccess(&m_anna->client);
+    ASSERT_EQ(m_anna->provider->Initialize(&info), 0);
+    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), 0);
+    Files files{Added(L"a.txt", "one")};
+
+    EXPECT_EQ(m_anna->provider->ShowHistory(files.Get()), 0);
+
+    EXPECT_TRUE(m_anna->client.Shows(user));
+}
+
+TEST_F(ArchivePlugin, WorksForAClientWithoutAnInterface)
+{
+    OrvixClientInfo info;
+    info.SetUserName(L"anna");
+    ASSERT_EQ(m_anna->provider->Initialize(&info), 0);
+    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), 0);
+    Files files{Added(L"a.txt", "one"), m_project.File(L"missing.txt")};
+
+    EXPECT_EQ(m_anna->provider->ShowHistory(files.Get()), -1);
+}
+
+// File operations
+
+TEST_F(ArchivePlugin, FailsWithoutActiveEntriesInEveryFileOperation)
+{
+    IOrvixProvider* provider = m_anna->provider;
+    Files none{};
+    for (OrvixFileList* list : {none.Get(), static_cast<OrvixFileList*>(nullptr)})
+    {
+        EXPECT_EQ(provider->Add(list, L"", 0), -1);
+        EXPECT_EQ(provider->CheckOut(list, L"", 0), -1);
+        EXPECT_EQ(provider->CheckIn(list, L"", 0), -1);
+        EXPECT_EQ(provider->UndoCheckOut(list, 0), -1);
+        EXPECT_EQ(provider->GetLatest(list, 0), -1);
+        EXPECT_EQ(provider->ShowHistory(list), -1);
+        EXPECT_EQ(provider->ShowProperties(list), -1);
+        EXPECT_EQ(provider->QueryStatus(list, 0), -1);
+    }
+}
+
+TEST_F(ArchivePlugin, FailsWithoutAnOpenProjectAndSaysSo)
+{
+    Files files{m_project.Write(L"a.txt", "one")};
+    IOrvixProvider* provider = m_anna->provider;
+    ASSERT_EQ(provider->CloseProject(), 0);
+
+    EXPECT_EQ(provider->Add(files.Get(), L"", 0), -1);
+    EXPECT_EQ(provider->CheckOut(files.Get(), L"", 0x2), -1);
+    EXPECT_EQ(provider->CheckIn(files.Get(), L"", 0), -1);
+    EXPECT_EQ(provider->UndoCheckOut(files.Get(), 0), -1);
+    EXPECT_EQ(provider->GetLatest(files.Get(), 0), -1);
+    EXPECT_EQ(provider->ShowHistory(files.Get()), -1);
+    EXPECT_EQ(provider->ShowProperties(files.Get()), -1);
+    EXPECT_EQ(m_anna->client.lines, std::vector<std::wstring>(7, L"No project is open"));
+}
+
+TEST_F(ArchivePlugin, WorksOnTheActiveEntriesOnly)
+{
+    const std::wstring active = m_project.Write(L"active.txt", "x");
+    const std::wstring passive = m_project.Write(L"passive.txt", "x");
+    OrvixFileList list;
+    list.CreateEntry(active.c_str(), nullptr, 0x1, 0);
+    list.CreateEntry(passive.c_str(), nullptr, 0x2, 0);
+    ASSERT_EQ(list.BuildActiveList(0x1, false), 1u);
+
+    EXPECT_EQ(m_anna->provider->Add(&list, nullptr, 0), 0);
+
+    EXPECT_EQ(m_anna->Status(active) & 0x2, 0x2u);
+    EXPECT_EQ(m_anna->Status(passive) & 0x2, 0u);
+}
+
+TEST_F(ArchivePlugin, TellsTheReasonForEachFileThatFailsAndDoesTheOthers)
+{
+    const std::wstring good = m_project.Write(L"good.txt", "x");
+    Files files{m_project.File(L"missing.txt"), good, m_project.File(L"..\\x.txt")};
+
+    EXPECT_EQ(m_anna->provider->Add(files.Get(), L"", 0), -1);
+
+    ASSERT_EQ(m_anna->client.lines.size(), 2u);
+    EXPECT_EQ(m_anna->client.lines[0].find(m_project.File(L"missing.txt") + L": "), 0u);
+    EXPECT_EQ(m_anna->client.lines[1].find(m_project.File(L"..\\x.txt") + L": "), 0u);
+    EXPECT_TRUE(IsReadOnly(good));
+}
+
+TEST_F(ArchivePlugin, HonoursTheKeepCheckedOutBitOfAddAndCheckIn)
+{
+    const std::wstring file = m_project.Write(L"a.txt", "one");
+    Files files{file};
+
+    ASSERT_EQ(m_anna->provider->Add(files.Get(), L"", 0x1), 0);
+    EXPECT_FALSE(IsReadOnly(file));
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0x5), 0);
+    EXPECT_FALSE(IsReadOnly(file));
+    EXPECT_EQ(m_anna->Status(file) & 0x4, 0x4u);
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0x4), 0);
+    EXPECT_TRUE(IsReadOnly(file));
+    EXPECT_EQ(m_anna->Status(file) & 0x4, 0u);
+}
+
+TEST_F(ArchivePlugin, KeepsTwoHostsFromHoldingOneFile)
+{
+    const std::wstring file = CheckedOut(L"a.txt", "one");
+    Files files{file};
+
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), -1);
+    EXPECT_TRUE(m_ben->client.Shows(L"anna"));
+    EXPECT_EQ(m_ben->provider->CheckIn(files.Get(), L"", 0), -1);
+    EXPECT_EQ(m_ben->provider->UndoCheckOut(files.Get(), 0), -1);
+
+    m_project.Write(L"a.txt", "two");
+    EXPECT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0), 0);
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), 0);
+    EXPECT_EQ(m_project.Read(L"a.txt"), "two");
+}
+
+TEST_F(ArchivePlugin, GetsTheLatestVersionBeforeACheckOutWhenAsked)
+{
+    const std::wstring file = CheckedOut(L"a.txt", "one");
+    Files files{file};
+    m_project.Write(L"a.txt", "two");
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0), 0);
+    m_project.Overwrite(file, "one");
+
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), -1);
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0x2), 0);
+
+    EXPECT_EQ(m_project.Read(L"a.txt"), "two");
+}
+
+TEST_F(ArchivePlugin, UndoesACheckOutAndGetsTheLatestVersionAfterwardsWhenAsked)
+{
+    const std::wstring held = CheckedOut(L"held.txt", "one");
+    const std::wstring missing = Added(L"missing.txt", "one");
+    m_project.Write(L"held.txt", "no good");
+    SetReadOnly(missing, false);
+    std::filesystem::remove(missing);
+    Files files{held, missing};
+
+    EXPECT_EQ(m_anna->provider->UndoCheckOut(files.Get(), 0x2), -1) << "one file was not checked out";
+
+    EXPECT_EQ(m_project.Read(L"held.txt"), "one");
+    EXPECT_TRUE(IsReadOnly(held));
+    EXPECT_EQ(m_project.Read(L"missing.txt"), "one");
+
+    Files one{CheckedOut(L"other.txt", "one")};
+    EXPECT_EQ(m_anna->provider->UndoCheckOut(one.Get(), 0x2), 0);
+}
+
+TEST_F(ArchivePlugin, GetsTheLatestVersion)
+{
+    const std::wstring file = Added(L"Ünïcode 日本.txt", "one");
+    SetReadOnly(file, false);
+    std::filesystem::remove(file);
+    Files files{file};
+
+    EXPECT_EQ(m_ben->provider->GetLatest(files.Get(), 0), 0);
+
+    EXPECT_EQ(m_project.Read(L"Ünïcode 日本.txt"), "one");
+    EXPECT_TRUE(IsReadOnly(file));
+}
+
+// Status
+
+TEST_F(ArchivePlugin, GivesTheStatusBitsOfEveryState)
+{
+    const std::wstring unknown = m_project.Write(L"unknown.txt", "x");
+    const std::wstring controlled = Added(L"controlled.txt", "one");
+    const std::wstring held = CheckedOut(L"held.txt", "one");
+    const std::wstring edited = CheckedOut(L"edited.txt", "one");
+    m_project.Write(L"edited.txt", "edited");
+    const std::wstring changed = Added(L"changed.txt", "one");
+    m_project.Overwrite(changed, "changed");
+    const std::wstring missing = Added(L"missing.txt", "one");
+    SetReadOnly(missing, false);
+    std::filesystem::remove(missing);
+
+    const auto flags = [&](Host& host) {
+        Files files{unknown, controlled, held, edited, changed, missing};
+        EXPECT_EQ(host.provider->QueryStatus(files.Get(), 0), 0);
+        std::vector<unsigned long> result;
+        for (unsigned int i = 0; i < 6; ++i)
+            result.push_back(files.Flags(i));
+        return result;
+    };
+    EXPECT_EQ(flags(*m_anna), (std::vector<unsigned long>{
+                                  0x100001,
+                                  0x2 | 0x20000 | 0x200000 | 0x400000,
+                                  0x2 | 0x4 | 0x10000 | 0x40000 | 0x80000 | 0x200000 | 0x400000,
+                                  0x2 | 0x4 | 0x80 | 0x10000 | 0x40000 | 0x80000 | 0x200000 | 0x400000,
+                                  0x2 | 0x80 | 0x20000 | 0x80000 | 0x200000 | 0x400000,
+                                  0x2 | 0x10 | 0x200000 | 0x400000,
+                              }));
+    EXPECT_EQ(flags(*m_ben), (std::vector<unsigned long>{
+                                 0x100001,
+                                 0x2 | 0x20000 | 0x200000 | 0x400000,
+                                 0x2 | 0x8 | 0x200000 | 0x400000,
+                                 0x2 | 0x8 | 0x80 | 0x80000 | 0x200000 | 0x400000,
+                                 0x2 | 0x80 | 0x20000 | 0x80000 | 0x200000 | 0x400000,
+                                 0x2 | 0x10 | 0x200000 | 0x400000,
+                             }));
+}
+
+TEST_F(ArchivePlugin, GivesEveryEntryTheUncontrolledBitWithoutAnOpenProject)
+{
+    const std::wstring file = CheckedOut(L"a.txt", "one");
+    ASSERT_EQ(m_anna->provider->CloseProject(), 0);
+
+    EXPECT_EQ(m_anna->Status(file), 0x1u);
+    m_anna->provider->Uninitialize();
+    EXPECT_EQ(m_anna->Status(file), 0x1u);
+    EXPECT_EQ(m_anna->Start(), 0);
+}
+
+TEST_F(ArchivePlugin, ChangesNoEntryWhenTheStatusOfOneFails)
+{
+    const std::wstring damaged = Added(L"a.txt", "one");
+    for (const auto& entry : std::filesystem::recursive_directory_iterator(m_project.Path(L".archive\\files")))
+    {
+        if (entry.is_regular_file())
+            m_project.Overwrite(entry.path(), "damaged");
+    }
+    Files files{m_project.Write(L"good.txt", "x"), damaged};
+    for (unsigned int i = 0; i < 2; ++i)
+        files.Get()->GetActiveFileEntry(i)->SetFlagsOut(0xABC);
+
+    EXPECT_EQ(m_anna->provider->QueryStatus(files.Get(), 0), -1);
+
+    EXPECT_EQ(files.Flags(0), 0xABCu);
+    EXPECT_EQ(files.Flags(1), 0xABCu);
+    EXPECT_TRUE(m_anna->client.Shows(damaged));
+}
+
+// Texts
+
+TEST_F(ArchivePlugin, ShowsTheHistoryLineByLineNewestFirst)
+{
+    const std::wstring file = CheckedOut(L"sub\\a.txt", "one");
+    Files files{file};
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"first line\r\nsecond line", 0), 0);
+
+    EXPECT_EQ(m_ben->provider->ShowHistory(files.Get()), 0);
+
+    const std::vector<std::wstring>& lines = m_ben->client.lines;
+    ASSERT_EQ(lines.size(), 4u);
+    EXPECT_EQ(lines[0], L"sub/a.txt");
+    EXPECT_EQ(lines[1].substr(0, 5), L"  2  ");
+    EXPECT_EQ(lines[1].substr(25), L"  anna  first line");
+    EXPECT_EQ(lines[2], L"     second line");
+    EXPECT_EQ(lines[3].substr(0, 5), L"  1  ");
+    EXPECT_EQ(lines[3].substr(25), L"  anna  added");
+}
+
+TEST_F(ArchivePlugin, ShowsThePropertiesOfTheFirstActiveFileOnly)
+{
+    Files files{CheckedOut(L"first.txt", "one"), Added(L"second.txt", "one"), m_project.File(L"missing.txt")};
+
+    EXPECT_EQ(m_ben->provider->ShowProperties(files.Get()), 0);
+
+    EXPECT_TRUE(m_ben->client.Shows(L"first.txt"));
+    EXPECT_TRUE(m_ben->client.Shows(L"anna"));
+    EXPECT_FALSE(m_ben->client.Shows(L"second.txt"));
+    EXPECT_FALSE(m_ben->client.Shows(L"missing.txt"));
+}

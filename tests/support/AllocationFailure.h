@@ -1,0 +1,100 @@
+#pragma once
+
+#include <windows.h>
+
+#include <string>
+
+/// Redirects one function that a loaded module imports, for as long as the object lives. Only calls made by
+/// that module are redirected, whatever library the function comes from.
+///
+///     static BSTR __stdcall NoMemory(const OLECHAR*) { return nullptr; }
+///     ImportHook hook(GetModuleHandleW(L"OrvixCore.dll"), "SysAllocString", reinterpret_cast<void*>(&NoMemory));
+///
+/// Hooks of the same import must end in reverse order of their beginning.
+class ImportHook
+{
+public:
+    /// `name` is the import's undecorated name. A module that does not import it gives an inactive hook.
+    ImportHook(HMODULE module, const char* name, void* replacement);
+    ImportHook(const ImportHook&) = delete;
+    ImportHook& operator=(const ImportHook&) = delete;
+    ~ImportHook();
+
+    bool IsActive() const { return m_slot != nullptr; }
+
+    /// The function as it was; null for an inactive hook.
+    template <typename Function>
+    Function* Original() const
+    {
+        return reinterpret_cast<Function*>(m_original);
+    }
+
+private:
+    void** m_slot = nullptr;
+    void* m_original = nullptr;
+};
+
+/// A heap of which one allocation can be made to fail. Not thread-safe.
+class AllocationHeap
+{
+public:
+    AllocationHeap() = default;
+    AllocationHeap(const AllocationHeap&) = delete;
+    AllocationHeap& operator=(const AllocationHeap&) = delete;
+    virtual ~AllocationHeap() = default;
+
+    /// Names the heap in the messages of a failed test.
+    virtual std::string Name() const = 0;
+
+    /// Makes the n-th allocation from now fail (1: the very next one), with `forGood` all later ones as well.
+    virtual void Fail(long n, bool forGood) = 0;
+
+    /// Ends the failing. True when an allocation has failed since `Fail`.
+    virtual bool Stop() = 0;
+
+    /// Blocks in use now. Two readings are compared; the value by itself means nothing.
+    virtual long LiveBlocks() const = 0;
+};
+
+/// The host's heap, on which records live: braeutil's, with the means of its development build. A failure is
+/// noticed only where OrvixCore.dll itself meets it.
+class HostHeap final : public AllocationHeap
+{
+public:
+    HostHeap();
+    HostHeap(const HostHeap&) = delete;
+    HostHeap& operator=(const HostHeap&) = delete;
+    ~HostHeap() override;
+
+    std::string Name() const override { return "host heap"; }
+    void Fail(long n, bool forGood) override;
+    bool Stop() override;
+    long LiveBlocks() const override;
+
+private:
+    ImportHook m_new;
+    ImportHook m_newArray;
+};
+
+/// OrvixCore.dll's ordinary allocator: `malloc` and its kin, as the module imports them. Its operator new and
+/// its C++ run-time call nothing else.
+///
+/// Live blocks are those that OrvixCore.dll has allocated since the program began and that neither it nor the
+/// program has freed: the storage of a std::wstring may grow in the one and go in the other.
+class LibraryHeap final : public AllocationHeap
+{
+public:
+    LibraryHeap();
+    LibraryHeap(const LibraryHeap&) = delete;
+    LibraryHeap& operator=(const LibraryHeap&) = delete;
+    ~LibraryHeap() override;
+
+    std::string Name() const override { return "OrvixCore.dll's own heap"; }
+    void Fail(long n, bool forGood) override;
+    bool Stop() override;
+    long LiveBlocks() const override;
+};
+
+/// Lets OrvixCore.dll throw and catch an exception on this thread. The C++ run-time keeps some memory for
+/// exceptions, once per thread; afterwards it counts neither as an allocation of an operation nor as a leak.
+void MeetException();

@@ -1,0 +1,96 @@
+// A provider plug-in for tests, built once per defect: the build sets FAKE_TAG (its word in the journal),
+// FAKE_NAME, FAKE_VERSION and what is to go wrong; the export list leaves functions out.
+
+#include "FakeJournal.h"
+#include "FakeProvider.h"
+
+#include <windows.h>
+
+#include <comdef.h>
+
+#include <cstdint>
+#include <new>
+
+#ifndef FAKE_VERSION
+#define FAKE_VERSION 200
+#endif
+#if defined(FAKE_NAME_FOREIGN)
+#define FAKE_NAME L"D\u00E9p\u00F4t \u5009\u5EAB"
+#elif !defined(FAKE_NAME)
+#define FAKE_NAME L"Fake Depot"
+#endif
+
+namespace
+{
+
+void Note(const wchar_t* what)
+{
+    FakeJournal::Add(std::wstring(FAKE_TAG L".") + what);
+}
+
+/// The file of the manifest that is active on this thread; empty when none is.
+std::wstring ActiveManifest()
+{
+    alignas(ACTIVATION_CONTEXT_DETAILED_INFORMATION) std::byte buffer[4096];
+    SIZE_T written = 0;
+    if (!QueryActCtxW(QUERY_ACTCTX_FLAG_USE_ACTIVE_ACTCTX, nullptr, nullptr, ActivationContextDetailedInformation,
+                      buffer, sizeof buffer, &written))
+        return {};
+    const auto* context = reinterpret_cast<const ACTIVATION_CONTEXT_DETAILED_INFORMATION*>(buffer);
+    return context->lpRootManifestPath ? context->lpRootManifestPath : L"";
+}
+
+} // namespace
+
+extern "C" {
+
+std::int32_t GetOrvixVersion()
+{
+    Note(L"version");
+    return FAKE_VERSION;
+}
+
+IOrvixProvider* GetIOrvixProvider()
+{
+    Note(L"get");
+#ifdef FAKE_PROVIDER_THROWS
+    throw FAKE_PROVIDER_THROWS;
+#else
+    // One of several in turn, so that the caller cannot have kept the last one.
+    static FakeProvider providers[] = {FakeProvider(FAKE_NAME), FakeProvider(FAKE_NAME), FakeProvider(FAKE_NAME)};
+    static unsigned int next = 0;
+    return &providers[next++ % 3];
+#endif
+}
+
+void ReleaseIOrvixProvider(IOrvixProvider*)
+{
+    Note(L"release");
+}
+
+const wchar_t* GetOrvixProviderName()
+{
+    Note(L"name");
+#ifdef FAKE_NAME_THROWS
+    throw FAKE_NAME_THROWS;
+#else
+    return FAKE_NAME;
+#endif
+}
+
+} // extern "C"
+
+BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
+{
+    if (reason == DLL_PROCESS_ATTACH)
+    {
+        Note(L"load");
+        SetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST", ActiveManifest().c_str());
+#ifdef FAKE_START_FAILS
+        return FALSE;
+#endif
+    }
+    else if (reason == DLL_PROCESS_DETACH)
+        Note(L"unload");
+    return TRUE;
+}

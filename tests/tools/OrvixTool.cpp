@@ -1,0 +1,98 @@
+#include "OrvixTool.h"
+
+#include "Files.h"
+
+#include <windows.h>
+
+#include <algorithm>
+#include <memory>
+#include <stdexcept>
+
+namespace
+{
+constexpr DWORD Milliseconds = 60'000;
+
+struct CloseHandleOf
+{
+    using pointer = HANDLE;
+    void operator()(HANDLE handle) const { CloseHandle(handle); }
+};
+using UniqueHandle = std::unique_ptr<HANDLE, CloseHandleOf>;
+
+UniqueHandle NewFile(const std::filesystem::path& path)
+{
+    SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
+    UniqueHandle file(CreateFileW(path.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE, &inheritable,
+                                  CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
+    if (file.get() == INVALID_HANDLE_VALUE)
+    {
+        file.release();
+        throw std::runtime_error("no file for the output");
+    }
+    return file;
+}
+
+/// One argument as the C run-time takes it apart again.
+std::wstring Quoted(const std::wstring& argument)
+{
+    std::wstring quoted = L"\"";
+    std::size_t backslashes = 0;
+    for (const wchar_t character : argument)
+    {
+        if (character == L'"')
+        {
+            quoted.append(backslashes + 1, L'\\');
+        }
+        backslashes = character == L'\\' ? backslashes + 1 : 0;
+        quoted += character;
+    }
+    return quoted.append(backslashes, L'\\') + L'"';
+}
+
+std::string Lines(const std::filesystem::path& path)
+{
+    std::string text = ReadBytes(path);
+    text.erase(std::remove(text.begin(), text.end(), '\r'), text.end());
+    return text;
+}
+} // namespace
+
+OrvixTool::Result OrvixTool::Run(const std::filesystem::path& program, const std::filesystem::path& scratch,
+                                 const std::filesystem::path& folder, const std::vector<std::wstring>& arguments)
+{
+    const std::filesystem::path outputFile = scratch / L"output.txt";
+    const std::filesystem::path errorFile = scratch / L"errors.txt";
+    std::wstring commandLine = Quoted(program.wstring());
+    for (const std::wstring& argument : arguments)
+    {
+        commandLine += L' ' + Quoted(argument);
+    }
+
+    Result result{TimedOut, {}, {}};
+    {
+        const UniqueHandle output = NewFile(outputFile);
+        const UniqueHandle errors = NewFile(errorFile);
+        STARTUPINFOW startup{};
+        startup.cb = sizeof startup;
+        startup.dwFlags = STARTF_USESTDHANDLES;
+        startup.hStdOutput = output.get();
+        startup.hStdError = errors.get();
+        PROCESS_INFORMATION information{};
+        if (!CreateProcessW(nullptr, commandLine.data(), nullptr, nullptr, TRUE, CREATE_NO_WINDOW, nullptr,
+                            folder.c_str(), &startup, &information))
+        {
+            throw std::runtime_error("the program does not start");
+        }
+        const UniqueHandle process(information.hProcess);
+        const UniqueHandle thread(information.hThread);
+        if (WaitForSingleObject(process.get(), Milliseconds) != WAIT_OBJECT_0)
+        {
+            TerminateProcess(process.get(), TimedOut);
+            WaitForSingleObject(process.get(), INFINITE);
+        }
+        GetExitCodeProcess(process.get(), &result.code);
+    }
+    result.output = Lines(outputFile);
+    result.errors = Lines(errorFile);
+    return result;
+}
