@@ -1,5 +1,6 @@
 #include "FileListOperation.h"
 
+#include "IOrvixCoreUI.h"
 #include "IOrvixProvider.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
@@ -186,7 +187,7 @@ FileListOperation::Confirmation FileListOperation::ShowDialog(bool locked)
 {
     const std::uint32_t options = m_params.GetOptions() | DialogShown;
     m_params.SetOptions(locked ? options & ~RememberOffered : options);
-    const std::int32_t result = m_services.ShowFileListDialog(m_dialogArgument, &m_params);
+    const std::int32_t result = m_services.CoreUI().ShowFileListDialog(m_dialogArgument, &m_params);
 
     bool run = false;
     if (result == Done)

@@ -372,7 +372,6 @@ OrvixProviderConfig* OrvixServices::ConfigOf(std::uint32_t index)
     return index < GetProviderCount() ? m_providers[index]->config : nullptr;
 }
 
-/// The user-interface library's interface, obtained on first use and kept until the object is destroyed.
 IOrvixCoreUI& OrvixServices::CoreUI()
 {
     if (!m_coreUI)

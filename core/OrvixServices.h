@@ -53,6 +53,9 @@ public:
     /// Whether the host says that nobody can answer.
     bool IsUnattended();
 
+    /// The user-interface library's interface, obtained on first use and kept until the object is destroyed.
+    IOrvixCoreUI& CoreUI();
+
 private:
     bool DiscoverPlugins(OrvixClientInfo* info);
     std::unique_ptr<OrvixProviderEntry> LoadPlugin(const wchar_t* path);
@@ -63,7 +66,6 @@ private:
     int FirstPrompt(std::uint32_t promptID);
     int LastPrompt(std::uint32_t promptID);
     OrvixProviderConfig* ConfigOf(std::uint32_t index);
-    IOrvixCoreUI& CoreUI();
 
     bool m_initialized = false;
     std::vector<std::unique_ptr<OrvixProviderEntry>> m_providers;
