@@ -89,6 +89,10 @@ bool OrvixFileIO::OpenDocument(const wchar_t* path)
     {
         VARIANT_BOOL ignored = VARIANT_FALSE;
         m_document->load(ComVariant(path).Get(), &ignored);
+        // Its entities can make a short file stand for gigabytes of text, and nothing here needs them.
+        ComPtr<IXMLDOMDocumentType> type;
+        if (m_document->get_doctype(&type) == S_OK && type)
+            m_document->loadXML(ComString(L"").Get(), &ignored);
     }
     if (FAILED(m_document->QueryInterface(InterfaceNode,
                                           reinterpret_cast<void**>(m_documentNode.ReleaseAndGetAddressOf()))))

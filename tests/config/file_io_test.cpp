@@ -138,7 +138,8 @@ TEST_F(OrvixFileIOOpenDocument, TakesANameRelativeToTheCurrentFolder)
 
 TEST_F(OrvixFileIOOpenDocument, GivesAnEmptyDocumentForAFileWithADocumentType)
 {
-    for (const char* type : {"<!DOCTYPE a>", "<!DOCTYPE a [<!ENTITY e \"text\">]>", "<!DOCTYPE a SYSTEM \"other.dtd\">"})
+    for (const char* type :
+         {"<!DOCTYPE a>", "<!DOCTYPE a [<!ENTITY e \"text\">]>", "<!DOCTYPE a SYSTEM \"other.dtd\">"})
     {
         OrvixFileIO file;
         WriteBytes(m_path, std::string("<?xml version=\"1.0\"?>") + type + "<a>text</a>");

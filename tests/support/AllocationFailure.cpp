@@ -77,21 +77,20 @@ struct Failing
 {
     bool Strikes()
     {
-        if (countdown == 0)
+        if (remaining == 0)
             return false;
         if (countdown > 1)
         {
             --countdown;
             return false;
         }
-        if (!forGood)
-            countdown = 0;
+        --remaining;
         ++failures;
         return true;
     }
 
-    long countdown = 0;
-    bool forGood = false;
+    long countdown = 1;
+    long remaining = 0;
     long failures = 0;
 };
 
@@ -268,6 +267,15 @@ LibraryHeap::LibraryHeap()
 {
     if (!g_watched.malloc.IsActive() || !g_watched.free.IsActive())
         throw std::runtime_error("OrvixCore.dll does not import malloc and free");
+
+    // What the C++ run-time makes when it is first needed to throw: its state for the thread, and the lock of
+    // the store from which exceptions come when there is no memory for them either.
+    for (const long failures : {1, 2})
+    {
+        g_watched.failing = {1, failures, 0};
+        OrvixPromptTable().AddPrompt(1, L"", 0, 0, false);
+    }
+    g_watched.failing = {};
 }
 
 LibraryHeap::~LibraryHeap()
@@ -277,7 +285,7 @@ LibraryHeap::~LibraryHeap()
 
 void LibraryHeap::Fail(long n, bool forGood)
 {
-    g_watched.failing = {n, forGood, 0};
+    g_watched.failing = {n, forGood ? std::numeric_limits<long>::max() : 1, 0};
 }
 
 bool LibraryHeap::Stop()

@@ -39,19 +39,19 @@ std::string LongEntity()
 
 const std::string Declaration = "<?xml version=\"1.0\"?>";
 
-/// Bytes that are no XML document: both files answer as if they were missing.
-struct Malformed
+/// Bytes that are no XML document, or one with a document type: both files answer as if they were missing.
+struct Unreadable
 {
     const char* name;
     std::function<std::string()> bytes;
 };
 
-void PrintTo(const Malformed& file, std::ostream* stream)
+void PrintTo(const Unreadable& file, std::ostream* stream)
 {
     *stream << file.name;
 }
 
-class MalformedFile : public ServicesTest, public testing::WithParamInterface<Malformed>
+class UnreadableFile : public ServicesTest, public testing::WithParamInterface<Unreadable>
 {
 };
 
@@ -71,7 +71,7 @@ protected:
 
 } // namespace
 
-TEST_P(MalformedFile, OfPromptsIsAnEmptyTableAndStaysAsItIs)
+TEST_P(UnreadableFile, OfPromptsIsAnEmptyTableAndStaysAsItIs)
 {
     const std::string bytes = GetParam().bytes();
     WritePrompts({{.id = "1", .action = "2"}});
@@ -84,7 +84,7 @@ TEST_P(MalformedFile, OfPromptsIsAnEmptyTableAndStaysAsItIs)
     EXPECT_EQ(ReadBytes(PromptsFile()), bytes);
 }
 
-TEST_P(MalformedFile, OfProvidersLeavesEveryProviderEnabledAndUnfiltered)
+TEST_P(UnreadableFile, OfProvidersLeavesEveryProviderEnabledAndUnfiltered)
 {
     AddPlugin(L"good");
     WriteBytes(m_config.Path() / L"OrvixProviders.xml", GetParam().bytes());
@@ -94,39 +94,56 @@ TEST_P(MalformedFile, OfProvidersLeavesEveryProviderEnabledAndUnfiltered)
 }
 
 INSTANTIATE_TEST_SUITE_P(
-    Bytes, MalformedFile,
+    Bytes, UnreadableFile,
     testing::Values(
-        Malformed{"Empty", [] { return std::string(); }},
-        Malformed{"BlanksOnly", [] { return std::string(" \r\n\t "); }},
-        Malformed{"ByteOrderMarkOnly", [] { return std::string("\xEF\xBB\xBF"); }},
-        Malformed{"Truncated",
-                  [] {
-                      const std::string whole = PromptsXml({{.id = "1", .action = "2"}});
-                      return whole.substr(0, whole.size() - 3);
-                  }},
-        Malformed{"TruncatedProviders",
-                  [] { return Declaration + "<OrvixProviders><a><Name>Depot</Name><Enabled>false</Enabled></a>"; }},
-        Malformed{"Binary", [] { return ReadBytes(std::filesystem::path(ORVIX_FAKE_PLUGINS) / L"good.dll"); }},
-        Malformed{"NulBytes", [] { return std::string(4096, '\0'); }},
-        Malformed{"NulInText",
-                  [] { return Declaration + "<OrvixProviders>a" + std::string(1, '\0') + "</OrvixProviders>"; }},
-        Malformed{"InvalidUtf8", [] { return Declaration + "<OrvixProviders>\xC3\x28\xFF</OrvixProviders>"; }},
-        Malformed{"OddUtf16", [] { return Utf16(u"<?xml version=\"1.0\"?><a>text</a") + "x"; }},
-        Malformed{"ControlCharacter", [] { return Declaration + "<OrvixProviders>\x01</OrvixProviders>"; }},
-        Malformed{"TwoRoots", [] { return Declaration + "<OrvixProviders/><OrvixProviders/>"; }},
-        Malformed{"UnknownEntity", [] { return Declaration + "<OrvixProviders>&nothing;</OrvixProviders>"; }},
-        Malformed{"OpenElements", [] { return Declaration + Repeated("<n>", 100000); }},
-        Malformed{"EntitiesOfEntities",
-                  [] {
-                      return Declaration + NestedEntities() + "<OrvixProviders><a><Name>&e11;</Name></a>" +
-                             "</OrvixProviders>";
-                  }},
-        Malformed{"EntityOfItself",
-                  [] {
-                      return Declaration + "<!DOCTYPE a [<!ENTITY e \"&e;\">]><OrvixProviders><a><Name>&e;</Name>" +
-                             "</a></OrvixProviders>";
-                  }}),
-    [](const testing::TestParamInfo<Malformed>& test) { return std::string(test.param.name); });
+        Unreadable{"Empty", [] { return std::string(); }},
+        Unreadable{"BlanksOnly", [] { return std::string(" \r\n\t "); }},
+        Unreadable{"ByteOrderMarkOnly", [] { return std::string("\xEF\xBB\xBF"); }},
+        Unreadable{"Truncated",
+                   [] {
+                       const std::string whole = PromptsXml({{.id = "1", .action = "2"}});
+                       return whole.substr(0, whole.size() - 3);
+                   }},
+        Unreadable{"TruncatedProviders",
+                   [] { return Declaration + "<OrvixProviders><a><Name>Depot</Name><Enabled>false</Enabled></a>"; }},
+        Unreadable{"Binary", [] { return ReadBytes(std::filesystem::path(ORVIX_FAKE_PLUGINS) / L"good.dll"); }},
+        Unreadable{"NulBytes", [] { return std::string(4096, '\0'); }},
+        Unreadable{"NulInText",
+                   [] { return Declaration + "<OrvixProviders>a" + std::string(1, '\0') + "</OrvixProviders>"; }},
+        Unreadable{"InvalidUtf8", [] { return Declaration + "<OrvixProviders>\xC3\x28\xFF</OrvixProviders>"; }},
+        Unreadable{"OddUtf16", [] { return Utf16(u"<?xml version=\"1.0\"?><a>text</a") + "x"; }},
+        Unreadable{"ControlCharacter", [] { return Declaration + "<OrvixProviders>\x01</OrvixProviders>"; }},
+        Unreadable{"TwoRoots", [] { return Declaration + "<OrvixProviders/><OrvixProviders/>"; }},
+        Unreadable{"UnknownEntity", [] { return Declaration + "<OrvixProviders>&nothing;</OrvixProviders>"; }},
+        Unreadable{"OpenElements", [] { return Declaration + Repeated("<n>", 100000); }},
+        Unreadable{"EntitiesOfEntities",
+                   [] {
+                       return Declaration + NestedEntities() + "<OrvixProviders><a><Name>&e11;</Name></a>" +
+                              "</OrvixProviders>";
+                   }},
+        Unreadable{"DocumentType",
+                   [] {
+                       return Declaration +
+                              "<!DOCTYPE a><OrvixProviders><a><Name>Depot</Name><Enabled>false</Enabled>" +
+                              "</a></OrvixProviders>";
+                   }},
+        Unreadable{"DocumentTypeOfPrompts",
+                   [] {
+                       std::string xml = PromptsXml({{.id = "1", .action = "2"}});
+                       return xml.replace(0, xml.find("<OrvixPrompts"), "<!DOCTYPE OrvixPrompts>");
+                   }},
+        Unreadable{"EntityOfAnotherFile",
+                   [] {
+                       return Declaration +
+                              "<!DOCTYPE a [<!ENTITY e SYSTEM \"OrvixPrompts.xml\">]><OrvixProviders><a>" +
+                              "<Name>Depot</Name><FixedProjectRoot>&e;</FixedProjectRoot></a></OrvixProviders>";
+                   }},
+        Unreadable{"EntityOfItself",
+                   [] {
+                       return Declaration + "<!DOCTYPE a [<!ENTITY e \"&e;\">]><OrvixProviders><a><Name>&e;</Name>" +
+                              "</a></OrvixProviders>";
+                   }}),
+    [](const testing::TestParamInfo<Unreadable>& test) { return std::string(test.param.name); });
 
 TEST_F(HostileFile, InUtf16IsReadLikeAnyOther)
 {
@@ -199,37 +216,21 @@ TEST_F(HostileFile, NestedTooDeepDoesNoHarm)
     EXPECT_EQ(ReadBytes(PromptsFile()), Declaration + deep);
 }
 
-TEST_F(HostileFile, WhoseDocumentTypeNamesOtherFilesDoesNotReadThem)
-{
-    AddPlugin(L"good");
-    WriteBytes(m_config.Path() / L"secret.txt", "false");
-    WriteBytes(m_config.Path() / L"OrvixProviders.xml",
-               Declaration + "<!DOCTYPE OrvixProviders [<!ENTITY e SYSTEM \"secret.txt\">]>"
-                             "<OrvixProviders><a><Name>Depot</Name><Enabled>&e;</Enabled></a></OrvixProviders>");
-    EXPECT_TRUE(Initialize());
-    EXPECT_EQ(ProviderNames(), Names{L"Fake Depot"});
-}
-
-TEST_F(HostileFile, WithADocumentTypeHasNoPromptsWhereTheRootIsLookedFor)
-{
-    std::string xml = PromptsXml({{.id = "1", .action = "2"}});
-    xml.insert(xml.find("<OrvixPrompts"), "<!DOCTYPE OrvixPrompts>");
-    WriteBytes(PromptsFile(), xml);
-    Initialize(0);
-    EXPECT_EQ(m_services->GetPromptAction(1), 0u);
-    m_services->Shutdown();
-    EXPECT_EQ(ReadBytes(PromptsFile()), xml);
-}
-
 TEST_F(HostileFile, OfALongEntityNamedOftenIsAnsweredInBoundedTimeAndMemory)
 {
     AddPlugin(L"good");
     const std::string references = Repeated("&e;", 1000);
-    WriteBytes(PromptsFile(), Declaration + LongEntity() + "<p>" + references + "</p>");
+    // Without a declaration the root would stand where the prompts are looked for.
+    const std::string prompts = LongEntity() + "<p><Prompt><Text>" + references +
+                                "</Text><ID>1</ID><Locked>false</Locked><ActionOpts>0</ActionOpts><Action>2</Action>"
+                                "</Prompt></p>";
+    WriteBytes(PromptsFile(), prompts);
     WriteBytes(m_config.Path() / L"OrvixProviders.xml", Declaration + LongEntity() +
                                                             "<OrvixProviders><a><Name>Depot</Name><FixedProjectRoot>" +
                                                             references + "</FixedProjectRoot></a></OrvixProviders>");
     EXPECT_TRUE(Initialize());
-    EXPECT_EQ(ProviderNames(), Names{L"Fake Depot"});
-    EXPECT_EQ(m_services->GetPromptAction(0), 0u);
+    EXPECT_EQ(m_services->GetProviderFixedProjectRoot(0), nullptr);
+    EXPECT_EQ(m_services->GetPromptAction(1), 0u);
+    m_services->Shutdown();
+    EXPECT_EQ(ReadBytes(PromptsFile()), prompts);
 }
