@@ -1,4 +1,5 @@
 #include "BraeSDKUtil.h"
+#include "ExceptionReserve.h"
 #include "LibraryModule.h"
 
 #include <windows.h>
@@ -8,6 +9,7 @@ extern "C" BOOL WINAPI DllMain(HINSTANCE module, DWORD reason, LPVOID)
 {
     if (reason == DLL_PROCESS_ATTACH)
     {
+        ReserveForExceptions();
         BraeSDK::Util::UseLanguagePackLocale(module);
         RememberLibraryModule(module);
         DisableThreadLibraryCalls(module);

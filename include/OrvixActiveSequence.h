@@ -28,6 +28,8 @@ public:
     /// Appends an entry that may already be there.
     void Append(OrvixFileEntry* entry)
     {
+        if (m_slots.size() == m_slots.capacity())
+            CloseGap();
         m_slots.push_back(entry);
         m_distinct = false;
         m_searched = 0;
@@ -42,6 +44,7 @@ public:
 private:
     std::size_t PositionOf(OrvixFileEntry* entry);
     bool HasNoRepetition() const;
+    void CloseGap();
 
     std::vector<OrvixFileEntry*> m_slots;
     std::size_t m_gapBegin = 0;

@@ -81,3 +81,10 @@ bool OrvixActiveSequence::HasNoRepetition() const
         return std::adjacent_find(sorted.begin(), sorted.end()) == sorted.end();
     });
 }
+
+void OrvixActiveSequence::CloseGap()
+{
+    const auto begin = m_slots.begin();
+    m_slots.erase(begin + static_cast<std::ptrdiff_t>(m_gapBegin), begin + static_cast<std::ptrdiff_t>(m_gapEnd));
+    m_gapEnd = m_gapBegin;
+}

@@ -81,7 +81,7 @@ using OrvixFileIOAddTextElement = FileIO;
 using OrvixFileIOAppendText = FileIO;
 using OrvixFileIOSetAttribute = FileIO;
 
-const std::string Declaration = "<?xml version=\"1.0\" standalone=\"yes\"?>";
+const std::string Declaration = R"(<?xml version="1.0" standalone="yes"?>)";
 
 /// Whether COM is initialised on this thread.
 bool HasApartment()
@@ -280,7 +280,7 @@ TEST_F(OrvixFileIOGetNodeText, JoinsTextCdataAndEntitiesOfAllDescendants)
 
 TEST_F(OrvixFileIOGetNodeText, TakesTextsAroundTheSizeOfAStackBufferAndFarBeyond)
 {
-    for (const std::size_t size : {1, 126, 127, 128, 129, 1000, 1000000})
+    for (const std::size_t size : {1u, 126u, 127u, 128u, 129u, 1000u, 1000000u})
     {
         OrvixFileIO file;
         WriteBytes(m_path, "<a>" + std::string(size - 1, 'x') + "y</a>");
@@ -337,7 +337,7 @@ TEST_F(OrvixFileIOFindChildText, LooksAtChildrenNotAtTheirChildren)
 
 TEST_F(OrvixFileIOFindChildText, TakesTheFirstNamesakeThatCanBeRead)
 {
-    OpenRoot("<a xmlns:dt=\"urn:schemas-microsoft-com:datatypes\"><T dt:dt=\"int\">1</T><T>two</T><T>three</T></a>");
+    OpenRoot(R"(<a xmlns:dt="urn:schemas-microsoft-com:datatypes"><T dt:dt="int">1</T><T>two</T><T>three</T></a>)");
     EXPECT_TRUE(m_file.FindChildText(m_node.Get(), L"T", m_text));
     EXPECT_EQ(m_text, L"two");
 }

@@ -52,6 +52,7 @@ using OrvixProviderConfigManagerFilters = ProviderConfigFile;
 std::vector<std::wstring> Names(const OrvixProviderConfig& config)
 {
     std::vector<std::wstring> names;
+    names.reserve(config.m_filters.size());
     for (const ProviderFilters* filter : config.m_filters)
         names.push_back(filter->m_name);
     return names;

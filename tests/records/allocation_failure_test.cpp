@@ -1,6 +1,7 @@
 // Every operation of the records that allocates, with each of its allocations failing in turn.
 
 #include "AllocationSweep.h"
+#include "ComesBack.h"
 #include "OrvixClientInfo.h"
 #include "OrvixExploreProviderParams.h"
 #include "OrvixFileEntry.h"
@@ -12,6 +13,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -541,13 +543,34 @@ TEST(AllocationFailure, IsNotMetByTheMakingOfARecord)
     EXPECT_EQ(failures, 0);
 }
 
-// Each test that the build runs has a process of its own, so that this one really meets the first exception.
-TEST(AllocationFailure, IsSurvivedByAProcessThatHasMetNoExceptionBefore)
+namespace
 {
-    LibraryHeap heap;
+
+int g_allocationsToFail;
+void* (*g_allocate)(std::size_t);
+
+void* FailingAllocate(std::size_t size)
+{
+    return g_allocationsToFail-- > 0 ? nullptr : g_allocate(size);
+}
+
+} // namespace
+
+// Without the warm-up of LibraryHeap. Each test that the build runs has a process of its own, so that this one
+// really meets the first exception without memory; the thread's own state comes from an exception with memory.
+TEST(AllocationFailure, IsSurvivedByAProcessInWhichNoExceptionWasEverWithoutMemory)
+{
+    ImportHook hook(GetModuleHandleW(L"OrvixCore.dll"), "malloc", reinterpret_cast<void*>(&FailingAllocate));
+    ASSERT_TRUE(hook.IsActive());
+    g_allocate = hook.Original<void*(std::size_t)>();
     OrvixFileEntry entry;
-    heap.Fail(1, true);
-    entry.SetFile(LongText);
-    EXPECT_TRUE(heap.Stop());
+    EXPECT_TRUE(ComesBack([&] {
+        g_allocationsToFail = 1;
+        entry.SetFile(LongText);
+        g_allocationsToFail = 1000;
+        entry.SetFile(LongText);
+        g_allocationsToFail = 0;
+    }));
+    g_allocationsToFail = 0;
     EXPECT_STREQ(entry.GetFile(), L"");
 }

@@ -1,4 +1,5 @@
 #include "BraeDiagnostics.h"
+#include "ComesBack.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
 
@@ -6,7 +7,6 @@
 
 #include <climits>
 #include <string>
-#include <thread>
 #include <vector>
 
 namespace
@@ -622,19 +622,6 @@ namespace
 {
 
 constexpr unsigned int Depth = 200'000;
-
-/// Runs `body` on a thread of its own; true when it came back. The thread, and it alone, ends where the stack
-/// overflows under Wine, whereas a main thread may take the process with it and report success.
-template <typename Body>
-bool ComesBack(Body body)
-{
-    bool cameBack = false;
-    std::thread([&] {
-        body();
-        cameBack = true;
-    }).join();
-    return cameBack;
-}
 
 OrvixFileEntry* CreateDeepTree(OrvixFileList& list)
 {

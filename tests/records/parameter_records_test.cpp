@@ -66,7 +66,7 @@ std::vector<TextFieldCase> AllTextFields()
 }
 
 /// A host whose answers do not matter here.
-class SilentHost : public IOrvixClientAccess
+class SilentHost final : public IOrvixClientAccess
 {
 public:
     void OutputText(const wchar_t*, int) override {}
@@ -76,7 +76,8 @@ public:
     std::intptr_t RelayB(void*, void*, void*, void*) override { return 0; }
 };
 
-HWND__* const SomeWindow = reinterpret_cast<HWND__*>(std::uintptr_t{0x123456789A});
+int g_window;
+HWND__* const SomeWindow = reinterpret_cast<HWND__*>(&g_window);
 
 } // namespace
 

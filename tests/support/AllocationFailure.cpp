@@ -5,6 +5,7 @@
 
 #include <cstddef>
 #include <cstring>
+#include <limits>
 #include <memory_resource>
 #include <mutex>
 #include <new>
@@ -268,13 +269,9 @@ LibraryHeap::LibraryHeap()
     if (!g_watched.malloc.IsActive() || !g_watched.free.IsActive())
         throw std::runtime_error("OrvixCore.dll does not import malloc and free");
 
-    // What the C++ run-time makes when it is first needed to throw: its state for the thread, and the lock of
-    // the store from which exceptions come when there is no memory for them either.
-    for (const long failures : {1, 2})
-    {
-        g_watched.failing = {1, failures, 0};
-        OrvixPromptTable().AddPrompt(1, L"", 0, 0, false);
-    }
+    // What the C++ run-time makes for a thread when it is first needed to throw there.
+    g_watched.failing = {1, 1, 0};
+    OrvixPromptTable().AddPrompt(1, L"", 0, 0, false);
     g_watched.failing = {};
 }
 
@@ -298,12 +295,4 @@ bool LibraryHeap::Stop()
 long LibraryHeap::LiveBlocks() const
 {
     return g_watched.blocks.Count();
-}
-
-void MeetException()
-{
-    LibraryHeap heap;
-    OrvixPromptTable table;
-    heap.Fail(1, false);
-    table.AddPrompt(1, L"", 0, 0, false);
 }

@@ -80,7 +80,9 @@ private:
 /// its C++ run-time call nothing else.
 ///
 /// Live blocks are those that OrvixCore.dll has allocated since the program began and that neither it nor the
-/// program has freed: the storage of a std::wstring may grow in the one and go in the other.
+/// program has freed: the storage of a std::wstring may grow in the one and go in the other. The constructor
+/// lets the module meet exceptions, so that what its C++ run-time then keeps, for the constructing thread and
+/// for the process, counts neither as an allocation of the operation under test nor as a leak.
 class LibraryHeap final : public AllocationHeap
 {
 public:
@@ -94,7 +96,3 @@ public:
     bool Stop() override;
     long LiveBlocks() const override;
 };
-
-/// Lets OrvixCore.dll throw and catch an exception on this thread. The C++ run-time keeps some memory for
-/// exceptions, once per thread; afterwards it counts neither as an allocation of an operation nor as a leak.
-void MeetException();

@@ -68,7 +68,6 @@ private:
 template <typename Body>
 long SweepAllocations(Body body)
 {
-    MeetException();
     HostHeap hostHeap;
     LibraryHeap libraryHeap;
     const std::array<AllocationHeap*, 2> heaps = {&hostHeap, &libraryHeap};

@@ -31,7 +31,7 @@ struct StoredPrompt
 /// The whole prompt file, in the form that the library writes.
 inline std::string PromptsXml(const std::vector<StoredPrompt>& prompts)
 {
-    std::string xml = "<?xml version=\"1.0\" standalone=\"yes\"?><OrvixPrompts version=\"1.0\">";
+    std::string xml = R"(<?xml version="1.0" standalone="yes"?><OrvixPrompts version="1.0">)";
     for (const StoredPrompt& prompt : prompts)
         xml += "<Prompt><Text>" + prompt.text + "</Text><ID>" + prompt.id + "</ID><Locked>" + prompt.locked +
                "</Locked><ActionOpts>" + prompt.options + "</ActionOpts><Action>" + prompt.action +
@@ -55,7 +55,7 @@ protected:
     /// Puts a fake plug-in into the plug-in folder, under another file name where one is given.
     std::filesystem::path AddPlugin(const std::wstring& fake, const std::wstring& fileName = {})
     {
-        const std::filesystem::path target = m_plugins.Path() / (fileName.empty() ? fake + L".dll" : fileName);
+        std::filesystem::path target = m_plugins.Path() / (fileName.empty() ? fake + L".dll" : fileName);
         std::filesystem::copy_file(std::filesystem::path(ORVIX_FAKE_PLUGINS) / (fake + L".dll"), target);
         return target;
     }

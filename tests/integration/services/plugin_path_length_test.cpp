@@ -22,8 +22,8 @@ protected:
         m_info.SetProviderPluginPath(m_folder.c_str());
     }
 
-    // Here rather than in the folder's own end, which knows no such paths.
-    ~PluginPathLength() override
+    // Here rather than at the end of the folder, which knows no such paths.
+    void TearDown() override
     {
         std::error_code ignored;
         m_services.reset();
@@ -76,7 +76,7 @@ TEST_F(PluginPathLength, OfTooManyCharactersIsNeverCutToTheNameOfAnotherFile)
 
 TEST_F(PluginPathLength, OfTheFolderAloneBeyondTheLimitFindsNothing)
 {
-    for (const std::size_t length : {254, 255, 256, 300, 5000})
+    for (const std::size_t length : {254u, 255u, 256u, 300u, 5000u})
     {
         std::wstring folder = m_folder;
         while (folder.size() < length)
