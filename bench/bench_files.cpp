@@ -144,6 +144,7 @@ void BenchFilters(MeasureTable& table)
         config.m_filters.insert(config.m_filters.end(), 5, &filter);
     }
     std::vector<std::wstring> paths;
+    paths.reserve(PathCount);
     for (int i = 0; i < PathCount; ++i)
         paths.push_back(L"c:\\project\\scenes\\level " + std::to_wstring(i / 100) + L"\\object " + std::to_wstring(i) +
                         L".mesh");
@@ -158,7 +159,7 @@ void BenchFilters(MeasureTable& table)
         [&] {
             for (const std::wstring& path : paths)
             {
-                const std::wstring upper = UpperCase(path.c_str());
+                const std::wstring upper = UpperCase(path);
                 const std::wstring_view type = std::wstring_view(upper).substr(upper.rfind(L'.') + 1);
                 bool excluded = false;
                 for (const auto& filter : owned)

@@ -12,7 +12,7 @@
 class ComVariant
 {
 public:
-    ComVariant() { VariantInit(&m_value); }
+    ComVariant() = default;
     explicit ComVariant(const wchar_t* text) : ComVariant()
     {
         V_BSTR(&m_value) = SysAllocString(text);
@@ -34,7 +34,7 @@ public:
     }
     ComVariant(const ComVariant&) = delete;
     ComVariant& operator=(const ComVariant&) = delete;
-    ~ComVariant() noexcept(false)
+    ~ComVariant() noexcept(false) // NOLINT(bugprone-exception-escape): as said above
     {
         const HRESULT result = VariantClear(&m_value);
         if (FAILED(result) && std::uncaught_exceptions() == 0)
@@ -50,5 +50,5 @@ public:
     BSTR String() const { return V_VT(&m_value) == VT_BSTR ? V_BSTR(&m_value) : nullptr; }
 
 private:
-    VARIANT m_value;
+    VARIANT m_value = {}; // VT_EMPTY
 };

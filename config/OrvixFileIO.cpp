@@ -46,6 +46,38 @@ std::wstring XmlText(const wchar_t* text)
     return result;
 }
 
+/// Whether the document refers to an entity that it declares: the few characters of a reference can stand for
+/// gigabytes of text. Looks at every node, but only where there is a document type to declare entities.
+bool UsesEntities(IXMLDOMDocument* document)
+{
+    ComPtr<IXMLDOMDocumentType> type;
+    if (document->get_doctype(&type) != S_OK || !type)
+        return false;
+    ComPtr<IXMLDOMElement> root;
+    document->get_documentElement(&root);
+    ComPtr<IXMLDOMNode> node = root;
+    while (node)
+    {
+        DOMNodeType kind = NODE_INVALID;
+        if (SUCCEEDED(node->get_nodeType(&kind)) && kind == NODE_ENTITY_REFERENCE)
+            return true;
+        ComPtr<IXMLDOMNode> next;
+        node->get_firstChild(&next);
+        while (!next && node)
+        {
+            node->get_nextSibling(&next);
+            if (!next)
+            {
+                ComPtr<IXMLDOMNode> parent;
+                node->get_parentNode(&parent);
+                node = std::move(parent);
+            }
+        }
+        node = std::move(next);
+    }
+    return false;
+}
+
 } // namespace
 
 OrvixFileIO::OrvixFileIO() = default;
@@ -89,9 +121,7 @@ bool OrvixFileIO::OpenDocument(const wchar_t* path)
     {
         VARIANT_BOOL ignored = VARIANT_FALSE;
         m_document->load(ComVariant(path).Get(), &ignored);
-        // Its entities can make a short file stand for gigabytes of text, and nothing here needs them.
-        ComPtr<IXMLDOMDocumentType> type;
-        if (m_document->get_doctype(&type) == S_OK && type)
+        if (UsesEntities(m_document.Get()))
             m_document->loadXML(ComString(L"").Get(), &ignored);
     }
     if (FAILED(m_document->QueryInterface(InterfaceNode,

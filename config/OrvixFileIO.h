@@ -33,8 +33,8 @@ public:
     /// Starts a new document that holds an XML declaration (version 1.0, standalone) and nothing else.
     bool CreateDocument();
 
-    /// Loads a file. A file that is missing, unreadable or not well-formed, and one with a document type
-    /// declaration, gives an empty document and true: the reader notices it by not finding its root element.
+    /// Loads a file. A file that is missing, unreadable or not well-formed, and one that uses entities of its
+    /// own, gives an empty document and true: the reader notices it by not finding its root element.
     bool OpenDocument(const wchar_t* path);
 
     /// Saves to `path`; false without a document and when MSXML reports a failure.

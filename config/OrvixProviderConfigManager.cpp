@@ -107,9 +107,10 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
 /// Finds the root element among the document's children; null when there is none.
 OrvixFileIO::Node FindRoot(OrvixFileIO& file, IXMLDOMNode* document)
 {
+    // By index: not every document type knows its next sibling.
     OrvixFileIO::Node node;
     std::wstring name;
-    for (bool more = file.GetFirstChild(document, node); more; more = file.GetNextSibling(node))
+    for (long i = 0; file.GetChildNode(document, i, node); ++i)
     {
         if (file.GetNodeName(node.Get(), name) && IsNamed(name, L"OrvixProviders"))
             return node;

@@ -63,7 +63,6 @@ std::wstring Decimal(unsigned long value)
 
 bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path)
 {
-    table.RemoveAll();
     try
     {
         return ReadPrompts(table, path);
@@ -86,16 +85,23 @@ bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
     const OpenedDocument opened(file);
     OrvixFileIO::Node root;
     file.AddElement(nullptr, L"OrvixPrompts", root, false);
+    if (!root)
+        return false;
     file.SetAttribute(root.Get(), L"version", L"1.0");
     for (unsigned int i = 0; i < static_cast<unsigned int>(table.NumPrompts()); ++i)
     {
         OrvixFileIO::Node prompt;
         file.AddElement(root.Get(), L"Prompt", prompt, false);
+        if (!prompt)
+            return false;
         const std::array<std::wstring, NumFields> values = {
             table.GetPromptText(i), std::to_wstring(table.GetPromptID(i)), table.GetLocked(i) ? L"true" : L"false",
             Decimal(table.GetPromptOptions(i)), Decimal(table.GetPrompt(i))};
         for (std::size_t field = 0; field < NumFields; ++field)
-            file.AddTextElement(prompt.Get(), FieldNames[field].data(), values[field].c_str());
+        {
+            if (!file.AddTextElement(prompt.Get(), FieldNames[field].data(), values[field].c_str()))
+                return false;
+        }
     }
     file.SaveDocument(path);
     return true;

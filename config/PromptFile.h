@@ -2,11 +2,11 @@
 
 class OrvixPromptTable;
 
-/// Fills the table from a file. The table is emptied first and stays empty when the file is missing or broken
+/// Fills the empty table from a file. The table stays empty when the file is missing or broken
 /// (false). Prompts that lack one of their five elements are dropped; texts are cut to 1024 characters.
 /// Exhausted memory leaves the table empty and throws std::bad_alloc or `_com_error`.
 bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path);
 
 /// Writes the table to a file. An empty table is never written, deliberately: the file keeps its content
-/// (true). False when the document cannot be made; a failure to save is silent.
+/// (true). False when the document cannot be made whole, with the file left as it is; a failure to save is silent.
 bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path);

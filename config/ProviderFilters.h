@@ -8,6 +8,7 @@
 struct FilteredPath
 {
     explicit FilteredPath(const wchar_t* path);
+    ~FilteredPath() = default;
 
     std::wstring text;
     bool hasType;           ///< whether there is any dot

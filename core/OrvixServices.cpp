@@ -334,6 +334,7 @@ bool OrvixServices::DiscoverMSSCCIProviders()
 
 bool OrvixServices::LoadPrompts()
 {
+    m_prompts.RemoveAll();
     return WithXmlBarrier(false,
                           [&] { return ReadPromptFile(m_prompts, (m_configFolder + L"OrvixPrompts.xml").c_str()); });
 }

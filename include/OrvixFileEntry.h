@@ -42,7 +42,8 @@ public:
     virtual void SetFlagsOut(unsigned long flags);
 
     /// Appends a child, which is not owned; its parent link is not touched and duplicates are not looked
-    /// for. Returns `NumChildren()`, or 0 with nothing changed for null and when memory is exhausted.
+    /// for. Links must not lead in a circle: whoever walks the tree would not come to an end. Returns `NumChildren()`,
+    /// or 0 with nothing changed for null and when memory is exhausted.
     virtual unsigned int AddChild(OrvixFileEntry* child);
     virtual unsigned int NumChildren();
     virtual OrvixFileEntry* GetChild(unsigned int index);

@@ -42,7 +42,8 @@ public:
     /// children of the entries that can be reached from the roots, and deletes it with its attachments. Its
     /// own children stay in the list as they are: no roots, and with a parent link to what was deleted; the
     /// host removes or links them itself. False when the list does not hold the entry. When memory is
-    /// exhausted while a tree is searched: false, and the entry stays in the list to be removed later.
+    /// exhausted while a tree is searched: false, and the entry stays in the list to be removed later, though
+    /// some links to it may be gone already.
     ORVIX_OVERLOADS_IN_SLOT_ORDER(virtual bool RemoveEntry(unsigned int index),
                                   virtual bool RemoveEntry(OrvixFileEntry* entry));
     virtual unsigned int NumEntries();

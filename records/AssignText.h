@@ -12,3 +12,9 @@ inline bool AssignText(std::wstring& field, const wchar_t* text)
                return true;
            });
 }
+
+/// True when a setter that was given `wanted` has stored it: setters leave the old, empty text without memory.
+inline bool IsStored(const wchar_t* wanted, const wchar_t* stored)
+{
+    return !wanted || !*wanted || *stored;
+}

@@ -1,5 +1,7 @@
 #include "EntryFactory.h"
 
+#include "AssignText.h"
+
 std::unique_ptr<OrvixFileEntry> MakeEntry(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
                                           long long clientPtr)
 {

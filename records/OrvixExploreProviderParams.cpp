@@ -52,14 +52,19 @@ std::uint32_t OrvixExploreProviderParams::AddFilter(const wchar_t* name, const w
 {
     if (!name || !extensions)
         return 0;
+    const std::size_t count = m_filterNames.size();
     const bool added = WithBarrier(false, [&] {
-        std::wstring copy(extensions);
-        m_filterExtensions.reserve(m_filterNames.size() + 1);
+        std::wstring copy(extensions); // may be a name of this record, which moves
         m_filterNames.emplace_back(name);
         m_filterExtensions.push_back(std::move(copy));
         return true;
     });
-    return added ? NumFilters() : 0;
+    if (!added)
+    {
+        m_filterNames.resize(count); // shrinking does not allocate
+        return 0;
+    }
+    return NumFilters();
 }
 
 std::uint32_t OrvixExploreProviderParams::NumFilters()

@@ -1,10 +1,11 @@
 #include "OrvixUserList.h"
 
-#include "EntryFactory.h"
+#include "AssignText.h"
 #include "ExceptionBarrier.h"
 #include "OrvixUserEntry.h"
 
 #include <algorithm>
+#include <memory>
 
 namespace
 {

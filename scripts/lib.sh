@@ -2,6 +2,7 @@
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 export WINEPREFIX=${ORVIX_WINEPREFIX:-$root/build/wine-prefix}
 export WINEARCH=win64 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree=;mshtml=;winemenubuilder.exe="
+export LC_ALL=C.UTF-8 # in another locale Wine has no files with foreign letters in their names
 wineserver=/usr/lib/wine/wineserver
 
 # One wineserver serves the rest of the calling script: it starts here, with no pipe of the script in its hands, and

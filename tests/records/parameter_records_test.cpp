@@ -310,6 +310,13 @@ TEST(ExploreProviderParamsAddFilter, TakesTextsThatAreTheRecordsOwn)
     EXPECT_STREQ(params.GetFilterExtensions(99), L"*.txt");
 }
 
+TEST(ExploreProviderParamsAddFilter, TakesManyFiltersWithinTheTimeLimit)
+{
+    OrvixExploreProviderParams params;
+    for (std::uint32_t i = 1; i <= 200000; ++i)
+        ASSERT_EQ(params.AddFilter(L"Text", L"*.txt"), i);
+}
+
 TEST(ExploreProviderParamsGetFilter, GivesNullForAnIndexOutOfRange)
 {
     OrvixExploreProviderParams params;

@@ -5,6 +5,7 @@
 #include <windows.h>
 
 #include <algorithm>
+#include <cwchar>
 #include <memory>
 
 namespace
@@ -14,7 +15,7 @@ constexpr DWORD UnwantedFolder = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM |
 /// The archive of a project, the file that links to it, or what an interrupted provider left: no part of the project.
 bool IsOfArchive(const std::wstring& name)
 {
-    return name == L".archive" || name == L".archive.tmp";
+    return _wcsicmp(name.c_str(), L".archive") == 0 || _wcsicmp(name.c_str(), L".archive.tmp") == 0;
 }
 
 struct CloseSearch

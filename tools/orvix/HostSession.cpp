@@ -5,7 +5,10 @@
 
 #include <windows.h>
 
+#include <comdef.h>
+
 #include <filesystem>
+#include <iostream>
 #include <new>
 
 namespace
@@ -93,6 +96,13 @@ std::uint32_t HostSession::FindProvider(const std::wstring& nameOrIndex)
 
 void HostSession::Release::operator()(IOrvixServices* services) const
 {
-    services->Shutdown();
+    try
+    {
+        services->Shutdown();
+    }
+    catch (const _com_error&)
+    {
+        std::cerr << "orvix: the stored answers cannot be saved: out of memory\n";
+    }
     ReleaseIOrvixServices(services);
 }

@@ -1,6 +1,8 @@
 #include "ConsoleCodePage.h"
 #include "FileCommand.h"
 
+#include <comdef.h>
+
 #include <iostream>
 
 namespace
@@ -50,6 +52,10 @@ int wmain(int count, wchar_t** arguments)
     {
         std::cerr << "orvix: " << error.what() << '\n';
         code = error.Code();
+    }
+    catch (const _com_error&)
+    {
+        std::cerr << "orvix: OrvixProviders.xml or OrvixPrompts.xml cannot be read: out of memory\n";
     }
     catch (const std::exception& error)
     {

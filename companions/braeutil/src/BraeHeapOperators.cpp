@@ -10,10 +10,13 @@ namespace
 {
 
 /// Stands before every block; 16 bytes, so that the block keeps the heap's alignment.
-struct alignas(16) BlockHeader
+struct BlockHeader
 {
     std::uint64_t mark;
+    std::uint64_t unused;
 };
+
+static_assert(sizeof(BlockHeader) == 16);
 
 constexpr std::uint64_t LiveMark = 0x4B4C425F45415242; // "BRAE_BLK"
 constexpr std::uint64_t FreedMark = 0x444545525F424C4B;

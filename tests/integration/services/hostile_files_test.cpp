@@ -39,7 +39,7 @@ std::string LongEntity()
 
 const std::string Declaration = "<?xml version=\"1.0\"?>";
 
-/// Bytes that are no XML document, or one with a document type: both files answer as if they were missing.
+/// Bytes that are no XML document, or one that uses entities of its own: both files answer as if they were missing.
 struct Unreadable
 {
     const char* name;
@@ -121,16 +121,10 @@ INSTANTIATE_TEST_SUITE_P(
                        return Declaration + NestedEntities() + "<OrvixProviders><a><Name>&e11;</Name></a>" +
                               "</OrvixProviders>";
                    }},
-        Unreadable{"DocumentType",
-                   [] {
-                       return Declaration +
-                              "<!DOCTYPE a><OrvixProviders><a><Name>Depot</Name><Enabled>false</Enabled>" +
-                              "</a></OrvixProviders>";
-                   }},
         Unreadable{"DocumentTypeOfPrompts",
                    [] {
                        std::string xml = PromptsXml({{.id = "1", .action = "2"}});
-                       return xml.replace(0, xml.find("<OrvixPrompts"), "<!DOCTYPE OrvixPrompts>");
+                       return xml.insert(xml.find("<OrvixPrompts"), "<!DOCTYPE OrvixPrompts>");
                    }},
         Unreadable{"EntityOfAnotherFile",
                    [] {
@@ -158,6 +152,20 @@ TEST_F(HostileFile, InUtf16IsReadLikeAnyOther)
     EXPECT_STREQ(m_services->GetProviderFixedProjectRoot(0), L"\u5009");
     m_services->Shutdown();
     EXPECT_EQ(SavedPrompts(), PromptsXml({{.text = "\xE5\x80\x89", .action = "2"}}));
+}
+
+TEST_F(HostileFile, WithADocumentTypeThatNothingRefersToStillSwitchesAProviderOff)
+{
+    AddPlugin(L"good");
+    for (const char* type : {"<!DOCTYPE a>", "<!DOCTYPE a [<!ENTITY e \"text\">]>", "<!DOCTYPE a SYSTEM \"b.dtd\">"})
+    {
+        SCOPED_TRACE(type);
+        WriteBytes(m_config.Path() / L"OrvixProviders.xml",
+                   Declaration + type +
+                       "<OrvixProviders><a><Name>Depot</Name><Enabled>false</Enabled></a></OrvixProviders>");
+        Initialize();
+        EXPECT_EQ(m_services->GetProviderCount(), 0u);
+    }
 }
 
 TEST_F(HostileFile, WithTenMegabytesOfTextKeepsTheOtherRows)
