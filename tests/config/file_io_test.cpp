@@ -141,7 +141,7 @@ TEST_F(OrvixFileIOOpenDocument, GivesAnEmptyDocumentForAFileThatUsesEntitiesOfIt
     for (const char* content : {"<a>&e;</a>", "<a><b>text</b><!-- --><b>text<c/>&e;</b></a>"})
     {
         OrvixFileIO file;
-        WriteBytes(m_path, std::string("<?xml version=\"1.0\"?><!DOCTYPE a [<!ENTITY e \"text\">]>") + content);
+        WriteBytes(m_path, std::string(R"(<?xml version="1.0"?><!DOCTYPE a [<!ENTITY e "text">]>)") + content);
         ASSERT_TRUE(file.OpenDocument(m_path.c_str()));
         EXPECT_EQ(file.NumChildNodes(file.GetDocumentRoot()->Get()), 0) << content;
         file.CloseDocument();
@@ -151,7 +151,7 @@ TEST_F(OrvixFileIOOpenDocument, GivesAnEmptyDocumentForAFileThatUsesEntitiesOfIt
 TEST_F(OrvixFileIOOpenDocument, ReadsAFileWithADocumentTypeThatNothingRefersTo)
 {
     for (const char* type :
-         {"<!DOCTYPE a>", "<!DOCTYPE a [<!ENTITY e \"text\">]>", "<!DOCTYPE a SYSTEM \"other.dtd\">"})
+         {"<!DOCTYPE a>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "other.dtd">)"})
     {
         OrvixFileIO file;
         WriteBytes(m_path, std::string("<?xml version=\"1.0\"?>") + type + "<a>text &amp; &#65;</a>");

@@ -157,7 +157,7 @@ TEST_F(HostileFile, InUtf16IsReadLikeAnyOther)
 TEST_F(HostileFile, WithADocumentTypeThatNothingRefersToStillSwitchesAProviderOff)
 {
     AddPlugin(L"good");
-    for (const char* type : {"<!DOCTYPE a>", "<!DOCTYPE a [<!ENTITY e \"text\">]>", "<!DOCTYPE a SYSTEM \"b.dtd\">"})
+    for (const char* type : {"<!DOCTYPE a>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
     {
         SCOPED_TRACE(type);
         WriteBytes(m_config.Path() / L"OrvixProviders.xml",
