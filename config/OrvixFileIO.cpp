@@ -117,12 +117,17 @@ bool OrvixFileIO::OpenDocument(const wchar_t* path)
     m_document->put_async(VARIANT_FALSE);
     m_document->put_validateOnParse(VARIANT_FALSE);
     m_document->put_resolveExternals(VARIANT_FALSE);
+    m_content = Content::Missing;
     if (path && _waccess(path, ReadPermission) == 0)
     {
-        VARIANT_BOOL ignored = VARIANT_FALSE;
-        m_document->load(ComVariant(path).Get(), &ignored);
+        VARIANT_BOOL loaded = VARIANT_FALSE;
+        m_document->load(ComVariant(path).Get(), &loaded);
+        m_content = loaded ? Content::Document : Content::Malformed;
         if (UsesEntities(m_document.Get()))
-            m_document->loadXML(ComString(L"").Get(), &ignored);
+        {
+            m_document->loadXML(ComString(L"").Get(), &loaded);
+            m_content = Content::UsesEntities;
+        }
     }
     if (FAILED(m_document->QueryInterface(InterfaceNode,
                                           reinterpret_cast<void**>(m_documentNode.ReleaseAndGetAddressOf()))))

@@ -33,9 +33,21 @@ public:
     /// Starts a new document that holds an XML declaration (version 1.0, standalone) and nothing else.
     bool CreateDocument();
 
+    /// What `OpenDocument` found.
+    enum class Content
+    {
+        Missing, ///< or not to be read
+        Malformed,
+        UsesEntities,
+        Document
+    };
+
     /// Loads a file. A file that is missing, unreadable or not well-formed, and one that uses entities of its
     /// own, gives an empty document and true: the reader notices it by not finding its root element.
     bool OpenDocument(const wchar_t* path);
+
+    /// What the last `OpenDocument` found.
+    Content GetContent() const { return m_content; }
 
     /// Saves to `path`; false without a document and when MSXML reports a failure.
     bool SaveDocument(const wchar_t* path);
@@ -92,6 +104,7 @@ private:
     Microsoft::WRL::ComPtr<IXMLDOMDocument> m_document;
     Node m_documentNode;
     Node m_rootNode;
+    Content m_content = Content::Missing;
 };
 
 /// Closes a document at the end of a scope, also when an exception leaves it. Declared before any node.

@@ -1,9 +1,16 @@
 #pragma once
 
+#include "ProviderFilters.h"
+
 #include <string>
 #include <vector>
 
-class ProviderFilters;
+/// The filter that excludes a file, and why; null and `None` when there is none.
+struct FileExclusion
+{
+    const ProviderFilters* filter = nullptr;
+    Exclusion reason = Exclusion::None;
+};
 
 /// The administrator's settings for one provider. The consumers read the fields.
 ///
@@ -13,6 +20,9 @@ class OrvixProviderConfig
 {
 public:
     virtual ~OrvixProviderConfig() = default;
+
+    /// The first of the filters that excludes the file. A null path is not excluded. Throws std::bad_alloc.
+    FileExclusion FindExclusion(const wchar_t* path) const;
 
     /// True when one of the filters excludes the file; `filterName` may be null and receives the name of the
     /// first such filter. A null path gives false.

@@ -4,19 +4,26 @@
 #include "OrvixFileIO.h"
 #include "OrvixProviderConfig.h"
 #include "ProviderFilters.h"
+#include "ReadingLog.h"
 #include "UpperCase.h"
 
+#include <algorithm>
 #include <cwchar>
+#include <iterator>
 #include <memory>
+#include <optional>
 
 namespace
 {
+
+using Why = ReadingLog::Why;
 
 /// What one reading of the file has made so far. It frees itself unless the reading succeeds.
 struct Reading
 {
     std::vector<std::unique_ptr<OrvixProviderConfig>> configs;
     std::vector<std::unique_ptr<ProviderFilters>> filters;
+    ReadingPlace place;
 };
 
 bool IsNamed(const std::wstring& name, const wchar_t* wanted)
@@ -24,20 +31,42 @@ bool IsNamed(const std::wstring& name, const wchar_t* wanted)
     return _wcsicmp(name.c_str(), wanted) == 0;
 }
 
-/// Calls `visit(name, text, child)` for every child element whose name and text can be read, until it
-/// returns false.
+/// Calls `visit(name, child)` for every child element until it returns false.
 template <class Visit>
-void ForEachReadableElement(OrvixFileIO& file, IXMLDOMNode* parent, Visit&& visit)
+void ForEachElement(OrvixFileIO& file, IXMLDOMNode* parent, Visit&& visit)
 {
     OrvixFileIO::Node child;
     std::wstring name;
-    std::wstring text;
     for (bool more = file.GetFirstChild(parent, child); more; more = file.GetNextSibling(child))
     {
-        if (file.GetNodeName(child.Get(), name) && file.GetNodeText(child.Get(), text) &&
-            !visit(name, text, child.Get()))
+        if (file.GetNodeName(child.Get(), name) && !visit(name, child.Get()))
             return;
     }
+}
+
+/// Calls `visit(name, text, child)` for every child element whose name and text can be read, until it
+/// returns false.
+template <class Visit>
+void ForEachReadableElement(OrvixFileIO& file, IXMLDOMNode* parent, const ReadingPlace& place, Visit&& visit)
+{
+    std::wstring text;
+    ForEachElement(file, parent, [&](const std::wstring& name, IXMLDOMNode* child) {
+        if (file.GetNodeText(child, text))
+            return visit(name, text, child);
+        place.Remark(Why::NoText, name.c_str());
+        return true;
+    });
+}
+
+/// Whether a text is the first of two choices; any text but the first is the second.
+bool IsFirstChoice(const std::wstring& element, const std::wstring& text, const wchar_t* first, const wchar_t* second,
+                   const ReadingPlace& place)
+{
+    if (IsNamed(text, first))
+        return true;
+    if (!IsNamed(text, second))
+        place.Remark(Why::UnknownValue, element.c_str(), text.c_str(), second);
+    return false;
 }
 
 /// Reads one filter. It is appended to the configuration once for its name and once more for every element
@@ -46,24 +75,33 @@ void ReadFilter(OrvixFileIO& file, IXMLDOMNode* node, OrvixProviderConfig& confi
 {
     auto owned = std::make_unique<ProviderFilters>();
     ProviderFilters* filter = owned.get();
-    ForEachReadableElement(file, node, [&](const std::wstring& name, const std::wstring& text, IXMLDOMNode*) {
-        if (IsNamed(name, L"Name"))
-        {
-            filter->m_name = text;
-            if (owned)
-                reading.filters.push_back(std::move(owned));
-        }
-        else if (owned)
-            return false;
-        else if (IsNamed(name, L"Type"))
-            filter->m_exclude = IsNamed(text, L"exclude");
-        else if (IsNamed(name, L"Folder"))
-            filter->m_folders.push_back(UpperCase(text));
-        else if (IsNamed(name, L"FileType"))
-            filter->m_fileTypes.push_back(UpperCase(text));
-        config.m_filters.push_back(filter);
-        return true;
-    });
+    Why dropped = Why::NoName;
+    ForEachReadableElement(file, node, reading.place,
+                           [&](const std::wstring& name, const std::wstring& text, IXMLDOMNode*) {
+                               if (IsNamed(name, L"Name"))
+                               {
+                                   filter->m_name = text;
+                                   if (owned)
+                                       reading.filters.push_back(std::move(owned));
+                               }
+                               else if (owned)
+                               {
+                                   dropped = Why::NameNotFirst;
+                                   return false;
+                               }
+                               else if (IsNamed(name, L"Type"))
+                                   filter->m_exclude = IsFirstChoice(name, text, L"exclude", L"include", reading.place);
+                               else if (IsNamed(name, L"Folder"))
+                                   filter->m_folders.push_back(UpperCase(text));
+                               else if (IsNamed(name, L"FileType"))
+                                   filter->m_fileTypes.push_back(UpperCase(text));
+                               else
+                                   reading.place.Remark(Why::UnknownElement, name.c_str());
+                               config.m_filters.push_back(filter);
+                               return true;
+                           });
+    if (owned)
+        reading.place.Remark(dropped);
 }
 
 /// Reads one provider; it is kept when it has a name.
@@ -71,51 +109,73 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
 {
     auto config = std::make_unique<OrvixProviderConfig>();
     const std::size_t filtersBefore = reading.filters.size();
-    bool named = false;
-    ForEachReadableElement(file, node, [&](const std::wstring& name, const std::wstring& text, IXMLDOMNode* child) {
-        if (IsNamed(name, L"Name"))
-        {
-            config->m_name = UpperCase(text);
-            named = true;
-        }
-        else if (IsNamed(name, L"Enabled"))
-            config->m_enabled = !IsNamed(text, L"false");
-        else if (IsNamed(name, L"FixedProjectRoot"))
-            config->m_fixedProjectRoot = text;
-        else if (IsNamed(name, L"AltProviderExecutable"))
-            config->m_altProviderExecutable = text;
-        else if (IsNamed(name, L"MSSCCProjectFile"))
-            config->m_msSccProjectFile = text;
-        else if (IsNamed(name, L"MSSCCDllSearchPath"))
-            config->m_msSccDllSearchPath = text;
-        else if (IsNamed(name, L"MSSCCDllFullPath"))
-            config->m_msSccDllFullPath = text;
-        else if (IsNamed(name, L"Filters"))
-        {
-            OrvixFileIO::Node filter;
-            for (bool more = file.GetFirstChild(child, filter); more; more = file.GetNextSibling(filter))
-                ReadFilter(file, filter.Get(), *config, reading);
-        }
-        return true;
-    });
-    if (named)
+    std::optional<std::wstring> writtenName;
+    ForEachReadableElement(file, node, reading.place,
+                           [&](const std::wstring& name, const std::wstring& text, IXMLDOMNode* child) {
+                               if (IsNamed(name, L"Name"))
+                               {
+                                   config->m_name = UpperCase(text);
+                                   writtenName = text;
+                               }
+                               else if (IsNamed(name, L"Enabled"))
+                                   config->m_enabled = !IsFirstChoice(name, text, L"false", L"true", reading.place);
+                               else if (IsNamed(name, L"FixedProjectRoot"))
+                                   config->m_fixedProjectRoot = text;
+                               else if (IsNamed(name, L"AltProviderExecutable"))
+                                   config->m_altProviderExecutable = text;
+                               else if (IsNamed(name, L"MSSCCProjectFile"))
+                                   config->m_msSccProjectFile = text;
+                               else if (IsNamed(name, L"MSSCCDllSearchPath"))
+                                   config->m_msSccDllSearchPath = text;
+                               else if (IsNamed(name, L"MSSCCDllFullPath"))
+                                   config->m_msSccDllFullPath = text;
+                               else if (IsNamed(name, L"Filters"))
+                               {
+                                   ForEachElement(file, child, [&](const std::wstring&, IXMLDOMNode* filter) {
+                                       reading.place.EnterFilter();
+                                       ReadFilter(file, filter, *config, reading);
+                                       return true;
+                                   });
+                                   reading.place.LeaveFilter();
+                               }
+                               else
+                                   reading.place.Remark(Why::UnknownElement, name.c_str());
+                               return true;
+                           });
+    if (writtenName)
+    {
+        reading.place.Use(config.get(), *writtenName);
         reading.configs.push_back(std::move(config));
+    }
     else
+    {
+        reading.place.Remark(Why::NoName);
         reading.filters.resize(filtersBefore);
+    }
 }
 
 /// Finds the root element among the document's children; null when there is none.
-OrvixFileIO::Node FindRoot(OrvixFileIO& file, IXMLDOMNode* document)
+OrvixFileIO::Node FindRoot(OrvixFileIO& file, IXMLDOMNode* document, ReadingLog* log)
 {
     // By index: not every document type knows its next sibling.
     OrvixFileIO::Node node;
     std::wstring name;
     for (long i = 0; file.GetChildNode(document, i, node); ++i)
     {
-        if (file.GetNodeName(node.Get(), name) && IsNamed(name, L"OrvixProviders"))
+        if (!file.GetNodeName(node.Get(), name))
+            continue;
+        if (log)
+            log->root = name;
+        if (IsNamed(name, OrvixProviderConfigManager::RootName))
             return node;
     }
     return nullptr;
+}
+
+/// Whether the configuration applies to a provider of this name, which is in upper case.
+bool Applies(const OrvixProviderConfig& config, const std::wstring& providerName)
+{
+    return providerName.find(config.m_name) != std::wstring::npos;
 }
 
 } // namespace
@@ -123,7 +183,7 @@ OrvixFileIO::Node FindRoot(OrvixFileIO& file, IXMLDOMNode* document)
 OrvixProviderConfigManager::OrvixProviderConfigManager() = default;
 OrvixProviderConfigManager::~OrvixProviderConfigManager() = default;
 
-bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path)
+bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log)
 {
     if (!path)
         return false;
@@ -133,14 +193,21 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path)
             return false;
         const OpenedDocument opened(file);
         const OrvixFileIO::Node* document = file.GetDocumentRoot();
-        const OrvixFileIO::Node root = document ? FindRoot(file, document->Get()) : nullptr;
+        const OrvixFileIO::Node root = document ? FindRoot(file, document->Get(), log) : nullptr;
+        if (log)
+        {
+            log->content = file.GetContent();
+            log->hasRoot = root != nullptr;
+        }
         if (!root)
             return false;
 
-        Reading reading;
-        OrvixFileIO::Node provider;
-        for (bool more = file.GetFirstChild(root.Get(), provider); more; more = file.GetNextSibling(provider))
-            ReadProvider(file, provider.Get(), reading);
+        Reading reading{{}, {}, ReadingPlace(log)};
+        ForEachElement(file, root.Get(), [&](const std::wstring&, IXMLDOMNode* provider) {
+            reading.place.EnterItem();
+            ReadProvider(file, provider, reading);
+            return true;
+        });
 
         // From here on nothing throws, and what was read lives until the process ends.
         m_configs.reserve(m_configs.size() + reading.configs.size());
@@ -159,8 +226,17 @@ OrvixProviderConfig* OrvixProviderConfigManager::FindConfig(const wchar_t* provi
     const std::wstring name = UpperCase(providerName);
     for (OrvixProviderConfig* config : m_configs)
     {
-        if (name.find(config->m_name) != std::wstring::npos)
+        if (Applies(*config, name))
             return config;
     }
     return nullptr;
+}
+
+std::vector<OrvixProviderConfig*> OrvixProviderConfigManager::FindAllConfigs(const wchar_t* providerName) const
+{
+    const std::wstring name = UpperCase(providerName);
+    std::vector<OrvixProviderConfig*> found;
+    std::copy_if(m_configs.begin(), m_configs.end(), std::back_inserter(found),
+                 [&](const OrvixProviderConfig* config) { return Applies(*config, name); });
+    return found;
 }

@@ -2,7 +2,9 @@
 
 #include "OrvixFileIO.h"
 #include "OrvixPromptTable.h"
+#include "ReadingLog.h"
 
+#include <algorithm>
 #include <array>
 #include <cwchar>
 #include <new>
@@ -25,20 +27,68 @@ enum Field
 
 constexpr std::array<std::wstring_view, NumFields> FieldNames = {L"Text", L"ID", L"Locked", L"ActionOpts", L"Action"};
 
-bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path)
+/// Any other text locks.
+bool IsUnlocked(const std::wstring& text)
+{
+    return _wcsicmp(text.c_str(), L"false") == 0;
+}
+
+using Why = ReadingLog::Why;
+
+/// Tells the log about the document, for which the library has no use.
+void Describe(OrvixFileIO& file, ReadingLog& log)
+{
+    OrvixFileIO::Node node;
+    log.content = file.GetContent();
+    log.hasRoot = file.GetChildNode(nullptr, RootIndex, node) && file.GetNodeName(node.Get(), log.root);
+    for (long i = 0; !log.hasRoot && log.root.empty() && file.GetChildNode(nullptr, i, node); ++i)
+        file.GetNodeName(node.Get(), log.root);
+}
+
+/// The remarks on one node below the root.
+void Explain(OrvixFileIO& file, IXMLDOMNode* prompt, ReadingPlace& place)
+{
+    std::wstring text;
+    if (!file.GetNodeName(prompt, text))
+        return;
+    place.EnterItem();
+    for (const std::wstring_view name : FieldNames)
+    {
+        if (!file.FindChildText(prompt, name.data(), text))
+            place.Remark(Why::LacksElement, name.data());
+        else if (name == FieldNames[Text] && text.size() > MaxTextLength)
+            place.Remark(Why::TextCut, name.data());
+        else if (name == FieldNames[Locked] && !IsUnlocked(text) && _wcsicmp(text.c_str(), L"true") != 0)
+            place.Remark(Why::UnknownValue, name.data(), text.c_str(), L"true");
+    }
+    OrvixFileIO::Node child;
+    for (bool more = file.GetFirstChild(prompt, child); more; more = file.GetNextSibling(child))
+    {
+        if (file.GetNodeName(child.Get(), text) &&
+            std::find(FieldNames.begin(), FieldNames.end(), text) == FieldNames.end())
+            place.Remark(Why::UnknownElement, text.c_str());
+    }
+}
+
+bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
 {
     OrvixFileIO file;
     if (!file.OpenDocument(path))
         return false;
     const OpenedDocument opened(file);
+    if (log)
+        Describe(file, *log);
     OrvixFileIO::Node root;
     if (!file.GetChildNode(nullptr, RootIndex, root))
         return false;
 
+    ReadingPlace place(log);
     std::array<std::wstring, NumFields> fields;
     OrvixFileIO::Node prompt;
     for (bool more = file.GetFirstChild(root.Get(), prompt); more; more = file.GetNextSibling(prompt))
     {
+        if (log)
+            Explain(file, prompt.Get(), place);
         if (!file.FindChildTexts(prompt.Get(), FieldNames, fields))
             continue;
         if (fields[Text].size() > MaxTextLength)
@@ -46,8 +96,7 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path)
         const int id = _wtoi(fields[Id].c_str());
         const auto options = static_cast<unsigned long>(_wtoi(fields[ActionOpts].c_str()));
         const auto action = static_cast<unsigned long>(_wtoi(fields[Action].c_str()));
-        const bool locked = _wcsicmp(fields[Locked].c_str(), L"false") != 0;
-        if (table.AddPrompt(id, fields[Text].c_str(), options, action, locked) < 0)
+        if (table.AddPrompt(id, fields[Text].c_str(), options, action, !IsUnlocked(fields[Locked])) < 0)
             throw std::bad_alloc();
     }
     return true;
@@ -61,11 +110,11 @@ std::wstring Decimal(unsigned long value)
 
 } // namespace
 
-bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path)
+bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
 {
     try
     {
-        return ReadPrompts(table, path);
+        return ReadPrompts(table, path, log);
     }
     catch (...)
     {
@@ -84,7 +133,7 @@ bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
         return false;
     const OpenedDocument opened(file);
     OrvixFileIO::Node root;
-    file.AddElement(nullptr, L"OrvixPrompts", root, false);
+    file.AddElement(nullptr, PromptFileRoot, root, false);
     if (!root)
         return false;
     file.SetAttribute(root.Get(), L"version", L"1.0");
@@ -103,6 +152,5 @@ bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
                 return false;
         }
     }
-    file.SaveDocument(path);
-    return true;
+    return file.SaveDocument(path);
 }

@@ -40,23 +40,23 @@ FilteredPath::FilteredPath(const wchar_t* path) : text(UpperCase(path))
         type = std::wstring_view(text).substr(dot + 1);
 }
 
-bool ProviderFilters::Excludes(const wchar_t* path) const
-{
-    return path && WithBarrier(false, [&] { return Excludes(FilteredPath(path)); });
-}
-
-bool ProviderFilters::Excludes(const FilteredPath& path) const
+Exclusion ProviderFilters::Judge(const FilteredPath& path) const
 {
     if (!m_folders.empty())
     {
         const bool inFolder = std::any_of(m_folders.begin(), m_folders.end(),
                                           [&](const std::wstring& folder) { return StartsWith(path.text, folder); });
         if (inFolder == m_exclude)
-            return true;
+            return Exclusion::ByFolder;
     }
     if (m_fileTypes.empty() || !path.hasType)
-        return false;
+        return Exclusion::None;
     const bool hasType = std::any_of(m_fileTypes.begin(), m_fileTypes.end(),
                                      [&](const std::wstring& type) { return IsSameType(type, path.type); });
-    return hasType == m_exclude;
+    return hasType == m_exclude ? Exclusion::ByType : Exclusion::None;
+}
+
+bool ProviderFilters::Excludes(const wchar_t* path) const
+{
+    return path && WithBarrier(false, [&] { return Judge(FilteredPath(path)) != Exclusion::None; });
 }

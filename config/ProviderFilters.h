@@ -18,18 +18,27 @@ struct FilteredPath
     FilteredPath& operator=(const FilteredPath&) = delete;
 };
 
+/// Why a filter excludes a file.
+enum class Exclusion
+{
+    None, ///< it does not
+    ByFolder,
+    ByType,
+};
+
 /// One file filter of a provider, as "OrvixProviders.xml" gives it. The consumers read the fields.
 class ProviderFilters
 {
 public:
     virtual ~ProviderFilters() = default;
 
-    /// True when the filter excludes the file. An exclude filter excludes by folder or by type; an include
+    /// Whether and why the filter excludes the file. An exclude filter excludes by folder or by type; an include
     /// filter excludes what lies outside its folders, and inside them what has another type. A path without
-    /// any dot has no type and is never excluded by it. Null gives false, and so does exhausted memory.
-    bool Excludes(const wchar_t* path) const;
+    /// any dot has no type and is never excluded by it.
+    Exclusion Judge(const FilteredPath& path) const;
 
-    bool Excludes(const FilteredPath& path) const;
+    /// True when the filter excludes the file. Null gives false, and so does exhausted memory.
+    bool Excludes(const wchar_t* path) const;
 
     std::wstring m_name;                   ///< as written
     bool m_exclude = true;                 ///< false: the lists name what is included

@@ -5,19 +5,13 @@
 namespace
 {
 
-/// This library's manifest, active on the thread for a scope. Without a manifest nothing is activated.
+/// A context that is active on the thread for a scope.
 class ActivationScope
 {
 public:
-    ActivationScope() noexcept
+    explicit ActivationScope(HANDLE context) noexcept
+        : m_active(context != INVALID_HANDLE_VALUE && ActivateActCtx(context, &m_cookie))
     {
-        ACTCTXW description = {};
-        description.cbSize = sizeof(description);
-        description.dwFlags = ACTCTX_FLAG_HMODULE_VALID | ACTCTX_FLAG_RESOURCE_NAME_VALID;
-        description.hModule = LibraryModule();
-        description.lpResourceName = ISOLATIONAWARE_MANIFEST_RESOURCE_ID;
-        m_context = CreateActCtxW(&description);
-        m_active = m_context != INVALID_HANDLE_VALUE && ActivateActCtx(m_context, &m_cookie);
     }
     ActivationScope(const ActivationScope&) = delete;
     ActivationScope& operator=(const ActivationScope&) = delete;
@@ -25,12 +19,9 @@ public:
     {
         if (m_active)
             DeactivateActCtx(0, m_cookie);
-        if (m_context != INVALID_HANDLE_VALUE)
-            ReleaseActCtx(m_context);
     }
 
 private:
-    HANDLE m_context;
     ULONG_PTR m_cookie = 0;
     bool m_active;
 };
@@ -59,9 +50,32 @@ private:
 
 } // namespace
 
-UniqueModule LoadLibraryIsolated(const wchar_t* path) noexcept
+ManifestContext::ManifestContext() noexcept
 {
-    const ActivationScope activation;
-    const SilentErrors silent;
-    return UniqueModule(LoadLibraryExW(path, nullptr, 0));
+    ACTCTXW description = {};
+    description.cbSize = sizeof(description);
+    description.dwFlags = ACTCTX_FLAG_HMODULE_VALID | ACTCTX_FLAG_RESOURCE_NAME_VALID;
+    description.hModule = LibraryModule();
+    description.lpResourceName = ISOLATIONAWARE_MANIFEST_RESOURCE_ID;
+    m_context = CreateActCtxW(&description);
+}
+
+ManifestContext::~ManifestContext()
+{
+    if (m_context != INVALID_HANDLE_VALUE)
+        ReleaseActCtx(m_context);
+}
+
+UniqueModule LoadLibraryIsolated(const wchar_t* path, const ManifestContext& context) noexcept
+{
+    UniqueModule module;
+    DWORD error = ERROR_SUCCESS;
+    {
+        const ActivationScope activation(context.Get());
+        const SilentErrors silent;
+        module.reset(LoadLibraryExW(path, nullptr, 0));
+        error = GetLastError();
+    }
+    SetLastError(error);
+    return module;
 }

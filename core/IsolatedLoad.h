@@ -13,6 +13,23 @@ struct ModuleDeleter
 /// A loaded library that frees itself.
 using UniqueModule = std::unique_ptr<HMODULE, ModuleDeleter>;
 
-/// Loads a library with the activation context of this library's own manifest, so that it binds to the same
-/// side-by-side components, and without the system's error boxes. Null when it does not load.
-UniqueModule LoadLibraryIsolated(const wchar_t* path) noexcept;
+/// The activation context of this library's own manifest. Making one reads the manifest; who loads many libraries
+/// keeps it. Where it cannot be made, libraries load in the host's context.
+class ManifestContext
+{
+public:
+    ManifestContext() noexcept;
+    ManifestContext(const ManifestContext&) = delete;
+    ManifestContext& operator=(const ManifestContext&) = delete;
+    ~ManifestContext();
+
+    /// INVALID_HANDLE_VALUE when it could not be made.
+    HANDLE Get() const { return m_context; }
+
+private:
+    HANDLE m_context;
+};
+
+/// Loads a library in the context, so that it binds to the same side-by-side components as this one, and without the
+/// system's error boxes. Null when it does not load; the thread's last error then says why.
+UniqueModule LoadLibraryIsolated(const wchar_t* path, const ManifestContext& context) noexcept;

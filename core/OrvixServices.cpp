@@ -5,17 +5,21 @@
 #include "IOrvixClientAccess.h"
 #include "IOrvixCoreUI.h"
 #include "IOrvixProvider.h"
+#include "InstalledProviders.h"
 #include "OrvixClientInfo.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixMSSCC.h"
 #include "OrvixProviderConfig.h"
-#include "OrvixVersion.h"
+#include "OrvixProviderWrapper.h"
+#include "PluginCandidate.h"
+#include "PluginSearch.h"
 #include "PromptAction.h"
 #include "PromptFile.h"
 
 #include <windows.h>
 
 #include <new>
-#include <string_view>
+#include <utility>
 
 namespace
 {
@@ -25,23 +29,6 @@ constexpr std::uint32_t Plugins = 0x1;
 constexpr std::uint32_t InstalledMSSCCI = 0x2;
 
 constexpr std::uint32_t StopAskingOffered = 0x100; // bit of a prompt's options
-
-constexpr std::size_t MaxPluginPath = 259; // characters of a 260-character buffer before its terminator
-
-struct FindDeleter
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE find) const noexcept { FindClose(find); }
-};
-
-using UniqueFind = std::unique_ptr<HANDLE, FindDeleter>;
-
-/// A plug-in's exported function; null when it is missing.
-template <class Function>
-Function Export(HMODULE module, const char* name)
-{
-    return reinterpret_cast<Function>(reinterpret_cast<void (*)()>(GetProcAddress(module, name)));
-}
 
 } // namespace
 
@@ -63,7 +50,9 @@ bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
     return WithXmlBarrier(false, [&] {
         if (const wchar_t* configPath = info->GetConfigFilePath())
             m_configFolder = std::wstring(configPath) + L'\\';
-        WithXmlBarrier(false, [&] { return m_config.LoadConfig((m_configFolder + L"OrvixProviders.xml").c_str()); });
+        WithXmlBarrier(false, [&] {
+            return m_config.LoadConfig((m_configFolder + OrvixProviderConfigManager::FileName).c_str());
+        });
         m_clientAccess = info->GetIOrvixClientAccess();
         LoadPrompts();
         const bool pluginsAdded = (sources & Plugins) && WithBarrier(false, [&] { return DiscoverPlugins(info); });
@@ -98,7 +87,10 @@ OrvixServices::~OrvixServices()
 
 void OrvixServices::ReleaseProviders()
 {
-    for (auto& entry : m_providers)
+    // Taken out first: a library that shows windows when it ends may let the host call back.
+    auto providers = std::exchange(m_providers, {});
+    m_initialized = false;
+    for (auto& entry : providers)
     {
         if (entry->provider && entry->isMSSCCI)
             delete entry->provider;
@@ -106,8 +98,6 @@ void OrvixServices::ReleaseProviders()
             entry->releaseProvider(entry->provider);
         entry.reset();
     }
-    m_providers.clear();
-    m_initialized = false;
 }
 
 std::uint32_t OrvixServices::GetProviderCount()
@@ -264,85 +254,81 @@ bool OrvixServices::IsUnattended()
 /// Appends every accepted plug-in of the client's plug-in folder; true when there was one.
 bool OrvixServices::DiscoverPlugins(OrvixClientInfo* info)
 {
-    // No separator is put between the folder and what follows: the folder ends in one.
-    const auto pathOf = [&](const wchar_t* name) {
-        const wchar_t* folder = info->GetProviderPluginPath();
-        return folder ? std::wstring(folder) + name : std::wstring();
-    };
-    const std::wstring pattern = pathOf(L"*.dll");
-    if (pattern.empty() || pattern.size() > MaxPluginPath)
+    PluginSearch search(*info);
+    if (search.GetState() != PluginSearch::State::Found)
         return false;
-
-    WIN32_FIND_DATAW found;
-    const HANDLE handle = FindFirstFileW(pattern.c_str(), &found);
-    if (handle == INVALID_HANDLE_VALUE)
-        return false;
-    const UniqueFind find(handle);
+    const ManifestContext context;
     bool added = false;
-    do
+    for (; search.GetState() == PluginSearch::State::Found; search.Next())
     {
-        const std::wstring_view name = found.cFileName;
-        if (name == L"." || name == L"..")
-            continue;
         added |= WithBarrier(false, [&] {
-            const std::wstring path = pathOf(found.cFileName);
-            auto entry = path.size() <= MaxPluginPath ? LoadPlugin(path.c_str()) : nullptr;
-            if (!entry)
+            PluginCandidate candidate = PluginCandidate::Judge(search.Path(), context, m_config);
+            if (candidate.verdict != PluginCandidate::Verdict::Listed)
                 return false;
-            m_providers.push_back(std::move(entry));
+            m_providers.push_back(std::move(candidate.entry));
             return true;
         });
-    } while (FindNextFileW(find.get(), &found));
+    }
     return added;
 }
 
-/// An entry for the plug-in; null when it does not load, does not speak this contract or is switched off.
-std::unique_ptr<OrvixProviderEntry> OrvixServices::LoadPlugin(const wchar_t* path)
-{
-    UniqueModule module = LoadLibraryIsolated(path);
-    if (!module)
-        return nullptr;
-    auto entry = std::make_unique<OrvixProviderEntry>();
-    entry->module = std::move(module);
-    // Within the life of the entry: what a plug-in throws is destroyed by the plug-in's own code.
-    const bool accepted = WithBarrier(false, [&] {
-        const HMODULE plugin = entry->module.get();
-        const auto getVersion = Export<std::int32_t (*)()>(plugin, "GetOrvixVersion");
-        if (!getVersion || getVersion() != ORVIX_PLUGIN_CONTRACT_VERSION)
-            return false;
-        entry->getProvider = Export<IOrvixProvider* (*)()>(plugin, "GetIOrvixProvider");
-        entry->releaseProvider = Export<void (*)(IOrvixProvider*)>(plugin, "ReleaseIOrvixProvider");
-        const auto getName = Export<const wchar_t* (*)()>(plugin, "GetOrvixProviderName");
-        if (getName)
-        {
-            // A null name stays the empty name, to which no configuration belongs.
-            const wchar_t* name = getName();
-            entry->name = name ? name : L"";
-            entry->config = m_config.FindConfig(name);
-        }
-        const bool complete = entry->getProvider && entry->releaseProvider && getName;
-        return complete && (!entry->config || entry->config->m_enabled);
-    });
-    return accepted ? std::move(entry) : nullptr;
-}
-
-/// Installed MSSCCI libraries are not adapted yet: as if their registry key could not be opened.
+/// Appends every installed MSSCCI library that can be set up; false when the registry's list cannot be opened. The
+/// libraries themselves are loaded on first use.
 bool OrvixServices::DiscoverMSSCCIProviders()
 {
-    return false;
+    const UniqueRegistryKey list = InstalledProviders::OpenList();
+    if (!list)
+        return false;
+    for (DWORD index = 0;; ++index)
+    {
+        const bool more = WithBarrier(true, [&] {
+            std::wstring keyPath;
+            const InstalledProviders::Step step = InstalledProviders::KeyPathAt(list.get(), index, keyPath);
+            if (step == InstalledProviders::Step::EndsProcess)
+                InstalledProviders::EndProcess();
+            if (step == InstalledProviders::Step::Found)
+                AddMSSCCIProvider(keyPath);
+            return step != InstalledProviders::Step::End;
+        });
+        if (!more)
+            return true;
+    }
+}
+
+/// Appends the provider of a registry key unless something of it is missing or it is switched off.
+void OrvixServices::AddMSSCCIProvider(const std::wstring& keyPath)
+{
+    const InstalledProviders::Candidate candidate = InstalledProviders::Judge(keyPath, m_config);
+    if (candidate.verdict == InstalledProviders::Verdict::EndsProcess)
+        InstalledProviders::EndProcess();
+    if (candidate.verdict != InstalledProviders::Verdict::Listed)
+        return;
+
+    std::unique_ptr<OrvixProviderWrapper> wrapper(new OrvixProviderWrapper); // null without memory
+    if (!wrapper)
+        return;
+    auto bridge = std::make_unique<OrvixMSSCC>();
+    bridge->SetProvider(candidate.serverPath.c_str(), candidate.searchPath.c_str(), candidate.name.c_str(), false);
+    if (candidate.config)
+        bridge->SetProjectSettingsFile(candidate.config->m_msSccProjectFile);
+    wrapper->SetMSSCC(bridge.release());
+    auto entry = std::make_unique<OrvixProviderEntry>();
+    entry->name = candidate.name;
+    entry->config = candidate.config;
+    entry->isMSSCCI = true;
+    m_providers.push_back(std::move(entry));
+    m_providers.back()->provider = wrapper.release();
 }
 
 bool OrvixServices::LoadPrompts()
 {
     m_prompts.RemoveAll();
-    return WithXmlBarrier(false,
-                          [&] { return ReadPromptFile(m_prompts, (m_configFolder + L"OrvixPrompts.xml").c_str()); });
+    return WithXmlBarrier(false, [&] { return ReadPromptFile(m_prompts, (m_configFolder + PromptFileName).c_str()); });
 }
 
 bool OrvixServices::SavePrompts()
 {
-    return WithXmlBarrier(false,
-                          [&] { return WritePromptFile(m_prompts, (m_configFolder + L"OrvixPrompts.xml").c_str()); });
+    return WithXmlBarrier(false, [&] { return WritePromptFile(m_prompts, (m_configFolder + PromptFileName).c_str()); });
 }
 
 /// Index of the first row with this ID; -1 when there is none.

@@ -58,8 +58,8 @@ public:
 
 private:
     bool DiscoverPlugins(OrvixClientInfo* info);
-    std::unique_ptr<OrvixProviderEntry> LoadPlugin(const wchar_t* path);
     bool DiscoverMSSCCIProviders();
+    void AddMSSCCIProvider(const std::wstring& keyPath);
     void ReleaseProviders();
     bool LoadPrompts();
     bool SavePrompts();

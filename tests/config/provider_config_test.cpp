@@ -71,3 +71,25 @@ TEST(OrvixProviderConfigIsFileExcluded, IsFalseForANullPath)
     EXPECT_FALSE(config.IsFileExcluded(nullptr, &name));
     EXPECT_EQ(name, L"before");
 }
+
+TEST(OrvixProviderConfigFindExclusion, GivesTheFirstFilterThatExcludesAndWhy)
+{
+    OrvixProviderConfig config;
+    config.m_filters = {ExcludeType(L"objects", L"OBJ"), ExcludeType(L"first of two", L"TMP"),
+                        ExcludeType(L"second", L"TMP")};
+    const FileExclusion exclusion = config.FindExclusion(L"a.tmp");
+    EXPECT_EQ(exclusion.filter, config.m_filters[1]);
+    EXPECT_EQ(exclusion.reason, Exclusion::ByType);
+}
+
+TEST(OrvixProviderConfigFindExclusion, GivesNothingForAFileThatIsNotExcludedAndForANullPath)
+{
+    OrvixProviderConfig config;
+    config.m_filters = {ExcludeType(L"temporary", L"TMP")};
+    for (const wchar_t* path : {L"a.txt", static_cast<const wchar_t*>(nullptr)})
+    {
+        const FileExclusion exclusion = config.FindExclusion(path);
+        EXPECT_EQ(exclusion.filter, nullptr);
+        EXPECT_EQ(exclusion.reason, Exclusion::None);
+    }
+}

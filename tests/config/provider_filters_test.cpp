@@ -165,3 +165,16 @@ TEST(ProviderFiltersExcludes, TakesVeryLongPaths)
     EXPECT_TRUE(Filter(Exclude, {}, {L"TMP"}).Excludes(path.c_str()));
     EXPECT_FALSE(Filter(Exclude, {}, {L"TXT"}).Excludes(path.c_str()));
 }
+
+TEST(ProviderFiltersJudge, TellsTheFolderFromTheType)
+{
+    const Filter exclude(Exclude, {L"C:\\OUT\\"}, {L"TMP"});
+    EXPECT_EQ(exclude.Judge(FilteredPath(L"c:\\out\\a.txt")), Exclusion::ByFolder);
+    EXPECT_EQ(exclude.Judge(FilteredPath(L"c:\\out\\a.tmp")), Exclusion::ByFolder);
+    EXPECT_EQ(exclude.Judge(FilteredPath(L"d:\\a.tmp")), Exclusion::ByType);
+    EXPECT_EQ(exclude.Judge(FilteredPath(L"d:\\a.txt")), Exclusion::None);
+    const Filter include(Include, {L"C:\\PROJ\\"}, {L"CFG"});
+    EXPECT_EQ(include.Judge(FilteredPath(L"d:\\a.cfg")), Exclusion::ByFolder);
+    EXPECT_EQ(include.Judge(FilteredPath(L"c:\\proj\\a.txt")), Exclusion::ByType);
+    EXPECT_EQ(include.Judge(FilteredPath(L"c:\\proj\\a.cfg")), Exclusion::None);
+}

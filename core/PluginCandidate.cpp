@@ -1,0 +1,62 @@
+#include "PluginCandidate.h"
+
+#include "ExceptionBarrier.h"
+#include "OrvixProviderConfig.h"
+#include "OrvixProviderConfigManager.h"
+#include "OrvixVersion.h"
+#include "PluginSearch.h"
+
+#include <utility>
+
+PluginCandidate PluginCandidate::Judge(const std::wstring& path, const ManifestContext& context,
+                                       const OrvixProviderConfigManager& configs)
+{
+    PluginCandidate candidate;
+    if (path.size() > PluginSearch::MaxPath)
+        return candidate;
+    UniqueModule module = LoadLibraryIsolated(path.c_str(), context);
+    if (!module)
+    {
+        candidate.loadError = GetLastError();
+        candidate.verdict = Verdict::DoesNotLoad;
+        return candidate;
+    }
+    candidate.entry = std::make_unique<OrvixProviderEntry>();
+    candidate.entry->module = std::move(module);
+    // Within the life of the entry: what a plug-in throws is destroyed by the plug-in's own code.
+    candidate.verdict = WithBarrier(Verdict::Throws, [&] { return candidate.Ask(configs); });
+    return candidate;
+}
+
+PluginCandidate::Verdict PluginCandidate::Ask(const OrvixProviderConfigManager& configs)
+{
+    auto* const getVersion = Export<std::int32_t()>("GetOrvixVersion");
+    if (!getVersion)
+        return Verdict::Incomplete;
+    version = getVersion();
+    if (version != ORVIX_PLUGIN_CONTRACT_VERSION)
+        return Verdict::OtherVersion;
+    entry->getProvider = Export<IOrvixProvider*()>("GetIOrvixProvider");
+    entry->releaseProvider = Export<void(IOrvixProvider*)>("ReleaseIOrvixProvider");
+    if (auto* const getName = Export<const wchar_t*()>("GetOrvixProviderName"))
+    {
+        // A null name stays the empty name, to which no configuration belongs.
+        const wchar_t* name = getName();
+        entry->name = name ? name : L"";
+        entry->config = configs.FindConfig(name);
+    }
+    if (!missing.empty())
+        return Verdict::Incomplete;
+    return !entry->config || entry->config->m_enabled ? Verdict::Listed : Verdict::SwitchedOff;
+}
+
+/// A function of the plug-in; null when it is missing.
+template <class Function>
+Function* PluginCandidate::Export(const char* name)
+{
+    auto* const function =
+        reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(entry->module.get(), name)));
+    if (!function)
+        missing.push_back(name);
+    return function;
+}

@@ -1,0 +1,48 @@
+#pragma once
+
+#include <windows.h>
+
+#include <memory>
+#include <string>
+
+class OrvixClientInfo;
+
+struct FindDeleter
+{
+    using pointer = HANDLE;
+    void operator()(HANDLE find) const noexcept { FindClose(find); }
+};
+
+/// The files that may be plug-ins, in the client's plug-in folder and in the order in which the system finds them.
+class PluginSearch
+{
+public:
+    static constexpr std::size_t MaxPath = 259; // characters of a 260-character buffer before its terminator
+
+    enum class State
+    {
+        Found, ///< there is a file to look at
+        NoFolder,
+        FolderTooLong,
+        End
+    };
+
+    /// Searches for the first file. The client must outlive this object. Throws std::bad_alloc.
+    explicit PluginSearch(OrvixClientInfo& client);
+
+    State GetState() const { return m_state; }
+
+    /// Steps to the next file.
+    void Next();
+
+    /// Path of the file found. Throws std::bad_alloc.
+    std::wstring Path() const { return PathOf(m_found.cFileName); }
+
+private:
+    std::wstring PathOf(const wchar_t* name) const;
+
+    OrvixClientInfo& m_client;
+    WIN32_FIND_DATAW m_found = {};
+    std::unique_ptr<HANDLE, FindDeleter> m_find;
+    State m_state = State::NoFolder;
+};

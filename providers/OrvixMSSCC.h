@@ -1,0 +1,123 @@
+#pragma once
+
+#include "IOrvixMSSCC.h"
+#include "IsolatedLoad.h"
+
+#include <array>
+#include <string>
+#include <string_view>
+#include <type_traits>
+
+template <class Function>
+struct SccFunction;
+
+/// The bridge to one MSSCCI library, which it loads on first use and frees when it is destroyed.
+///
+/// Each operation finds its function when it is called for the first time; one that is missing fails that operation
+/// alone, but without SccGetVersion the operation that loads the library fails. A load that failed is tried again by
+/// the next operation. The folder that the process searches for libraries is the search folder during the load and as
+/// before afterwards. An empty one is restored as none: the system reports both alike.
+///
+/// What a library may write by its interface, up to 300 bytes of text, never reaches other memory than its buffer's.
+/// Texts are cut to the field's limit, between characters on their way to the library.
+///
+/// Where the interface leaves the choice: a library that asks for a project (`GetProjPath`) may make a new one, and
+/// the context of a failed start is dropped.
+class OrvixMSSCC final : public IOrvixMSSCC
+{
+public:
+    OrvixMSSCC() = default;
+    OrvixMSSCC(const OrvixMSSCC&) = delete;
+    OrvixMSSCC& operator=(const OrvixMSSCC&) = delete;
+    ~OrvixMSSCC() override;
+
+    /// Names the library; called once. `searchFolder` is where the libraries that it needs are looked for; null keeps
+    /// the old one. False only with `loadNow`, when the library does not load or lacks SccGetVersion. Throws
+    /// std::bad_alloc.
+    bool SetProvider(const wchar_t* dllPath, const wchar_t* searchFolder, const wchar_t* providerName, bool loadNow);
+
+    /// Bare name of the settings file that is kept in each project's folder; empty for none. Throws std::bad_alloc.
+    void SetProjectSettingsFile(const std::wstring& name) { m_settingsFileName = name; }
+
+    /// Parent of the library's dialogs; may be null.
+    void SetParentWindow(HWND window) { m_parentWindow = window; }
+
+    const wchar_t* GetProviderName() override { return m_providerName.c_str(); }
+    const wchar_t* GetDllPath() override { return m_dllPath.c_str(); }
+    bool IsInitialized() override { return m_initialized; }
+    bool IsProjectOpen() override { return m_projectOpen; }
+    LONG GetVersion() override;
+    SCCRTN Initialize(LPCSTR callerName) override;
+    SCCRTN Uninitialize() override;
+    SCCRTN OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC output) override;
+    SCCRTN CloseProject() override;
+    SCCRTN GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath, BOOL allowChangePath) override;
+    SCCRTN Get(LONG count, LPCSTR* names, LONG options, LPCMDOPTS block) override;
+    SCCRTN Checkout(LONG count, LPCSTR* names, LPCSTR comment, LONG options, LPCMDOPTS block) override;
+    SCCRTN Uncheckout(LONG count, LPCSTR* names, LONG options, LPCMDOPTS block) override;
+    SCCRTN Checkin(LONG count, LPCSTR* names, LPCSTR comment, LONG options, LPCMDOPTS block) override;
+    SCCRTN Add(LONG count, LPCSTR* names, LPCSTR comment, LONG* options, LPCMDOPTS block) override;
+    SCCRTN Reserved1() override { return DoNothing(); }
+    SCCRTN BeginBatch() override;
+    SCCRTN EndBatch() override;
+    SCCRTN Reserved2() override { return DoNothing(); }
+    SCCRTN Reserved3() override { return DoNothing(); }
+    SCCRTN Reserved4() override { return DoNothing(); }
+    SCCRTN History(LONG count, LPCSTR* names, LONG options, LPCMDOPTS block) override;
+    SCCRTN Properties(LPCSTR name) override;
+    SCCRTN QueryInfo(LONG count, LPCSTR* names, LPLONG status) override;
+    SCCRTN Reserved5() override { return DoNothing(); }
+    SCCRTN PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback, LPVOID callerData,
+                        LPLONG status, LONG options) override;
+    SCCRTN Reserved6() override { return DoNothing(); }
+    SCCRTN RunScc(LONG count, LPCSTR* names) override;
+    SCCRTN GetCommandOptions() override;
+    SCCRTN AddFromScc(LPLONG count, LPCSTR** names) override;
+    SCCRTN SetOption(LONG option, LONG value) override;
+    SCCRTN Reserved7() override { return DoNothing(); }
+    SCCRTN Reserved8() override { return DoNothing(); }
+    SCCRTN Reserved9() override { return DoNothing(); }
+    SCCRTN Reserved10() override { return DoNothing(); }
+
+private:
+    static constexpr std::size_t FieldLimit = 260; // characters
+    static constexpr std::size_t NumOperations = 31;
+    using Field = std::array<wchar_t, FieldLimit + 1>;
+    using AnyFunction = void (*)();
+
+    static SCCRTN DoNothing() { return SCC_OK; }
+    static void Store(Field& field, std::wstring_view text, std::size_t limit) noexcept;
+    static void StoreNarrow(Field& field, const char* text, std::size_t limit) noexcept;
+
+    bool Load();
+    template <class Function>
+    Function* Resolve(const SccFunction<Function>& entry) noexcept;
+    template <class Result, class... Parameters>
+    Result Call(const SccFunction<Result(Parameters...)>& entry,
+                std::type_identity_t<Parameters>... arguments) noexcept;
+    void ReadProjectSettings(const wchar_t* folder);
+    void WriteProjectSettings(const wchar_t* folder);
+
+    std::wstring m_providerName;
+    std::wstring m_dllPath;
+    std::wstring m_searchFolder;
+    std::wstring m_settingsFileName;
+    bool m_initialized = false;
+    bool m_projectOpen = false;
+    bool m_commandOptionsPending = true; // until the library has said that it has options
+    UniqueModule m_module;
+    std::array<AnyFunction, NumOperations> m_entryPoints = {};
+    Field m_sccName = {};
+    Field m_auxPath = {};
+    Field m_user = {};
+    Field m_spare = {}; // has no use; kept on purpose
+    Field m_projectName = {};
+    Field m_localPath = {};
+    LPVOID m_context = nullptr;
+    LPCMDOPTS m_commandOptions = nullptr;
+    HWND m_parentWindow = nullptr;
+    LONG m_version = 0;
+    LONG m_capabilities = 0;
+    LONG m_checkoutCommentLength = 0;
+    LONG m_commentLength = 0;
+};

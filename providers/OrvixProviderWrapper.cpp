@@ -1,0 +1,304 @@
+#include "OrvixProviderWrapper.h"
+
+#include "CStr.h"
+#include "ExceptionBarrier.h"
+#include "IOrvixClientAccess.h"
+#include "NarrowPaths.h"
+#include "OrvixClientInfo.h"
+#include "OrvixFileEntry.h"
+#include "OrvixFileList.h"
+#include "OrvixMSSCC.h"
+#include "WStr.h"
+
+#include <new>
+
+namespace
+{
+
+constexpr int Success = 0;
+constexpr int Failure = -1;
+constexpr int NotOffered = -2;
+constexpr int ReloadFile = 1; // of ShowHistory
+
+// Bits of an operation's options.
+constexpr unsigned long KeepCheckedOut = 0x1;
+constexpr unsigned long WithGetLatest = 0x2;
+
+/// Shared by all wrappers: set by every `Initialize`, read by the text output, to which no wrapper is given.
+IOrvixClientAccess* clientAccess = nullptr;
+
+int ToResult(SCCRTN result)
+{
+    return result == SCC_OK ? Success : Failure;
+}
+
+LONG KeepOption(unsigned long options)
+{
+    return options & KeepCheckedOut ? SCC_KEEP_CHECKEDOUT : 0;
+}
+
+/// A comment or a name in the ANSI code page, never null. Throws std::bad_alloc.
+class NarrowText
+{
+public:
+    explicit NarrowText(const wchar_t* text) : m_text(text ? text : L"")
+    {
+        if (!m_text.Get())
+            throw std::bad_alloc();
+    }
+    LPCSTR Get() const { return m_text.Get(); }
+
+private:
+    CStr m_text;
+};
+
+/// Receives the library's text output, of whatever kind.
+LONG OutputText(LPCSTR text, LONG)
+{
+    return WithBarrier(LONG{0}, [text] {
+        const WStr wide(text);
+        if (clientAccess && wide.Get())
+            clientAccess->OutputText(wide.Get(), 0);
+        return LONG{0};
+    });
+}
+
+/// Hands the paths of the active entries, of which there must be one, to `work` and gives its result.
+template <class Work>
+int FileOperation(OrvixFileList* list, Work work)
+{
+    return WithBarrier(Failure, [&] {
+        const unsigned int count = list ? list->NumActiveEntries() : 0;
+        if (count == 0)
+            return Failure;
+        NarrowPaths paths(*list, count);
+        return work(paths);
+    });
+}
+
+/// The flags of `IOrvixProvider::QueryStatus` for a file's status bits.
+unsigned long FlagsOf(LONG status, bool projectOpen)
+{
+    const auto has = [status](LONG bits) { return (status & bits) != 0; };
+    const bool controlled = has(SCC_STATUS_CONTROLLED);
+    const bool onlyMine = has(SCC_STATUS_CHECKEDOUT) && !has(SCC_STATUS_OUTOTHER);
+
+    unsigned long flags = 0;
+    if (status == 0)
+        flags |= 0x1;
+    if (controlled)
+        flags |= 0x2 | 0x200000 | 0x400000;
+    if (has(SCC_STATUS_CHECKEDOUT))
+        flags |= 0x4;
+    if (has(SCC_STATUS_OUTOTHER))
+        flags |= 0x8;
+    if (has(SCC_STATUS_OUTOFDATE))
+        flags |= 0x10;
+    if (has(SCC_STATUS_DELETED))
+        flags |= 0x20;
+    if (has(SCC_STATUS_MODIFIED))
+        flags |= 0x80;
+    if (controlled && onlyMine)
+        flags |= 0x10000 | 0x40000;
+    if (controlled && !has(SCC_STATUS_CHECKEDOUT | SCC_STATUS_OUTOTHER | SCC_STATUS_OUTOFDATE))
+        flags |= 0x20000;
+    if (controlled && has(SCC_STATUS_CHECKEDOUT | SCC_STATUS_MODIFIED))
+        flags |= 0x80000;
+    if (!controlled && projectOpen)
+        flags |= 0x100000;
+    return flags;
+}
+
+} // namespace
+
+OrvixProviderWrapper::~OrvixProviderWrapper()
+{
+    delete m_bridge;
+}
+
+void OrvixProviderWrapper::SetMSSCC(IOrvixMSSCC* bridge)
+{
+    delete m_bridge;
+    m_bridge = bridge;
+}
+
+const wchar_t* OrvixProviderWrapper::GetName()
+{
+    return m_bridge->GetProviderName();
+}
+
+int OrvixProviderWrapper::ReservedA()
+{
+    return Success;
+}
+
+bool OrvixProviderWrapper::IsInitialized()
+{
+    return m_bridge->IsInitialized();
+}
+
+bool OrvixProviderWrapper::IsProjectOpen()
+{
+    return m_bridge->IsProjectOpen();
+}
+
+int OrvixProviderWrapper::Initialize(OrvixClientInfo* info)
+{
+    return WithBarrier(Failure, [&] {
+        if (!info)
+            return Failure;
+        static_cast<OrvixMSSCC*>(m_bridge)->SetParentWindow(info->GetParentWindow());
+        clientAccess = info->GetIOrvixClientAccess();
+        return ToResult(m_bridge->Initialize(NarrowText(info->GetClientName()).Get()));
+    });
+}
+
+int OrvixProviderWrapper::Uninitialize()
+{
+    return ToResult(m_bridge->Uninitialize());
+}
+
+int OrvixProviderWrapper::OpenProject(const wchar_t* localPath, const wchar_t* comment)
+{
+    return WithBarrier(Failure, [&] {
+        NarrowPaths folder(localPath);
+        return ToResult(m_bridge->OpenProject(*folder.Get(), NarrowText(comment).Get(), OutputText));
+    });
+}
+
+int OrvixProviderWrapper::CloseProject()
+{
+    return ToResult(m_bridge->CloseProject());
+}
+
+int OrvixProviderWrapper::ReservedB()
+{
+    return Success;
+}
+
+int OrvixProviderWrapper::ReservedC()
+{
+    return NotOffered;
+}
+
+int OrvixProviderWrapper::CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options)
+{
+    return FileOperation(list, [&](NarrowPaths& paths) {
+        const NarrowText text(comment);
+        return ToResult(m_bridge->Checkin(paths.Count(), paths.Get(), text.Get(), KeepOption(options), nullptr));
+    });
+}
+
+int OrvixProviderWrapper::CheckOut(OrvixFileList* list, const wchar_t* comment, unsigned long options)
+{
+    return FileOperation(list, [&](NarrowPaths& paths) {
+        const NarrowText text(comment);
+        if (options & WithGetLatest)
+            m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr); // a failed get does not stop the check-out
+        return ToResult(m_bridge->Checkout(paths.Count(), paths.Get(), text.Get(), 0, nullptr));
+    });
+}
+
+int OrvixProviderWrapper::UndoCheckOut(OrvixFileList* list, unsigned long options)
+{
+    return FileOperation(list, [&](NarrowPaths& paths) {
+        SCCRTN result = m_bridge->Uncheckout(paths.Count(), paths.Get(), 0, nullptr);
+        if (options & WithGetLatest)
+            result = m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr);
+        return ToResult(result);
+    });
+}
+
+int OrvixProviderWrapper::GetLatest(OrvixFileList* list, unsigned long)
+{
+    return FileOperation(
+        list, [&](NarrowPaths& paths) { return ToResult(m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr)); });
+}
+
+int OrvixProviderWrapper::ReservedD(void*, unsigned long* first, unsigned long* second)
+{
+    *first = 0;
+    *second = 0;
+    return NotOffered;
+}
+
+int OrvixProviderWrapper::ReservedE()
+{
+    return NotOffered;
+}
+
+int OrvixProviderWrapper::Add(OrvixFileList* list, const wchar_t* comment, unsigned long options)
+{
+    return FileOperation(list, [&](NarrowPaths& paths) {
+        const NarrowText text(comment);
+        std::vector<LONG> perFile(static_cast<std::size_t>(paths.Count()), KeepOption(options));
+        return ToResult(m_bridge->Add(paths.Count(), paths.Get(), text.Get(), perFile.data(), nullptr));
+    });
+}
+
+int OrvixProviderWrapper::ShowHistory(OrvixFileList* list)
+{
+    return FileOperation(list, [&](NarrowPaths& paths) {
+        const SCCRTN result = m_bridge->History(paths.Count(), paths.Get(), 0, nullptr);
+        if (result < 0)
+            return Failure;
+        return result == SCC_I_RELOADFILE ? ReloadFile : Success;
+    });
+}
+
+int OrvixProviderWrapper::ShowProperties(OrvixFileList* list)
+{
+    return WithBarrier(Failure, [&] {
+        if (!list || list->NumActiveEntries() == 0)
+            return Failure;
+        NarrowPaths first(*list, 1);
+        return ToResult(m_bridge->Properties(*first.Get()));
+    });
+}
+
+int OrvixProviderWrapper::QueryStatus(OrvixFileList* list, unsigned long)
+{
+    return FileOperation(list, [&](NarrowPaths& paths) {
+        // Whatever a library does not fill stays "not controlled".
+        std::vector<LONG> statuses(static_cast<std::size_t>(paths.Count()), 0);
+        if (IsProjectOpen() && m_bridge->QueryInfo(paths.Count(), paths.Get(), statuses.data()) != SCC_OK)
+            return Failure;
+        for (unsigned int i = 0; i < statuses.size(); ++i)
+        {
+            // A library that shows windows may have let the host shorten the list.
+            if (OrvixFileEntry* entry = list->GetActiveFileEntry(i))
+                entry->SetFlagsOut(FlagsOf(statuses[i], IsProjectOpen()));
+        }
+        return Success;
+    });
+}
+
+int OrvixProviderWrapper::ReservedF()
+{
+    return NotOffered;
+}
+
+int OrvixProviderWrapper::ReservedG()
+{
+    return NotOffered;
+}
+
+int OrvixProviderWrapper::ShowOptions()
+{
+    return ToResult(m_bridge->GetCommandOptions());
+}
+
+int OrvixProviderWrapper::RunProviderClient()
+{
+    return ToResult(m_bridge->RunScc(0, nullptr));
+}
+
+int OrvixProviderWrapper::ReservedH()
+{
+    return NotOffered;
+}
+
+bool OrvixProviderWrapper::ReservedI()
+{
+    return true;
+}

@@ -1,0 +1,55 @@
+#pragma once
+
+#include "IOrvixProvider.h"
+
+class IOrvixMSSCC;
+
+/// An installed MSSCCI library as a provider: turns the active entries of a list into narrow paths, calls the bridge,
+/// and turns its result into 0 (the library answered 0) or -1.
+///
+/// Before anything is sent, an operation fails with -1 for a null or empty list or path, without memory, and for a path
+/// that the ANSI code page does not carry exactly: it would name another file. Comments and names may lose characters.
+/// A null comment is an empty one. What the library or the host throws during an operation makes it fail.
+///
+/// The library's text output goes to the client access of the last `Initialize` of any wrapper.
+class OrvixProviderWrapper : public IOrvixProvider
+{
+public:
+    OrvixProviderWrapper() = default;
+    OrvixProviderWrapper(const OrvixProviderWrapper&) = delete;
+    OrvixProviderWrapper& operator=(const OrvixProviderWrapper&) = delete;
+    ~OrvixProviderWrapper() override;
+
+    /// Takes ownership of a bridge, which must be an `OrvixMSSCC`, and deletes the old one.
+    void SetMSSCC(IOrvixMSSCC* bridge);
+
+    const wchar_t* GetName() override;
+    int ReservedA() override;
+    bool IsInitialized() override;
+    bool IsProjectOpen() override;
+    int Initialize(OrvixClientInfo* info) override;
+    int Uninitialize() override;
+    int OpenProject(const wchar_t* localPath, const wchar_t* comment) override;
+    int CloseProject() override;
+    int ReservedB() override;
+    int ReservedC() override;
+    int CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options) override;
+    int CheckOut(OrvixFileList* list, const wchar_t* comment, unsigned long options) override;
+    int UndoCheckOut(OrvixFileList* list, unsigned long options) override;
+    int GetLatest(OrvixFileList* list, unsigned long options) override;
+    int ReservedD(void* argument, unsigned long* first, unsigned long* second) override;
+    int ReservedE() override;
+    int Add(OrvixFileList* list, const wchar_t* comment, unsigned long options) override;
+    int ShowHistory(OrvixFileList* list) override;
+    int ShowProperties(OrvixFileList* list) override;
+    int QueryStatus(OrvixFileList* list, unsigned long options) override;
+    int ReservedF() override;
+    int ReservedG() override;
+    int ShowOptions() override;
+    int RunProviderClient() override;
+    int ReservedH() override;
+    bool ReservedI() override;
+
+private:
+    IOrvixMSSCC* m_bridge = nullptr;
+};

@@ -1,0 +1,134 @@
+// An MSSCCI library that keeps every rule of the interface but the one that `Defect` names. It remembers the status of
+// files for as long as it is loaded, and touches none.
+
+#include "Defect.h"
+#include "MSSCCI.h"
+
+#include <cstring>
+#include <map>
+#include <string>
+
+namespace
+{
+
+constexpr LONG Controlled = SCC_STATUS_CONTROLLED;
+constexpr LONG CheckedOut = SCC_STATUS_CONTROLLED | SCC_STATUS_CHECKEDOUT;
+
+LPTEXTOUTPROC printer = nullptr;
+std::map<std::string, LONG> statuses;
+
+void Print(LPCSTR text, LONG kind)
+{
+    if (printer)
+        printer(text, kind);
+}
+
+SCCRTN Become(LONG count, LPCSTR* names, LONG status)
+{
+    for (LONG i = 0; i < count; ++i)
+        statuses[names[i]] = status;
+    return SCC_OK;
+}
+
+} // namespace
+
+extern "C" {
+
+LONG SccGetVersion()
+{
+    return Defect::Is(L"version") ? 0x00030001 : 0x00010003;
+}
+
+SCCRTN SccInitialize(LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabilities, LPSTR auxPathLabel,
+                     LPLONG checkoutCommentLength, LPLONG commentLength)
+{
+    if (Defect::Is(L"handles"))
+        CreateEventW(nullptr, FALSE, FALSE, nullptr);
+    if (Defect::Is(L"starts"))
+        return SCC_E_INITIALIZEFAILED;
+    *context = &statuses;
+    std::memset(sccName, 0, Defect::Is(L"texts") ? 260 : SCC_NAME_SIZE);
+    std::strcpy(sccName, "Defective");
+    if (Defect::Is(L"no-terminator"))
+        std::memset(auxPathLabel, 'x', SCC_AUXLABEL_SIZE);
+    *capabilities = SCC_CAP_QUERYINFO | (Defect::Is(L"capabilities") ? SCC_CAP_POPULATELIST : 0);
+    *checkoutCommentLength = 100;
+    *commentLength = 100;
+    return SCC_OK;
+}
+
+SCCRTN SccUninitialize(LPVOID)
+{
+    return SCC_OK;
+}
+
+SCCRTN SccOpenProject(LPVOID, HWND, LPSTR, LPCSTR projectName, LPCSTR, LPSTR, LPCSTR, LPTEXTOUTPROC output, LONG)
+{
+    printer = output;
+    if (Defect::Is(L"input-texts"))
+        std::strcpy(const_cast<LPSTR>(projectName), "mine");
+    return SCC_OK;
+}
+
+SCCRTN SccCloseProject(LPVOID)
+{
+    return SCC_OK;
+}
+
+SCCRTN SccGet(LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS)
+{
+    if (Defect::Is(L"text-without-kind"))
+        Print("got", 99);
+    else if (Defect::Is(L"text-null"))
+        Print(nullptr, SCC_MSG_INFO);
+    else
+        Print(Defect::Is(L"text-output") ? "got\r\n" : "got", SCC_MSG_INFO);
+    return Defect::Is(L"codes") ? 42 : SCC_OK;
+}
+
+SCCRTN SccCheckout(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDOPTS)
+{
+    return Become(count, names, CheckedOut);
+}
+
+SCCRTN SccUncheckout(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
+{
+    return Become(count, names, Controlled);
+}
+
+SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDOPTS)
+{
+    if (Defect::Is(L"input-names") && count > 0)
+        const_cast<LPSTR>(names[0])[0] = '#';
+    return Become(count, names, Controlled);
+}
+
+SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG*, LPCMDOPTS)
+{
+    return Become(count, names, Controlled);
+}
+
+SCCRTN SccQueryInfo(LPVOID, LONG count, LPCSTR* names, LPLONG status)
+{
+    if (Defect::Is(L"null-arguments") && count == 0)
+        Defect::Crash();
+    for (LONG i = 0; i < count; ++i)
+    {
+        if (Defect::Is(L"info-left-out") && i + 1 == count)
+            break;
+        status[i] = statuses.contains(names[i]) ? statuses[names[i]] : 0;
+        status[i] |= Defect::Is(L"info-bits") && status[i] == CheckedOut ? 0x4000 : 0;
+    }
+    if (Defect::Is(L"info-overrun"))
+        status[count] = 0;
+    return SCC_OK;
+}
+
+SCCRTN SccGetCommandOptions(LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block)
+{
+    if (Defect::Is(L"hang") && !block)
+        Defect::Hang();
+    return SCC_E_OPNOTSUPPORTED;
+}
+
+} // extern "C"
