@@ -3,8 +3,6 @@
 #include "ArchiveText.h"
 #include "Sha256.h"
 
-#include <vector>
-
 namespace
 {
 
@@ -19,6 +17,28 @@ std::uint64_t LastWrite(HANDLE file)
     if (!GetFileTime(file, nullptr, nullptr, &time))
         ArchiveFiles::ThrowLastError(L"A file's time cannot be read");
     return Join(time.dwHighDateTime, time.dwLowDateTime);
+}
+
+struct SearchCloser
+{
+    using pointer = HANDLE;
+    void operator()(HANDLE search) const noexcept { FindClose(search); }
+};
+using UniqueSearch = std::unique_ptr<HANDLE, SearchCloser>;
+
+/// Begins to list what a pattern names; null when that failed, with the reason in `GetLastError`.
+UniqueSearch BeginSearch(const std::wstring& pattern, WIN32_FIND_DATAW& data)
+{
+    const HANDLE search = FindFirstFileW(pattern.c_str(), &data);
+    return UniqueSearch(search == INVALID_HANDLE_VALUE ? nullptr : search);
+}
+
+ArchiveFiles::Facts FactsOf(const WIN32_FIND_DATAW& data)
+{
+    const bool isLink = (data.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
+                        (data.dwReserved0 == IO_REPARSE_TAG_SYMLINK || data.dwReserved0 == IO_REPARSE_TAG_MOUNT_POINT);
+    return {data.cFileName, data.dwFileAttributes, Join(data.nFileSizeHigh, data.nFileSizeLow),
+            Join(data.ftLastWriteTime.dwHighDateTime, data.ftLastWriteTime.dwLowDateTime), isLink};
 }
 
 void Write(HANDLE file, const char* bytes, std::size_t size)
@@ -106,18 +126,27 @@ bool ArchiveFiles::IsMissing(DWORD error)
 std::optional<ArchiveFiles::Facts> ArchiveFiles::Find(const std::wstring& path)
 {
     WIN32_FIND_DATAW data;
-    const HANDLE search = FindFirstFileW(path.c_str(), &data);
-    if (search == INVALID_HANDLE_VALUE)
+    if (BeginSearch(path, data))
+        return FactsOf(data);
+    if (IsMissing(GetLastError()))
+        return std::nullopt;
+    ThrowLastError(L"A file cannot be found");
+}
+
+std::vector<ArchiveFiles::Facts> ArchiveFiles::List(const std::wstring& folder)
+{
+    std::vector<Facts> entries;
+    WIN32_FIND_DATAW data;
+    const UniqueSearch search = BeginSearch(folder + L"\\*", data);
+    for (bool more = search != nullptr; more; more = FindNextFileW(search.get(), &data) != FALSE)
     {
-        if (IsMissing(GetLastError()))
-            return std::nullopt;
-        ThrowLastError(L"A file cannot be found");
+        const std::wstring_view name = data.cFileName;
+        if (name != L"." && name != L"..")
+            entries.push_back(FactsOf(data));
     }
-    FindClose(search);
-    const bool isLink = (data.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
-                        (data.dwReserved0 == IO_REPARSE_TAG_SYMLINK || data.dwReserved0 == IO_REPARSE_TAG_MOUNT_POINT);
-    return Facts{data.cFileName, data.dwFileAttributes, Join(data.nFileSizeHigh, data.nFileSizeLow),
-                 Join(data.ftLastWriteTime.dwHighDateTime, data.ftLastWriteTime.dwLowDateTime), isLink};
+    if (GetLastError() != ERROR_NO_MORE_FILES)
+        ThrowLastError(L"A folder of the archive cannot be listed");
+    return entries;
 }
 
 std::optional<std::string> ArchiveFiles::ReadText(const std::wstring& path, std::size_t limit)

@@ -9,6 +9,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 /// What the archive does to files. Paths are full ones with the prefix "\\?\". Everything throws
 /// `ArchiveFailure` (mostly `ArchiveError::Access`) when Windows refuses.
@@ -46,6 +47,9 @@ struct Facts
 
 /// The entry at a path; nothing when there is none.
 std::optional<Facts> Find(const std::wstring& path);
+
+/// The entries of a folder, in no order.
+std::vector<Facts> List(const std::wstring& folder);
 
 /// True when the last error says that a file or its folder does not exist.
 bool IsMissing(DWORD error);

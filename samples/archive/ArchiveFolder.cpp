@@ -34,11 +34,22 @@ std::wstring ReadLink(const std::wstring& file)
     return *target;
 }
 
+/// Where a project has its archive, or a link to it.
+std::wstring ArchivePlace(const std::wstring& projectFolder)
+{
+    return projectFolder + L'\\' + std::wstring(ArchivePaths::ArchiveName);
+}
+
 } // namespace
+
+bool ArchiveFolder::Exists(const std::wstring& projectFolder)
+{
+    return ArchiveFiles::Find(ArchivePlace(projectFolder)).has_value();
+}
 
 ArchiveFolder::ArchiveFolder(const std::wstring& projectFolder, std::chrono::milliseconds lockWait)
 {
-    const std::wstring path = projectFolder + L'\\' + std::wstring(ArchivePaths::ArchiveName);
+    const std::wstring path = ArchivePlace(projectFolder);
     const std::optional<ArchiveFiles::Facts> facts = ArchiveFiles::Find(path);
     if (!facts)
         ArchiveFiles::MakeFolder(path);
@@ -73,13 +84,44 @@ std::wstring ArchiveFolder::Place(const wchar_t* kind, const std::string& name) 
 
 std::optional<ArchiveRecord> ArchiveFolder::Load(const ArchiveTarget& target) const
 {
-    const std::optional<std::string> text = ArchiveFiles::ReadText(Place(Records, target.key), MaxRecordSize);
+    return Load(target.key);
+}
+
+std::optional<ArchiveRecord> ArchiveFolder::Load(const std::string& key) const
+{
+    const std::optional<std::string> text = ArchiveFiles::ReadText(Place(Records, key), MaxRecordSize);
     if (!text)
         return std::nullopt;
     std::optional<ArchiveRecord> record = ArchiveRecord::Parse(*text);
-    if (!record || ArchiveText::Fold(record->path) != ArchiveText::Fold(target.relative))
+    if (!record || ArchivePaths::KeyOf(record->path) != key)
         ThrowDamaged(L"The file's record in the archive is damaged");
     return record;
+}
+
+std::vector<std::wstring> ArchiveFolder::List(ArchiveFailures& failures) const
+{
+    std::vector<std::wstring> paths;
+    const std::wstring records = m_path + L'\\' + Records;
+    for (const ArchiveFiles::Facts& group : ArchiveFiles::List(records))
+    {
+        if (!group.IsFolder())
+            continue;
+        for (const ArchiveFiles::Facts& file : ArchiveFiles::List(records + L'\\' + group.name))
+        {
+            try
+            {
+                // What does not lie where its name belongs is no record.
+                if (const std::optional<ArchiveRecord> record = Load(ArchiveText::ToUtf8(file.name)))
+                    paths.push_back(record->path);
+            }
+            catch (ArchiveFailure& failure)
+            {
+                failure.file = ArchivePaths::ShortForm(records + L'\\' + group.name + L'\\' + file.name);
+                failures.push_back(std::move(failure));
+            }
+        }
+    }
+    return paths;
 }
 
 void ArchiveFolder::Save(const ArchiveTarget& target, const ArchiveRecord& record) const

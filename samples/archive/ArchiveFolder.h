@@ -7,6 +7,7 @@
 #include <chrono>
 #include <optional>
 #include <string>
+#include <vector>
 
 /// The archive on disk: records and contents, and how they are written so that nothing is ever lost. The format is
 /// described in docs/archive-format.md.
@@ -18,6 +19,9 @@
 class ArchiveFolder
 {
 public:
+    /// True when a project folder has an archive or a link to one. The folder as `ArchivePaths::FindFolder` gives it.
+    static bool Exists(const std::wstring& projectFolder);
+
     /// Opens the archive of a project folder and makes it when there is none. The folder as
     /// `ArchivePaths::FindFolder` gives it.
     ArchiveFolder(const std::wstring& projectFolder, std::chrono::milliseconds lockWait);
@@ -29,6 +33,10 @@ public:
 
     /// The record of a file; nothing when it is not controlled.
     std::optional<ArchiveRecord> Load(const ArchiveTarget& target) const;
+
+    /// The paths of all files under control as their records have them, in no order. Records that cannot be read are
+    /// added to `failures`, each under its own path.
+    std::vector<std::wstring> List(ArchiveFailures& failures) const;
 
     /// Writes the record of a file in place of the old one.
     void Save(const ArchiveTarget& target, const ArchiveRecord& record) const;
@@ -43,6 +51,7 @@ public:
 private:
     void Prepare(std::chrono::milliseconds lockWait) const;
     bool HasFormat() const;
+    std::optional<ArchiveRecord> Load(const std::string& key) const;
     std::wstring TemporaryFile() const { return m_path + L"\\new.tmp"; }
     std::wstring FormatFile() const { return m_path + L"\\archive.txt"; }
 

@@ -10,6 +10,7 @@ namespace
 
 constexpr std::size_t MaxPathLength = 32767;
 constexpr std::wstring_view LongPrefix = L"\\\\?\\";
+constexpr std::wstring_view LongSharePrefix = L"\\\\?\\UNC\\";
 constexpr wchar_t LinkReason[] = L"Links are not taken";
 constexpr wchar_t Outside[] = L"The file lies outside the project folder";
 
@@ -45,7 +46,7 @@ std::wstring LongForm(const std::wstring& given)
     std::replace(path.begin(), path.end(), L'/', L'\\');
 
     std::wstring_view rest = path;
-    const bool isLongShare = TakePrefix(rest, L"\\\\?\\UNC\\");
+    const bool isLongShare = TakePrefix(rest, LongSharePrefix);
     const bool isLong = !isLongShare && TakePrefix(rest, LongPrefix);
     std::wstring result;
     if (isLongShare || (!isLong && !rest.starts_with(L"\\\\.\\") && TakePrefix(rest, L"\\\\")))
@@ -141,6 +142,15 @@ std::wstring ArchivePaths::FindFolder(const std::wstring& path)
     return place;
 }
 
+std::wstring ArchivePaths::ShortForm(const std::wstring& path)
+{
+    std::wstring_view rest = path;
+    if (TakePrefix(rest, LongSharePrefix))
+        return L"\\\\" + std::wstring(rest);
+    TakePrefix(rest, LongPrefix);
+    return std::wstring(rest);
+}
+
 bool ArchivePaths::IsReserved(std::wstring_view path)
 {
     static const std::wstring archiveName = ArchiveText::Fold(ArchiveName);
@@ -175,11 +185,24 @@ ArchiveTarget ArchivePaths::Resolve(const std::wstring& path)
     if (IsReserved(target.relative))
         Refuse(L"The name is reserved for the archive");
     std::replace(target.relative.begin(), target.relative.end(), L'\\', L'/');
-    const std::string identity = ArchiveText::ToUtf8(ArchiveText::Fold(target.relative));
+    target.key = KeyOf(target.relative);
+    return target;
+}
+
+std::wstring ArchivePaths::RelativeFolder(const std::wstring& path)
+{
+    std::wstring relative = ResolveFolder(LongForm(path)).substr(m_project.size()) + L'\\';
+    relative.erase(0, 1);
+    std::replace(relative.begin(), relative.end(), L'\\', L'/');
+    return relative;
+}
+
+std::string ArchivePaths::KeyOf(std::wstring_view relative)
+{
+    const std::string identity = ArchiveText::ToUtf8(ArchiveText::Fold(relative));
     Sha256 sha256;
     sha256.Add(identity.data(), identity.size());
-    target.key = sha256.Finish();
-    return target;
+    return sha256.Finish();
 }
 
 void ArchivePaths::MakeFolders(const ArchiveTarget& target) const

@@ -37,12 +37,22 @@ public:
     /// Throws `ArchiveError::InvalidPath` for a path that a project cannot hold, a folder's among them.
     ArchiveTarget Resolve(const std::wstring& path);
 
+    /// Where a folder, on disk or not, lies in the project: relative to it, with "/" behind every name; empty for the
+    /// project folder itself. Throws `ArchiveError::InvalidPath` for a folder elsewhere.
+    std::wstring RelativeFolder(const std::wstring& path);
+
+    /// The name of the record of a file, from `ArchiveTarget::relative`.
+    static std::string KeyOf(std::wstring_view relative);
+
     /// Makes the folders above a file of the project that are missing.
     void MakeFolders(const ArchiveTarget& target) const;
 
     /// The place of an existing folder with every link and short name on the way resolved, without a
     /// separator at its end. Throws `ArchiveError::InvalidPath` or `ArchiveError::Access`.
     static std::wstring FindFolder(const std::wstring& path);
+
+    /// A path with the prefix "\\?\" as people write it.
+    static std::wstring ShortForm(const std::wstring& path);
 
     /// True when a name of the path is one of the reserved ones. Takes paths with "\".
     static bool IsReserved(std::wstring_view path);

@@ -5,10 +5,6 @@
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
 
-#include <windows.h>
-
-#include <lmcons.h>
-
 #include <algorithm>
 #include <span>
 
@@ -39,18 +35,6 @@ int Guarded(Work work) noexcept
 std::wstring Text(const wchar_t* text)
 {
     return text ? text : L"";
-}
-
-std::wstring WindowsUser()
-{
-    wchar_t name[UNLEN + 1];
-    DWORD size = static_cast<DWORD>(std::size(name));
-    return ::GetUserNameW(name, &size) ? name : L"";
-}
-
-std::wstring Wide(const std::string& ascii)
-{
-    return {ascii.begin(), ascii.end()};
 }
 
 /// The bits of `IOrvixProvider::QueryStatus` for a file of an open project.
@@ -104,7 +88,7 @@ int ArchiveProvider::Initialize(OrvixClientInfo* info)
             return Failed;
         m_user = Text(info->GetUserNameW());
         if (m_user.empty())
-            m_user = WindowsUser();
+            m_user = ArchiveReport::WindowsUser();
         m_clientAccess = info->GetIOrvixClientAccess();
         m_initialized = true;
         return Success;
@@ -220,15 +204,7 @@ int ArchiveProvider::ShowHistory(OrvixFileList* list)
         std::vector<ArchiveRecord> records;
         const int result = Report(m_store.History(paths, records));
         for (const ArchiveRecord& record : records)
-        {
-            Output(record.path);
-            for (std::size_t number = record.versions.size(); number > 0; --number)
-            {
-                const ArchiveVersion& version = record.versions[number - 1];
-                Output(L"  " + std::to_wstring(number) + L"  " + Wide(version.time) + L"  " + version.user + L"  " +
-                       version.comment);
-            }
-        }
+            Output(ArchiveReport::History(record));
         return result;
     });
 }
@@ -239,17 +215,7 @@ int ArchiveProvider::ShowProperties(OrvixFileList* list)
         std::vector<ArchiveRecord> records;
         const int result = Report(m_store.History(std::span(paths).first(1), records));
         for (const ArchiveRecord& record : records)
-        {
-            const ArchiveVersion& latest = record.Latest();
-            Output(record.path);
-            Output(L"  version      " + std::to_wstring(record.versions.size()));
-            Output(L"  stored       " + Wide(latest.time) + L"  " + latest.user);
-            Output(L"  comment      " + latest.comment);
-            Output(L"  size         " + std::to_wstring(latest.size) + L" bytes");
-            Output(L"  SHA-256      " + Wide(latest.sha256));
-            Output(L"  checked out  " +
-                   (record.checkOut ? Wide(record.checkOut->time) + L"  " + record.checkOut->user : L"no"));
-        }
+            Output(ArchiveReport::Properties(record));
         return result;
     });
 }
@@ -305,20 +271,14 @@ bool ArchiveProvider::ReservedI()
 int ArchiveProvider::Report(const ArchiveFailures& failures)
 {
     for (const ArchiveFailure& failure : failures)
-        Output(failure.file.empty() ? failure.reason : failure.file + L": " + failure.reason);
+        Output(ArchiveReport::Failure(failure));
     return failures.empty() ? Success : Failed;
 }
 
-/// Shows a text line by line, the lines after the first indented.
-void ArchiveProvider::Output(const std::wstring& text)
+void ArchiveProvider::Output(const ArchiveReport::Lines& lines)
 {
     if (!m_clientAccess)
         return;
-    for (std::size_t begin = 0; begin <= text.size();)
-    {
-        const std::size_t end = std::min(text.find_first_of(L"\r\n", begin), text.size());
-        if (end > begin || begin == 0)
-            m_clientAccess->OutputText(((begin > 0 ? L"     " : L"") + text.substr(begin, end - begin)).c_str(), 0);
-        begin = end + 1;
-    }
+    for (const std::wstring& line : lines)
+        m_clientAccess->OutputText(line.c_str(), 0);
 }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "ArchiveReport.h"
 #include "ArchiveStore.h"
 #include "IOrvixProvider.h"
 
@@ -55,7 +56,7 @@ private:
     template <typename Work>
     int FileOperation(OrvixFileList* list, Work work);
     int Report(const ArchiveFailures& failures);
-    void Output(const std::wstring& text);
+    void Output(const ArchiveReport::Lines& lines);
 
     ArchiveStore m_store;
     std::wstring m_user;

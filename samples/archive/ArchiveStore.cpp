@@ -190,6 +190,25 @@ ArchiveFailures ArchiveStore::Open(const std::wstring& projectFolder, const std:
     return {};
 }
 
+ArchiveFailures ArchiveStore::Find(const std::wstring& projectFolder, bool& isProject)
+{
+    isProject = false;
+    try
+    {
+        isProject = ArchiveFolder::Exists(ArchivePaths::FindFolder(projectFolder));
+    }
+    catch (const ArchiveFailure& failure)
+    {
+        return {failure};
+    }
+    return {};
+}
+
+std::wstring ArchiveStore::ArchivePath() const
+{
+    return m_project ? ArchivePaths::ShortForm(m_project->archive.Path()) : L"";
+}
+
 template <typename Work>
 ArchiveFailures ArchiveStore::ForEachFile(std::span<const std::wstring> files, bool withLock, Work work) const
 {
@@ -326,6 +345,7 @@ ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::v
     Session session(*m_project);
     const auto statusOf = [&](const ArchiveTarget& target) {
         ArchiveStatus status;
+        status.missing = !target.facts;
         const std::optional<ArchiveRecord> record = session.Find(target);
         if (!record)
             return status;
@@ -365,5 +385,37 @@ ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::v
     }
     if (!failures.empty())
         statuses.clear();
+    return failures;
+}
+
+ArchiveFailures ArchiveStore::List(const std::wstring& folder, bool withSubfolders,
+                                   std::vector<std::wstring>& files) const
+{
+    files.clear();
+    if (!m_project)
+        return {Failure(ArchiveError::NotOpen, L"No project is open")};
+
+    ArchiveFailures failures;
+    try
+    {
+        const std::wstring inside =
+            ArchiveText::Fold(ArchivePaths(m_project->folder, m_project->archive.Path()).RelativeFolder(folder));
+        const std::wstring above = folder.substr(0, folder.find_last_not_of(L"\\/") + 1) + L'\\';
+        for (const std::wstring& path : m_project->archive.List(failures))
+        {
+            std::wstring rest = path.substr(std::min(path.size(), inside.size()));
+            if (!ArchiveText::Fold(path).starts_with(inside) ||
+                (!withSubfolders && rest.find(L'/') != std::wstring::npos))
+                continue;
+            std::replace(rest.begin(), rest.end(), L'/', L'\\');
+            files.push_back(above + rest);
+        }
+        std::sort(files.begin(), files.end());
+    }
+    catch (ArchiveFailure& failure)
+    {
+        failure.file = folder;
+        failures.push_back(std::move(failure));
+    }
     return failures;
 }

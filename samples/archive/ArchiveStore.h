@@ -13,6 +13,7 @@
 /// How a file stands to the archive, for the user of the store.
 struct ArchiveStatus
 {
+    bool missing = false; ///< not on disk
     bool controlled = false;
     bool checkedOut = false;        ///< by this user
     bool checkedOutByOther = false; ///< by another user
@@ -44,8 +45,14 @@ public:
     /// compared without regard to letter case.
     ArchiveFailures Open(const std::wstring& projectFolder, const std::wstring& user);
 
+    /// Tells whether an existing folder is a project: has an archive or a link to one.
+    static ArchiveFailures Find(const std::wstring& projectFolder, bool& isProject);
+
     void Close() { m_project.reset(); }
     bool IsOpen() const { return m_project.has_value(); }
+
+    /// The open project's archive folder, for people to read; empty when no project is open.
+    std::wstring ArchivePath() const;
 
     /// Puts files under control and stores their first version.
     ArchiveFailures Add(std::span<const std::wstring> files, const std::wstring& comment, bool keepCheckedOut);
@@ -72,6 +79,10 @@ public:
 
     /// Gives the records of the files, in order, without those that are reported as failures.
     ArchiveFailures History(std::span<const std::wstring> files, std::vector<ArchiveRecord>& records) const;
+
+    /// Gives the full paths of the files under control in a folder of the project, on disk or not, each beginning with
+    /// the folder as it is given, in the order of their names. Reads every record of the archive.
+    ArchiveFailures List(const std::wstring& folder, bool withSubfolders, std::vector<std::wstring>& files) const;
 
 private:
     struct Project

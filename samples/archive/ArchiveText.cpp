@@ -16,26 +16,46 @@ int Length(std::size_t size)
     return static_cast<int>(size);
 }
 
+std::string ToBytes(UINT codePage, std::wstring_view text)
+{
+    const int length = Length(text.size());
+    const int size = WideCharToMultiByte(codePage, 0, text.data(), length, nullptr, 0, nullptr, nullptr);
+    std::string bytes(static_cast<std::size_t>(size), '\0');
+    WideCharToMultiByte(codePage, 0, text.data(), length, bytes.data(), size, nullptr, nullptr);
+    return bytes;
+}
+
+std::optional<std::wstring> FromBytes(UINT codePage, DWORD flags, std::string_view bytes)
+{
+    const int size = Length(bytes.size());
+    const int length = MultiByteToWideChar(codePage, flags, bytes.data(), size, nullptr, 0);
+    if (length == 0 && size != 0)
+        return std::nullopt;
+    std::wstring text(static_cast<std::size_t>(length), L'\0');
+    MultiByteToWideChar(codePage, flags, bytes.data(), size, text.data(), length);
+    return text;
+}
+
 } // namespace
 
 std::string ArchiveText::ToUtf8(std::wstring_view text)
 {
-    const int length = Length(text.size());
-    const int size = WideCharToMultiByte(CP_UTF8, 0, text.data(), length, nullptr, 0, nullptr, nullptr);
-    std::string bytes(static_cast<std::size_t>(size), '\0');
-    WideCharToMultiByte(CP_UTF8, 0, text.data(), length, bytes.data(), size, nullptr, nullptr);
-    return bytes;
+    return ToBytes(CP_UTF8, text);
 }
 
 std::optional<std::wstring> ArchiveText::FromUtf8(std::string_view bytes)
 {
-    const int size = Length(bytes.size());
-    const int length = MultiByteToWideChar(CP_UTF8, MB_ERR_INVALID_CHARS, bytes.data(), size, nullptr, 0);
-    if (length == 0 && size != 0)
-        return std::nullopt;
-    std::wstring text(static_cast<std::size_t>(length), L'\0');
-    MultiByteToWideChar(CP_UTF8, MB_ERR_INVALID_CHARS, bytes.data(), size, text.data(), length);
-    return text;
+    return FromBytes(CP_UTF8, MB_ERR_INVALID_CHARS, bytes);
+}
+
+std::string ArchiveText::ToAnsi(std::wstring_view text)
+{
+    return ToBytes(CP_ACP, text);
+}
+
+std::wstring ArchiveText::FromAnsi(std::string_view bytes)
+{
+    return FromBytes(CP_ACP, 0, bytes).value_or(L"");
 }
 
 bool ArchiveText::IsValid(std::wstring_view text)

@@ -14,6 +14,12 @@ std::string ToUtf8(std::wstring_view text);
 /// Converts UTF-8; nothing when the bytes are not UTF-8.
 std::optional<std::wstring> FromUtf8(std::string_view bytes);
 
+/// Converts UTF-16 to the ANSI code page; characters that it lacks become others.
+std::string ToAnsi(std::wstring_view text);
+
+/// Converts text in the ANSI code page.
+std::wstring FromAnsi(std::string_view bytes);
+
 /// False when the text has lone surrogates, which UTF-8 cannot carry.
 bool IsValid(std::wstring_view text);
 

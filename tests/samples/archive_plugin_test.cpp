@@ -1,4 +1,5 @@
 #include "ArchiveProject.h"
+#include "LoadedLibrary.h"
 
 #include "BraeDiagnostics.h"
 #include "IOrvixClientAccess.h"
@@ -20,45 +21,17 @@ namespace
 {
 
 /// A loaded copy of the plug-in: what one host process has of it.
-class Plugin
+struct Plugin
 {
-public:
-    explicit Plugin(const std::filesystem::path& file)
-        : m_module(LoadLibraryW(file.c_str())), version(Export<std::int32_t (*)()>("GetOrvixVersion")),
-          get(Export<IOrvixProvider* (*)()>("GetIOrvixProvider")),
-          release(Export<void (*)(IOrvixProvider*)>("ReleaseIOrvixProvider")),
-          name(Export<const wchar_t* (*)()>("GetOrvixProviderName"))
-    {
-    }
-    Plugin(const Plugin&) = delete;
-    Plugin& operator=(const Plugin&) = delete;
-    ~Plugin() { Unload(); }
+    explicit Plugin(const std::filesystem::path& file) : library(file) {}
 
     bool IsLoaded() const { return version && get && release && name; }
-    HMODULE Module() const { return m_module; }
 
-    void Unload()
-    {
-        if (m_module)
-            FreeLibrary(m_module);
-        m_module = nullptr;
-    }
-
-private:
-    template <typename Function>
-    Function Export(const char* exportName) const
-    {
-        return m_module ? reinterpret_cast<Function>(reinterpret_cast<void*>(GetProcAddress(m_module, exportName)))
-                        : nullptr;
-    }
-
-    HMODULE m_module;
-
-public:
-    std::int32_t (*version)();
-    IOrvixProvider* (*get)();
-    void (*release)(IOrvixProvider*);
-    const wchar_t* (*name)();
+    LoadedLibrary library;
+    std::int32_t (*version)() = library.Export<std::int32_t()>("GetOrvixVersion");
+    IOrvixProvider* (*get)() = library.Export<IOrvixProvider*()>("GetIOrvixProvider");
+    void (*release)(IOrvixProvider*) = library.Export<void(IOrvixProvider*)>("ReleaseIOrvixProvider");
+    const wchar_t* (*name)() = library.Export<const wchar_t*()>("GetOrvixProviderName");
 };
 
 /// A host that keeps the lines it is shown.
@@ -185,22 +158,6 @@ protected:
     std::unique_ptr<Host> m_ben;
 };
 
-/// The names in the module's export table.
-std::vector<std::string> ExportedNames(HMODULE module)
-{
-    const auto* base = reinterpret_cast<const char*>(module);
-    const auto* dos = reinterpret_cast<const IMAGE_DOS_HEADER*>(base);
-    const auto* headers = reinterpret_cast<const IMAGE_NT_HEADERS*>(base + dos->e_lfanew);
-    const auto& directory = headers->OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_EXPORT];
-    const auto* exports = reinterpret_cast<const IMAGE_EXPORT_DIRECTORY*>(base + directory.VirtualAddress);
-    const auto* names = reinterpret_cast<const DWORD*>(base + exports->AddressOfNames);
-    std::vector<std::string> result;
-    for (DWORD i = 0; i < exports->NumberOfNames; ++i)
-        result.emplace_back(base + names[i]);
-    EXPECT_EQ(exports->NumberOfFunctions, exports->NumberOfNames);
-    return result;
-}
-
 } // namespace
 
 // The contract
@@ -210,7 +167,7 @@ TEST(ArchivePluginContract, ExportsItsFourFunctionsAndNothingElse)
     const Plugin plugin(ARCHIVE_PLUGIN);
     ASSERT_TRUE(plugin.IsLoaded());
 
-    EXPECT_EQ(ExportedNames(plugin.Module()), (std::vector<std::string>{"GetIOrvixProvider", "GetOrvixProviderName",
+    EXPECT_EQ(plugin.library.ExportedNames(), (std::vector<std::string>{"GetIOrvixProvider", "GetOrvixProviderName",
                                                                         "GetOrvixVersion", "ReleaseIOrvixProvider"}));
     EXPECT_EQ(plugin.version(), 200);
     EXPECT_STREQ(plugin.name(), L"Archive");
@@ -243,7 +200,7 @@ TEST(ArchivePluginContract, DeletesTheProviderWhenItIsUnloaded)
     ASSERT_TRUE(plugin.IsLoaded());
     ASSERT_NE(plugin.get(), nullptr);
 
-    plugin.Unload();
+    plugin.library.Unload();
 
     EXPECT_EQ(BraeDiagnostics::LiveBlocks(), before);
 }

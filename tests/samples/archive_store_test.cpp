@@ -116,6 +116,7 @@ using ArchiveStoreCheckIn = ArchiveStoreTest;
 using ArchiveStoreUndo = ArchiveStoreTest;
 using ArchiveStoreGet = ArchiveStoreTest;
 using ArchiveStoreStatus = ArchiveStoreTest;
+using ArchiveStoreList = ArchiveStoreTest;
 using ArchiveStoreSafety = ArchiveStoreTest;
 using ArchiveStoreUsers = ArchiveStoreTest;
 using ArchiveStorePaths = ArchiveStoreTest;
@@ -188,17 +189,43 @@ TEST_F(ArchiveStoreOpen, RefusesALinkThatCannotBeRead)
     }
 }
 
+TEST_F(ArchiveStoreOpen, KnowsAProjectByItsArchiveWithoutOpeningOrMakingIt)
+{
+    const ArchiveProject other;
+    bool isProject = false;
+    ASSERT_TRUE(ArchiveStore::Find(m_project.Text(), isProject).empty());
+    EXPECT_TRUE(isProject);
+    ASSERT_TRUE(ArchiveStore::Find(other.Text(), isProject).empty());
+    EXPECT_FALSE(isProject);
+    EXPECT_FALSE(std::filesystem::exists(other.Path(L".archive")));
+
+    other.Write(L".archive", "a link, whatever it says");
+    ASSERT_TRUE(ArchiveStore::Find(other.Text(), isProject).empty());
+    EXPECT_TRUE(isProject);
+    ExpectFailure(ArchiveStore::Find(m_project.File(L"nowhere"), isProject), ArchiveError::Access, L"");
+    EXPECT_FALSE(isProject);
+}
+
+TEST_F(ArchiveStoreOpen, TellsWhereTheArchiveIsAsPeopleWriteIt)
+{
+    EXPECT_TRUE(std::filesystem::equivalent(m_anna.ArchivePath(), m_project.Path(L".archive")));
+    EXPECT_EQ(m_anna.ArchivePath().find(L'?'), std::wstring::npos);
+    EXPECT_EQ(ArchiveStore().ArchivePath(), L"");
+    EXPECT_EQ(ArchivePaths::ShortForm(L"\\\\?\\UNC\\server\\share"), L"\\\\server\\share");
+}
+
 TEST_F(ArchiveStoreOpen, OfNothingLetsEveryCommandFail)
 {
     ArchiveStore closed;
     const Files files{m_project.Write(L"a.txt", "one")};
     std::vector<ArchiveStatus> statuses;
     std::vector<ArchiveRecord> records;
+    Files listed;
 
     for (const ArchiveFailures& failures :
          {closed.Add(files, L"", false), closed.CheckOut(files, L"", false), closed.CheckIn(files, L"", false),
           closed.UndoCheckOut(files), closed.GetLatest(files), closed.Status(files, statuses),
-          closed.History(files, records)})
+          closed.History(files, records), closed.List(m_project.Text(), true, listed)})
         ExpectFailure(failures, ArchiveError::NotOpen, L"");
 }
 
@@ -682,6 +709,93 @@ TEST_F(ArchiveStoreStatus, FailsForADamagedRecordAndGivesNoStatusAtAll)
     ExpectFailure(m_anna.Status(Files{good, file}, statuses), ArchiveError::Damaged, file);
 
     EXPECT_TRUE(statuses.empty());
+}
+
+TEST_F(ArchiveStoreStatus, TellsWhatIsNotOnDisk)
+{
+    const std::wstring file = Added(L"a.txt", "one");
+    EXPECT_FALSE(StatusOf(m_anna, file).missing);
+    m_project.Overwrite(file, "one");
+    std::filesystem::remove(file);
+
+    EXPECT_TRUE(StatusOf(m_anna, file).missing);
+    EXPECT_TRUE(StatusOf(m_anna, m_project.File(L"unknown.txt")).missing);
+}
+
+// Listing
+
+TEST_F(ArchiveStoreList, GivesTheFilesOfAFolderInOrderWhetherTheyAreOnDiskOrNot)
+{
+    const std::wstring b = Added(L"b.txt", "one");
+    const std::wstring a = Added(L"a.txt", "one");
+    const std::wstring deep = Added(L"Sub\\Deep\\c.txt", "one");
+    const std::wstring inSub = Added(L"Sub\\d.txt", "one");
+    Added(L"Subway\\e.txt", "one");
+    m_project.Write(L"Sub\\unknown.txt", "x");
+    m_project.Overwrite(inSub, "one");
+    std::filesystem::remove(inSub);
+    Files files;
+
+    EXPECT_TRUE(m_anna.List(m_project.Text(), false, files).empty());
+    EXPECT_EQ(files, (Files{a, b}));
+    EXPECT_TRUE(m_anna.List(m_project.File(L"Sub\\"), true, files).empty());
+    EXPECT_EQ(files, (Files{deep, inSub}));
+    EXPECT_TRUE(m_anna.List(m_project.Text(), true, files).empty());
+    EXPECT_EQ(files.size(), 5u);
+    EXPECT_TRUE(m_anna.List(m_project.File(L"nowhere"), true, files).empty());
+    EXPECT_TRUE(files.empty());
+}
+
+TEST_F(ArchiveStoreList, NamesTheFilesByTheFolderAsItIsGiven)
+{
+    Added(L"Sub\\a.txt", "one");
+    const std::wstring folder = L"\\\\?\\" + m_project.File(L"SUB");
+    Files files;
+
+    ASSERT_TRUE(m_anna.List(folder, false, files).empty());
+
+    EXPECT_EQ(files, (Files{folder + L"\\a.txt"}));
+    EXPECT_TRUE(StatusOf(m_anna, files[0]).controlled);
+}
+
+TEST_F(ArchiveStoreList, RefusesAFolderOutsideTheProject)
+{
+    Files files{L"left over"};
+    ExpectFailure(m_anna.List(L"C:\\", true, files), ArchiveError::InvalidPath, L"C:\\");
+    EXPECT_TRUE(files.empty());
+}
+
+TEST_F(ArchiveStoreList, ReportsADamagedRecordAndGivesTheOthers)
+{
+    Added(L"damaged.txt", "one");
+    const std::filesystem::path record = RecordPath();
+    m_project.Overwrite(record, "damaged");
+    const std::wstring good = Added(L"good.txt", "one");
+    m_project.Write(L".archive\\files\\note.txt", "no record");
+    m_project.Write(L".archive\\files\\" + record.filename().wstring().substr(0, 2) + L"\\note.txt", "no record");
+    Files files;
+
+    const ArchiveFailures failures = m_anna.List(m_project.Text(), true, files);
+
+    ASSERT_EQ(failures.size(), 1u);
+    EXPECT_EQ(failures[0].error, ArchiveError::Damaged);
+    EXPECT_TRUE(std::filesystem::equivalent(failures[0].file, record));
+    EXPECT_EQ(files, (Files{good}));
+}
+
+TEST_F(ArchiveStoreList, DoesNotTakeARecordUnderAnotherFilesName)
+{
+    Added(L"a.txt", "one");
+    const std::filesystem::path record = RecordPath();
+    const std::wstring other = std::wstring(64, L'0');
+    m_project.Write(L".archive\\files\\00\\" + other, ReadBytes(record));
+    Files files;
+
+    const ArchiveFailures failures = m_anna.List(m_project.Text(), true, files);
+
+    ASSERT_EQ(failures.size(), 1u);
+    EXPECT_EQ(failures[0].error, ArchiveError::Damaged);
+    EXPECT_EQ(files, (Files{m_project.File(L"a.txt")}));
 }
 
 // Safety

@@ -1,0 +1,450 @@
+#include "ArchiveScc.h"
+
+#include "ArchiveText.h"
+
+#include <algorithm>
+#include <cstring>
+#include <span>
+#include <unordered_set>
+
+namespace
+{
+
+constexpr SCCRTN BadArgument = SCC_E_NONSPECIFICERROR;
+
+std::wstring Text(LPCSTR text)
+{
+    return text ? ArchiveText::FromAnsi(text) : L"";
+}
+
+/// The text in a buffer of the host, which may lack a terminator.
+std::wstring TextIn(LPCSTR buffer, std::size_t size)
+{
+    return ArchiveText::FromAnsi({buffer, strnlen(buffer, size)});
+}
+
+/// True when the ANSI code page has all characters of a text.
+bool IsAnsi(const std::wstring& text)
+{
+    return ArchiveText::FromAnsi(ArchiveText::ToAnsi(text)) == text;
+}
+
+void Put(LPSTR buffer, const std::string& bytes)
+{
+    std::memcpy(buffer, bytes.c_str(), bytes.size() + 1);
+}
+
+/// Writes a text, cut between two characters to what the buffer holds.
+void PutCut(LPSTR buffer, std::size_t size, std::wstring_view text)
+{
+    std::string bytes = ArchiveText::ToAnsi(text);
+    while (bytes.size() >= size)
+    {
+        text.remove_suffix(text.size() > 1 && IS_LOW_SURROGATE(text.back()) ? 2 : 1);
+        bytes = ArchiveText::ToAnsi(text);
+    }
+    Put(buffer, bytes);
+}
+
+/// Writes a text that means something else when it is cut: an empty one when it cannot be given exactly.
+void PutWhole(LPSTR buffer, std::size_t size, const std::wstring& text)
+{
+    const std::string bytes = ArchiveText::ToAnsi(text);
+    Put(buffer, bytes.size() < size && IsAnsi(text) ? bytes : "");
+}
+
+/// The user whom the host names, or the user of the Windows session, who is told to the host.
+std::wstring UserOf(LPSTR user)
+{
+    std::wstring name = TextIn(user, SCC_USER_SIZE);
+    if (name.empty())
+    {
+        name = ArchiveReport::WindowsUser();
+        PutWhole(user, SCC_USER_SIZE, name);
+    }
+    return name;
+}
+
+void PutAuxPath(LPSTR auxPath)
+{
+    PutCut(auxPath, SCC_PRJPATH_SIZE, ArchivePaths::ArchiveName);
+}
+
+std::wstring_view LastName(std::wstring_view folder)
+{
+    folder = folder.substr(0, folder.find_last_not_of(L"\\/") + 1);
+    return folder.substr(folder.find_last_of(L"\\/") + 1);
+}
+
+SCCRTN ResultOf(ArchiveError error)
+{
+    switch (error)
+    {
+    case ArchiveError::NotOpen:
+        return SCC_E_PROJNOTOPEN;
+    case ArchiveError::InvalidPath:
+        return SCC_E_INVALIDFILEPATH;
+    case ArchiveError::NoSuchFile:
+        return SCC_E_FILENOTEXIST;
+    case ArchiveError::NotControlled:
+        return SCC_E_FILENOTCONTROLLED;
+    case ArchiveError::AlreadyControlled:
+        return SCC_E_FILEALREADYEXISTS;
+    case ArchiveError::CheckedOutByOther:
+        return SCC_E_FILEOUTEXCLUSIVE;
+    case ArchiveError::NotCheckedOut:
+        return SCC_E_NOTCHECKEDOUT;
+    case ArchiveError::OutOfDate:
+    case ArchiveError::Modified:
+        return SCC_E_OPNOTPERFORMED;
+    case ArchiveError::Access:
+    case ArchiveError::Busy:
+        return SCC_E_ACCESSFAILURE;
+    case ArchiveError::Damaged:
+        break;
+    }
+    return SCC_E_NONSPECIFICERROR;
+}
+
+/// A file is checked out by one user at most, and so always exclusively.
+LONG StatusOf(const ArchiveStatus& status)
+{
+    if (!status.controlled)
+        return 0;
+    LONG bits = SCC_STATUS_CONTROLLED;
+    if (status.checkedOut)
+        bits |= SCC_STATUS_CHECKEDOUT | SCC_STATUS_OUTBYUSER | SCC_STATUS_OUTEXCLUSIVE;
+    if (status.checkedOutByOther)
+        bits |= SCC_STATUS_OUTOTHER | SCC_STATUS_OUTEXCLUSIVE;
+    if (status.outOfDate)
+        bits |= SCC_STATUS_OUTOFDATE;
+    if (status.modified)
+        bits |= SCC_STATUS_MODIFIED;
+    return bits;
+}
+
+/// Whether a command is for files of this status; those that the archive does not have are for none.
+bool IsFor(SCCCOMMAND command, LONG status)
+{
+    switch (command)
+    {
+    case SCC_COMMAND_GET:
+    case SCC_COMMAND_HISTORY:
+    case SCC_COMMAND_PROPERTIES:
+        return (status & SCC_STATUS_CONTROLLED) != 0;
+    case SCC_COMMAND_CHECKOUT:
+        return (status & SCC_STATUS_CONTROLLED) != 0 && (status & SCC_STATUS_OUTEXCLUSIVE) == 0;
+    case SCC_COMMAND_CHECKIN:
+    case SCC_COMMAND_UNCHECKOUT:
+        return (status & SCC_STATUS_CHECKEDOUT) != 0;
+    case SCC_COMMAND_ADD:
+        return (status & SCC_STATUS_CONTROLLED) == 0;
+    case SCC_COMMAND_OPTIONS:
+        break;
+    }
+    return false;
+}
+
+void Append(ArchiveFailures& failures, ArchiveFailures more)
+{
+    std::move(more.begin(), more.end(), std::back_inserter(failures));
+}
+
+} // namespace
+
+SCCRTN ArchiveScc::OpenProject(LPSTR user, LPCSTR projectName, LPCSTR localPath, LPSTR auxPath, LPTEXTOUTPROC output,
+                               LONG flags)
+{
+    if (!user || !projectName || !localPath || !auxPath)
+        return BadArgument;
+    if (m_store.IsOpen())
+        return SCC_E_PROJECTALREADYOPEN;
+    m_output = output;
+    m_folder = Text(localPath);
+    m_user = UserOf(user);
+
+    bool isProject = false;
+    if (const ArchiveFailures failures = ArchiveStore::Find(m_folder, isProject); !failures.empty())
+        return Report(failures);
+    const bool wasChosen = m_folder == m_newFolder;
+    if (!isProject && !(wasChosen && (flags & SCC_OP_CREATEIFNEW)))
+    {
+        m_refusedFolder = m_folder;
+        return wasChosen || (flags & SCC_OP_SILENTOPEN) ? SCC_E_UNKNOWNPROJECT : SCC_E_PROJSYNTAXERR;
+    }
+    const SCCRTN result = Report(m_store.Open(m_folder, m_user));
+    if (result == SCC_OK)
+    {
+        PutAuxPath(auxPath);
+        m_refusedFolder.clear();
+        m_newFolder.clear();
+    }
+    return result;
+}
+
+SCCRTN ArchiveScc::CloseProject()
+{
+    const bool wasOpen = m_store.IsOpen();
+    m_store.Close();
+    m_output = nullptr;
+    return wasOpen ? SCC_OK : SCC_E_PROJNOTOPEN;
+}
+
+SCCRTN ArchiveScc::GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath, BOOL allowChangePath,
+                               LPBOOL isNew)
+{
+    if (!user || !projectName || !localPath || !auxPath || !isNew)
+        return BadArgument;
+    // The host's local path may be that of an earlier project.
+    const bool wasRefused = allowChangePath && !m_refusedFolder.empty();
+    const std::wstring folder = wasRefused ? m_refusedFolder : TextIn(localPath, MAX_PATH);
+    if (folder.empty())
+        return SCC_E_OPNOTPERFORMED;
+
+    bool isProject = false;
+    if (const ArchiveFailures failures = ArchiveStore::Find(folder, isProject); !failures.empty())
+        return Report(failures);
+    if (!isProject && !*isNew)
+        return SCC_E_UNKNOWNPROJECT;
+    *isNew = isProject ? FALSE : TRUE;
+    m_newFolder = isProject ? L"" : folder;
+    m_refusedFolder.clear();
+
+    UserOf(user);
+    PutCut(projectName, SCC_PRJPATH_SIZE, LastName(folder));
+    PutAuxPath(auxPath);
+    if (wasRefused)
+        PutWhole(localPath, MAX_PATH, folder);
+    return SCC_OK;
+}
+
+/// Hands the paths of the files, of which there must be one, to `work`.
+template <typename Work>
+SCCRTN ArchiveScc::FileOperation(LONG count, LPCSTR* names, Work work)
+{
+    if (count <= 0 || !names)
+        return BadArgument;
+    const std::span all(names, static_cast<std::size_t>(count));
+    if (std::find(all.begin(), all.end(), nullptr) != all.end())
+        return BadArgument;
+    if (!m_store.IsOpen())
+        return SCC_E_PROJNOTOPEN;
+    Paths paths(all.size());
+    std::transform(all.begin(), all.end(), paths.begin(), Text);
+    return work(paths);
+}
+
+/// Puts the files that the archive holds in the place of their folders, when the names are folders.
+ArchiveFailures ArchiveScc::Expand(Paths& paths, LONG options) const
+{
+    ArchiveFailures failures;
+    if (!(options & SCC_GET_ALL))
+        return failures;
+    Paths all;
+    Paths files;
+    for (const std::wstring& folder : paths)
+    {
+        Append(failures, m_store.List(folder, (options & SCC_GET_RECURSIVE) != 0, files));
+        std::move(files.begin(), files.end(), std::back_inserter(all));
+    }
+    paths = std::move(all);
+    return failures;
+}
+
+SCCRTN ArchiveScc::Get(LONG count, LPCSTR* names, LONG options)
+{
+    return FileOperation(count, names, [&](Paths& paths) {
+        ArchiveFailures failures = Expand(paths, options);
+        Append(failures, m_store.GetLatest(paths));
+        return Report(failures);
+    });
+}
+
+SCCRTN ArchiveScc::Checkout(LONG count, LPCSTR* names, LPCSTR comment, LONG options)
+{
+    return FileOperation(count, names, [&](Paths& paths) {
+        ArchiveFailures failures = Expand(paths, options);
+        Append(failures, m_store.CheckOut(paths, Text(comment), false));
+        return Report(failures);
+    });
+}
+
+SCCRTN ArchiveScc::Uncheckout(LONG count, LPCSTR* names)
+{
+    return FileOperation(count, names, [&](const Paths& paths) { return Report(m_store.UndoCheckOut(paths)); });
+}
+
+SCCRTN ArchiveScc::Checkin(LONG count, LPCSTR* names, LPCSTR comment, LONG options)
+{
+    return FileOperation(count, names, [&](const Paths& paths) {
+        return Report(m_store.CheckIn(paths, Text(comment), (options & SCC_KEEP_CHECKEDOUT) != 0));
+    });
+}
+
+SCCRTN ArchiveScc::Add(LONG count, LPCSTR* names, LPCSTR comment, const LONG* options)
+{
+    if (!options)
+        return BadArgument;
+    return FileOperation(count, names, [&](const Paths& paths) {
+        ArchiveFailures failures;
+        for (const LONG kept : {0L, SCC_KEEP_CHECKEDOUT})
+        {
+            Paths files;
+            for (std::size_t i = 0; i < paths.size(); ++i)
+            {
+                if ((options[i] & SCC_KEEP_CHECKEDOUT) == kept)
+                    files.push_back(paths[i]);
+            }
+            if (!files.empty())
+                Append(failures, m_store.Add(files, Text(comment), kept != 0));
+        }
+        return Report(failures);
+    });
+}
+
+SCCRTN ArchiveScc::History(LONG count, LPCSTR* names)
+{
+    return FileOperation(count, names, [&](const Paths& paths) {
+        std::vector<ArchiveRecord> records;
+        const SCCRTN result = Report(m_store.History(paths, records));
+        for (const ArchiveRecord& record : records)
+        {
+            if (!Output(ArchiveReport::History(record), SCC_MSG_INFO))
+                return SCC_I_OPERATIONCANCELED;
+        }
+        return result;
+    });
+}
+
+SCCRTN ArchiveScc::Properties(LPCSTR name)
+{
+    return FileOperation(1, &name, [&](const Paths& paths) {
+        std::vector<ArchiveRecord> records;
+        const SCCRTN result = Report(m_store.History(paths, records));
+        for (const ArchiveRecord& record : records)
+            Output(ArchiveReport::Properties(record), SCC_MSG_INFO);
+        return result;
+    });
+}
+
+SCCRTN ArchiveScc::QueryInfo(LONG count, LPCSTR* names, LPLONG status)
+{
+    if (!status)
+        return BadArgument;
+    std::fill_n(status, std::max(count, 0L), SCC_STATUS_INVALID);
+    return FileOperation(count, names, [&](const Paths& paths) {
+        std::vector<ArchiveStatus> statuses;
+        const SCCRTN result = Report(m_store.Status(paths, statuses));
+        std::transform(statuses.begin(), statuses.end(), status, StatusOf);
+        return result;
+    });
+}
+
+SCCRTN ArchiveScc::PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback, LPVOID callerData,
+                                LPLONG status, LONG options)
+{
+    if (!callback)
+        return BadArgument;
+    if (options & SCC_PL_DIR)
+        return SCC_E_OPNOTSUPPORTED;
+    const SCCRTN result = QueryInfo(count, names, status);
+    if (result != SCC_OK)
+        return result;
+    for (LONG i = 0; i < count; ++i)
+    {
+        std::string name = names[i];
+        if (!IsFor(command, status[i]) && !callback(callerData, FALSE, status[i], name.data()))
+            return SCC_I_OPERATIONCANCELED;
+    }
+    return SCC_OK;
+}
+
+SCCRTN ArchiveScc::RunScc()
+{
+    Output({L"The archive has no program of its own"}, SCC_MSG_ERROR);
+    return SCC_E_OPNOTSUPPORTED;
+}
+
+SCCRTN ArchiveScc::GetCommandOptions(SCCCOMMAND command, LPCMDOPTS* block)
+{
+    if (command != SCC_COMMAND_OPTIONS)
+        return SCC_E_OPNOTSUPPORTED;
+    if (!block)
+        return SCC_I_ADV_SUPPORT;
+    if (!m_store.IsOpen())
+        return SCC_E_PROJNOTOPEN;
+    Output({L"archive  " + m_store.ArchivePath(), L"user     " + m_user}, SCC_MSG_INFO);
+    return SCC_OK;
+}
+
+SCCRTN ArchiveScc::AddFromScc(LPLONG count, LPCSTR** names)
+{
+    // The host may name the folder in the array that it was given before.
+    const bool hasFolder = count && names && *count == 1 && *names && **names;
+    const std::wstring folder = hasFolder ? Text(**names) : m_folder;
+    m_broughtFiles.clear();
+    m_broughtNames.clear();
+    if (!count)
+        return SCC_OK;
+    if (!names)
+        return BadArgument;
+    *count = 0;
+    *names = nullptr;
+    if (!m_store.IsOpen())
+        return SCC_E_PROJNOTOPEN;
+
+    Paths held;
+    ArchiveFailures failures = m_store.List(folder, true, held);
+    std::vector<ArchiveStatus> statuses;
+    Append(failures, m_store.Status(held, statuses));
+    Paths missing;
+    for (std::size_t i = 0; i < statuses.size(); ++i)
+    {
+        if (!statuses[i].missing)
+            continue;
+        if (IsAnsi(held[i]))
+            missing.push_back(held[i]);
+        else
+            failures.push_back({ArchiveError::InvalidPath, L"The ANSI code page lacks a letter of the name", held[i]});
+    }
+
+    const ArchiveFailures notBrought = m_store.GetLatest(missing);
+    std::unordered_set<std::wstring> failed;
+    for (const ArchiveFailure& failure : notBrought)
+        failed.insert(failure.file);
+    for (const std::wstring& file : missing)
+    {
+        if (!failed.contains(file) && !failed.contains(L""))
+            m_broughtFiles.push_back(ArchiveText::ToAnsi(file));
+    }
+    std::transform(m_broughtFiles.begin(), m_broughtFiles.end(), std::back_inserter(m_broughtNames),
+                   [](const std::string& file) { return file.c_str(); });
+    Append(failures, notBrought);
+    *count = static_cast<LONG>(m_broughtNames.size());
+    *names = m_broughtNames.empty() ? nullptr : m_broughtNames.data();
+    return Report(failures);
+}
+
+SCCRTN ArchiveScc::SetOption(LONG option)
+{
+    return option == SCC_OPT_SHARESUBPROJ ? SCC_I_SHARESUBPROJOK : SCC_E_OPNOTSUPPORTED;
+}
+
+/// Shows what went wrong; the result of the operation.
+SCCRTN ArchiveScc::Report(const ArchiveFailures& failures) const
+{
+    for (const ArchiveFailure& failure : failures)
+    {
+        if (!Output(ArchiveReport::Failure(failure), SCC_MSG_ERROR))
+            break;
+    }
+    return failures.empty() ? SCC_OK : ResultOf(failures.front().error);
+}
+
+/// False when the host wants no more lines.
+bool ArchiveScc::Output(const ArchiveReport::Lines& lines, LONG kind) const
+{
+    return std::all_of(lines.begin(), lines.end(), [&](const std::wstring& line) {
+        return !m_output || m_output(ArchiveText::ToAnsi(line).c_str(), kind) != SCC_MSG_RTN_CANCEL;
+    });
+}
