@@ -1,9 +1,12 @@
 #include "Dialog.h"
 
 #include "ActivationContext.h"
+#include "DpiAwareness.h"
 #include "Module.h"
+#include "Settings.h"
 
 #include <commctrl.h>
+#include <windowsx.h>
 
 #include <algorithm>
 #include <bit>
@@ -11,6 +14,7 @@
 std::int32_t Dialog::Run(HWND owner)
 {
     const ActivationContext look;
+    const DpiAwareness resolution;
     const INITCOMMONCONTROLSEX classes{sizeof classes, ICC_LISTVIEW_CLASSES | ICC_STANDARD_CLASSES};
     InitCommonControlsEx(&classes);
     const INT_PTR result = DialogBoxParamW(ThisModule(), ResourceName(static_cast<std::uintptr_t>(m_templateId)), owner,
@@ -30,6 +34,23 @@ std::wstring Dialog::GetText(int control) const
 void Dialog::SetTicked(int control, bool ticked) const
 {
     CheckDlgButton(m_window, control, ticked ? BST_CHECKED : BST_UNCHECKED);
+}
+
+void Dialog::Resize(LONG width, LONG height) const
+{
+    MONITORINFO monitor{};
+    monitor.cbSize = sizeof monitor;
+    GetMonitorInfoW(MonitorFromWindow(m_window, MONITOR_DEFAULTTONEAREST), &monitor);
+    const RECT& work = monitor.rcWork;
+    RECT now{};
+    GetWindowRect(m_window, &now);
+    const POINT smallest = m_layout.SmallestWindow();
+    width = std::max(std::min(width, work.right - work.left), smallest.x);
+    height = std::max(std::min(height, work.bottom - work.top), smallest.y);
+    const LONG left = std::min(now.left - (width - (now.right - now.left)) / 2, work.right - width);
+    const LONG top = std::min(now.top - (height - (now.bottom - now.top)) / 2, work.bottom - height);
+    SetWindowPos(m_window, nullptr, std::max(left, work.left), std::max(top, work.top), width, height,
+                 SWP_NOZORDER | SWP_NOACTIVATE);
 }
 
 void Dialog::Hide(int control) const
@@ -64,16 +85,55 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
     switch (message)
     {
     case WM_INITDIALOG:
-        OnInit();
+        OnOpen();
         return TRUE;
     case WM_COMMAND:
         OnCommand(LOWORD(wParam), HIWORD(wParam));
         return TRUE;
     case WM_NOTIFY:
-        if (std::bit_cast<const NMHDR*>(lParam)->code == LVN_ITEMCHANGED)
-            OnListSelection();
-        return FALSE;
+        SetWindowLongPtrW(m_window, DWLP_MSGRESULT, OnNotify(*std::bit_cast<const NMHDR*>(lParam)));
+        return TRUE;
+    case WM_CONTEXTMENU:
+        return OnContextMenu(std::bit_cast<HWND>(wParam), {GET_X_LPARAM(lParam), GET_Y_LPARAM(lParam)}) ? TRUE : FALSE;
+    case WM_SIZE:
+        m_layout.Apply();
+        OnSize();
+        return TRUE;
+    case WM_GETMINMAXINFO:
+        std::bit_cast<MINMAXINFO*>(lParam)->ptMinTrackSize = m_layout.SmallestWindow();
+        return TRUE;
+    case WM_DPICHANGED: {
+        m_layout.SetDpi(LOWORD(wParam));
+        const RECT& place = *std::bit_cast<const RECT*>(lParam);
+        SetWindowPos(m_window, nullptr, place.left, place.top, place.right - place.left, place.bottom - place.top,
+                     SWP_NOZORDER | SWP_NOACTIVATE);
+        return TRUE;
+    }
+    case WM_DESTROY:
+        RememberSize();
+        return TRUE;
     default:
         return reinterpret_cast<INT_PTR>(m_palette.Apply(message, std::bit_cast<HDC>(wParam)));
     }
+}
+
+void Dialog::OnOpen()
+{
+    OnInit();
+    m_layout = Layout(m_window, Rules());
+    const auto size = m_name ? Settings::WindowSize(m_name) : std::nullopt;
+    if (size)
+        Resize(m_layout.ToPixels(size->cx), m_layout.ToPixels(size->cy));
+    OnOpened();
+}
+
+void Dialog::RememberSize() const
+{
+    WINDOWPLACEMENT placement{};
+    placement.length = sizeof placement;
+    if (!m_name || !GetWindowPlacement(m_window, &placement))
+        return;
+    const RECT& place = placement.rcNormalPosition; // that of a maximised window as well
+    Settings::StoreWindowSize(
+        m_name, {m_layout.FromPixels(place.right - place.left), m_layout.FromPixels(place.bottom - place.top)});
 }

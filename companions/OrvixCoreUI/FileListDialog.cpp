@@ -3,7 +3,11 @@
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
+#include "Settings.h"
+#include "Texts.h"
 #include "resource.h"
+
+#include <string_view>
 
 namespace
 {
@@ -13,10 +17,67 @@ constexpr unsigned long StartsTicked = 0x1;
 /// FlagsOut: the user left the entry ticked.
 constexpr unsigned long Ticked = 0x2;
 
+constexpr Layout::Rule FileListRules[] = {{IDC_MESSAGE, Layout::GrowX},
+                                          {IDC_FILTER, Layout::GrowX},
+                                          {IDC_LIST, Layout::GrowX | Layout::GrowY},
+                                          {IDC_SELECT_ALL, Layout::MoveY},
+                                          {IDC_SELECT_NONE, Layout::MoveY},
+                                          {IDC_COUNT, Layout::GrowX | Layout::MoveY},
+                                          {IDC_COMMENT_LABEL, Layout::MoveY},
+                                          {IDC_COMMENT, Layout::GrowX | Layout::MoveY},
+                                          {IDC_RECENT_LABEL, Layout::MoveY},
+                                          {IDC_RECENT, Layout::GrowX | Layout::MoveY},
+                                          {IDC_OPTION, Layout::MoveY},
+                                          {IDC_REMEMBER, Layout::MoveY},
+                                          {IDOK, Layout::MoveX | Layout::MoveY},
+                                          {IDCANCEL, Layout::MoveX | Layout::MoveY}};
+
+/// A file's state from its FlagsOut.
+std::wstring StateInWords(unsigned long flags)
+{
+    struct Word
+    {
+        unsigned long flag;
+        UINT text;
+    };
+    constexpr Word Words[] = {{0x1, IDS_UNCONTROLLED}, {0x4, IDS_CHECKED_OUT}, {0x8, IDS_CHECKED_OUT_BY_OTHER},
+                              {0x10, IDS_OUT_OF_DATE}, {0x20, IDS_DELETED},    {0x80, IDS_MODIFIED}};
+    std::wstring state;
+    for (const Word& word : Words)
+    {
+        if ((flags & word.flag) != 0)
+            state += (state.empty() ? L"" : L", ") + Text(word.text);
+    }
+    if (state.empty())
+        return Text((flags & 0x2) != 0 ? IDS_CHECKED_IN : IDS_UNKNOWN);
+    return state;
+}
+
+/// Name, folder and state.
+std::vector<std::wstring> CellsOf(OrvixFileEntry& entry)
+{
+    const std::wstring_view path = entry.GetFile();
+    const std::size_t separator = path.find_last_of(L"\\/");
+    const bool hasFolder = separator != std::wstring_view::npos;
+    return {std::wstring(path.substr(hasFolder ? separator + 1 : 0)),
+            std::wstring(path.substr(0, hasFolder ? separator : 0)), StateInWords(entry.GetFlagsOut())};
+}
+
+/// A comment on one line.
+std::wstring OneLine(std::wstring text)
+{
+    for (wchar_t& letter : text)
+    {
+        if (letter == L'\r' || letter == L'\n' || letter == L'\t')
+            letter = L' ';
+    }
+    return text;
+}
+
 } // namespace
 
 FileListDialog::FileListDialog(IOrvixCoreUIClientAccess* access, OrvixFileListDialogParams& params)
-    : Dialog(IDD_FILE_LIST, access), m_params(params)
+    : Dialog(IDD_FILE_LIST, L"FileList", access), m_params(params)
 {
     OrvixFileList& list = *params.GetOrvixFileList();
     for (unsigned int i = 0; i < list.NumActiveEntries(); ++i)
@@ -26,39 +87,109 @@ FileListDialog::FileListDialog(IOrvixCoreUIClientAccess* access, OrvixFileListDi
     }
 }
 
+std::span<const Layout::Rule> FileListDialog::Rules() const
+{
+    return FileListRules;
+}
+
 void FileListDialog::OnInit()
 {
     SetTitle(m_params.GetTitle());
     SetText(IDC_MESSAGE, m_params.GetMessageW());
     SetText(IDC_COMMENT, m_params.GetComment());
-
-    m_list = ListView(Item(IDC_FILES), Colors(), Has(OfferTicks));
-    m_list.AddColumn(0, L"File", m_list.Width());
-    for (int row = 0; OrvixFileEntry * entry : m_entries)
-    {
-        m_list.AddRow(row, entry->GetFile());
-        m_list.SetTicked(row, (entry->GetFlagsIn() & StartsTicked) != 0);
-        ++row;
-    }
-
-    SetText(IDC_OPTION, Has(OptionKeepsCheckedOut) ? L"&Keep checked out" : L"&Get the latest version");
+    FillList();
+    ShowRecentComments();
+    SetText(IDC_OPTION, Text(Has(OptionKeepsCheckedOut) ? IDS_KEEP_CHECKED_OUT : IDS_GET_LATEST).c_str());
     InitBox(IDC_OPTION, OffersOption(), OptionTicked);
     InitBox(IDC_REMEMBER, Has(OfferRemember), RememberTicked);
 }
 
-void FileListDialog::OnCommand(int control, int)
+void FileListDialog::OnCommand(int control, int notification)
 {
-    if (control == IDOK)
+    switch (control)
     {
+    case IDC_FILTER:
+        if (notification == EN_CHANGE)
+            m_files.Filter(GetText(IDC_FILTER));
+        break;
+    case IDC_SELECT_ALL:
+    case IDC_SELECT_NONE:
+        m_files.TickShown(control == IDC_SELECT_ALL);
+        break;
+    case IDC_RECENT:
+        if (notification == CBN_SELCHANGE)
+            TakeRecentComment();
+        break;
+    case IDOK:
         StoreOptions();
         StoreChoice();
         End(1);
-    }
-    else if (control == IDCANCEL)
-    {
+        return;
+    case IDCANCEL:
         StoreOptions();
         End(0);
+        return;
+    default:
+        return;
     }
+    ShowCount();
+}
+
+LRESULT FileListDialog::OnNotify(const NMHDR& notification)
+{
+    const LRESULT result = m_files.Handle(notification);
+    if (notification.code == LVN_KEYDOWN || notification.code == NM_CLICK || notification.code == NM_DBLCLK)
+        ShowCount();
+    return result;
+}
+
+bool FileListDialog::OnContextMenu(HWND control, POINT point)
+{
+    if (control != Item(IDC_LIST))
+        return false;
+    m_files.ShowMenu(point);
+    return true;
+}
+
+void FileListDialog::FillList()
+{
+    m_files = TableView(Item(IDC_LIST), Colors(), Has(OfferTicks));
+    m_files.AddColumn(Text(IDS_NAME), 28);
+    m_files.AddColumn(Text(IDS_FOLDER), 34);
+    m_files.AddColumn(Text(IDS_STATE), 38);
+    for (OrvixFileEntry* entry : m_entries)
+        m_files.AddRow(CellsOf(*entry), !Has(OfferTicks) || (entry->GetFlagsIn() & StartsTicked) != 0);
+    m_files.Refresh();
+    if (!Has(OfferTicks))
+    {
+        Hide(IDC_SELECT_ALL);
+        Hide(IDC_SELECT_NONE);
+    }
+    ShowCount();
+}
+
+void FileListDialog::ShowCount() const
+{
+    const bool all = m_files.NumShown() == m_files.NumRows();
+    const auto count =
+        FormatText(all ? IDS_COUNT : IDS_COUNT_SHOWN, {m_files.NumTicked(), m_files.NumRows(), m_files.NumShown()});
+    if (count != GetText(IDC_COUNT))
+        SetText(IDC_COUNT, count.c_str());
+}
+
+void FileListDialog::ShowRecentComments()
+{
+    m_recentComments = Settings::RecentComments();
+    for (const std::wstring& comment : m_recentComments)
+        SendDlgItemMessageW(Window(), IDC_RECENT, CB_ADDSTRING, 0, reinterpret_cast<LPARAM>(OneLine(comment).c_str()));
+    EnableWindow(Item(IDC_RECENT), !m_recentComments.empty());
+}
+
+void FileListDialog::TakeRecentComment() const
+{
+    const LRESULT chosen = SendDlgItemMessageW(Window(), IDC_RECENT, CB_GETCURSEL, 0, 0);
+    if (chosen >= 0)
+        SetText(IDC_COMMENT, m_recentComments[static_cast<std::size_t>(chosen)].c_str());
 }
 
 void FileListDialog::InitBox(int control, bool offered, std::uint32_t tickedBit) const
@@ -85,13 +216,13 @@ void FileListDialog::StoreOptions() const
 
 void FileListDialog::StoreChoice() const
 {
-    m_params.SetComment(GetText(IDC_COMMENT).c_str());
-    const bool choice = Has(OfferTicks);
-    for (int row = 0; OrvixFileEntry * entry : m_entries)
+    const std::wstring comment = GetText(IDC_COMMENT);
+    m_params.SetComment(comment.c_str());
+    Settings::AddRecentComment(comment);
+    for (std::size_t row = 0; OrvixFileEntry * entry : m_entries)
     {
-        const bool ticked = !choice || m_list.IsTicked(row);
         const unsigned long flags = entry->GetFlagsOut();
-        entry->SetFlagsOut(ticked ? flags | Ticked : flags & ~Ticked);
+        entry->SetFlagsOut(m_files.IsTicked(row) ? flags | Ticked : flags & ~Ticked);
         ++row;
     }
 }

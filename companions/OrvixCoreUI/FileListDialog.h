@@ -1,8 +1,9 @@
 #pragma once
 
 #include "Dialog.h"
-#include "ListView.h"
+#include "TableView.h"
 
+#include <string>
 #include <vector>
 
 class OrvixFileEntry;
@@ -24,9 +25,17 @@ public:
     FileListDialog(IOrvixCoreUIClientAccess* access, OrvixFileListDialogParams& params);
 
 private:
+    std::span<const Layout::Rule> Rules() const override;
     void OnInit() override;
     void OnCommand(int control, int notification) override;
+    LRESULT OnNotify(const NMHDR& notification) override;
+    bool OnContextMenu(HWND control, POINT point) override;
+    void OnSize() override { m_files.FitColumns(); }
 
+    void FillList();
+    void ShowCount() const;
+    void ShowRecentComments();
+    void TakeRecentComment() const;
     void InitBox(int control, bool offered, std::uint32_t tickedBit) const;
     void StoreBox(int control, bool offered, std::uint32_t tickedBit) const;
     void StoreOptions() const;
@@ -36,5 +45,6 @@ private:
 
     OrvixFileListDialogParams& m_params;
     std::vector<OrvixFileEntry*> m_entries;
-    ListView m_list;
+    std::vector<std::wstring> m_recentComments;
+    TableView m_files;
 };

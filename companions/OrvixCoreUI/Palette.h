@@ -1,9 +1,8 @@
 #pragma once
 
-#include <windows.h>
+#include "GdiObject.h"
 
-#include <memory>
-#include <type_traits>
+#include <windows.h>
 
 class IOrvixCoreUIClientAccess;
 
@@ -22,16 +21,10 @@ public:
     HBRUSH Apply(UINT message, HDC context) const;
 
 private:
-    struct BrushDeleter
-    {
-        void operator()(HBRUSH brush) const { DeleteObject(brush); }
-    };
-    using Brush = std::unique_ptr<std::remove_pointer_t<HBRUSH>, BrushDeleter>;
-
     COLORREF m_face;
     COLORREF m_faceText;
     COLORREF m_window;
     COLORREF m_windowText;
-    Brush m_faceBrush;
-    Brush m_windowBrush;
+    GdiObject<HBRUSH> m_faceBrush;
+    GdiObject<HBRUSH> m_windowBrush;
 };

@@ -1,11 +1,23 @@
 #include "PromptDialog.h"
 
+#include "Texts.h"
 #include "resource.h"
 
+#include <algorithm>
+#include <bit>
+#include <iterator>
 #include <optional>
 
 namespace
 {
+
+/// From the right.
+constexpr int Buttons[] = {IDC_NO_TO_ALL, IDNO, IDC_YES_TO_ALL, IDYES};
+
+constexpr Layout::Rule PromptRules[] = {
+    {IDC_MESSAGE, Layout::GrowX | Layout::GrowY}, {IDC_DO_NOT_ASK, Layout::GrowX | Layout::MoveY},
+    {IDYES, Layout::MoveX | Layout::MoveY},       {IDC_YES_TO_ALL, Layout::MoveX | Layout::MoveY},
+    {IDNO, Layout::MoveX | Layout::MoveY},        {IDC_NO_TO_ALL, Layout::MoveX | Layout::MoveY}};
 
 std::optional<std::int32_t> AnswerOf(int control)
 {
@@ -25,36 +37,117 @@ std::optional<std::int32_t> AnswerOf(int control)
     }
 }
 
+RECT PlaceOf(HWND control)
+{
+    RECT place{};
+    GetWindowRect(control, &place);
+    MapWindowPoints(nullptr, GetParent(control), reinterpret_cast<POINT*>(&place), 2);
+    return place;
+}
+
+/// How high a static control of this width has to be to show its text.
+LONG NeededHeight(HWND control, const std::wstring& text, LONG width)
+{
+    const HDC context = GetDC(control);
+    auto* const font = std::bit_cast<HFONT>(SendMessageW(control, WM_GETFONT, 0, 0));
+    const HGDIOBJ before = SelectObject(context, font);
+    RECT area{0, 0, width, 0};
+    DrawTextW(context, text.c_str(), static_cast<int>(text.size()), &area,
+              DT_CALCRECT | DT_WORDBREAK | DT_EDITCONTROL | DT_NOPREFIX | DT_EXPANDTABS);
+    SelectObject(context, before);
+    ReleaseDC(control, context);
+    return area.bottom;
+}
+
 } // namespace
 
 PromptDialog::PromptDialog(IOrvixCoreUIClientAccess* access, const wchar_t* title, const wchar_t* message,
                            std::uint32_t options)
-    : Dialog(IDD_PROMPT, access), m_title(title ? title : L""), m_message(message ? message : L""), m_options(options)
+    : Dialog(IDD_PROMPT, nullptr, access), m_title(title ? title : L""), m_message(message ? message : L""),
+      m_options(options)
 {
+}
+
+std::span<const Layout::Rule> PromptDialog::Rules() const
+{
+    return PromptRules;
 }
 
 void PromptDialog::OnInit()
 {
     SetTitle(m_title);
     SetText(IDC_MESSAGE, m_message);
+    SendDlgItemMessageW(Window(), IDC_ICON_OF_PROMPT, STM_SETICON, reinterpret_cast<WPARAM>(LoadIconW(nullptr, Icon())),
+                        0);
     if (Has(OnlyOk))
-    {
-        SetText(IDYES, L"OK");
-        Hide(IDNO);
-    }
-    if (!Has(OfferYesToAll) || Has(OnlyOk))
-        Hide(IDC_YES_TO_ALL);
-    if (!Has(OfferNoToAll) || Has(OnlyOk))
-        Hide(IDC_NO_TO_ALL);
+        SetText(IDYES, Text(IDS_OK).c_str());
     if (!Has(OfferDoNotAsk))
         Hide(IDC_DO_NOT_ASK);
+
+    // The buttons that are offered take the places on the right.
+    RECT places[std::size(Buttons)];
+    std::transform(std::begin(Buttons), std::end(Buttons), places,
+                   [this](int button) { return PlaceOf(Item(button)); });
+    const RECT* place = places;
+    for (const int button : Buttons)
+    {
+        if (Offers(button))
+        {
+            SetWindowPos(Item(button), nullptr, place->left, place->top, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
+            ++place;
+        }
+        else
+            Hide(button);
+    }
+}
+
+void PromptDialog::OnOpened()
+{
+    const RECT message = PlaceOf(Item(IDC_MESSAGE));
+    const LONG more =
+        NeededHeight(Item(IDC_MESSAGE), m_message, message.right - message.left) - (message.bottom - message.top);
+    RECT window{};
+    GetWindowRect(Window(), &window);
+    if (more > 0)
+        Resize(window.right - window.left, window.bottom - window.top + more);
 }
 
 void PromptDialog::OnCommand(int control, int)
 {
-    const auto answer = AnswerOf(control);
+    // Where OK is all that can be said, closing says it.
+    const auto answer = AnswerOf(control == IDCANCEL && Has(OnlyOk) ? IDYES : control);
     if (!answer)
         return;
     m_doNotAskAgain = IsTicked(IDC_DO_NOT_ASK);
     End(*answer);
+}
+
+bool PromptDialog::Offers(int button) const
+{
+    switch (button)
+    {
+    case IDYES:
+        return true;
+    case IDNO:
+        return !Has(OnlyOk);
+    case IDC_YES_TO_ALL:
+        return Has(OfferYesToAll) && !Has(OnlyOk);
+    default:
+        return Has(OfferNoToAll) && !Has(OnlyOk);
+    }
+}
+
+const wchar_t* PromptDialog::Icon() const
+{
+    switch (m_options & Icons)
+    {
+    case InformationIcon:
+        return IDI_INFORMATION;
+    case WarningIcon:
+        return IDI_WARNING;
+    case ErrorIcon:
+        return IDI_ERROR;
+    default:
+        return Has(OnlyOk) ? IDI_INFORMATION : IDI_QUESTION;
+    }
 }

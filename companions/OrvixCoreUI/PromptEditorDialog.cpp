@@ -1,6 +1,8 @@
 #include "PromptEditorDialog.h"
 
 #include "OrvixPromptTable.h"
+#include "PromptDialog.h"
+#include "Texts.h"
 #include "resource.h"
 
 #include <algorithm>
@@ -10,14 +12,24 @@
 namespace
 {
 
+constexpr Layout::Rule EditorRules[] = {{IDC_FILTER, Layout::GrowX},
+                                        {IDC_LIST, Layout::GrowX | Layout::GrowY},
+                                        {IDC_ANSWER_LABEL, Layout::MoveY},
+                                        {IDC_ANSWER, Layout::MoveY},
+                                        {IDC_RESET, Layout::MoveY},
+                                        {IDOK, Layout::MoveX | Layout::MoveY},
+                                        {IDCANCEL, Layout::MoveX | Layout::MoveY}};
+
 struct Answer
 {
     unsigned long action;
-    const wchar_t* words;
+    UINT words;
 };
 
 /// In the order of precedence in which a stored action is read; the last one also stands for no answer at all.
-constexpr Answer Answers[] = {{0x1, L"Ask"}, {0x2, L"Yes"}, {0x8, L"Yes to all"}, {0x10, L"No to all"}, {0x4, L"No"}};
+constexpr Answer Answers[] = {
+    {0x1, IDS_ASK}, {0x2, IDS_YES}, {0x8, IDS_YES_TO_ALL}, {0x10, IDS_NO_TO_ALL}, {0x4, IDS_NO}};
+constexpr std::size_t Ask = 0;
 
 std::size_t AnswerIndex(unsigned long action)
 {
@@ -29,65 +41,138 @@ std::size_t AnswerIndex(unsigned long action)
 } // namespace
 
 PromptEditorDialog::PromptEditorDialog(IOrvixCoreUIClientAccess* access, OrvixPromptTable& prompts)
-    : Dialog(IDD_PROMPT_EDITOR, access), m_prompts(prompts)
+    : Dialog(IDD_PROMPT_EDITOR, L"PromptEditor", access), m_prompts(prompts)
 {
     const auto count = static_cast<unsigned int>(prompts.NumPrompts());
     for (unsigned int row = 0; row < count; ++row)
         m_actions.push_back(prompts.GetPrompt(row));
 }
 
+std::span<const Layout::Rule> PromptEditorDialog::Rules() const
+{
+    return EditorRules;
+}
+
 void PromptEditorDialog::OnInit()
 {
-    for (const Answer& answer : Answers)
-        SendMessageW(Item(IDC_ANSWER), CB_ADDSTRING, 0, reinterpret_cast<LPARAM>(answer.words));
-    EnableWindow(Item(IDC_ANSWER), FALSE);
-
-    m_list = ListView(Item(IDC_PROMPTS), Colors(), false);
-    m_list.AddColumn(0, L"Prompt", m_list.Width() * 2 / 3);
-    m_list.AddColumn(1, L"Answer", m_list.Width() / 3);
+    m_list = TableView(Item(IDC_LIST), Colors(), false);
+    m_list.AddColumn(Text(IDS_PROMPT), 70);
+    m_list.AddColumn(Text(IDS_ANSWER), 30);
     for (unsigned int row = 0; row < m_actions.size(); ++row)
-    {
-        m_list.AddRow(static_cast<int>(row), m_prompts.GetPromptText(row));
-        ShowAction(static_cast<int>(row));
-    }
+        m_list.AddRow({m_prompts.GetPromptText(row), AnswerInWords(row)}, false);
+    m_list.Refresh();
+    ShowSelected();
 }
 
 void PromptEditorDialog::OnCommand(int control, int notification)
 {
-    if (control == IDC_ANSWER && notification == CBN_SELCHANGE)
-        TakeAnswer();
-    else if (control == IDOK)
+    switch (control)
+    {
+    case IDC_FILTER:
+        if (notification == EN_CHANGE)
+            m_list.Filter(GetText(IDC_FILTER));
+        break;
+    case IDC_ANSWER:
+        if (notification == CBN_SELCHANGE)
+            TakeAnswer();
+        break;
+    case IDC_RESET:
+        if (const auto row = m_list.Selected())
+            SetAnswer(static_cast<unsigned int>(*row), Ask);
+        Focus(IDC_LIST); // before the button that has it is disabled
+        ShowSelected();
+        break;
+    case IDOK:
         End(Store() ? 1 : 0);
-    else if (control == IDCANCEL)
+        break;
+    case IDCANCEL:
         End(0);
+        break;
+    default:
+        break;
+    }
 }
 
-void PromptEditorDialog::OnListSelection()
+LRESULT PromptEditorDialog::OnNotify(const NMHDR& notification)
 {
-    const auto row = m_list.Selected();
-    EnableWindow(Item(IDC_ANSWER), row && !m_prompts.GetLocked(static_cast<unsigned int>(*row)));
-    const WPARAM answer = row ? AnswerIndex(m_actions[static_cast<std::size_t>(*row)]) : static_cast<WPARAM>(-1);
-    SendMessageW(Item(IDC_ANSWER), CB_SETCURSEL, answer, 0);
+    const LRESULT result = m_list.Handle(notification);
+    if (notification.code == LVN_ITEMCHANGED)
+        ShowSelected();
+    return result;
 }
 
-void PromptEditorDialog::ShowAction(int row) const
+bool PromptEditorDialog::OnContextMenu(HWND control, POINT point)
 {
-    std::wstring words = Answers[AnswerIndex(m_actions[static_cast<std::size_t>(row)])].words;
-    if (m_prompts.GetLocked(static_cast<unsigned int>(row)))
-        words += L" (locked)";
-    m_list.SetText(row, 1, words.c_str());
+    if (control != Item(IDC_LIST))
+        return false;
+    m_list.ShowMenu(point);
+    return true;
+}
+
+std::wstring PromptEditorDialog::AnswerInWords(unsigned int row) const
+{
+    std::wstring words = Text(Answers[AnswerIndex(m_actions[row])].words);
+    if (!m_prompts.GetLocked(row))
+        return words;
+    return FormatText(IDS_LOCKED, {reinterpret_cast<DWORD_PTR>(words.c_str())});
+}
+
+bool PromptEditorDialog::IsOffered(unsigned int row, std::size_t answer) const
+{
+    const unsigned long options = m_prompts.GetPromptOptions(row);
+    switch (Answers[answer].words)
+    {
+    case IDS_NO:
+        return (options & PromptDialog::OnlyOk) == 0;
+    case IDS_YES_TO_ALL:
+        return (options & PromptDialog::OnlyOk) == 0 && (options & PromptDialog::OfferYesToAll) != 0;
+    case IDS_NO_TO_ALL:
+        return (options & PromptDialog::OnlyOk) == 0 && (options & PromptDialog::OfferNoToAll) != 0;
+    default:
+        return true;
+    }
+}
+
+void PromptEditorDialog::ShowSelected()
+{
+    const HWND answers = Item(IDC_ANSWER);
+    SendMessageW(answers, CB_RESETCONTENT, 0, 0);
+    const auto selected = m_list.Selected();
+    const bool editable = selected && !m_prompts.GetLocked(static_cast<unsigned int>(*selected));
+    EnableWindow(answers, editable);
+    EnableWindow(Item(IDC_RESET), editable && AnswerIndex(m_actions[*selected]) != Ask);
+    if (!selected)
+        return;
+    const std::size_t current = AnswerIndex(m_actions[*selected]);
+    for (std::size_t answer = 0; answer < std::size(Answers); ++answer)
+    {
+        if (answer != current && !IsOffered(static_cast<unsigned int>(*selected), answer))
+            continue;
+        const std::wstring words = Text(Answers[answer].words);
+        const LRESULT item = SendMessageW(answers, CB_ADDSTRING, 0, reinterpret_cast<LPARAM>(words.c_str()));
+        SendMessageW(answers, CB_SETITEMDATA, static_cast<WPARAM>(item), static_cast<LPARAM>(answer));
+        if (answer == current)
+            SendMessageW(answers, CB_SETCURSEL, static_cast<WPARAM>(item), 0);
+    }
 }
 
 void PromptEditorDialog::TakeAnswer()
 {
     const auto row = m_list.Selected();
-    const LRESULT answer = SendMessageW(Item(IDC_ANSWER), CB_GETCURSEL, 0, 0);
-    if (!row || answer < 0)
+    const LRESULT item = SendDlgItemMessageW(Window(), IDC_ANSWER, CB_GETCURSEL, 0, 0);
+    if (!row || item < 0)
         return;
-    unsigned long& action = m_actions[static_cast<std::size_t>(*row)];
-    if (AnswerIndex(action) != static_cast<std::size_t>(answer))
-        action = Answers[answer].action;
-    ShowAction(*row);
+    const LRESULT answer = SendDlgItemMessageW(Window(), IDC_ANSWER, CB_GETITEMDATA, static_cast<WPARAM>(item), 0);
+    SetAnswer(static_cast<unsigned int>(*row), static_cast<std::size_t>(answer));
+    EnableWindow(Item(IDC_RESET), static_cast<std::size_t>(answer) != Ask);
+}
+
+void PromptEditorDialog::SetAnswer(unsigned int row, std::size_t answer)
+{
+    // An action of several bits that reads as this answer already keeps them.
+    if (AnswerIndex(m_actions[row]) != answer)
+        m_actions[row] = Answers[answer].action;
+    m_list.SetCell(row, 1, AnswerInWords(row));
 }
 
 bool PromptEditorDialog::Store()

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "Dialog.h"
-#include "ListView.h"
+#include "TableView.h"
 
 #include <vector>
 
@@ -15,15 +15,21 @@ public:
     PromptEditorDialog(IOrvixCoreUIClientAccess* access, OrvixPromptTable& prompts);
 
 private:
+    std::span<const Layout::Rule> Rules() const override;
     void OnInit() override;
     void OnCommand(int control, int notification) override;
-    void OnListSelection() override;
+    LRESULT OnNotify(const NMHDR& notification) override;
+    bool OnContextMenu(HWND control, POINT point) override;
+    void OnSize() override { m_list.FitColumns(); }
 
-    void ShowAction(int row) const;
+    std::wstring AnswerInWords(unsigned int row) const;
+    bool IsOffered(unsigned int row, std::size_t answer) const;
+    void ShowSelected();
     void TakeAnswer();
+    void SetAnswer(unsigned int row, std::size_t answer);
     bool Store();
 
     OrvixPromptTable& m_prompts;
     std::vector<unsigned long> m_actions;
-    ListView m_list;
+    TableView m_list;
 };

@@ -119,22 +119,6 @@ TEST_F(ServicesInitialize, AMissingConfigurationFolderIsNoError)
     EXPECT_FALSE(std::filesystem::exists(m_config.Path() / L"no"));
 }
 
-TEST_F(ServicesInitialize, InstalledLibrariesAloneAreFalseWhereNoneCanBeRead)
-{
-    AddPlugin(L"good");
-    EXPECT_FALSE(Initialize(Installed));
-    EXPECT_EQ(m_services->GetProviderCount(), 0u);
-    EXPECT_EQ(FakeJournal::Read(), L"");
-}
-
-TEST_F(ServicesInitialize, BothSourcesAreTrueWhenThePluginScanAddsAProvider)
-{
-    EXPECT_FALSE(Initialize(Plugins | Installed));
-    AddPlugin(L"good");
-    EXPECT_TRUE(Initialize(Plugins | Installed));
-    EXPECT_EQ(m_services->GetProviderCount(), 1u);
-}
-
 TEST_F(ServicesInitialize, OtherSourceBitsFindNothing)
 {
     AddPlugin(L"good");

@@ -1,0 +1,279 @@
+#include "TableView.h"
+
+#include "Texts.h"
+#include "resource.h"
+
+#include <algorithm>
+#include <bit>
+#include <iterator>
+#include <memory>
+#include <type_traits>
+#include <utility>
+
+namespace
+{
+
+/// The state image of a row with a check box: number 1 not ticked, number 2 ticked.
+constexpr UINT StateImageShift = 12;
+
+struct DestroyMenuDeleter
+{
+    void operator()(HMENU menu) const { DestroyMenu(menu); }
+};
+using Menu = std::unique_ptr<std::remove_pointer_t<HMENU>, DestroyMenuDeleter>;
+
+} // namespace
+
+TableView::TableView(HWND window, const Palette& palette, bool checkBoxes) : m_window(window), m_checkBoxes(checkBoxes)
+{
+    const LPARAM style =
+        LVS_EX_FULLROWSELECT | LVS_EX_DOUBLEBUFFER | LVS_EX_LABELTIP | (checkBoxes ? LVS_EX_CHECKBOXES : 0);
+    SendMessageW(m_window, LVM_SETEXTENDEDLISTVIEWSTYLE, 0, style);
+    SendMessageW(m_window, LVM_SETCALLBACKMASK, checkBoxes ? LVIS_STATEIMAGEMASK : 0, 0);
+    SendMessageW(m_window, LVM_SETBKCOLOR, 0, static_cast<LPARAM>(palette.Window()));
+    SendMessageW(m_window, LVM_SETTEXTBKCOLOR, 0, static_cast<LPARAM>(palette.Window()));
+    SendMessageW(m_window, LVM_SETTEXTCOLOR, 0, static_cast<LPARAM>(palette.WindowText()));
+}
+
+void TableView::AddColumn(const std::wstring& heading, int share)
+{
+    RECT inside{};
+    GetClientRect(m_window, &inside);
+    LVCOLUMNW column{};
+    column.mask = LVCF_TEXT | LVCF_WIDTH;
+    column.cx = (inside.right - GetSystemMetrics(SM_CXVSCROLL)) * share / 100;
+    column.pszText = const_cast<wchar_t*>(heading.c_str());
+    Send(LVM_INSERTCOLUMNW, m_columns++, &column);
+}
+
+void TableView::AddRow(std::vector<std::wstring> cells, bool ticked)
+{
+    m_table.Add(std::move(cells));
+    m_ticked.push_back(ticked);
+}
+
+void TableView::Refresh() const
+{
+    SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
+    InvalidateRect(m_window, nullptr, TRUE);
+}
+
+void TableView::SetCell(std::size_t row, std::size_t column, std::wstring text)
+{
+    m_table.SetCell(row, column, std::move(text));
+    InvalidateRect(m_window, nullptr, FALSE);
+}
+
+void TableView::Filter(const std::wstring& text)
+{
+    KeepingSelection([&] { m_table.Filter(text); });
+}
+
+std::size_t TableView::NumTicked() const
+{
+    return static_cast<std::size_t>(std::count(m_ticked.begin(), m_ticked.end(), true));
+}
+
+void TableView::TickShown(bool ticked)
+{
+    for (std::size_t place = 0; place < m_table.NumShown(); ++place)
+        m_ticked[m_table.RowAt(place)] = ticked;
+    InvalidateRect(m_window, nullptr, FALSE);
+}
+
+std::optional<std::size_t> TableView::Selected() const
+{
+    const auto places = SelectedPlaces();
+    if (places.empty())
+        return std::nullopt;
+    return m_table.RowAt(places.front());
+}
+
+void TableView::FitColumns() const
+{
+    RECT inside{};
+    GetClientRect(m_window, &inside);
+    std::vector<int> widths;
+    int total = 0;
+    for (std::size_t column = 0; column < m_columns; ++column)
+    {
+        widths.push_back(static_cast<int>(SendMessageW(m_window, LVM_GETCOLUMNWIDTH, column, 0)));
+        total += widths.back();
+    }
+    const int room =
+        inside.right - ((GetWindowLongW(m_window, GWL_STYLE) & WS_VSCROLL) != 0 ? 0 : GetSystemMetrics(SM_CXVSCROLL));
+    for (std::size_t column = 0; column < m_columns && total > 0; ++column)
+        SendMessageW(m_window, LVM_SETCOLUMNWIDTH, column, MAKELPARAM(MulDiv(widths[column], room, total), 0));
+}
+
+void TableView::ShowMenu(POINT point)
+{
+    if (point.x == -1 && point.y == -1)
+    {
+        point = {};
+        ClientToScreen(m_window, &point);
+    }
+    const Menu menu(CreatePopupMenu());
+    for (std::size_t column = 0; column < m_columns; ++column)
+    {
+        const std::wstring heading = Heading(column);
+        const std::wstring words = FormatText(IDS_SORT_BY, {reinterpret_cast<DWORD_PTR>(heading.c_str())});
+        AppendMenuW(menu.get(), MF_STRING, column + 1, words.c_str());
+    }
+    const int chosen = TrackPopupMenu(menu.get(), TPM_RETURNCMD, point.x, point.y, 0, m_window, nullptr);
+    if (chosen > 0)
+        SortBy(static_cast<std::size_t>(chosen) - 1);
+}
+
+LRESULT TableView::Handle(const NMHDR& notification)
+{
+    const auto* const header = &notification;
+    switch (notification.code)
+    {
+    case LVN_GETDISPINFOW:
+        GiveItem(const_cast<NMLVDISPINFOW*>(reinterpret_cast<const NMLVDISPINFOW*>(header))->item);
+        return 0;
+    case LVN_COLUMNCLICK:
+        SortBy(static_cast<std::size_t>(reinterpret_cast<const NMLISTVIEW*>(header)->iSubItem));
+        return 0;
+    case LVN_KEYDOWN:
+        if (reinterpret_cast<const NMLVKEYDOWN*>(header)->wVKey == VK_SPACE)
+            ToggleSelected();
+        return 0;
+    case NM_CLICK:
+    case NM_DBLCLK:
+        ToggleClicked(*reinterpret_cast<const NMITEMACTIVATE*>(header));
+        return 0;
+    case LVN_ODFINDITEMW:
+        return Find(*reinterpret_cast<const NMLVFINDITEMW*>(header));
+    default:
+        return 0;
+    }
+}
+
+std::wstring TableView::Heading(std::size_t column) const
+{
+    wchar_t text[64] = {};
+    LVCOLUMNW request{};
+    request.mask = LVCF_TEXT;
+    request.pszText = text;
+    request.cchTextMax = static_cast<int>(std::size(text));
+    Send(LVM_GETCOLUMNW, column, &request);
+    return text;
+}
+
+void TableView::GiveItem(LVITEMW& item) const
+{
+    const auto place = static_cast<std::size_t>(item.iItem);
+    if (place >= m_table.NumShown())
+        return;
+    const std::size_t row = m_table.RowAt(place);
+    if ((item.mask & LVIF_TEXT) != 0)
+        item.pszText = const_cast<wchar_t*>(m_table.Cell(row, static_cast<std::size_t>(item.iSubItem)).c_str());
+    if ((item.mask & LVIF_STATE) != 0 && m_checkBoxes)
+        item.state = (m_ticked[row] ? 2U : 1U) << StateImageShift;
+}
+
+void TableView::SortBy(std::size_t column)
+{
+    m_ascending = !m_sorted || column != m_sortColumn || !m_ascending;
+    m_sorted = true;
+    m_sortColumn = column;
+    KeepingSelection([&] { m_table.Sort(column, m_ascending); });
+
+    auto* const headings = std::bit_cast<HWND>(SendMessageW(m_window, LVM_GETHEADER, 0, 0));
+    for (std::size_t i = 0; i < m_columns; ++i)
+    {
+        HDITEMW heading{};
+        heading.mask = HDI_FORMAT;
+        SendMessageW(headings, HDM_GETITEMW, i, reinterpret_cast<LPARAM>(&heading));
+        heading.fmt &= ~(HDF_SORTUP | HDF_SORTDOWN);
+        if (i == column)
+            heading.fmt |= m_ascending ? HDF_SORTUP : HDF_SORTDOWN;
+        SendMessageW(headings, HDM_SETITEMW, i, reinterpret_cast<LPARAM>(&heading));
+    }
+}
+
+template <typename Rearrange>
+void TableView::KeepingSelection(const Rearrange& rearrange)
+{
+    // The control remembers places, and other rows come to stand there.
+    std::vector<bool> selected(m_table.NumRows());
+    for (const std::size_t place : SelectedPlaces())
+        selected[m_table.RowAt(place)] = true;
+    Select(static_cast<std::size_t>(-1), false);
+    rearrange();
+    Refresh();
+    for (std::size_t place = 0; place < m_table.NumShown(); ++place)
+    {
+        if (selected[m_table.RowAt(place)])
+            Select(place, true);
+    }
+}
+
+void TableView::Select(std::size_t place, bool selected) const
+{
+    LVITEMW item{};
+    item.stateMask = LVIS_SELECTED;
+    item.state = selected ? LVIS_SELECTED : 0;
+    Send(LVM_SETITEMSTATE, place, &item);
+}
+
+void TableView::ToggleSelected()
+{
+    const auto places = SelectedPlaces();
+    if (places.empty())
+        return;
+    const bool ticked = !m_ticked[m_table.RowAt(places.front())];
+    for (const std::size_t place : places)
+        m_ticked[m_table.RowAt(place)] = ticked;
+    InvalidateRect(m_window, nullptr, FALSE);
+}
+
+void TableView::ToggleClicked(const NMITEMACTIVATE& click)
+{
+    LVHITTESTINFO hit{};
+    hit.pt = click.ptAction;
+    const LRESULT place = Send(LVM_HITTEST, 0, &hit);
+    if (place < 0 || (hit.flags & LVHT_ONITEM) != LVHT_ONITEMSTATEICON)
+        return;
+    const std::size_t row = m_table.RowAt(static_cast<std::size_t>(place));
+    m_ticked[row] = !m_ticked[row];
+    InvalidateRect(m_window, nullptr, FALSE);
+}
+
+LRESULT TableView::Find(const NMLVFINDITEMW& search) const
+{
+    if ((search.lvfi.flags & (LVFI_STRING | LVFI_PARTIAL)) == 0 || !search.lvfi.psz)
+        return -1;
+    const std::wstring start = search.lvfi.psz;
+    const std::size_t count = m_table.NumShown();
+    const auto first = static_cast<std::size_t>(std::max(search.iStart, 0));
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const std::size_t place = (first + i) % count;
+        const std::wstring& cell = m_table.Cell(m_table.RowAt(place), 0);
+        if (cell.size() >= start.size() &&
+            CompareStringOrdinal(cell.c_str(), static_cast<int>(start.size()), start.c_str(),
+                                 static_cast<int>(start.size()), TRUE) == CSTR_EQUAL)
+            return static_cast<LRESULT>(place);
+    }
+    return -1;
+}
+
+std::vector<std::size_t> TableView::SelectedPlaces() const
+{
+    std::vector<std::size_t> places;
+    const auto next = [this](LRESULT after) {
+        return SendMessageW(m_window, LVM_GETNEXTITEM, static_cast<WPARAM>(after), LVNI_SELECTED);
+    };
+    for (LRESULT place = next(-1); place >= 0 && static_cast<std::size_t>(place) < m_table.NumShown();
+         place = next(place))
+        places.push_back(static_cast<std::size_t>(place));
+    return places;
+}
+
+LRESULT TableView::Send(UINT message, WPARAM wParam, const void* argument) const
+{
+    return SendMessageW(m_window, message, wParam, reinterpret_cast<LPARAM>(argument));
+}

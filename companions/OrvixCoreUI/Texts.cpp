@@ -1,0 +1,28 @@
+#include "Texts.h"
+
+#include "Module.h"
+
+#include <memory>
+
+std::wstring Text(UINT id)
+{
+    const wchar_t* text = nullptr; // not terminated
+    const int length = LoadStringW(ThisModule(), id, reinterpret_cast<wchar_t*>(&text), 0);
+    return {text, static_cast<std::size_t>(length)};
+}
+
+std::wstring FormatText(UINT id, std::initializer_list<DWORD_PTR> inserts)
+{
+    struct FreeLocal
+    {
+        void operator()(wchar_t* text) const { LocalFree(text); }
+    };
+    wchar_t* made = nullptr;
+    const std::wstring form = Text(id);
+    auto* arguments = reinterpret_cast<va_list*>(const_cast<DWORD_PTR*>(inserts.begin()));
+    const DWORD length =
+        FormatMessageW(FORMAT_MESSAGE_FROM_STRING | FORMAT_MESSAGE_ARGUMENT_ARRAY | FORMAT_MESSAGE_ALLOCATE_BUFFER,
+                       form.c_str(), 0, 0, reinterpret_cast<wchar_t*>(&made), 0, arguments);
+    const std::unique_ptr<wchar_t, FreeLocal> owned(made);
+    return {made, length};
+}

@@ -1,0 +1,12 @@
+#pragma once
+
+#include <windows.h>
+
+#include <string>
+
+/// A text of the string table.
+std::wstring Text(UINT id);
+
+/// A text of the string table with its inserts (%1, %2!u!, as FormatMessageW has them) filled in: numbers up to
+/// 32 bits and null-terminated texts.
+std::wstring FormatText(UINT id, std::initializer_list<DWORD_PTR> inserts);

@@ -1,0 +1,74 @@
+#pragma once
+
+#include <windows.h>
+
+#include <string>
+#include <vector>
+
+/// A dialog of this process as its user handles it: by keyboard and mouse messages, from another thread than the one
+/// that shows it. Controls are named by what a person sees, and a screen reader says: a button by its text, any other
+/// control by the label before it, both without the mark of the access key. What is not there throws
+/// std::runtime_error.
+class DialogWindow
+{
+public:
+    /// `settle` returns when the dialog has handled every message posted before.
+    DialogWindow(HWND window, void (*settle)(HWND)) : m_window(window), m_settle(settle) {}
+
+    HWND Handle() const { return m_window; }
+    bool IsOpen() const { return IsWindow(m_window) != FALSE; }
+
+    /// Keys go to the control that has the focus.
+    void Press(WORD key) const;
+    void Type(const std::wstring& text) const;
+    void PressAlt(wchar_t accessKey) const;
+    std::wstring Focused() const;
+    void Focus(const std::wstring& name) const;
+
+    /// Clicks a button.
+    void Click(const std::wstring& name) const;
+
+    /// Clicks the cross in the corner.
+    void Close() const;
+
+    /// A visible control, by name.
+    HWND Control(const std::wstring& name) const;
+    bool Has(const std::wstring& name) const;
+    bool IsEnabled(const std::wstring& name) const { return IsWindowEnabled(Control(name)) != FALSE; }
+    bool IsTicked(const std::wstring& name) const;
+
+    /// The visible buttons, check boxes left out, from left to right.
+    std::vector<std::wstring> Buttons() const;
+
+    /// The visible controls that take the focus, in tab order; one without a name is "".
+    std::vector<std::wstring> TabStops() const;
+
+    std::wstring Text(const std::wstring& name) const;
+
+    /// Chooses the item of a drop-down list as a user does, and the items.
+    void Choose(const std::wstring& name, const std::wstring& item) const;
+    std::vector<std::wstring> Items(const std::wstring& name) const;
+    std::wstring Chosen(const std::wstring& name) const;
+
+    /// The place of a control inside the dialog.
+    RECT Place(const std::wstring& name) const;
+
+    /// The rows of a list, as they are shown.
+    int NumRows(const std::wstring& list) const;
+    std::wstring Cell(const std::wstring& list, int row, int column) const;
+    std::vector<std::wstring> Column(const std::wstring& list, int column) const;
+    bool IsRowTicked(const std::wstring& list, int row) const;
+    void SelectRow(const std::wstring& list, int row) const;
+    void ClickHeading(const std::wstring& list, int column) const;
+    /// Opens a control's menu by the keyboard and chooses the item with this number, from 1.
+    void ChooseFromMenu(const std::wstring& name, int item) const;
+    void ClickCheckBox(const std::wstring& list, int row) const;
+
+private:
+    HWND FocusWindow() const;
+    void Post(HWND control, UINT message, WPARAM wParam, LPARAM lParam) const;
+    void ClickAt(HWND control, LONG x, LONG y) const;
+
+    HWND m_window;
+    void (*m_settle)(HWND);
+};

@@ -1,0 +1,76 @@
+#include "DialogsTest.h"
+
+#include "Files.h"
+#include "OrvixClientInfo.h"
+
+namespace
+{
+
+bool HasDisplay()
+{
+    const HWND window =
+        CreateWindowExW(0, L"Static", nullptr, WS_POPUP, 0, 0, 1, 1, nullptr, nullptr, nullptr, nullptr);
+    if (window)
+        DestroyWindow(window);
+    return window != nullptr;
+}
+
+} // namespace
+
+DialogsTest::DialogsTest()
+{
+    Restart();
+    m_params.SetTitle(Title);
+    m_params.SetMessage(L"These files are opened.");
+    m_params.SetOrvixFileList(&m_list);
+}
+
+void DialogsTest::SetUp()
+{
+    if (!HasDisplay())
+        GTEST_SKIP() << "no display to show dialogs on";
+}
+
+void DialogsTest::Restart()
+{
+    m_services.reset();
+    m_services.reset(GetIOrvixServices());
+    OrvixClientInfo info;
+    info.SetConfigFilePath(m_config.Text().c_str());
+    info.SetIOrvixClientAccess(&m_host);
+    m_services->Initialize(&info, 0);
+}
+
+std::int32_t DialogsTest::ShowPrompt(std::uint32_t options, const std::function<void(const DialogWindow&)>& handle,
+                                     std::uint32_t promptID, bool* dontAskAgain, const std::wstring& message)
+{
+    const User user(Title, handle);
+    return m_services->ShowPrompt(nullptr, const_cast<wchar_t*>(Title), const_cast<wchar_t*>(message.c_str()), options,
+                                  promptID, dontAskAgain);
+}
+
+OrvixFileEntry& DialogsTest::AddFile(const wchar_t* path, unsigned long flagsOut, bool ticked)
+{
+    OrvixFileEntry* entry = m_list.CreateEntry(path, nullptr, ticked ? 0x1 : 0, 0);
+    entry->SetFlagsOut(flagsOut);
+    m_list.AddActiveEntry(entry);
+    return *entry;
+}
+
+std::int32_t DialogsTest::ShowFileList(std::uint32_t options, const std::function<void(const DialogWindow&)>& handle)
+{
+    m_params.SetOptions(options);
+    const User user(Title, handle);
+    return m_services->ShowFileListDialog(nullptr, &m_params);
+}
+
+std::int32_t DialogsTest::ShowEditor(const std::function<void(const DialogWindow&)>& handle)
+{
+    const User user(L"Stored answers", handle);
+    return m_services->EditPrompts(nullptr, nullptr);
+}
+
+std::string DialogsTest::PromptFile() const
+{
+    return ReadBytes(m_config.Path() / L"OrvixPrompts.xml");
+}

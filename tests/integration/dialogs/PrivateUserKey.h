@@ -1,0 +1,28 @@
+#pragma once
+
+#include <windows.h>
+
+#include <string>
+
+/// Lets this process see an empty HKEY_CURRENT_USER of its own for the object's lifetime.
+class PrivateUserKey
+{
+public:
+    PrivateUserKey() : m_path(L"Software\\OrvixCoreTest" + std::to_wstring(GetCurrentProcessId()))
+    {
+        HKEY key = nullptr;
+        RegCreateKeyExW(HKEY_CURRENT_USER, m_path.c_str(), 0, nullptr, 0, KEY_ALL_ACCESS, nullptr, &key, nullptr);
+        RegOverridePredefKey(HKEY_CURRENT_USER, key);
+        RegCloseKey(key);
+    }
+    PrivateUserKey(const PrivateUserKey&) = delete;
+    PrivateUserKey& operator=(const PrivateUserKey&) = delete;
+    ~PrivateUserKey()
+    {
+        RegOverridePredefKey(HKEY_CURRENT_USER, nullptr);
+        RegDeleteTreeW(HKEY_CURRENT_USER, m_path.c_str());
+    }
+
+private:
+    std::wstring m_path;
+};

@@ -1,0 +1,122 @@
+#include "User.h"
+
+#include <gtest/gtest.h>
+
+#include <bit>
+#include <chrono>
+#include <exception>
+#include <memory>
+#include <optional>
+#include <utility>
+
+namespace
+{
+
+using Clock = std::chrono::steady_clock;
+constexpr std::chrono::seconds Patience{20};
+constexpr UINT MarkMessage = WM_APP;
+
+struct CloseHandleDeleter
+{
+    using pointer = HANDLE;
+    void operator()(HANDLE handle) const { CloseHandle(handle); }
+};
+
+/// A window of the dialog's thread that says when the messages posted before have had their turn.
+struct MarkWindow
+{
+    HWND window = nullptr;
+    std::unique_ptr<HANDLE, CloseHandleDeleter> reached{CreateEventW(nullptr, FALSE, FALSE, nullptr)};
+};
+
+MarkWindow& Mark()
+{
+    static MarkWindow mark;
+    return mark;
+}
+
+LRESULT CALLBACK MarkProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam)
+{
+    if (message == MarkMessage)
+        SetEvent(Mark().reached.get());
+    return DefWindowProcW(window, message, wParam, lParam);
+}
+
+void MakeMarkWindow()
+{
+    if (Mark().window)
+        return;
+    Mark().window = CreateWindowExW(0, L"Static", nullptr, 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr);
+    SetWindowLongPtrW(Mark().window, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(&MarkProcedure));
+}
+
+void Settle(HWND dialog)
+{
+    // The second time for the messages that the first ones posted in their turn, a key's character say.
+    for (int i = 0; i < 2 && IsWindow(dialog); ++i)
+    {
+        ResetEvent(Mark().reached.get());
+        PostMessageW(Mark().window, MarkMessage, 0, 0);
+        while (IsWindow(dialog) && WaitForSingleObject(Mark().reached.get(), 10) == WAIT_TIMEOUT)
+        {
+        }
+    }
+}
+
+struct Search
+{
+    const std::wstring& title;
+    HWND found = nullptr;
+};
+
+BOOL CALLBACK CompareTitle(HWND window, LPARAM parameter)
+{
+    auto& search = *std::bit_cast<Search*>(parameter);
+    wchar_t title[256] = {};
+    GetWindowTextW(window, title, 256);
+    if (IsWindowVisible(window) && title == search.title)
+        search.found = window;
+    return search.found == nullptr;
+}
+
+std::optional<DialogWindow> Await(DWORD thread, const std::wstring& title)
+{
+    for (const auto end = Clock::now() + Patience; Clock::now() < end; Sleep(5))
+    {
+        Search search{title};
+        EnumThreadWindows(thread, &CompareTitle, reinterpret_cast<LPARAM>(&search));
+        if (search.found)
+        {
+            Settle(search.found);
+            return DialogWindow(search.found, &Settle);
+        }
+    }
+    return std::nullopt;
+}
+
+void Handle(DWORD thread, const std::wstring& title, const std::function<void(const DialogWindow&)>& handle)
+{
+    const auto dialog = Await(thread, title);
+    ASSERT_TRUE(dialog) << "no dialog came up";
+    try
+    {
+        handle(*dialog);
+    }
+    catch (const std::exception& failure)
+    {
+        ADD_FAILURE() << failure.what();
+    }
+    if (dialog->IsOpen())
+    {
+        ADD_FAILURE() << "the dialog stays open";
+        PostMessageW(dialog->Handle(), WM_COMMAND, IDCANCEL, 0);
+    }
+}
+
+} // namespace
+
+User::User(std::wstring title, std::function<void(const DialogWindow&)> handle)
+{
+    MakeMarkWindow();
+    m_thread = std::thread(Handle, GetCurrentThreadId(), std::move(title), std::move(handle));
+}

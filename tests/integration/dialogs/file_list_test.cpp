@@ -1,0 +1,386 @@
+#include "DialogsTest.h"
+#include "FakeProvider.h"
+
+#include <commctrl.h>
+#include <windows.h>
+
+#include <chrono>
+#include <utility>
+
+namespace
+{
+
+constexpr const wchar_t* List = L"Files:";
+
+/// Bits of the options.
+constexpr std::uint32_t Ticks = 0x1;
+constexpr std::uint32_t KeepOption = 0x4;
+constexpr std::uint32_t LatestOption = 0x8;
+constexpr std::uint32_t OptionTicked = 0x10;
+constexpr std::uint32_t OfferRemember = 0x40;
+constexpr std::uint32_t Remember = 0x80;
+
+class FileListDialog : public DialogsTest
+{
+protected:
+    static void Cancel(const DialogWindow& dialog) { dialog.Press(VK_ESCAPE); }
+};
+
+TEST_F(FileListDialog, ShowsTitleMessageAndEachFileWithFolderAndState)
+{
+    const std::pair<unsigned long, const wchar_t*> states[] = {
+        {0, L"Unknown"},
+        {0x1, L"Not under source control"},
+        {0x2, L"Checked in"},
+        {0x2 | 0x4, L"Checked out by you"},
+        {0x2 | 0x8, L"Checked out by another user"},
+        {0x2 | 0x10, L"Out of date"},
+        {0x2 | 0x20, L"Deleted"},
+        {0x2 | 0x80, L"Modified"},
+        {0x4700BE, L"Checked out by you, Checked out by another user, Out of date, Deleted, Modified"}};
+    Texts words;
+    for (const auto& [flags, text] : states)
+    {
+        AddFile(L"C:\\town\\bridge.model", flags);
+        words.emplace_back(text);
+    }
+    AddFile(L"town/church.model", 0);
+    AddFile(L"tower.model", 0);
+    ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+        EXPECT_TRUE(dialog.Has(L"These files are opened."));
+        const int last = static_cast<int>(words.size());
+        Texts shown = dialog.Column(List, 2);
+        shown.resize(words.size());
+        EXPECT_EQ(shown, words);
+        EXPECT_EQ(dialog.Cell(List, 0, 0), L"bridge.model");
+        EXPECT_EQ(dialog.Cell(List, 0, 1), L"C:\\town");
+        EXPECT_EQ(dialog.Cell(List, last, 0), L"church.model");
+        EXPECT_EQ(dialog.Cell(List, last, 1), L"town");
+        EXPECT_EQ(dialog.Cell(List, last + 1, 0), L"tower.model");
+        EXPECT_EQ(dialog.Cell(List, last + 1, 1), L"");
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, MarksTickedEntriesAndOnlyThem)
+{
+    OrvixFileEntry& kept = AddFile(L"a", 0x4);
+    OrvixFileEntry& unticked = AddFile(L"b", 0x6);
+    OrvixFileEntry& ticked = AddFile(L"c", 0x1, false);
+    OrvixFileEntry& left = AddFile(L"d", 0x2, false);
+    EXPECT_EQ(ShowFileList(Ticks,
+                           [](const DialogWindow& dialog) {
+                               EXPECT_TRUE(dialog.IsRowTicked(List, 0));
+                               EXPECT_FALSE(dialog.IsRowTicked(List, 3));
+                               dialog.ClickCheckBox(List, 1);
+                               dialog.ClickCheckBox(List, 2);
+                               dialog.Click(L"OK");
+                           }),
+              1);
+    EXPECT_EQ(kept.GetFlagsOut(), 0x6U);
+    EXPECT_EQ(unticked.GetFlagsOut(), 0x4U);
+    EXPECT_EQ(ticked.GetFlagsOut(), 0x3U);
+    EXPECT_EQ(left.GetFlagsOut(), 0x0U);
+}
+
+TEST_F(FileListDialog, IsTickedByTheSpaceBar)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.Focus(List);
+        dialog.SelectRow(List, 1);
+        dialog.Press(VK_SPACE);
+        EXPECT_TRUE(dialog.IsRowTicked(List, 0));
+        EXPECT_FALSE(dialog.IsRowTicked(List, 1));
+        dialog.Press(VK_SPACE);
+        EXPECT_TRUE(dialog.IsRowTicked(List, 1));
+        dialog.Press(VK_SPACE);
+        dialog.Press(VK_RETURN);
+    });
+    EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0x2U);
+    EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut() & 0x2, 0U);
+}
+
+TEST_F(FileListDialog, TakesEveryEntryWhereNoTicksAreOffered)
+{
+    OrvixFileEntry& entry = AddFile(L"a", 0x4, false);
+    EXPECT_EQ(ShowFileList(0,
+                           [](const DialogWindow& dialog) {
+                               EXPECT_FALSE(dialog.Has(L"Select all"));
+                               dialog.Press(VK_RETURN);
+                           }),
+              1);
+    EXPECT_EQ(entry.GetFlagsOut(), 0x6U);
+}
+
+TEST_F(FileListDialog, ChangesNoEntryAndNoCommentWhenItIsCancelled)
+{
+    OrvixFileEntry& entry = AddFile(L"a", 0x4);
+    m_params.SetComment(L"before");
+    EXPECT_EQ(ShowFileList(Ticks,
+                           [](const DialogWindow& dialog) {
+                               dialog.Focus(L"Comment:");
+                               dialog.Type(L"after");
+                               dialog.Click(L"Cancel");
+                           }),
+              0);
+    EXPECT_EQ(entry.GetFlagsOut(), 0x4U);
+    EXPECT_STREQ(m_params.GetComment(), L"before");
+}
+
+TEST_F(FileListDialog, FiltersByNameFolderAndStateWhileTyping)
+{
+    AddFile(L"C:\\town\\bridge.model");
+    AddFile(L"C:\\town\\Church.model", 0x1);
+    AddFile(L"C:\\church\\tower.model");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.PressAlt(L'l');
+        dialog.Type(L"c");
+        EXPECT_EQ(dialog.NumRows(List), 3);
+        dialog.Type(L"HUR");
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"Church.model", L"tower.model"}));
+        dialog.Press(VK_HOME);
+        dialog.Type(L"x");
+        EXPECT_EQ(dialog.NumRows(List), 0);
+        SetWindowTextW(dialog.Control(L"Filter:"), L"not under");
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"Church.model"}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, SelectsAllAndNoneOfWhatIsShownAndCounts)
+{
+    AddFile(L"bridge");
+    AddFile(L"church");
+    AddFile(L"tower", 0x2, false);
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        EXPECT_TRUE(dialog.Has(L"2 of 3 files ticked"));
+        dialog.PressAlt(L'n');
+        EXPECT_TRUE(dialog.Has(L"0 of 3 files ticked"));
+        dialog.PressAlt(L'l');
+        dialog.Type(L"chur");
+        EXPECT_TRUE(dialog.Has(L"0 of 3 files ticked, 1 shown"));
+        dialog.PressAlt(L'a');
+        EXPECT_TRUE(dialog.Has(L"1 of 3 files ticked, 1 shown"));
+        dialog.Click(L"OK");
+    });
+    EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut(), 0U);
+    EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut(), 0x2U);
+    EXPECT_EQ(m_list.GetFileEntry(2)->GetFlagsOut(), 0U);
+}
+
+TEST_F(FileListDialog, SortsByTheColumnThatIsClickedAndTurnsTheOrderRound)
+{
+    AddFile(L"x\\b", 0x2, false);
+    AddFile(L"z\\A", 0x2, true);
+    AddFile(L"y\\c", 0x1, true);
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"b", L"A", L"c"}));
+        dialog.ClickHeading(List, 0);
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"A", L"b", L"c"}));
+        EXPECT_TRUE(dialog.IsRowTicked(List, 0));
+        EXPECT_FALSE(dialog.IsRowTicked(List, 1));
+        dialog.ClickHeading(List, 0);
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"c", L"b", L"A"}));
+        dialog.ClickHeading(List, 1);
+        EXPECT_EQ(dialog.Column(List, 1), (Texts{L"x", L"y", L"z"}));
+        dialog.ClickHeading(List, 2);
+        EXPECT_EQ(dialog.Column(List, 2), (Texts{L"Checked in", L"Checked in", L"Not under source control"}));
+        dialog.ClickCheckBox(List, 0);
+        dialog.Click(L"OK");
+    });
+    EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0x2U) << "b, the first one of the checked in";
+    EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut() & 0x2, 0x2U);
+    EXPECT_EQ(m_list.GetFileEntry(2)->GetFlagsOut() & 0x2, 0x2U);
+}
+
+TEST_F(FileListDialog, IsSortedByKeysThroughItsMenu)
+{
+    AddFile(L"x\\b");
+    AddFile(L"y\\a");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.ChooseFromMenu(List, 1);
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"a", L"b"}));
+        dialog.ChooseFromMenu(List, 2);
+        EXPECT_EQ(dialog.Column(List, 1), (Texts{L"x", L"y"}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, TakesTheCommentAndOffersItAgain)
+{
+    AddFile(L"a");
+    for (const wchar_t* comment : {L"first", L"second", L"first"})
+    {
+        m_params.SetComment(L"");
+        ShowFileList(Ticks, [comment](const DialogWindow& dialog) {
+            dialog.PressAlt(L'm');
+            dialog.Type(comment);
+            dialog.Click(L"OK");
+        });
+        EXPECT_STREQ(m_params.GetComment(), comment);
+    }
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        EXPECT_EQ(dialog.Items(L"Recent comments:"), (Texts{L"first", L"second"}));
+        dialog.Choose(L"Recent comments:", L"second");
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"second");
+        dialog.Click(L"OK");
+    });
+    EXPECT_STREQ(m_params.GetComment(), L"second");
+}
+
+TEST_F(FileListDialog, TakesBadRecentCommentsForNone)
+{
+    AddFile(L"a");
+    constexpr const wchar_t* Key = L"Software\\OrvixCore\\Dialogs";
+    const DWORD number = 7;
+    RegSetKeyValueW(HKEY_CURRENT_USER, Key, L"RecentComments", REG_DWORD, &number, sizeof number);
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        EXPECT_FALSE(dialog.IsEnabled(L"Recent comments:"));
+        Cancel(dialog);
+    });
+    // No null at the end.
+    RegSetKeyValueW(HKEY_CURRENT_USER, Key, L"RecentComments", REG_MULTI_SZ, L"abc", 6);
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        EXPECT_EQ(dialog.Items(L"Recent comments:"), (Texts{L"abc"}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, OffersTheBoxesThatItsOptionsName)
+{
+    AddFile(L"a");
+    constexpr const wchar_t* Keep = L"Keep checked out";
+    constexpr const wchar_t* Latest = L"Get the latest version";
+    constexpr const wchar_t* RememberBox = L"Remember my answer";
+    struct Offer
+    {
+        std::uint32_t options;
+        bool keep;
+        bool latest;
+        bool remember;
+    };
+    const Offer offers[] = {{Ticks, false, false, false},
+                            {Ticks | KeepOption, true, false, false},
+                            {Ticks | LatestOption, false, true, false},
+                            {Ticks | KeepOption | LatestOption, true, false, false},
+                            {Ticks | OfferRemember, false, false, true},
+                            {Ticks | Remember | OptionTicked, false, false, false}};
+    for (const Offer& offer : offers)
+    {
+        ShowFileList(offer.options, [&](const DialogWindow& dialog) {
+            EXPECT_EQ(dialog.Has(Keep), offer.keep);
+            EXPECT_EQ(dialog.Has(Latest), offer.latest);
+            EXPECT_EQ(dialog.Has(RememberBox), offer.remember);
+            dialog.Click(L"OK");
+        });
+        EXPECT_EQ(m_params.GetOptions(), offer.options) << "nothing was ticked or unticked";
+    }
+}
+
+TEST_F(FileListDialog, GivesTheStateOfItsBoxesBackWhateverTheAnswer)
+{
+    AddFile(L"a");
+    constexpr std::uint32_t Offered = Ticks | KeepOption | OfferRemember;
+    for (const wchar_t* button : {L"OK", L"Cancel"})
+    {
+        ShowFileList(Offered | OptionTicked, [button](const DialogWindow& dialog) {
+            EXPECT_TRUE(dialog.IsTicked(L"Keep checked out"));
+            EXPECT_FALSE(dialog.IsTicked(L"Remember my answer"));
+            dialog.PressAlt(L'k');
+            dialog.PressAlt(L'r');
+            dialog.Click(button);
+        });
+        EXPECT_EQ(m_params.GetOptions(), Offered | Remember);
+    }
+}
+
+/// Writes down on which files it worked, and how.
+class CheckInProvider final : public FakeProvider
+{
+public:
+    CheckInProvider() : FakeProvider(L"CheckIn") {}
+
+    Texts files;
+    std::wstring comment;
+    unsigned long options = 0;
+
+    int CheckIn(OrvixFileList* list, const wchar_t* text, unsigned long how) override
+    {
+        for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
+            files.emplace_back(list->GetActiveFileEntry(i)->GetFile());
+        comment = text;
+        options = how;
+        return 0;
+    }
+};
+
+TEST_F(FileListDialog, DecidesWhatAnOperationWorksOn)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    AddFile(L"c");
+    constexpr std::uint32_t DialogPrompt = 100;
+    constexpr std::uint32_t OptionPrompt = 200;
+    constexpr std::uint32_t Ask = 0x1;
+    m_services->RegisterPrompt(DialogPrompt, L"Check in?", Ask, 0, true);
+    m_services->RegisterPrompt(OptionPrompt, L"Keep checked out?", Ask, 0, true);
+    m_params.SetDialogPromptID(DialogPrompt);
+    m_params.SetOptionPromptID(OptionPrompt);
+    m_params.SetOptions(KeepOption | OfferRemember);
+
+    CheckInProvider provider;
+    std::int32_t result = 0;
+    {
+        const User user(Title, [](const DialogWindow& dialog) {
+            dialog.ClickCheckBox(List, 1);
+            dialog.PressAlt(L'm');
+            dialog.Type(L"done");
+            dialog.PressAlt(L'k');
+            dialog.PressAlt(L'r');
+            dialog.Click(L"OK");
+        });
+        constexpr std::uint32_t CheckIn = 0x2;
+        result = m_services->RunFileListOperation(nullptr, &m_params, false, &provider, CheckIn, 0xFFFFFFFF);
+    }
+    EXPECT_EQ(result, 1);
+    EXPECT_EQ(provider.files, (Texts{L"a", L"c"}));
+    EXPECT_EQ(provider.comment, L"done");
+    EXPECT_EQ(provider.options, 1U) << "keep checked out";
+    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), 0x2U);
+    EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), 0x8U);
+}
+
+TEST_F(FileListDialog, IsQuickWithFiftyThousandFiles)
+{
+    constexpr int Count = 50000;
+    constexpr double Quick = 3; // on a busy machine and under Wine
+    for (int i = 0; i < Count; ++i)
+        AddFile((L"C:\\town\\file" + std::to_wstring(i)).c_str());
+    using Clock = std::chrono::steady_clock;
+    auto last = Clock::now();
+    ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+        const auto seconds = [&last] {
+            const auto now = Clock::now();
+            return std::chrono::duration<double>(now - std::exchange(last, now)).count();
+        };
+        EXPECT_LT(seconds(), Quick) << "to open";
+        EXPECT_EQ(dialog.NumRows(List), Count);
+        EXPECT_NE(GetWindowLongW(dialog.Control(List), GWL_STYLE) & LVS_OWNERDATA, 0);
+        dialog.Click(L"Select none");
+        EXPECT_LT(seconds(), Quick) << "to untick all";
+        dialog.Focus(L"Filter:");
+        dialog.Type(L"49999");
+        EXPECT_LT(seconds(), Quick) << "to filter";
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"file49999"}));
+        dialog.Click(L"Select all");
+        dialog.ClickHeading(List, 0);
+        EXPECT_LT(seconds(), Quick) << "to sort";
+        dialog.Click(L"OK");
+    });
+    EXPECT_EQ(m_list.GetFileEntry(Count - 1)->GetFlagsOut() & 0x2, 0x2U);
+    EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0U);
+}
+
+} // namespace

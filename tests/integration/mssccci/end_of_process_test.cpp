@@ -1,0 +1,139 @@
+#include "InstalledTest.h"
+
+#include <memory>
+
+using testing::HasSubstr;
+
+namespace
+{
+
+/// How a process that looked for installed libraries has ended.
+struct Outcome
+{
+    DWORD exitCode = 0;
+    std::string debugOutput;
+    std::string marks; ///< how far it came
+};
+
+struct CloseAHandle
+{
+    using pointer = HANDLE;
+    void operator()(HANDLE handle) const { CloseHandle(handle); }
+};
+using UniqueHandle = std::unique_ptr<HANDLE, CloseAHandle>;
+
+/// Listens to the debug output of all processes, as a monitor program does. (A debugger proper would not do: a library
+/// that throws and catches while it is loaded does not survive one under Wine.)
+class DebugOutput
+{
+public:
+    /// What the process puts out until it ends, which it is to do within a minute.
+    std::string ReadUntilTheEnd(const PROCESS_INFORMATION& process)
+    {
+        std::string output;
+        const HANDLE events[] = {m_written.get(), process.hProcess};
+        DWORD event = WAIT_OBJECT_0;
+        while (event == WAIT_OBJECT_0)
+        {
+            SetEvent(m_free.get());
+            event = WaitForMultipleObjects(2, events, FALSE, 60000);
+            if (event == WAIT_OBJECT_0 && m_buffer->process == process.dwProcessId)
+                output += m_buffer->text;
+        }
+        EXPECT_EQ(event, WAIT_OBJECT_0 + 1) << "the process does not end";
+        return output;
+    }
+
+private:
+    struct Buffer
+    {
+        DWORD process;
+        char text[4096 - sizeof(DWORD)];
+    };
+
+    // The names by which the system finds its monitor.
+    UniqueHandle m_free{CreateEventW(nullptr, FALSE, FALSE, L"DBWIN_BUFFER_READY")};
+    UniqueHandle m_written{CreateEventW(nullptr, FALSE, FALSE, L"DBWIN_DATA_READY")};
+    UniqueHandle m_section{
+        CreateFileMappingW(INVALID_HANDLE_VALUE, nullptr, PAGE_READWRITE, 0, sizeof(Buffer), L"DBWIN_BUFFER")};
+    std::unique_ptr<const Buffer, decltype(&UnmapViewOfFile)> m_buffer{
+        static_cast<const Buffer*>(MapViewOfFile(m_section.get(), FILE_MAP_READ, 0, 0, 0)), UnmapViewOfFile};
+};
+
+/// Runs a process that looks for installed libraries.
+class EndOfProcess : public InstalledTest
+{
+protected:
+    Outcome Discover() const
+    {
+        const std::filesystem::path marker = m_config.Path() / L"marks";
+        SetEnvironmentVariableW(L"ORVIX_END_MARKER", marker.c_str());
+        std::wstring program(MAX_PATH, L'\0');
+        program.resize(GetModuleFileNameW(nullptr, program.data(), static_cast<DWORD>(program.size())));
+        program = (std::filesystem::path(program).parent_path() / L"discovering_process.exe").wstring();
+
+        DebugOutput debugOutput;
+        STARTUPINFOW startup = {};
+        startup.cb = sizeof startup;
+        PROCESS_INFORMATION process = {};
+        Outcome outcome;
+        if (!CreateProcessW(program.c_str(), nullptr, nullptr, nullptr, FALSE, 0, nullptr, nullptr, &startup, &process))
+        {
+            ADD_FAILURE() << "no process: error " << GetLastError();
+            return outcome;
+        }
+        const UniqueHandle thread(process.hThread);
+        const UniqueHandle handle(process.hProcess);
+        outcome.debugOutput = debugOutput.ReadUntilTheEnd(process);
+        GetExitCodeProcess(process.hProcess, &outcome.exitCode);
+        outcome.marks = ReadBytes(marker);
+        return outcome;
+    }
+
+    /// The process has ended at once, with the system's code for that and a reason, and ran nothing more.
+    void ExpectFatal() const
+    {
+        const Outcome outcome = Discover();
+        EXPECT_EQ(outcome.exitCode, 0xC0000409u);
+        EXPECT_THAT(outcome.debugOutput,
+                    HasSubstr("OrvixCore: the process ends: a text of an installed MSSCCI provider"));
+        EXPECT_EQ(outcome.marks, "started ");
+    }
+
+    static constexpr std::size_t Unterminable = 2048;
+};
+
+} // namespace
+
+TEST_F(EndOfProcess, IsTheOrdinaryOneWithTextsThatFit)
+{
+    SetBytes(Install(L"Recorded"), ServerPath, REG_SZ, std::string(Unterminable - 1, '\0'));
+    const Outcome outcome = Discover();
+    EXPECT_EQ(outcome.exitCode, 1u);
+    EXPECT_EQ(outcome.debugOutput, "");
+    EXPECT_EQ(outcome.marks, "started initialised atexit detached ");
+}
+
+TEST_F(EndOfProcess, ComesAtOnceForAListTextThatFillsItsBuffer)
+{
+    SetBytes(m_list, L"1", REG_SZ, Bytes(AddProvider(L"Recorded").Path(), Unterminable));
+    ExpectFatal();
+}
+
+TEST_F(EndOfProcess, ComesAtOnceForANameThatFillsItsBuffer)
+{
+    SetBytes(Install(L"Recorded"), ServerName, REG_SZ, Bytes(L"Recorded", Unterminable));
+    ExpectFatal();
+}
+
+TEST_F(EndOfProcess, ComesAtOnceForAPathThatFillsItsBuffer)
+{
+    SetBytes(Install(L"Recorded"), ServerPath, REG_SZ, Bytes(Recording(L"recording_full"), Unterminable));
+    ExpectFatal();
+}
+
+TEST_F(EndOfProcess, ComesAtOnceForATextOfAnyTypeInAProvidersKey)
+{
+    SetBytes(Install(L"Recorded"), ServerName, REG_BINARY, std::string(Unterminable, 'x'));
+    ExpectFatal();
+}

@@ -1,0 +1,241 @@
+#include "InstalledTest.h"
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+namespace
+{
+
+using InstalledLibrary = InstalledTest;
+
+/// The folder that the process searches for libraries; empty for none.
+std::wstring DllDirectory()
+{
+    std::wstring folder(MAX_PATH, L'\0');
+    folder.resize(GetDllDirectoryW(static_cast<DWORD>(folder.size()), folder.data()));
+    return folder;
+}
+
+/// Sets that folder for a scope; null for none.
+class TemporaryDllDirectory
+{
+public:
+    explicit TemporaryDllDirectory(const wchar_t* folder) : m_previous(DllDirectory()) { SetDllDirectoryW(folder); }
+    TemporaryDllDirectory(const TemporaryDllDirectory&) = delete;
+    TemporaryDllDirectory& operator=(const TemporaryDllDirectory&) = delete;
+    ~TemporaryDllDirectory() { SetDllDirectoryW(m_previous.empty() ? nullptr : m_previous.c_str()); }
+
+private:
+    std::wstring m_previous;
+};
+
+std::wstring ModulePath(const wchar_t* name)
+{
+    std::wstring path(1024, L'\0');
+    path.resize(GetModuleFileNameW(GetModuleHandleW(name), path.data(), static_cast<DWORD>(path.size())));
+    return path;
+}
+
+/// Every operation that needs the library fails; without an open project the status does not.
+void ExpectNotAvailable(IOrvixProvider& provider, OrvixClientInfo& info)
+{
+    EXPECT_EQ(provider.Initialize(&info), -1);
+    EXPECT_FALSE(provider.IsInitialized());
+    EXPECT_EQ(provider.OpenProject(L"C:\\p", L""), -1);
+    EXPECT_FALSE(provider.IsProjectOpen());
+    EXPECT_EQ(provider.RunProviderClient(), -1);
+    EXPECT_EQ(provider.ShowOptions(), -1);
+    EXPECT_EQ(provider.CloseProject(), -1);
+    EXPECT_EQ(provider.Uninitialize(), -1);
+}
+
+} // namespace
+
+TEST_F(InstalledLibrary, IsLoadedOnFirstUseOnly)
+{
+    Install(L"Recorded");
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    EXPECT_STREQ(m_services->GetProviderName(0), L"Recorded");
+    EXPECT_STREQ(provider->GetName(), L"Recorded");
+    EXPECT_FALSE(provider->IsInitialized());
+    EXPECT_FALSE(provider->IsProjectOpen());
+    EXPECT_THAT(m_scc.calls, IsEmpty());
+    m_info.SetClientName(L"Test host");
+    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    EXPECT_THAT(m_scc.calls, ElementsAre("load recording_full", "SccGetVersion()",
+                                         R"(SccInitialize(0x0, 0x0, "Test host", "Recorded", ""))"));
+}
+
+TEST_F(InstalledLibrary, HasOneProviderForAllRequests)
+{
+    Install(L"Recorded");
+    Install(L"Other");
+    ASSERT_TRUE(Initialize(Installed));
+    EXPECT_NE(m_services->GetProvider(0), nullptr);
+    EXPECT_EQ(m_services->GetProvider(0), m_services->GetProvider(0));
+    EXPECT_NE(m_services->GetProvider(0), m_services->GetProvider(1));
+    EXPECT_STREQ(m_services->GetProvider(0)->GetName(), L"Recorded");
+    EXPECT_STREQ(m_services->GetProvider(1)->GetName(), L"Other");
+    EXPECT_EQ(m_services->GetProvider(2), nullptr);
+    EXPECT_EQ(m_services->GetProviderName(2), nullptr);
+}
+
+TEST_F(InstalledLibrary, ThatIsMissingIsListedAndNotAvailable)
+{
+    Install(L"Recorded", Recording(L"missing"));
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
+    ExpectNotAvailable(*provider, m_info);
+}
+
+TEST_F(InstalledLibrary, ThatIsNoneIsListedAndNotAvailable)
+{
+    const std::filesystem::path file = m_config.Path() / L"notes.dll";
+    WriteBytes(file, "These are notes, not a library.");
+    Install(L"Recorded", file.wstring());
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    ExpectNotAvailable(*provider, m_info);
+}
+
+TEST_F(InstalledLibrary, IsTriedAgainAfterAFailedLoad)
+{
+    const std::filesystem::path file = m_config.Path() / L"late.dll";
+    Install(L"Recorded", file.wstring());
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    EXPECT_EQ(provider->Initialize(&m_info), -1);
+    std::filesystem::copy_file(Recording(L"recording_full"), file);
+    EXPECT_EQ(provider->Initialize(&m_info), 0);
+}
+
+TEST_F(InstalledLibrary, IsLoadedUnderOrvixCoresManifest)
+{
+    Install(L"Recorded");
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    HANDLE before = nullptr;
+    HANDLE after = nullptr;
+    ASSERT_TRUE(GetCurrentActCtx(&before));
+    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    ASSERT_TRUE(GetCurrentActCtx(&after));
+    EXPECT_EQ(before, after);
+    const std::wstring core = ModulePath(L"OrvixCore.dll");
+    EXPECT_EQ(CompareStringOrdinal(m_scc.manifestAtLoad.c_str(), -1, core.c_str(), -1, TRUE), CSTR_EQUAL)
+        << std::filesystem::path(m_scc.manifestAtLoad);
+}
+
+TEST_F(InstalledLibrary, LeavesTheFolderThatTheProcessSearchesAsItWas)
+{
+    const std::wstring needed = ORVIX_RECORDING_MSSCCI L"\\needed";
+    Install(L"Recorded");
+    Install(L"Missing", Recording(L"missing"));
+    WriteProviders("<a><Name></Name><MSSCCDllSearchPath>" + std::string(needed.begin(), needed.end()) +
+                   "</MSSCCDllSearchPath></a>");
+    for (const wchar_t* folder : {static_cast<const wchar_t*>(nullptr), L"C:\\windows"})
+    {
+        const TemporaryDllDirectory directory(folder);
+        ASSERT_TRUE(Initialize(Installed));
+        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+        EXPECT_EQ(m_services->GetProvider(0)->Initialize(&m_info), 0);
+        EXPECT_EQ(m_scc.dllDirectoryAtLoad, needed);
+        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+        EXPECT_EQ(m_services->GetProvider(1)->Initialize(&m_info), -1);
+        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+        m_services->Shutdown();
+        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+    }
+}
+
+TEST_F(InstalledLibrary, WithoutASearchFolderSeesTheHosts)
+{
+    Install(L"Recorded");
+    const TemporaryDllDirectory directory(L"C:\\windows");
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    EXPECT_EQ(m_scc.dllDirectoryAtLoad, L"C:\\windows");
+}
+
+TEST_F(InstalledLibrary, IsEndedAndFreedAtShutdown)
+{
+    Install(L"Recorded");
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    ASSERT_EQ(provider->Initialize(&m_info), 0);
+    ASSERT_EQ(provider->OpenProject(L"C:\\p", L""), 0);
+    m_scc.Take();
+    m_services->Shutdown();
+    EXPECT_THAT(m_scc.calls, ElementsAre("SccCloseProject(0x0)", "SccUninitialize(0x0)", "unload recording_full"));
+    EXPECT_EQ(m_services->GetProviderCount(), 0u);
+    EXPECT_FALSE(IsLoaded(Recording(L"recording_full")));
+    m_services.reset();
+    EXPECT_EQ(m_scc.calls.size(), 3u);
+}
+
+TEST_F(InstalledLibrary, IsEndedAndFreedWithTheServicesObject)
+{
+    Install(L"Recorded");
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    ASSERT_EQ(provider->Initialize(&m_info), 0);
+    m_scc.Take();
+    m_services.reset();
+    EXPECT_THAT(m_scc.calls, ElementsAre("SccUninitialize(0x0)", "unload recording_full"));
+}
+
+TEST_F(InstalledLibrary, MayLetTheHostCallBackWhileItIsEnded)
+{
+    Install(L"First");
+    Install(L"Second");
+    ASSERT_TRUE(Initialize(Installed));
+    ASSERT_EQ(m_services->GetProviderCount(), 2u);
+    for (std::uint32_t i = 0; i < 2; ++i)
+        ASSERT_EQ(m_services->GetProvider(i)->Initialize(&m_info), 0);
+    int called = 0;
+    m_scc.uninitialize = [&](LPVOID) {
+        ++called;
+        EXPECT_EQ(m_services->GetProviderName(0), nullptr);
+        EXPECT_EQ(m_services->GetProvider(0), nullptr);
+        m_services->Shutdown();
+        return SCC_OK;
+    };
+    m_services->Shutdown();
+    EXPECT_EQ(called, 2);
+    m_scc.uninitialize = nullptr;
+}
+
+TEST_F(InstalledLibrary, ThatWasNeverUsedIsNotLoadedAtTheEnd)
+{
+    Install(L"Recorded");
+    ASSERT_TRUE(Initialize(Installed));
+    m_services.reset();
+    EXPECT_THAT(m_scc.calls, IsEmpty());
+}
+
+TEST_F(InstalledLibrary, CanBeFoundAgainAfterShutdown)
+{
+    Install(L"Recorded");
+    ASSERT_NE(InitializeAndGet(), nullptr);
+    m_services->Shutdown();
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    EXPECT_EQ(provider->Initialize(&m_info), 0);
+}
+
+TEST_F(InstalledLibrary, SendsItsTextOutputToTheHost)
+{
+    static OutputHost host; // the providers keep it
+    Install(L"Recorded");
+    IOrvixProvider* provider = InitializeAndGet();
+    ASSERT_NE(provider, nullptr);
+    m_info.SetIOrvixClientAccess(&host);
+    ASSERT_EQ(provider->Initialize(&m_info), 0);
+    m_scc.openProject = [](LPVOID, HWND, LPSTR, LPCSTR, LPCSTR, LPSTR, LPCSTR, LPTEXTOUTPROC output, LONG) {
+        return output("opening", SCC_MSG_WARNING);
+    };
+    EXPECT_EQ(provider->OpenProject(L"C:\\p", L""), 0);
+    EXPECT_THAT(host.lines, ElementsAre(OutputHost::Line(L"opening", 0)));
+}
