@@ -1,11 +1,7 @@
 // orvix.exe from the outside: a process on a project of its own, with the archive plug-in.
 
-#include "Files.h"
-#include "OrvixTool.h"
 #include "OrvixVersion.h"
-#include "TempFolder.h"
-
-#include <windows.h>
+#include "ToolTest.h"
 
 #include <gmock/gmock.h>
 
@@ -15,62 +11,15 @@ using testing::AllOf;
 using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
-using Arguments = std::vector<std::wstring>;
 
-constexpr unsigned long Success = 0;
-constexpr unsigned long Failed = 1;
-constexpr unsigned long BadUsage = 2;
-constexpr unsigned long NoProject = 3;
-
-bool IsReadOnly(const std::filesystem::path& path)
-{
-    return (GetFileAttributesW(path.c_str()) & FILE_ATTRIBUTE_READONLY) != 0;
-}
-
-class Tool : public testing::Test
+class Tool : public ToolTest
 {
 protected:
-    void SetUp() override { std::filesystem::create_directories(Project()); }
-
-    void TearDown() override
-    {
-        // What a provider made read-only could not be deleted with its folder.
-        for (const auto& entry : std::filesystem::recursive_directory_iterator(m_temp.Path()))
-        {
-            SetFileAttributesW(entry.path().c_str(), FILE_ATTRIBUTE_NORMAL);
-        }
-    }
-
-    std::filesystem::path Project() const { return m_temp.Path() / L"project"; }
-    std::filesystem::path Config() const { return m_temp.Path() / L"config"; }
-    std::filesystem::path File(const std::wstring& name) const { return Project() / name; }
-
-    void Write(const std::wstring& name, std::string_view text)
-    {
-        std::filesystem::create_directories(File(name).parent_path());
-        WriteBytes(File(name), text);
-    }
-
-    /// Runs the tool in the project folder with exactly these arguments.
-    OrvixTool::Result RunExactly(const Arguments& arguments)
-    {
-        return OrvixTool::Run(m_program, m_temp.Path(), Project(), arguments);
-    }
-
-    /// The same with a configuration folder of this test and a user, and with nobody to answer.
-    OrvixTool::Result RunAs(const std::wstring& user, Arguments arguments)
-    {
-        arguments.insert(arguments.begin(), {L"--config", Config().wstring(), L"--user", user, L"--unattended"});
-        return RunExactly(arguments);
-    }
-
-    OrvixTool::Result Run(Arguments arguments) { return RunAs(L"ada", std::move(arguments)); }
-
     /// From here on the tool is a copy whose dialogs are answered with these words of WrittenAnswerUI.cpp.
     void AnswerDialogs(const wchar_t* words)
     {
         const std::filesystem::path original(ORVIX_TOOL);
-        const std::filesystem::path folder = m_temp.Path() / L"bin";
+        const std::filesystem::path folder = Scratch() / L"bin";
         if (std::filesystem::create_directories(folder / L"plugins"))
         {
             for (const wchar_t* name : {L"orvix.exe", L"OrvixCore.dll", L"braeutil.dll", L"plugins\\archive.dll"})
@@ -79,7 +28,7 @@ protected:
             }
             std::filesystem::copy_file(ORVIX_TOOL_USER, folder / L"OrvixCoreUI.dll");
         }
-        m_program = folder / L"orvix.exe";
+        UseProgram(folder / L"orvix.exe");
         SetEnvironmentVariableW(L"ORVIX_TEST_ANSWER", words);
     }
 
@@ -117,11 +66,12 @@ protected:
     }
 
     std::string StoredPrompts() const { return ReadBytes(Config() / L"OrvixPrompts.xml"); }
-
-private:
-    TempFolder m_temp;
-    std::filesystem::path m_program = ORVIX_TOOL;
 };
+
+bool IsReadOnly(const std::filesystem::path& path)
+{
+    return (GetFileAttributesW(path.c_str()) & FILE_ATTRIBUTE_READONLY) != 0;
+}
 
 // IDs of the tool's prompts, as they stand in the prompt file.
 constexpr const char* CheckInPrompt = "1330796546";

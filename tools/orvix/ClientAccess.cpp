@@ -1,16 +1,12 @@
 #include "ClientAccess.h"
 
-#include "Text.h"
-
 #include <windows.h>
-
-#include <iostream>
 
 void ClientAccess::OutputText(const wchar_t* text, int)
 {
     if (text != nullptr)
     {
-        std::cout << PrintableLines(text) << '\n';
+        m_output.Say(text);
     }
 }
 

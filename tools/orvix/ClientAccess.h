@@ -1,14 +1,15 @@
 #pragma once
 
 #include "IOrvixClientAccess.h"
+#include "Output.h"
 
 /// The console as the library and its providers see it.
 class ClientAccess final : public IOrvixClientAccess
 {
 public:
-    explicit ClientAccess(bool unattended) : m_unattended(unattended) {}
+    /// `output` must outlive this object.
+    ClientAccess(bool unattended, Output& output) : m_unattended(unattended), m_output(output) {}
 
-    /// Prints the text on the standard output.
     void OutputText(const wchar_t* text, int kind) override;
     std::intptr_t RelayA(void*, void*, void*, void*) override { return 0; }
     std::uint32_t GetColor(std::int32_t index) override;
@@ -17,4 +18,5 @@ public:
 
 private:
     bool m_unattended;
+    Output& m_output;
 };

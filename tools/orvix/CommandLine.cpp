@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <iostream>
+#include <iterator>
 
 namespace
 {
@@ -66,22 +67,107 @@ struct Command
 {
     const char* name;
     const char* description;
+    const char* examples;
     bool takesComment;
     bool takesKeep;
 };
 
 constexpr Command Commands[] = {
-    {"status", "Show the state of files", false, false},
-    {"add", "Put files under control", true, true},
-    {"checkout", "Take files for editing", true, false},
-    {"checkin", "Store new versions of checked-out files", true, true},
-    {"undo", "Give checked-out files back unchanged", false, false},
-    {"get", "Bring the latest versions", false, false},
-    {"history", "Show the versions of files", false, false},
+    {"status", "Show the state of files",
+     "  orvix status .\n"
+     "  orvix status src\\a.txt --json",
+     false, false},
+    {"add", "Put files under control",
+     "  orvix add src -m \"first version\"\n"
+     "  orvix add new.txt --keep --unattended",
+     true, true},
+    {"checkout", "Take files for editing",
+     "  orvix checkout src\\a.txt -m \"to mend the title\"\n"
+     "  orvix checkout src --unattended --json",
+     true, false},
+    {"checkin", "Store new versions of checked-out files",
+     "  orvix checkin . -m \"title mended\"\n"
+     "  orvix checkin . --unattended -m nightly --veto *.key",
+     true, true},
+    {"undo", "Give checked-out files back unchanged", "  orvix undo src\\a.txt", false, false},
+    {"get", "Bring the latest versions", "  orvix get . --unattended", false, false},
+    {"history", "Show the versions of files",
+     "  orvix history src\\a.txt\n"
+     "  orvix history src --json",
+     false, false},
 };
 
-constexpr const char* Footer = "Exit codes: 0 success, 1 something failed or was refused, 2 bad usage,\n"
-                               "3 no such provider, project or folder.";
+/// Adds a command; its help ends with the examples.
+CLI::App* AddCommand(CLI::App& parent, const char* name, const char* description, const std::string& examples)
+{
+    CLI::App* command = parent.add_subcommand(name, description);
+    command->footer("Examples:\n" + examples + "\n\nOptions of every command, and exit codes: orvix --help");
+    return command;
+}
+
+void AddJson(CLI::App* command, CommandLine& result)
+{
+    command->add_flag("--json", result.json, "Print the result as JSON");
+}
+
+void AddPrompts(CLI::App& app, CommandLine& result, std::string& id, std::string& answer)
+{
+    CLI::App* prompts = AddCommand(app, "prompts", "Show and change the stored answers",
+                                   "  orvix prompts list\n"
+                                   "  orvix prompts set 1330796546 yes\n"
+                                   "  orvix prompts reset --all\n"
+                                   "  orvix prompts lock 1330796546");
+    prompts->require_subcommand(1);
+    const auto add = [&](const char* name, const char* description, const char* examples) {
+        CLI::App* command = AddCommand(*prompts, name, description, examples);
+        AddJson(command, result);
+        return command;
+    };
+    constexpr const char* IdHelp = "ID of the prompt; every row that has it is meant";
+
+    add("list", "List the prompts", "  orvix prompts list\n  orvix prompts list --json --config D:\\Config");
+    CLI::App* set = add("set", "Store an answer", "  orvix prompts set 1330796546 yes\n  orvix prompts set 7 ask");
+    set->add_option("ID", id, IdHelp)->required();
+    set->add_option("ANSWER", answer, "ask, yes, no, yes-to-all or no-to-all")->required();
+    CLI::App* reset = add("reset", "Have a prompt ask again", "  orvix prompts reset 7\n  orvix prompts reset --all");
+    CLI::Option_group* which = reset->add_option_group("Which");
+    which->add_option("ID", id, IdHelp);
+    which->add_flag("--all", result.all, "Every prompt that is not locked");
+    which->require_option(1);
+    add("lock", "Lock the answer of a prompt", "  orvix prompts lock 7")->add_option("ID", id, IdHelp)->required();
+    add("unlock", "Unlock it", "  orvix prompts unlock 7")->add_option("ID", id, IdHelp)->required();
+}
+
+constexpr struct
+{
+    const char* text;
+    std::uint32_t bits;
+} SourceLists[] = {
+    {"plugins", Source::Plugins},
+    {"mssccci", Source::InstalledMSSCCI},
+    {"plugins,mssccci", Source::Plugins | Source::InstalledMSSCCI},
+    {"mssccci,plugins", Source::Plugins | Source::InstalledMSSCCI},
+};
+
+std::uint32_t Sources(const std::string& text)
+{
+    const auto* found = std::find_if(std::begin(SourceLists), std::end(SourceLists),
+                                     [&](const auto& list) { return text == list.text; });
+    if (found == std::end(SourceLists))
+    {
+        throw ToolError(ExitCode::BadUsage, L"--sources takes plugins, mssccci or both with a comma between, not " +
+                                                (text.empty() ? L"an empty text" : Unmarked(text)));
+    }
+    return found->bits;
+}
+
+constexpr const char* Footer = "Examples:\n"
+                               "  orvix providers\n"
+                               "  orvix checkin . -m \"title mended\"\n"
+                               "  orvix checkin --help\n"
+                               "\n"
+                               "Exit codes: 0 success, 1 something failed, was refused or is wrong, 2 bad usage,\n"
+                               "3 no such provider, project, folder, library or prompt.";
 
 std::string Version()
 {
@@ -92,7 +178,7 @@ std::string Version()
 
 std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
 {
-    std::string plugins, config, provider, project, user, comment;
+    std::string sources = "plugins", plugins, config, provider, project, user, comment, name, prompt, answer;
     std::vector<std::string> paths, vetoes;
     CommandLine result;
 
@@ -102,6 +188,8 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
     app.allow_windows_style_options(false); // a path may start with a slash
     app.require_subcommand(1);
     app.fallthrough();
+    app.add_option("--sources", sources,
+                   "Where providers come from: plugins, mssccci or both (default: plugins; doctor: both)");
     app.add_option("--plugins", plugins, "Folder of provider plug-ins (default: plugins beside the program)");
     app.add_option("--config", config, "Configuration folder (default: %APPDATA%\\OrvixCore)");
     app.add_option("--provider", provider, "Provider by name or index (default: the first)");
@@ -112,13 +200,22 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
         ->take_all()
         ->allow_extra_args(false);
     app.add_flag("--unattended", result.unattended, "Answer yes instead of showing a dialog");
-    app.add_flag("--verbose", result.verbose, "Print notifications");
+    app.add_flag("--no-color", result.noColor, "No colours on a terminal; the same as the variable NO_COLOR");
+    app.add_flag("--verbose", result.verbose, "Print notifications; doctor: name each library before it is loaded");
 
-    app.add_subcommand("providers", "List the providers");
+    AddJson(AddCommand(app, "providers", "List the providers",
+                       "  orvix providers\n"
+                       "  orvix providers --sources plugins,mssccci --json"),
+            result);
+    AddJson(AddCommand(app, "doctor", "Say of every possible provider whether it is listed and why, and what is wrong",
+                       "  orvix doctor\n"
+                       "  orvix doctor --sources mssccci --json"),
+            result);
     for (const Command& command : Commands)
     {
-        CLI::App* subcommand = app.add_subcommand(command.name, command.description);
+        CLI::App* subcommand = AddCommand(app, command.name, command.description, command.examples);
         subcommand->add_option("PATH", paths, "Files, and folders with everything in them")->required();
+        AddJson(subcommand, result);
         if (command.takesComment)
         {
             subcommand->add_option("-m", comment, "Comment");
@@ -128,6 +225,40 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
             subcommand->add_flag("--keep", result.keep, "Keep the files checked out");
         }
     }
+    CLI::App* filters = AddCommand(app, "filters", "Show which files the filters of providers exclude, and why",
+                                   "  orvix filters src\n"
+                                   "  orvix filters a.tmp --provider Archive --json");
+    filters->add_option("PATH", paths, "Files, and folders with everything in them")->required();
+    AddJson(filters, result);
+    AddPrompts(app, result, prompt, answer);
+
+    AddCommand(app, "open", "Open the project and close it again", "  orvix open --project D:\\Projects\\Song");
+    AddCommand(app, "options", "Show the provider's own options", "  orvix options --provider Archive");
+    AddCommand(app, "client", "Start the provider's own program", "  orvix client --sources mssccci");
+    AddCommand(app, "properties", "Show the properties of a file", "  orvix properties src\\a.txt")
+        ->add_option("PATH", paths, "The file")
+        ->required()
+        ->expected(1)
+        ->allow_extra_args(false);
+    CLI::App* registering = AddCommand(app, "register", "Register an MSSCCI library on this machine",
+                                       "  orvix register archive_mssccci.dll \"Archive MSSCCI\"");
+    registering->add_option("PATH", paths, "The library, a 64-bit DLL")
+        ->required()
+        ->expected(1)
+        ->allow_extra_args(false);
+    registering->add_option("NAME", name, "Its name as a provider")->required();
+    AddCommand(app, "unregister", "Undo register", "  orvix unregister \"Archive MSSCCI\"")
+        ->add_option("NAME", name, "Its name as a provider")
+        ->required();
+    CLI::App* validating = AddCommand(app, "validate", "Check a provider plug-in or an MSSCCI library",
+                                      "  orvix validate plugins\\depot.dll\n"
+                                      "  orvix validate depot_mssccci.dll --mssccci --json");
+    validating->add_option("PATH", paths, "The plug-in or library")->required()->expected(1)->allow_extra_args(false);
+    validating->add_flag("--mssccci", result.mssccci, "It is an MSSCCI library");
+    validating->add_flag("--dialogs", result.dialogs, "Check also what may show windows");
+    validating->add_option("--timeout", result.timeout, "Seconds that a rule may take (default: 30)")
+        ->check(CLI::Range(1, 3600));
+    AddJson(validating, result);
 
     try
     {
@@ -145,8 +276,15 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
         throw ToolError(ExitCode::BadUsage, message + L" (see --help)");
     }
 
-    result.command = Wide(app.get_subcommands().front()->get_name());
+    const CLI::App* command = app.get_subcommands().front();
+    result.command = Wide(command->get_name());
+    result.action = command->get_subcommands().empty() ? L"" : Wide(command->get_subcommands().front()->get_name());
+    result.prompt = Unmarked(prompt);
+    result.answer = Unmarked(answer);
     result.paths = Unmarked(paths);
+    result.name = Unmarked(name);
+    const bool looksEverywhere = result.command == L"doctor" && app.count("--sources") == 0;
+    result.sources = looksEverywhere ? Source::Plugins | Source::InstalledMSSCCI : Sources(sources);
     result.plugins = Unmarked(plugins);
     result.config = Unmarked(config);
     result.provider = Unmarked(provider);

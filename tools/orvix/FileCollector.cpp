@@ -1,15 +1,19 @@
 #include "FileCollector.h"
 
 #include "FilePath.h"
+#include "Text.h"
 
 #include <windows.h>
 
 #include <algorithm>
 #include <cwchar>
+#include <iostream>
 #include <memory>
 
 namespace
 {
+constexpr std::size_t FilesBetweenProgress = 256;
+
 constexpr DWORD UnwantedFolder = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM | FILE_ATTRIBUTE_REPARSE_POINT;
 
 /// The archive of a project, the file that links to it, or what an interrupted provider left: no part of the project.
@@ -38,11 +42,30 @@ void FileCollector::Add(const std::wstring& named)
     }
 }
 
+Listing::Count FileCollector::SkippedFolders() const
+{
+    return {"hiddenFolders", m_skippedFolders == 1 ? "hidden folder skipped" : "hidden folders skipped",
+            m_skippedFolders};
+}
+
+bool FileCollector::ReportUnreadableFolders() const
+{
+    for (const std::wstring& folder : m_unreadableFolders)
+    {
+        std::cerr << "orvix: cannot read the folder " << Printable(folder) << '\n';
+    }
+    return !m_unreadableFolders.empty();
+}
+
 void FileCollector::AddFile(std::wstring path, bool named)
 {
     if (m_seen.insert(PathKey(path)).second)
     {
         m_files.push_back({std::move(path), named});
+        if (m_files.size() % FilesBetweenProgress == 0)
+        {
+            m_output.Progress(L"looking for files: " + std::to_wstring(m_files.size()));
+        }
     }
 }
 

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "Output.h"
+
 #include <string>
 #include <unordered_set>
 #include <vector>
@@ -18,19 +20,25 @@ public:
         bool named; ///< named by the user, not found in a folder
     };
 
+    /// `output` is told about the progress and must outlive this object.
+    explicit FileCollector(Output& output) : m_output(output) {}
+
     /// Takes what the user named, which need not exist. Throws `ToolError` when the text is no path.
     void Add(const std::wstring& named);
 
     const std::vector<File>& Files() const { return m_files; }
-    unsigned int NumSkippedFolders() const { return m_skippedFolders; }
 
-    /// Folders that could not be read.
-    const std::vector<std::wstring>& UnreadableFolders() const { return m_unreadableFolders; }
+    /// How many folders were skipped.
+    Listing::Count SkippedFolders() const;
+
+    /// Says on the error output which folders could not be read; false when there is none.
+    bool ReportUnreadableFolders() const;
 
 private:
     void AddFile(std::wstring path, bool named);
     void AddFolder(const std::wstring& folder);
 
+    Output& m_output;
     std::vector<File> m_files;
     unsigned int m_skippedFolders = 0;
     std::vector<std::wstring> m_unreadableFolders;

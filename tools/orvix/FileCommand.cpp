@@ -9,16 +9,28 @@
 
 #include <iostream>
 #include <new>
+#include <numeric>
 
 namespace
 {
-constexpr const char* OutcomeNames[] = {"done", "not ticked", "refused", "cancelled", "failed"};
+constexpr struct
+{
+    const char* key;
+    const char* words;
+    Listing::Tone tone;
+} OutcomeNames[] = {
+    {"done", "done", Listing::Tone::Good},      {"notTicked", "not ticked", Listing::Tone::Quiet},
+    {"refused", "refused", Listing::Tone::Bad}, {"cancelled", "cancelled", Listing::Tone::Bad},
+    {"failed", "failed", Listing::Tone::Bad},
+};
 
 // Bits of an entry's FlagsIn.
 constexpr unsigned long TakenByOperation = 0x1; // set by the library
 constexpr unsigned long Selected = 0x2;
 
 constexpr std::uint32_t NotifyListeners = 0x1;
+
+constexpr std::uint32_t OffersToAll = 0x2 | 0x4; // bits of a prompt's options: its answers are those two
 
 namespace DialogOption
 {
@@ -36,10 +48,14 @@ constexpr std::uint32_t Keep = 0x8;
 constexpr std::uint32_t DoNotKeep = 0x10;
 } // namespace PromptAction
 
-FileTable::Row Heading(const CommandLine& commandLine)
+Listing EmptyListing(const CommandLine& commandLine)
 {
-    return commandLine.command == L"status" ? FileTable::Row{"State", "File"}
-                                            : FileTable::Row{"Result", "State", "File"};
+    Listing listing{.key = "files", .columns = {{"state", "State"}, {"file", "File"}}, .rows = {}, .summary = {}};
+    if (commandLine.command != L"status")
+    {
+        listing.columns.insert(listing.columns.begin(), {"result", "Result"});
+    }
+    return listing;
 }
 
 /// Makes the prompts known; what the user stored before stays.
@@ -51,13 +67,15 @@ void RegisterPrompts(IOrvixServices& services, const OperationRule& rule)
     if (rule.CanKeep())
     {
         services.RegisterPrompt(rule.keepPrompt, (title + L": keep the files checked out").c_str(),
-                                PromptAction::DoNotKeep, 0, false);
+                                PromptAction::DoNotKeep, OffersToAll, false);
     }
 }
 } // namespace
 
-FileCommand::FileCommand(ProjectSession& project, OrvixClientInfo& client, const CommandLine& commandLine)
-    : m_project(project), m_client(client), m_commandLine(commandLine), m_table(Heading(commandLine))
+FileCommand::FileCommand(ProjectSession& project, OrvixClientInfo& client, const CommandLine& commandLine,
+                         Output& output)
+    : m_project(project), m_client(client), m_commandLine(commandLine), m_output(output), m_collector(output),
+      m_listing(EmptyListing(commandLine))
 {
     for (const std::wstring& path : commandLine.paths)
     {
@@ -77,7 +95,7 @@ FileCommand::FileCommand(ProjectSession& project, OrvixClientInfo& client, const
         }
         else if (files[i].named)
         {
-            Report(Refused, "excluded by filter " + Printable(filter), path);
+            Report(Refused, L"excluded by filter " + filter, path);
         }
         else
         {
@@ -103,11 +121,11 @@ ExitCode FileCommand::Run()
             ShowStatus();
         }
     }
-    m_table.Print(std::cout);
-    PrintSummary();
+    m_listing.summary = Summary();
+    m_output.Show(m_listing);
 
     const unsigned int bad = m_counts[Refused] + m_counts[Cancelled] + m_counts[Failed];
-    return bad == 0 && m_collector.UnreadableFolders().empty() ? ExitCode::Success : ExitCode::Failed;
+    return m_collector.ReportUnreadableFolders() || bad > 0 ? ExitCode::Failed : ExitCode::Success;
 }
 
 void FileCommand::ShowStatus()
@@ -152,7 +170,7 @@ void FileCommand::Change(const OperationRule& rule)
     std::optional<NotificationPrinter> printer;
     if (m_commandLine.verbose)
     {
-        printer.emplace();
+        printer.emplace(m_output);
     }
     VetoRule veto(m_commandLine.vetoes, m_project.Folder());
 
@@ -182,10 +200,12 @@ void FileCommand::Change(const OperationRule& rule)
     }
 
     m_list.BuildActiveList(Selected, false);
+    m_output.Progress(std::wstring(rule.title) + L", files: " + std::to_wstring(m_list.NumActiveEntries()));
     const bool ran = services.RunFileListOperation(m_client.GetParentWindow(), &params, true, &m_project.Provider(),
                                                    NotifyListeners | rule.operation, rule.allowedBy) == 1;
     if (!veto.Reason().empty())
     {
+        m_output.Progress({});
         std::cerr << "orvix: vetoed: " << Printable(veto.Reason()) << '\n';
     }
 
@@ -240,6 +260,7 @@ std::vector<std::optional<FileCommand::Outcome>> FileCommand::OutcomesOfRun(cons
 void FileCommand::QueryStatus()
 {
     m_list.BuildActiveList(Selected, false);
+    m_output.Progress(L"asking for the state, files: " + std::to_wstring(m_list.NumActiveEntries()));
     if (m_project.Provider().QueryStatus(&m_list, 0) != 0)
     {
         throw ToolError(ExitCode::Failed, L"the provider does not tell the state of the files");
@@ -253,42 +274,35 @@ bool FileCommand::IsNamed(OrvixFileEntry& entry) const
 
 void FileCommand::Report(Outcome outcome, OrvixFileEntry& entry)
 {
-    Report(outcome, FileState::InWords(entry.GetFlagsOut(), PathExists(entry.GetFile())), entry.GetFile());
+    Report(outcome, Wide(FileState::InWords(entry.GetFlagsOut(), PathExists(entry.GetFile()))), entry.GetFile());
 }
 
-void FileCommand::Report(Outcome outcome, const std::string& state, const std::wstring& path)
+void FileCommand::Report(Outcome outcome, const std::wstring& state, const std::wstring& path)
 {
     ++m_counts[outcome];
-    FileTable::Row row{OutcomeNames[outcome], state, Printable(PathBelow(m_project.Folder(), path))};
-    if (m_commandLine.command == L"status")
+    const Listing::Tone tone = OutcomeNames[outcome].tone;
+    std::vector<Listing::Cell>& row = m_listing.rows.emplace_back();
+    if (m_commandLine.command != L"status")
     {
-        row.erase(row.begin());
+        row.push_back({Wide(OutcomeNames[outcome].words), tone});
     }
-    m_table.Add(std::move(row));
+    row.push_back({state, outcome == Refused ? tone : Listing::Tone::Plain});
+    row.push_back({PathBelow(m_project.Folder(), path)});
 }
 
-void FileCommand::PrintSummary() const
+std::vector<Listing::Count> FileCommand::Summary() const
 {
-    for (const std::wstring& folder : m_collector.UnreadableFolders())
-    {
-        std::cerr << "orvix: cannot read the folder " << Printable(folder) << '\n';
-    }
-    unsigned int total = 0;
-    std::string parts;
-    const auto add = [&parts](unsigned int count, const char* what) {
-        parts += count == 0 ? "" : ", " + std::to_string(count) + " " + what;
-    };
+    const unsigned int total = std::accumulate(m_counts.begin(), m_counts.end(), 0U);
+    std::vector<Listing::Count> counts = {{"files", total == 1 ? "file" : "files", total}};
     for (std::size_t outcome = 0; outcome < NumOutcomes; ++outcome)
     {
-        total += m_counts[outcome];
         if (m_commandLine.command != L"status" || outcome != Done)
         {
-            add(m_counts[outcome], OutcomeNames[outcome]);
+            counts.push_back({OutcomeNames[outcome].key, OutcomeNames[outcome].words, m_counts[outcome]});
         }
     }
-    add(m_otherState, "left out for their state");
-    add(m_excluded, "left out by filters");
-    add(m_collector.NumSkippedFolders(),
-        m_collector.NumSkippedFolders() == 1 ? "hidden folder skipped" : "hidden folders skipped");
-    std::cout << total << (total == 1 ? " file" : " files") << parts << '\n';
+    counts.push_back({"leftOutForState", "left out for their state", m_otherState});
+    counts.push_back({"leftOutByFilters", "left out by filters", m_excluded});
+    counts.push_back(m_collector.SkippedFolders());
+    return counts;
 }

@@ -1,10 +1,10 @@
 #pragma once
 
 #include "FileCollector.h"
-#include "FileTable.h"
 #include "OperationRule.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
+#include "Output.h"
 #include "ProjectSession.h"
 #include "ToolError.h"
 
@@ -17,9 +17,9 @@ class FileCommand
 public:
     /// Collects the files and leaves out those that the provider's filters exclude. The arguments must outlive
     /// this object.
-    FileCommand(ProjectSession& project, OrvixClientInfo& client, const CommandLine& commandLine);
+    FileCommand(ProjectSession& project, OrvixClientInfo& client, const CommandLine& commandLine, Output& output);
 
-    /// Carries the command out and prints the result. `ExitCode::Failed` when a folder could not be read, or
+    /// Carries the command out and shows the result. `ExitCode::Failed` when a folder could not be read, or
     /// a file was refused, cancelled or did not reach the expected state.
     ExitCode Run();
 
@@ -47,15 +47,16 @@ private:
 
     bool IsNamed(OrvixFileEntry& entry) const;
     void Report(Outcome outcome, OrvixFileEntry& entry);
-    void Report(Outcome outcome, const std::string& state, const std::wstring& path);
-    void PrintSummary() const;
+    void Report(Outcome outcome, const std::wstring& state, const std::wstring& path);
+    std::vector<Listing::Count> Summary() const;
 
     ProjectSession& m_project;
     OrvixClientInfo& m_client;
     const CommandLine& m_commandLine;
+    Output& m_output;
     FileCollector m_collector;
     OrvixFileList m_list;
-    FileTable m_table;
+    Listing m_listing;
     std::array<unsigned int, NumOutcomes> m_counts{};
     unsigned int m_excluded = 0;
     unsigned int m_otherState = 0;

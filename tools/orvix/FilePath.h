@@ -1,5 +1,7 @@
 #pragma once
 
+#include <windows.h>
+
 #include <string>
 
 /// The absolute path of what the user typed, without a separator at its end (but for a root).
@@ -13,6 +15,9 @@ std::wstring PathKey(const std::wstring& path);
 
 /// Whether a file or folder is there.
 bool PathExists(const std::wstring& path);
+
+/// The full path of a loaded module; of this program for null.
+std::wstring ModulePath(HMODULE module);
 
 /// Whether a folder is there.
 bool IsFolder(const std::wstring& path);

@@ -15,6 +15,7 @@ constexpr unsigned long Modified = 0x80;
 constexpr unsigned long AllowsCheckIn = 0x10000;
 constexpr unsigned long AllowsCheckOut = 0x20000;
 constexpr unsigned long AllowsUndo = 0x40000;
+constexpr unsigned long AllowsCompare = 0x80000;
 constexpr unsigned long AllowsAdd = 0x100000;
 constexpr unsigned long AllowsGet = 0x200000;
 constexpr unsigned long AllowsHistory = 0x400000;

@@ -13,18 +13,9 @@
 
 namespace
 {
-constexpr std::uint32_t PluginSource = 0x1;
-
 std::wstring DefaultPlugins()
 {
-    std::wstring program(MAX_PATH, L'\0');
-    DWORD length = 0;
-    while ((length = GetModuleFileNameW(nullptr, program.data(), static_cast<DWORD>(program.size()))) == program.size())
-    {
-        program.resize(2 * program.size());
-    }
-    program.resize(length);
-    return (std::filesystem::path(program).parent_path() / L"plugins").wstring();
+    return (std::filesystem::path(ModulePath(nullptr)).parent_path() / L"plugins").wstring();
 }
 
 std::wstring DefaultConfig()
@@ -46,14 +37,24 @@ std::wstring WindowsUser()
 }
 } // namespace
 
-HostSession::HostSession(const CommandLine& commandLine) : m_access(commandLine.unattended)
+HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_access(commandLine.unattended, output)
 {
-    m_plugins = FullPath(commandLine.plugins.empty() ? DefaultPlugins() : commandLine.plugins);
-    if (!IsFolder(m_plugins))
+    if ((commandLine.sources & Source::Plugins) != 0)
     {
-        throw ToolError(ExitCode::NoProject, L"no such plug-in folder: " + m_plugins);
+        const std::wstring plugins = PluginFolder(commandLine);
+        if (!IsFolder(plugins))
+        {
+            throw ToolError(ExitCode::NoProject, L"no such plug-in folder: " + plugins);
+        }
+        m_client.SetProviderPluginPath((plugins + L'\\').c_str());
+        m_searched = plugins;
     }
-    const std::wstring config = FullPath(commandLine.config.empty() ? DefaultConfig() : commandLine.config);
+    if ((commandLine.sources & Source::InstalledMSSCCI) != 0)
+    {
+        m_searched += m_searched.empty() ? L"" : L" or ";
+        m_searched += L"the registry's list of MSSCCI libraries";
+    }
+    const std::wstring config = ConfigFolder(commandLine);
     std::error_code error;
     std::filesystem::create_directories(config, error);
     if (!IsFolder(config))
@@ -63,7 +64,6 @@ HostSession::HostSession(const CommandLine& commandLine) : m_access(commandLine.
 
     m_client.SetClientName(L"orvix");
     m_client.SetUserName((commandLine.user.empty() ? WindowsUser() : commandLine.user).c_str());
-    m_client.SetProviderPluginPath((m_plugins + L'\\').c_str());
     m_client.SetConfigFilePath(config.c_str());
     m_client.SetParentWindow(GetConsoleWindow());
     m_client.SetIOrvixClientAccess(&m_access);
@@ -73,7 +73,17 @@ HostSession::HostSession(const CommandLine& commandLine) : m_access(commandLine.
     {
         throw std::bad_alloc();
     }
-    m_services->Initialize(&m_client, PluginSource);
+    m_services->Initialize(&m_client, commandLine.sources);
+}
+
+std::wstring HostSession::PluginFolder(const CommandLine& commandLine)
+{
+    return FullPath(commandLine.plugins.empty() ? DefaultPlugins() : commandLine.plugins);
+}
+
+std::wstring HostSession::ConfigFolder(const CommandLine& commandLine)
+{
+    return FullPath(commandLine.config.empty() ? DefaultConfig() : commandLine.config);
 }
 
 std::uint32_t HostSession::FindProvider(const std::wstring& nameOrIndex)
@@ -81,7 +91,7 @@ std::uint32_t HostSession::FindProvider(const std::wstring& nameOrIndex)
     const std::uint32_t count = m_services->GetProviderCount();
     if (count == 0)
     {
-        throw ToolError(ExitCode::NoProject, L"no provider in " + m_plugins);
+        throw ToolError(ExitCode::NoProject, L"no provider in " + m_searched);
     }
     for (std::uint32_t index = 0; index < count; ++index)
     {

@@ -14,8 +14,14 @@ class HostSession
 {
 public:
     /// Makes the configuration folder when it is missing. Throws `ToolError` with `ExitCode::NoProject` when
-    /// that fails or the plug-in folder does not exist.
-    explicit HostSession(const CommandLine& commandLine);
+    /// that fails or the plug-in folder, if wanted, does not exist. The providers' text goes to `output`, which must
+    /// outlive this object.
+    HostSession(const CommandLine& commandLine, Output& output);
+
+    /// The full path of the folder that a run with this command line uses, whether it exists or not. Throws `ToolError`
+    /// with `ExitCode::NoProject` when none is named and there is no default.
+    static std::wstring PluginFolder(const CommandLine& commandLine);
+    static std::wstring ConfigFolder(const CommandLine& commandLine);
 
     IOrvixServices& Services() { return *m_services; }
     OrvixClientInfo& Client() { return m_client; }
@@ -32,6 +38,6 @@ private:
 
     ClientAccess m_access;
     OrvixClientInfo m_client;
-    std::wstring m_plugins;
+    std::wstring m_searched; // where providers were looked for, in words
     std::unique_ptr<IOrvixServices, Release> m_services;
 };

@@ -3,7 +3,7 @@
 #include "OrvixFileList.h"
 #include "OrvixNotifyParams.h"
 
-#include <iostream>
+#include <sstream>
 
 namespace
 {
@@ -41,11 +41,13 @@ const char* NotificationName(std::uint32_t id)
 
 std::uint32_t NotificationPrinter::Notify(OrvixNotifyParams* params, std::int64_t)
 {
-    std::cout << "notification " << params->GetID() << " (" << NotificationName(params->GetID()) << ')';
+    std::wostringstream line;
+    line << L"notification " << params->GetID() << L" (" << NotificationName(params->GetID()) << L')';
     if (OrvixFileList* list = params->GetOrvixFileList())
     {
-        std::cout << ", files: " << list->NumActiveEntries();
+        line << L", files: " << list->NumActiveEntries();
     }
-    std::cout << (params->IsCancelled() ? ", cancelled" : "") << '\n';
+    line << (params->IsCancelled() ? L", cancelled" : L"");
+    m_output.Say(line.str());
     return 0;
 }

@@ -1,10 +1,17 @@
 #pragma once
 
 #include "Listener.h"
+#include "Output.h"
 
 /// Prints every notification.
 class NotificationPrinter final : public Listener
 {
 public:
+    /// `output` must outlive this object.
+    explicit NotificationPrinter(Output& output) : m_output(output) {}
+
     std::uint32_t Notify(OrvixNotifyParams* params, std::int64_t userData) override;
+
+private:
+    Output& m_output;
 };

@@ -20,19 +20,19 @@ ProjectSession::ProjectSession(HostSession& host, const CommandLine& commandLine
       m_provider(m_services.GetProvider(m_index)),
       m_folder(ProjectFolder(commandLine.project, m_services.GetProviderFixedProjectRoot(m_index)))
 {
-    const std::wstring name = m_services.GetProviderName(m_index);
     if (!IsFolder(m_folder))
     {
         throw ToolError(ExitCode::NoProject, L"no such project folder: " + m_folder);
     }
     if (m_provider == nullptr || m_provider->Initialize(&host.Client()) != 0)
     {
-        throw ToolError(ExitCode::NoProject, L"the provider does not start: " + name);
+        throw ToolError(ExitCode::NoProject, L"the provider does not start: " + ProviderName());
     }
     if (m_provider->OpenProject(m_folder.c_str(), L"") != 0)
     {
         m_provider->Uninitialize();
-        throw ToolError(ExitCode::NoProject, L"the provider " + name + L" cannot open the project " + m_folder);
+        throw ToolError(ExitCode::NoProject,
+                        L"the provider " + ProviderName() + L" cannot open the project " + m_folder);
     }
 }
 

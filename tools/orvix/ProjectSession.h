@@ -19,6 +19,7 @@ public:
     IOrvixServices& Services() { return m_services; }
     IOrvixProvider& Provider() { return *m_provider; }
     std::uint32_t ProviderIndex() const { return m_index; }
+    std::wstring ProviderName() { return m_services.GetProviderName(m_index); }
     const std::wstring& Folder() const { return m_folder; }
 
 private:

@@ -3,6 +3,8 @@
 #include <windows.h>
 
 #include <algorithm>
+#include <array>
+#include <cstdio>
 
 namespace
 {
@@ -45,4 +47,11 @@ std::string Printable(std::wstring_view text)
 std::string PrintableLines(std::wstring_view text)
 {
     return WithoutControls(text, L"\t\r\n");
+}
+
+std::string Hexadecimal(unsigned long number)
+{
+    std::array<char, 11> text{};
+    std::snprintf(text.data(), text.size(), "0x%08lX", number);
+    return text.data();
 }

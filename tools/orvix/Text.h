@@ -14,3 +14,6 @@ std::string Printable(std::wstring_view text);
 
 /// As above, with tabs and line ends kept.
 std::string PrintableLines(std::wstring_view text);
+
+/// A number as people read bits and codes: 0x and eight digits.
+std::string Hexadecimal(unsigned long number);

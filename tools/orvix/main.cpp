@@ -1,21 +1,71 @@
 #include "ConsoleCodePage.h"
+#include "Doctor.h"
 #include "FileCommand.h"
+#include "FilePath.h"
+#include "FilterCommand.h"
+#include "JsonOutput.h"
+#include "PromptCommand.h"
+#include "ProviderCommand.h"
+#include "Registration.h"
+#include "Terminal.h"
+#include "TextOutput.h"
+#include "ValidateCommand.h"
+#include "ValidationProcess.h"
 
 #include <comdef.h>
 
 #include <iostream>
+#include <memory>
 
 namespace
 {
-void ListProviders(HostSession& host)
+std::unique_ptr<Output> MakeOutput(const CommandLine& commandLine, const Terminal& terminal)
+{
+    if (commandLine.json)
+    {
+        return std::make_unique<JsonOutput>(std::cout);
+    }
+    return std::make_unique<TextOutput>(std::cout, terminal.Style(commandLine.noColor));
+}
+
+void ListProviders(HostSession& host, Output& output)
 {
     host.FindProvider(L""); // fails when there is none
-    FileTable table({"Index", "Provider"});
+    Listing listing{
+        .key = "providers", .columns = {{"index", "Index"}, {"name", "Provider"}}, .rows = {}, .summary = {}};
     for (std::uint32_t index = 0; const wchar_t* name = host.Services().GetProviderName(index); ++index)
     {
-        table.Add({std::to_string(index), Printable(name)});
+        listing.rows.push_back({{std::int64_t{index}}, {std::wstring(name)}});
     }
-    table.Print(std::cout);
+    output.Show(listing);
+}
+
+void Register(const std::wstring& name, const std::wstring& path)
+{
+    const std::wstring library = FullPath(path);
+    const std::optional<std::wstring> previous = Registration(name).Set(library);
+    std::cout << (previous ? "replaced " : "registered ") << Printable(name) << ": " << Printable(library);
+    std::cout << (previous ? " instead of " + Printable(*previous) : "") << '\n';
+}
+
+void Unregister(const std::wstring& name)
+{
+    Registration(name).Remove();
+    std::cout << "unregistered " << Printable(name) << '\n';
+}
+
+ExitCode Diagnose(const CommandLine& commandLine)
+{
+    const DoctorReport report = Doctor(commandLine).Examine();
+    if (commandLine.json)
+    {
+        report.PrintJson(std::cout);
+    }
+    else
+    {
+        report.PrintText(std::cout);
+    }
+    return report.NumProblems() == 0 ? ExitCode::Success : ExitCode::Failed;
 }
 
 ExitCode Run(int count, wchar_t** arguments)
@@ -25,19 +75,57 @@ ExitCode Run(int count, wchar_t** arguments)
     {
         return ExitCode::Success;
     }
-    HostSession host(*commandLine);
-    if (commandLine->command == L"providers")
+    if (commandLine->command == L"register")
     {
-        ListProviders(host);
+        Register(commandLine->name, commandLine->paths.front());
         return ExitCode::Success;
     }
+    if (commandLine->command == L"unregister")
+    {
+        Unregister(commandLine->name);
+        return ExitCode::Success;
+    }
+    if (commandLine->command == L"validate")
+    {
+        return ValidateCommand(*commandLine).Run();
+    }
+    if (commandLine->command == L"doctor")
+    {
+        return Diagnose(*commandLine);
+    }
+    const Terminal terminal;
+    const std::unique_ptr<Output> output = MakeOutput(*commandLine, terminal);
+    if (commandLine->command == L"prompts")
+    {
+        PromptCommand(*commandLine, *output).Run();
+        return ExitCode::Success;
+    }
+    HostSession host(*commandLine, *output);
+    if (commandLine->command == L"providers")
+    {
+        ListProviders(host, *output);
+        return ExitCode::Success;
+    }
+    if (commandLine->command == L"filters")
+    {
+        return FilterCommand(host, *commandLine, *output).Run();
+    }
     ProjectSession project(host, *commandLine);
-    return FileCommand(project, host.Client(), *commandLine).Run();
+    if (ProviderCommand::IsOne(commandLine->command))
+    {
+        ProviderCommand(project, *commandLine).Run();
+        return ExitCode::Success;
+    }
+    return FileCommand(project, host.Client(), *commandLine, *output).Run();
 }
 } // namespace
 
 int wmain(int count, wchar_t** arguments)
 {
+    if (const std::optional<int> validated = ValidationProcess::RunAsChild(count, arguments))
+    {
+        return *validated;
+    }
     const ConsoleCodePage codePage;
     ExitCode code = ExitCode::Failed;
     try

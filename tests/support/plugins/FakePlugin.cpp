@@ -1,6 +1,7 @@
 // A provider plug-in for tests, built once per defect: the build sets FAKE_TAG (its word in the journal),
 // FAKE_NAME, FAKE_VERSION and what is to go wrong; the export list leaves functions out.
 
+#include "../ActiveManifest.h"
 #include "FakeJournal.h"
 #include "FakeProvider.h"
 
@@ -9,6 +10,8 @@
 #include <comdef.h>
 
 #include <cstdint>
+#include <filesystem>
+#include <fstream>
 #include <new>
 
 #ifndef FAKE_VERSION
@@ -28,16 +31,13 @@ void Note(const wchar_t* what)
     FakeJournal::Add(std::wstring(FAKE_TAG L".") + what);
 }
 
-/// The file of the manifest that is active on this thread; empty when none is.
-std::wstring ActiveManifest()
+/// Leaves a text for a test in another process, in the file that ORVIX_FAKE_MANIFEST_FILE names, if any.
+void Leave(const std::wstring& text)
 {
-    alignas(ACTIVATION_CONTEXT_DETAILED_INFORMATION) std::byte buffer[4096];
-    SIZE_T written = 0;
-    if (!QueryActCtxW(QUERY_ACTCTX_FLAG_USE_ACTIVE_ACTCTX, nullptr, nullptr, ActivationContextDetailedInformation,
-                      buffer, sizeof buffer, &written))
-        return {};
-    const auto* context = reinterpret_cast<const ACTIVATION_CONTEXT_DETAILED_INFORMATION*>(buffer);
-    return context->lpRootManifestPath ? context->lpRootManifestPath : L"";
+    std::wstring file(1024, L'\0');
+    file.resize(GetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST_FILE", file.data(), static_cast<DWORD>(file.size())));
+    if (!file.empty())
+        std::wofstream(std::filesystem::path(file)) << text;
 }
 
 } // namespace
@@ -86,6 +86,7 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
     {
         Note(L"load");
         SetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST", ActiveManifest().c_str());
+        Leave(ActiveManifest());
 #ifdef FAKE_START_FAILS
         return FALSE;
 #endif

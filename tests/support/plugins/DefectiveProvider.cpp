@@ -1,0 +1,232 @@
+// A provider plug-in that keeps every rule of the contract but the one that `Defect` names. It remembers the state of
+// files for as long as it is loaded, and touches none.
+
+#include "Defect.h"
+#include "FakeProvider.h"
+#include "OrvixFileEntry.h"
+#include "OrvixFileList.h"
+#include "OrvixVersion.h"
+
+#include <cstdint>
+#include <map>
+#include <stdexcept>
+#include <string>
+
+namespace
+{
+
+constexpr int Success = 0;
+constexpr int Failure = -1;
+constexpr int NotOffered = -2;
+
+class DefectiveProvider final : public FakeProvider
+{
+public:
+    DefectiveProvider() : FakeProvider(L"Defective") {}
+
+    bool IsInitialized() override { return m_initialized; }
+    bool IsProjectOpen() override { return m_open || (m_wasOpen && Defect::Is(L"state")); }
+
+    int Initialize(OrvixClientInfo*) override
+    {
+        ++m_starts;
+        if (Defect::Is(L"handles"))
+            CreateEventW(nullptr, FALSE, FALSE, nullptr);
+        if (Defect::Is(L"starts") || (Defect::Is(L"sessions") && m_starts == 4))
+            return Failure;
+        m_initialized = true;
+        return Success;
+    }
+
+    int Uninitialize() override
+    {
+        m_initialized = false;
+        m_open = false;
+        m_wasOpen = false;
+        return Success;
+    }
+
+    int OpenProject(const wchar_t* localPath, const wchar_t*) override
+    {
+        m_open = true;
+        m_wasOpen = true;
+        m_project = std::wstring(localPath) + L"\\";
+        return Success;
+    }
+
+    int CloseProject() override
+    {
+        m_open = false;
+        return Success;
+    }
+
+    int Add(OrvixFileList* list, const wchar_t*, unsigned long) override { return Become(list, Controlled); }
+
+    int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long) override
+    {
+        if (Defect::Is(L"bad-input") && std::wstring(Last(list)).find(L'?') != std::wstring::npos)
+            return 3;
+        return Become(list, CheckedOut);
+    }
+
+    int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long) override
+    {
+        if (Defect::Is(L"list-untouched") && list->NumActiveEntries() != 0)
+            list->GetActiveFileEntry(0)->SetFlagsIn(0);
+        return Become(list, Controlled);
+    }
+
+    int UndoCheckOut(OrvixFileList* list, unsigned long options) override
+    {
+        const int result = Become(list, Controlled);
+        return Defect::Is(L"results") && options != 0 ? 7 : result;
+    }
+
+    int GetLatest(OrvixFileList* list, unsigned long) override
+    {
+        return list->NumActiveEntries() == 0 && !Defect::Is(L"empty-list") ? Failure : Success;
+    }
+
+    int ShowHistory(OrvixFileList* list) override { return list->NumActiveEntries() == 0 ? Failure : 1; }
+    int ShowProperties(OrvixFileList* list) override { return list->NumActiveEntries() == 0 ? Failure : Success; }
+
+    int QueryStatus(OrvixFileList* list, unsigned long) override
+    {
+        const unsigned int count = list->NumActiveEntries();
+        for (unsigned int i = 0; i < count; ++i)
+        {
+            const std::wstring file = list->GetActiveFileEntry(i)->GetFile();
+            if (m_open && file.compare(0, m_project.size(), m_project) != 0)
+                return Failure;
+            if (!Defect::Is(L"status-failure"))
+                continue;
+            list->GetActiveFileEntry(i)->SetFlagsOut(NotControlled); // too early
+        }
+        for (unsigned int i = 0; i < count; ++i)
+            if (!Defect::Is(L"status-left-out") || !m_open || i + 1 < count)
+                list->GetActiveFileEntry(i)->SetFlagsOut(FlagsOf(*list->GetActiveFileEntry(i)));
+        return count == 0 ? Failure : Success;
+    }
+
+    int ReservedC() override
+    {
+        if (Defect::Is(L"exception"))
+            throw std::runtime_error("defect");
+        return Defect::Is(L"reserved") ? Success : NotOffered;
+    }
+
+    int ReservedD(void* argument, unsigned long* first, unsigned long* second) override
+    {
+        return Defect::Is(L"reserved-pointers") ? NotOffered : FakeProvider::ReservedD(argument, first, second);
+    }
+
+    int ReservedE() override
+    {
+        if (Defect::Is(L"crash"))
+            Defect::Crash();
+        return NotOffered;
+    }
+
+    int ReservedF() override
+    {
+        if (Defect::Is(L"hang"))
+            Defect::Hang();
+        return NotOffered;
+    }
+
+    int ReservedG() override
+    {
+        if (Defect::Is(L"exit"))
+            ExitProcess(7);
+        return NotOffered;
+    }
+
+    int ReservedH() override
+    {
+        if (Defect::Is(L"descendant"))
+            Defect::StartDescendant();
+        return NotOffered;
+    }
+
+    bool ReservedI() override { return !Defect::Is(L"reserved-false"); }
+
+    int ShowOptions() override { return Defect::Is(L"dialogs") ? 9 : NotOffered; }
+    int RunProviderClient() override { return NotOffered; }
+
+private:
+    static constexpr unsigned long NotControlled = 0x1;
+    static constexpr unsigned long Controlled = 0x2;
+    static constexpr unsigned long CheckedOut = 0x2 | 0x4;
+
+    static const wchar_t* Last(OrvixFileList* list)
+    {
+        const unsigned int count = list->NumActiveEntries();
+        return count == 0 ? L"" : list->GetActiveFileEntry(count - 1)->GetFile();
+    }
+
+    int Become(OrvixFileList* list, unsigned long state)
+    {
+        for (unsigned int i = 0; OrvixFileEntry* entry = list->GetActiveFileEntry(i); ++i)
+            m_states[entry->GetFile()] = state;
+        return list->NumActiveEntries() == 0 ? Failure : Success;
+    }
+
+    unsigned long FlagsOf(OrvixFileEntry& entry)
+    {
+        if (!m_open)
+            return Defect::Is(L"status-closed") ? NotControlled | 0x100000 : NotControlled;
+        const auto found = m_states.find(entry.GetFile());
+        const unsigned long state = found == m_states.end() ? NotControlled : found->second;
+        if (Defect::Is(L"status-contradiction"))
+            return state | NotControlled | Controlled;
+        return Defect::Is(L"status-bits") && state == CheckedOut ? state | 0x40 : state;
+    }
+
+    std::map<std::wstring, unsigned long> m_states;
+    std::wstring m_project;
+    bool m_initialized = false;
+    bool m_open = false;
+    bool m_wasOpen = false;
+    int m_starts = 0;
+};
+
+// Not within a function: what GCC guards such an object with leaves handles open in every load.
+DefectiveProvider provider;
+
+} // namespace
+
+extern "C" {
+
+std::int32_t GetOrvixVersion()
+{
+    return Defect::Is(L"version") ? ORVIX_PLUGIN_CONTRACT_VERSION + 1 : ORVIX_PLUGIN_CONTRACT_VERSION;
+}
+
+IOrvixProvider* GetIOrvixProvider()
+{
+    static int requests = 0;
+    return Defect::Is(L"objects") && ++requests == 2 ? nullptr : &provider;
+}
+
+void ReleaseIOrvixProvider(IOrvixProvider*)
+{
+}
+
+const wchar_t* GetOrvixProviderName()
+{
+    static int requests = 0;
+    return Defect::Is(L"name")              ? nullptr
+           : Defect::Is(L"name-that-turns") ? (++requests % 2 == 0 ? L"Even" : L"Odd")
+                                            : L"Defective";
+}
+
+} // extern "C"
+
+BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
+{
+    if (reason != DLL_PROCESS_ATTACH)
+        return TRUE;
+    if (Defect::Is(L"crash-at-load"))
+        Defect::Crash();
+    return !Defect::Is(L"reload") || Defect::Count(L"ORVIX_DEFECT_LOADS") != 5;
+}

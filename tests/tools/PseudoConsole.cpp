@@ -1,0 +1,115 @@
+#include "PseudoConsole.h"
+
+#include <memory>
+#include <regex>
+#include <stdexcept>
+#include <vector>
+
+namespace
+{
+constexpr DWORD Milliseconds = 60'000;
+constexpr DWORD PipeSize = 1 << 20; // the console is read when the program has ended
+
+struct CloseHandleOf
+{
+    using pointer = HANDLE;
+    void operator()(HANDLE handle) const { CloseHandle(handle); }
+};
+using UniqueHandle = std::unique_ptr<HANDLE, CloseHandleOf>;
+
+struct CloseConsole
+{
+    using pointer = HPCON;
+    void operator()(HPCON console) const { ClosePseudoConsole(console); }
+};
+using UniqueConsole = std::unique_ptr<HPCON, CloseConsole>;
+
+struct Pipe
+{
+    Pipe()
+    {
+        HANDLE readEnd = nullptr;
+        HANDLE writeEnd = nullptr;
+        if (!CreatePipe(&readEnd, &writeEnd, nullptr, PipeSize))
+        {
+            throw std::runtime_error("no pipe");
+        }
+        reader.reset(readEnd);
+        writer.reset(writeEnd);
+    }
+
+    UniqueHandle reader;
+    UniqueHandle writer;
+};
+
+/// A process that is started with a console for its own.
+DWORD RunIn(HPCON console, std::wstring& commandLine)
+{
+    SIZE_T size = 0;
+    InitializeProcThreadAttributeList(nullptr, 1, 0, &size);
+    std::vector<std::byte> memory(size);
+    STARTUPINFOEXW startup{};
+    startup.StartupInfo.cb = sizeof startup;
+    startup.lpAttributeList = reinterpret_cast<LPPROC_THREAD_ATTRIBUTE_LIST>(memory.data());
+    PROCESS_INFORMATION information{};
+    if (!InitializeProcThreadAttributeList(startup.lpAttributeList, 1, 0, &size) ||
+        !UpdateProcThreadAttribute(startup.lpAttributeList, 0, PROC_THREAD_ATTRIBUTE_PSEUDOCONSOLE, console,
+                                   sizeof console, nullptr, nullptr) ||
+        !CreateProcessW(nullptr, commandLine.data(), nullptr, nullptr, FALSE, EXTENDED_STARTUPINFO_PRESENT, nullptr,
+                        nullptr, &startup.StartupInfo, &information))
+    {
+        throw std::runtime_error("the program does not start in a console");
+    }
+    DeleteProcThreadAttributeList(startup.lpAttributeList);
+    const UniqueHandle process(information.hProcess);
+    const UniqueHandle thread(information.hThread);
+    DWORD code = 0;
+    if (WaitForSingleObject(process.get(), Milliseconds) != WAIT_OBJECT_0)
+    {
+        TerminateProcess(process.get(), 1);
+        throw std::runtime_error("the program does not end in a console");
+    }
+    GetExitCodeProcess(process.get(), &code);
+    return code;
+}
+
+std::string ReadAll(HANDLE pipe)
+{
+    std::string bytes;
+    char buffer[4096];
+    DWORD size = 0;
+    while (ReadFile(pipe, buffer, sizeof buffer, &size, nullptr) && size > 0)
+    {
+        bytes.append(buffer, size);
+    }
+    return bytes;
+}
+
+std::string WithoutSequences(const std::string& output)
+{
+    // A blank may come as an erased line and a step to the right.
+    std::string text = std::regex_replace(output, std::regex("(\x1b\\[K)?\x1b\\[1C"), " ");
+    text = std::regex_replace(text, std::regex("\x1b\\[[?0-9;]*[A-Za-z]"), "");
+    return std::regex_replace(text, std::regex("\r"), "");
+}
+} // namespace
+
+PseudoConsole::Result PseudoConsole::Run(std::wstring commandLine)
+{
+    Result result{};
+    Pipe input;
+    Pipe output;
+    {
+        HPCON opened = nullptr;
+        if (FAILED(CreatePseudoConsole({Columns, 100}, input.reader.get(), output.writer.get(), 0, &opened)))
+        {
+            throw std::runtime_error("no pseudo console");
+        }
+        const UniqueConsole console(opened);
+        output.writer.reset(); // the console has its own
+        result.code = RunIn(console.get(), commandLine);
+    }
+    result.output = ReadAll(output.reader.get());
+    result.text = WithoutSequences(result.output);
+    return result;
+}

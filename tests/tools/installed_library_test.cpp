@@ -1,0 +1,99 @@
+// Commands that a provider carries out by itself, with an installed MSSCCI library, and where providers come from.
+
+#include "RegistryToolTest.h"
+
+#include <gmock/gmock.h>
+
+namespace
+{
+using testing::HasSubstr;
+
+class InstalledLibrary : public RegistryToolTest
+{
+protected:
+    void SetUp() override
+    {
+        RegistryToolTest::SetUp();
+        ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    }
+
+    OrvixTool::Result RunInstalled(Arguments arguments)
+    {
+        arguments.insert(arguments.begin(), {L"--sources", L"mssccci"});
+        return Run(std::move(arguments));
+    }
+
+    /// Makes the library fail as long as it lives.
+    class Failing
+    {
+    public:
+        Failing() { SetEnvironmentVariableW(L"ORVIX_TEST_SCC_FAILS", L"1"); }
+        Failing(const Failing&) = delete;
+        Failing& operator=(const Failing&) = delete;
+        ~Failing() { SetEnvironmentVariableW(L"ORVIX_TEST_SCC_FAILS", nullptr); }
+    };
+};
+} // namespace
+
+TEST_F(InstalledLibrary, IsNotLookedForUnlessAskedFor)
+{
+    EXPECT_EQ(Run({L"providers"}).output, "Index  Provider\n0      Archive\n");
+    EXPECT_EQ(Run({L"providers", L"--sources", L"plugins"}).output, "Index  Provider\n0      Archive\n");
+}
+
+TEST_F(InstalledLibrary, FollowsThePluginsInWhateverOrderTheSourcesAreNamed)
+{
+    for (const wchar_t* both : {L"plugins,mssccci", L"mssccci,plugins"})
+    {
+        EXPECT_EQ(Run({L"providers", L"--sources", both}).output, "Index  Provider\n0      Archive\n1      Talking\n");
+    }
+}
+
+TEST_F(InstalledLibrary, NeedsNoPluginFolder)
+{
+    const auto result = RunInstalled({L"providers", L"--plugins", L"nowhere"});
+    EXPECT_EQ(result.code, Success);
+    EXPECT_EQ(result.output, "Index  Provider\n0      Talking\n");
+    EXPECT_EQ(Run({L"providers", L"--plugins", L"nowhere", L"--sources", L"plugins,mssccci"}).code, NoProject);
+}
+
+TEST_F(InstalledLibrary, OpensAndClosesAProject)
+{
+    const auto result = RunInstalled({L"open"});
+    EXPECT_EQ(result.code, Success);
+    EXPECT_EQ(result.output, "opened " + Project().string() + " with Talking\nthe project is closed\n");
+}
+
+TEST_F(InstalledLibrary, PrintsWhatItSaysToEveryCommand)
+{
+    EXPECT_EQ(RunInstalled({L"options"}).output, "the options\nthe project is closed\n");
+    EXPECT_EQ(RunInstalled({L"client"}).output, "the client\nthe project is closed\n");
+    const auto properties = RunInstalled({L"properties", L"sub/a.txt"});
+    EXPECT_EQ(properties.output, "the properties of " + File(L"sub\\a.txt").string() + "\nthe project is closed\n");
+    EXPECT_EQ(properties.code, Success);
+}
+
+TEST_F(InstalledLibrary, ThatFailsIsNamedAndItsTextStillPrinted)
+{
+    const Failing failing;
+    const std::vector<Arguments> commands = {{L"options"}, {L"client"}, {L"properties", L"a.txt"}};
+    for (const Arguments& command : commands)
+    {
+        const auto result = RunInstalled(command);
+        EXPECT_EQ(result.code, Failed);
+        EXPECT_THAT(result.output, testing::StartsWith("the "));
+        EXPECT_THAT(result.errors, HasSubstr(" failed in the provider Talking\n"));
+    }
+}
+
+TEST_F(InstalledLibrary, ThatIsGoneIsListedButDoesNotStart)
+{
+    const std::filesystem::path copy = Scratch() / L"gone.dll";
+    std::filesystem::copy_file(ORVIX_TALKING_MSSCCI, copy);
+    ASSERT_EQ(Register(copy, L"Talking").code, Success);
+    std::filesystem::remove(copy);
+    EXPECT_THAT(Providers().output, HasSubstr("Talking"));
+    const auto result = RunInstalled({L"open"});
+    EXPECT_EQ(result.code, NoProject);
+    EXPECT_EQ(result.errors, "orvix: the provider does not start: Talking\n");
+}

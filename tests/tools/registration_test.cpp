@@ -1,0 +1,236 @@
+// orvix register and orvix unregister.
+
+#include "RegistryToolTest.h"
+
+#include <gmock/gmock.h>
+
+namespace
+{
+using testing::HasSubstr;
+using Registration = RegistryToolTest;
+
+constexpr const wchar_t* ForeignKey = L"Software\\OrvixTestForeign";
+
+std::string Library()
+{
+    return std::filesystem::path(ORVIX_TALKING_MSSCCI).make_preferred().string();
+}
+} // namespace
+
+TEST_F(Registration, IsSeenAmongTheProvidersUntilItIsTakenOut)
+{
+    const auto registered = Register(ORVIX_TALKING_MSSCCI, L"Talking");
+    EXPECT_EQ(registered.code, Success);
+    EXPECT_EQ(registered.output, "registered Talking: " + Library() + "\n");
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      Talking\n");
+
+    const auto unregistered = Unregister(L"Talking");
+    EXPECT_EQ(unregistered.code, Success);
+    EXPECT_EQ(unregistered.output, "unregistered Talking\n");
+    EXPECT_EQ(Providers().code, NoProject);
+    EXPECT_EQ(Providers().errors, "orvix: no provider in the registry's list of MSSCCI libraries\n");
+}
+
+TEST_F(Registration, IsAValueInTheListAndAKeyOfItsOwn)
+{
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    EXPECT_EQ(List().Text(L"Talking"), L"Software\\OrvixCore\\MSSCCI\\Talking");
+    EXPECT_EQ(TemporaryRegistryKey::Text(L"Software\\OrvixCore\\MSSCCI\\Talking", L"SCCServerName"), L"Talking");
+    EXPECT_EQ(Path(L"Talking"), std::filesystem::path(Library()).wstring());
+}
+
+TEST_F(Registration, LeavesNothingOfItsName)
+{
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Other").code, Success);
+    ASSERT_EQ(Unregister(L"Talking").code, Success);
+    EXPECT_EQ(List().Text(L"Talking"), std::nullopt);
+    EXPECT_FALSE(TemporaryRegistryKey::Exists(L"Software\\OrvixCore\\MSSCCI\\Talking"));
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      Other\n");
+}
+
+TEST_F(Registration, MakesTheListWhereItIsMissing)
+{
+    List().Remove();
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      Talking\n");
+}
+
+TEST_F(Registration, OfAKnownNameInAnyCaseReplacesThePath)
+{
+    const std::filesystem::path copy = Scratch() / L"copy.dll";
+    std::filesystem::copy_file(ORVIX_TALKING_MSSCCI, copy);
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    const auto result = Register(copy, L"TALKING");
+    EXPECT_EQ(result.code, Success);
+    EXPECT_EQ(result.output, "replaced TALKING: " + copy.string() + " instead of " + Library() + "\n");
+    EXPECT_EQ(Path(L"Talking"), copy.wstring());
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      TALKING\n");
+}
+
+TEST_F(Registration, IsTakenOutByItsNameInAnyCase)
+{
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    EXPECT_EQ(Unregister(L"talking").code, Success);
+    EXPECT_EQ(List().Text(L"Talking"), std::nullopt);
+}
+
+TEST_F(Registration, MakesARelativePathFull)
+{
+    std::filesystem::copy_file(ORVIX_TALKING_MSSCCI, File(L"here.dll"));
+    ASSERT_EQ(Register(L"here.dll", L"Talking").code, Success);
+    EXPECT_EQ(Path(L"Talking"), File(L"here.dll").wstring());
+}
+
+TEST_F(Registration, TakesNamesOutsideAscii)
+{
+    const auto result = Register(ORVIX_TALKING_MSSCCI, L"L\u00E4ger \u5009/\u5EAB");
+    EXPECT_EQ(result.code, Success);
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      L\xC3\xA4ger \xE5\x80\x89/\xE5\xBA\xAB\n");
+    EXPECT_EQ(Unregister(L"L\u00C4GER \u5009/\u5EAB").code, Success);
+}
+
+TEST_F(Registration, TakesTheLongestNameOfAKeyAndNoLongerOne)
+{
+    EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, std::wstring(255, L'n')).code, Success);
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      " + std::string(255, 'n') + "\n");
+    EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, std::wstring(256, L'n')).code, BadUsage);
+}
+
+TEST_F(Registration, RefusesNamesThatNoKeyCanHave)
+{
+    for (const wchar_t* name : {L"", L"a\\b", L"tab\t", L"line\n", L"delete\x7F", L"next\x85"})
+    {
+        for (const auto& result : {Register(ORVIX_TALKING_MSSCCI, name), Unregister(name)})
+        {
+            EXPECT_EQ(result.code, BadUsage);
+            EXPECT_EQ(result.errors, "orvix: a provider's name has 1 to 255 characters, and no backslash or control "
+                                     "character among them\n");
+        }
+    }
+    EXPECT_FALSE(TemporaryRegistryKey::Exists(L"Software\\OrvixCore\\MSSCCI"));
+}
+
+TEST_F(Registration, RefusesAPathThatWouldNotFitIntoTheLibrarysBuffer)
+{
+    const std::wstring root = L"C:\\";
+    const auto tooLong = Register(root + std::wstring(1023 - root.size(), L'x'), L"Talking");
+    EXPECT_EQ(tooLong.code, BadUsage);
+    EXPECT_EQ(tooLong.errors, "orvix: the path of the library is longer than 1022 characters\n");
+    EXPECT_THAT(Register(root + std::wstring(1022 - root.size(), L'x'), L"Talking").errors,
+                HasSubstr("orvix: no such library: "));
+}
+
+TEST_F(Registration, RefusesWhatIsNo64BitMSSCCILibrary)
+{
+    const std::filesystem::path fakes(ORVIX_FAKE_PLUGINS);
+    Write(L"text.dll", "no library");
+    std::filesystem::copy_file(ORVIX_TALKING_MSSCCI, File(L"half.dll"));
+    std::filesystem::resize_file(File(L"half.dll"), std::filesystem::file_size(File(L"half.dll")) / 2);
+    std::vector<std::pair<std::filesystem::path, const char*>> bad = {
+        {L"nowhere.dll", "no such library: "},
+        {L".", "no such library: "},
+        {L"text.dll", "not a 64-bit library: "},
+        {L"half.dll", "not a 64-bit library: "},
+        {fakes / L"good.dll", "no MSSCCI library, it has no SccGetVersion: "},
+        {ORVIX_TOOL, "no MSSCCI library, it has no SccGetVersion: "},
+    };
+    if (std::filesystem::exists(fakes / L"wrongbitness.dll"))
+    {
+        bad.emplace_back(fakes / L"wrongbitness.dll", "not a 64-bit library: ");
+    }
+    for (const auto& [path, message] : bad)
+    {
+        const auto result = Register(path, L"Talking");
+        EXPECT_EQ(result.code, NoProject) << path;
+        EXPECT_THAT(result.errors, HasSubstr(std::string("orvix: ") + message)) << path;
+    }
+    EXPECT_EQ(Providers().code, NoProject);
+    EXPECT_EQ(Path(L"Talking"), std::nullopt);
+}
+
+TEST_F(Registration, OfAnUnknownNameCannotBeTakenOut)
+{
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    const auto result = Unregister(L"Talk");
+    EXPECT_EQ(result.code, NoProject);
+    EXPECT_EQ(result.errors, "orvix: no such registration: Talk\n");
+    EXPECT_EQ(Providers().code, Success);
+}
+
+TEST_F(Registration, OfAnotherProgramIsNeitherReplacedNorTakenOut)
+{
+    TemporaryRegistryKey foreign(ForeignKey);
+    foreign.SetString(L"SCCServerName", L"Talking");
+    foreign.SetString(L"SCCServerPath", L"C:\\elsewhere.dll");
+    List().SetString(L"any name", ForeignKey);
+    for (const auto& result : {Register(ORVIX_TALKING_MSSCCI, L"talking"), Unregister(L"talking")})
+    {
+        EXPECT_EQ(result.code, Failed);
+        EXPECT_EQ(result.errors, "orvix: talking is registered by another program and stays as it is: "
+                                 "HKEY_LOCAL_MACHINE\\Software\\OrvixTestForeign\n");
+    }
+    EXPECT_EQ(List().Text(L"any name"), ForeignKey);
+    EXPECT_EQ(foreign.Text(L"SCCServerPath"), L"C:\\elsewhere.dll");
+    EXPECT_EQ(Path(L"talking"), std::nullopt);
+}
+
+TEST_F(Registration, NeverOverwritesAValueOfTheListThatBelongsToAnotherProgram)
+{
+    List().SetString(L"Talking", ForeignKey);
+    List().SetDword(L"Number", 7);
+    EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, L"talking").code, Failed);
+    EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Number").code, Failed);
+    EXPECT_EQ(List().Text(L"Talking"), ForeignKey);
+}
+
+TEST_F(Registration, ThatAnInterruptedRunHasLeftOutOfTheListCanBeCompletedOrTakenOut)
+{
+    TemporaryRegistryKey half(std::wstring(OwnPlace) + L"Talking");
+    half.SetString(L"SCCServerName", L"Talking");
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      Talking\n");
+    List().Remove();
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
+    EXPECT_FALSE(TemporaryRegistryKey::Exists(half.Path()));
+}
+
+TEST_F(Registration, WithoutRightsSaysSoAndLeavesNothingBehind)
+{
+    SetAccess(List().Path(), ReadAndDelete);
+    const auto result = Register(ORVIX_TALKING_MSSCCI, L"Talking");
+    EXPECT_EQ(result.code, Failed);
+    EXPECT_EQ(result.errors, "orvix: the registry cannot be changed without administrator rights: run orvix as "
+                             "administrator\n");
+    EXPECT_EQ(result.output, "");
+    EXPECT_FALSE(TemporaryRegistryKey::Exists(L"Software\\OrvixCore\\MSSCCI\\Talking"));
+}
+
+TEST_F(Registration, IsNotListedWhenItsOwnKeyCannotBeWritten)
+{
+    SetAccess(L"Software\\OrvixCore", ReadAndDelete);
+    EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Failed);
+    EXPECT_EQ(List().Text(L"Talking"), std::nullopt);
+}
+
+TEST_F(Registration, WithoutRightsStaysRegistered)
+{
+    ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
+    SetAccess(List().Path(), ReadAndDelete);
+    const auto result = Unregister(L"Talking");
+    EXPECT_EQ(result.code, Failed);
+    EXPECT_THAT(result.errors, HasSubstr("run orvix as administrator"));
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      Talking\n");
+}
+
+TEST_F(Registration, ThatFailsKeepsThePathThatWasThere)
+{
+    const std::filesystem::path copy = Scratch() / L"copy.dll";
+    std::filesystem::copy_file(ORVIX_TALKING_MSSCCI, copy);
+    ASSERT_EQ(Register(copy, L"Talking").code, Success);
+    List().Remove();
+    List().SetString(L"", L"");
+    SetAccess(List().Path(), ReadAndDelete);
+    EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Failed);
+    EXPECT_EQ(Path(L"Talking"), copy.wstring());
+}

@@ -1,0 +1,362 @@
+// orvix validate: what it says of good libraries, and of one with a single defect.
+
+#include "Defect.h"
+#include "ToolTest.h"
+
+#include <nlohmann/json.hpp>
+
+#include <gmock/gmock.h>
+
+#include <map>
+
+namespace
+{
+using testing::AllOf;
+using testing::ElementsAre;
+using testing::EndsWith;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::Pair;
+using testing::StartsWith;
+
+const std::filesystem::path Plugins = ORVIX_DEFECTIVE_PLUGINS;
+const std::filesystem::path Libraries = ORVIX_DEFECTIVE_MSSCCI;
+
+/// A variable that processes inherit, for as long as this object lives.
+class Environment
+{
+public:
+    Environment(const wchar_t* variable, const std::wstring& text) : m_variable(variable)
+    {
+        SetEnvironmentVariableW(m_variable, text.c_str());
+    }
+    Environment(const Environment&) = delete;
+    Environment& operator=(const Environment&) = delete;
+    ~Environment() { SetEnvironmentVariableW(m_variable, nullptr); }
+
+private:
+    const wchar_t* m_variable;
+};
+
+class Validate : public ToolTest
+{
+protected:
+    using Reasons = std::map<std::string, std::string>; ///< by the names of rules
+
+    OrvixTool::Result ValidatePlugin(const std::filesystem::path& library, Arguments more = {})
+    {
+        more.insert(more.begin(), {L"validate", library.wstring()});
+        return RunExactly(more);
+    }
+
+    OrvixTool::Result ValidateLibrary(const std::filesystem::path& library, Arguments more = {})
+    {
+        more.insert(more.begin(), L"--mssccci");
+        return ValidatePlugin(library, std::move(more));
+    }
+
+    /// The rules with this result, from the lines of a run.
+    static Reasons With(const std::string& verdict, const OrvixTool::Result& result)
+    {
+        Reasons reasons;
+        std::istringstream lines(result.output);
+        for (std::string word, rule, reason; lines >> word >> rule && std::getline(lines >> std::ws, reason);)
+        {
+            if (word == verdict)
+            {
+                reasons[rule] = reason;
+            }
+        }
+        return reasons;
+    }
+
+    /// The rules that a plug-in with a defect fails.
+    Reasons FailedWith(const std::wstring& defect)
+    {
+        const Environment environment(Defect::Variable, defect);
+        const auto result = ValidatePlugin(Plugins / L"defective.dll", {L"--dialogs"});
+        EXPECT_EQ(result.code, Failed);
+        return With("fail", result);
+    }
+
+    /// The rules that an MSSCCI library with a defect fails.
+    Reasons LibraryFailedWith(const std::wstring& defect)
+    {
+        const Environment environment(Defect::Variable, defect);
+        const auto result = ValidateLibrary(Libraries / L"defective_scc.dll", {L"--dialogs"});
+        EXPECT_EQ(result.code, Failed);
+        return With("fail", result);
+    }
+};
+
+/// What a library has against one rule.
+struct OneDefect
+{
+    const wchar_t* name;
+    const char* rule;
+    const char* reason; ///< part of what the rule says
+};
+
+/// Defects that do not get in each other's way, no two against the same rule.
+using Defects = std::vector<OneDefect>;
+
+std::wstring NamesOf(const Defects& defects)
+{
+    std::wstring names;
+    for (const OneDefect& defect : defects)
+    {
+        names += std::wstring(names.empty() ? L"" : L" ") + defect.name;
+    }
+    return names;
+}
+
+class ValidateDefectivePlugin : public Validate, public testing::WithParamInterface<Defects>
+{
+};
+
+class ValidateDefectiveLibrary : public Validate, public testing::WithParamInterface<Defects>
+{
+};
+
+void ExpectExactly(const Defects& defects, const std::map<std::string, std::string>& failed)
+{
+    EXPECT_EQ(failed.size(), defects.size()) << testing::PrintToString(failed);
+    for (const auto& [name, rule, reason] : defects)
+    {
+        EXPECT_THAT(failed, testing::Contains(Pair(rule, HasSubstr(reason)))) << std::filesystem::path(name);
+    }
+}
+} // namespace
+
+TEST_F(Validate, PassesTheSamplePluginInEveryRule)
+{
+    const auto result = ValidatePlugin(ORVIX_ARCHIVE, {L"--dialogs"});
+    EXPECT_EQ(result.code, Success) << result.output;
+    EXPECT_THAT(result.output, EndsWith("\n19 rules, 19 passed, 0 failed, 0 skipped\n"));
+}
+
+TEST_F(Validate, PassesTheSampleLibraryInEveryRule)
+{
+    const auto result = ValidateLibrary(ORVIX_ARCHIVE_MSSCCI, {L"--dialogs"});
+    EXPECT_EQ(result.code, Success) << result.output;
+    EXPECT_THAT(result.output, EndsWith("\n24 rules, 24 passed, 0 failed, 0 skipped\n"));
+}
+
+TEST_F(Validate, PassesWhatTheDefectsAreMadeOf)
+{
+    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", {L"--dialogs"});
+    EXPECT_EQ(plugin.code, Success) << plugin.output;
+    EXPECT_THAT(With("skip", plugin), IsEmpty());
+    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", {L"--dialogs"});
+    EXPECT_EQ(library.code, Success) << library.output;
+    EXPECT_THAT(With("skip", library), IsEmpty());
+}
+
+TEST_P(ValidateDefectivePlugin, FailsTheRulesThatItBreaksAndNoOthers)
+{
+    ExpectExactly(GetParam(), FailedWith(NamesOf(GetParam())));
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    All, ValidateDefectivePlugin,
+    testing::Values(Defects{{L"version", "version", "GetOrvixVersion gives 201"},
+                            {L"name", "name", "GetOrvixProviderName gives no name"},
+                            {L"objects", "objects", "GetIOrvixProvider gives null"},
+                            {L"state", "state", "IsProjectOpen is true after CloseProject"},
+                            {L"reserved", "reserved", "ReservedC gives 0"},
+                            {L"results", "results", "UndoCheckOut gives 7"},
+                            {L"bad-input", "bad-input", "what?.txt\" gives 3"},
+                            {L"empty-list", "empty-list", "GetLatest gives 0"},
+                            {L"status-bits", "status-bits", "QueryStatus sets bits that mean nothing: 0x00000046"},
+                            {L"status-failure", "status-failure", "QueryStatus fails and changes FlagsOut"},
+                            {L"status-closed", "status-closed", "QueryStatus writes 0x00100001 before OpenProject"},
+                            {L"list-untouched", "list-untouched", "CheckIn changes more of the list than FlagsOut"},
+                            {L"handles", "handles", "10 sessions leave 10 handles open"},
+                            {L"dialogs", "dialogs", "ShowOptions gives 9"}},
+                    Defects{{L"name-that-turns", "name", "gives another name when it is asked again"},
+                            {L"reserved-pointers", "reserved", "ReservedD does not store 0 through both pointers"},
+                            {L"status-left-out", "status-bits", "QueryStatus does not write an entry's FlagsOut"},
+                            {L"sessions", "sessions", "Initialize gives -1 in session 3"}},
+                    Defects{{L"reserved-false", "reserved", "ReservedI gives false"},
+                            {L"status-contradiction", "status-bits",
+                             "QueryStatus says controlled and not controlled: 0x00000003"},
+                            {L"reload", "reload", "it does not load: "}},
+                    Defects{{L"starts", "starts", "Initialize gives -1"}},
+                    Defects{{L"exception", "reserved", "ReservedC lets an exception out"}},
+                    Defects{{L"crash", "reserved", "ReservedE crashes the process with exception 0xC0000005"}},
+                    Defects{{L"exit", "reserved", "ReservedG ends the process with exit code 7"}}));
+
+TEST_P(ValidateDefectiveLibrary, FailsTheRulesThatItBreaksAndNoOthers)
+{
+    ExpectExactly(GetParam(), LibraryFailedWith(NamesOf(GetParam())));
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    All, ValidateDefectiveLibrary,
+    testing::Values(
+        Defects{{L"version", "version", "SccGetVersion gives 0x00030001"},
+                {L"capabilities", "capabilities", "the bits 0x02000080 promise SccPopulateList"},
+                {L"texts", "texts", "the library's name is written beyond its 32 bytes"},
+                {L"input-names", "input-texts", "SccCheckin writes to the file names"},
+                {L"codes", "codes", "SccGet gives 42"},
+                {L"null-arguments", "null-arguments", "SccQueryInfo crashes the process with exception 0xC0000005"},
+                {L"info-bits", "info-bits", "SccQueryInfo sets unknown bits: 0x00004003"},
+                {L"text-output", "text-output", "a line carries a line end"},
+                {L"handles", "handles", "10 sessions leave 10 handles open"}},
+        Defects{{L"no-terminator", "texts", "the label of the auxiliary path has no terminator in its 32 bytes"},
+                {L"input-texts", "input-texts", "SccOpenProject writes to the project name or the local path"},
+                {L"info-left-out", "info-bits", "SccQueryInfo leaves a file's word as it was"},
+                {L"text-without-kind", "text-output", "the kind 99 means nothing"}},
+        Defects{{L"info-overrun", "info-bits", "SccQueryInfo writes more words than there are files"},
+                {L"text-null", "text-output", "a line of kind 1 has no text"}},
+        Defects{{L"starts", "starts", "Initialize gives -1"}}));
+
+TEST_F(Validate, NamesTheMissingExportOfAPlugin)
+{
+    for (const wchar_t* name :
+         {L"GetOrvixVersion", L"GetIOrvixProvider", L"ReleaseIOrvixProvider", L"GetOrvixProviderName"})
+    {
+        const auto result = ValidatePlugin(Plugins / (std::wstring(L"defective_without_") + name + L".dll"));
+        EXPECT_EQ(result.code, Failed);
+        EXPECT_THAT(With("fail", result),
+                    ElementsAre(Pair("exports", "it lacks " + std::filesystem::path(name).string())));
+    }
+}
+
+TEST_F(Validate, FailsALibraryForAFunctionThatIsNeededAndRemarksOneThatIsNot)
+{
+    const auto result = ValidateLibrary(Libraries / L"defective_scc_without_SccCheckin.dll");
+    EXPECT_THAT(With("fail", result), ElementsAre(Pair("exports", "it lacks SccCheckin")));
+    const auto passed = With("pass", ValidateLibrary(Libraries / L"defective_scc.dll"));
+    ASSERT_TRUE(passed.contains("exports"));
+    EXPECT_THAT(passed.at("exports"), AllOf(StartsWith("without SccGetProjPath "), HasSubstr(" SccRunScc ")));
+}
+
+TEST_F(Validate, EndsAHangingOperationAtTheLimitAndGoesOn)
+{
+    const Environment environment(Defect::Variable, L"hang");
+    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", {L"--timeout", L"5"});
+    EXPECT_EQ(plugin.code, Failed);
+    EXPECT_THAT(With("fail", plugin), ElementsAre(Pair("reserved", "ReservedF hangs: ended after 5 s")));
+    EXPECT_THAT(plugin.output, HasSubstr("\npass  handles "));
+    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", {L"--timeout", L"5"});
+    EXPECT_THAT(With("fail", library),
+                ElementsAre(Pair("null-arguments", "SccGetCommandOptions hangs: ended after 5 s")));
+}
+
+TEST_F(Validate, FailsALibraryThatCrashesWhenItIsLoaded)
+{
+    const Environment environment(Defect::Variable, L"crash-at-load");
+    const auto result = ValidatePlugin(Plugins / L"defective.dll");
+    EXPECT_EQ(result.code, Failed);
+    EXPECT_TRUE(With("fail", result).contains("loads")); // the system may make a failed load of it
+    EXPECT_THAT(With("pass", result), IsEmpty());
+}
+
+TEST_F(Validate, LeavesNoProcessBehindThatTheLibraryStarted)
+{
+    const std::filesystem::path file = Scratch() / L"descendant.txt";
+    const Environment environment(Defect::Variable, L"descendant");
+    const Environment where(L"ORVIX_DEFECT_FILE", file.wstring());
+    ASSERT_EQ(ValidatePlugin(Plugins / L"defective.dll").code, Success);
+    const std::string number = ReadBytes(file);
+    ASSERT_NE(number, "");
+    const HANDLE process = OpenProcess(SYNCHRONIZE, FALSE, std::stoul(number));
+    EXPECT_TRUE(process == nullptr || WaitForSingleObject(process, 10000) == WAIT_OBJECT_0);
+    CloseHandle(process);
+}
+
+TEST_F(Validate, FailsOneRuleForWhatIsNoLibraryAndSkipsTheOthers)
+{
+    WriteBytes(File(L"text.dll"), "no library");
+    const auto result = ValidatePlugin(L"text.dll");
+    EXPECT_EQ(result.code, Failed);
+    EXPECT_THAT(With("fail", result), ElementsAre(Pair("loads", StartsWith("it does not load: error 193"))));
+    EXPECT_THAT(With("pass", result), IsEmpty());
+    EXPECT_THAT(result.output, EndsWith("\n19 rules, 0 passed, 1 failed, 18 skipped\n"));
+}
+
+TEST_F(Validate, FailsAPluginWhosePathNoHostFinds)
+{
+    const std::wstring name(MAX_PATH - 5 - Project().wstring().size(), L'x'); // a separator and .dll are added
+    const auto copy = [this](const std::wstring& file) {
+        std::filesystem::path path = File(file + L".dll");
+        std::filesystem::copy_file(Plugins / L"defective.dll", L"\\\\?\\" + path.wstring());
+        return path;
+    };
+    EXPECT_THAT(With("fail", ValidatePlugin(copy(name))),
+                testing::Contains(Pair("loads", HasSubstr("longer than 259"))));
+    EXPECT_THAT(With("fail", ValidatePlugin(copy(name.substr(1)))), IsEmpty());
+}
+
+TEST_F(Validate, RunsWhatMayShowWindowsOnlyWhenAskedTo)
+{
+    const Environment environment(Defect::Variable, L"dialogs");
+    const auto result = ValidatePlugin(Plugins / L"defective.dll");
+    EXPECT_EQ(result.code, Success);
+    EXPECT_THAT(With("skip", result), ElementsAre(Pair("dialogs", HasSubstr("--dialogs"))));
+}
+
+TEST_F(Validate, LeavesNothingOnTheDiskAndInTheRegistry)
+{
+    const std::filesystem::path temp = Scratch() / L"temp";
+    std::filesystem::create_directory(temp);
+    const Environment environment(L"TMP", temp.wstring());
+    ASSERT_EQ(ValidateLibrary(ORVIX_ARCHIVE_MSSCCI).code, Success);
+    EXPECT_TRUE(std::filesystem::is_empty(temp));
+    EXPECT_TRUE(std::filesystem::is_empty(Project()));
+    HKEY key = nullptr;
+    ASSERT_EQ(RegOpenKeyExW(HKEY_CURRENT_USER, L"Software\\OrvixCore", 0, KEY_READ, &key), ERROR_SUCCESS);
+    DWORD keys = 1;
+    RegQueryInfoKeyW(key, nullptr, nullptr, nullptr, &keys, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr,
+                     nullptr);
+    RegCloseKey(key);
+    EXPECT_EQ(keys, 0u);
+}
+
+TEST_F(Validate, PrintsAJsonDocumentWithTheSameResults)
+{
+    const Environment environment(Defect::Variable, L"reserved");
+    const auto result = ValidatePlugin(Plugins / L"defective.dll", {L"--json"});
+    EXPECT_EQ(result.code, Failed);
+    const auto document = nlohmann::json::parse(result.output);
+    EXPECT_EQ(document["library"], (Plugins / L"defective.dll").make_preferred().string());
+    EXPECT_EQ(document["kind"], "plugin");
+    EXPECT_EQ(document["failed"], 1);
+    EXPECT_EQ(document["skipped"], 1);
+    EXPECT_EQ(document["passed"].get<std::size_t>() + 2, document["rules"].size());
+    const auto& rules = document["rules"];
+    const auto found =
+        std::find_if(rules.begin(), rules.end(), [](const auto& rule) { return rule["name"] == "reserved"; });
+    ASSERT_NE(found, rules.end());
+    EXPECT_EQ((*found)["result"], "fail");
+    EXPECT_EQ((*found)["reason"], "ReservedC gives 0");
+    EXPECT_THAT((*found)["demand"].get<std::string>(), HasSubstr("reserved operations"));
+    EXPECT_EQ(document["kind"], "plugin");
+}
+
+TEST_F(Validate, OfAFileThatIsNotThereEndsWithThree)
+{
+    for (const wchar_t* path : {L"nowhere.dll", L"."})
+    {
+        const auto result = ValidatePlugin(path);
+        EXPECT_EQ(result.code, NoProject);
+        EXPECT_THAT(result.errors, StartsWith("orvix: no such library: "));
+        EXPECT_EQ(result.output, "");
+    }
+}
+
+TEST_F(Validate, BadUsageEndsWithTwo)
+{
+    const std::vector<Arguments> bad = {{L"validate"},
+                                        {L"validate", L""},
+                                        {L"validate", L"a.dll", L"b.dll"},
+                                        {L"validate", L"a.dll", L"--timeout", L"0"},
+                                        {L"validate", L"a.dll", L"--timeout", L"soon"},
+                                        {L"validate", L"a.dll", L"--timeout", L"3601"},
+                                        {L"validate", L"a.dll", L"--rule"}};
+    for (const Arguments& arguments : bad)
+    {
+        EXPECT_EQ(RunExactly(arguments).code, BadUsage) << testing::PrintToString(arguments);
+    }
+}

@@ -1,0 +1,204 @@
+#include "Registration.h"
+
+#include "FilePath.h"
+#include "InstalledProviders.h"
+#include "IsolatedLoad.h"
+#include "ToolError.h"
+
+#include <algorithm>
+#include <array>
+
+namespace
+{
+using InstalledProviders::ListPath;
+using InstalledProviders::ServerName;
+using InstalledProviders::ServerPath;
+
+constexpr wchar_t OwnPlace[] = L"Software\\OrvixCore\\MSSCCI\\";
+constexpr std::size_t MaxName = 255; // characters in the name of a key
+
+// A text that fills the library's buffer with its terminator would end the process of every host.
+constexpr std::size_t MaxPath = InstalledProviders::MaxText - 2;
+
+void Check(LSTATUS status)
+{
+    if (status == ERROR_ACCESS_DENIED)
+    {
+        throw ToolError(ExitCode::Failed, L"the registry cannot be changed without administrator rights: "
+                                          L"run orvix as administrator");
+    }
+    if (status != ERROR_SUCCESS)
+    {
+        throw ToolError(ExitCode::Failed, L"the registry cannot be changed: error " + std::to_wstring(status));
+    }
+}
+
+bool EqualNames(const std::wstring& left, const std::wstring& right)
+{
+    return PathKey(left) == PathKey(right);
+}
+
+/// A text that the library could read; nothing otherwise.
+std::optional<std::wstring> ReadText(const std::wstring& keyPath, const wchar_t* valueName)
+{
+    std::array<wchar_t, InstalledProviders::MaxText> text{};
+    DWORD size = sizeof text;
+    return RegGetValueW(HKEY_LOCAL_MACHINE, keyPath.c_str(), valueName, RRF_RT_REG_SZ, nullptr, text.data(), &size) ==
+                   ERROR_SUCCESS
+               ? std::optional<std::wstring>(text.data())
+               : std::nullopt;
+}
+
+/// Writes a text and, where it is missing, its key.
+LSTATUS WriteText(const wchar_t* keyPath, const wchar_t* valueName, const std::wstring& text)
+{
+    return RegSetKeyValueW(HKEY_LOCAL_MACHINE, keyPath, valueName, REG_SZ, text.c_str(),
+                           static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t)));
+}
+
+bool KeyExists(const std::wstring& path)
+{
+    HKEY key = nullptr;
+    const bool exists = RegOpenKeyExW(HKEY_LOCAL_MACHINE, path.c_str(), 0, KEY_READ, &key) == ERROR_SUCCESS;
+    const UniqueRegistryKey closing(key);
+    return exists;
+}
+
+/// Throws `ToolError` unless a host can use the library. None of its code runs.
+void CheckLibrary(const std::wstring& path)
+{
+    if (path.size() > MaxPath)
+    {
+        throw ToolError(ExitCode::BadUsage,
+                        L"the path of the library is longer than " + std::to_wstring(MaxPath) + L" characters");
+    }
+    if (!PathExists(path) || IsFolder(path))
+    {
+        throw ToolError(ExitCode::NoProject, L"no such library: " + path);
+    }
+    SetThreadErrorMode(SEM_FAILCRITICALERRORS, nullptr); // no message box about a damaged file
+    const UniqueModule module(LoadLibraryExW(path.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES));
+    if (!module)
+    {
+        throw ToolError(ExitCode::NoProject, L"not a 64-bit library: " + path);
+    }
+    if (GetProcAddress(module.get(), "SccGetVersion") == nullptr)
+    {
+        throw ToolError(ExitCode::NoProject, L"no MSSCCI library, it has no SccGetVersion: " + path);
+    }
+}
+} // namespace
+
+Registration::Registration(const std::wstring& name) : m_name(name), m_keyPath(OwnPlace + name)
+{
+    const auto isForbidden = [](wchar_t c) { return c == L'\\' || c < 0x20 || (c >= 0x7F && c < 0xA0); };
+    if (name.empty() || name.size() > MaxName || std::any_of(name.begin(), name.end(), isForbidden))
+    {
+        throw ToolError(ExitCode::BadUsage, L"a provider's name has 1 to " + std::to_wstring(MaxName) +
+                                                L" characters, and no backslash or control character among them");
+    }
+}
+
+std::optional<std::wstring> Registration::Set(const std::wstring& library)
+{
+    CheckLibrary(library);
+    const std::vector<Entry> list = ReadList();
+    RefuseForeign(list);
+    const bool isListed = std::any_of(list.begin(), list.end(), [this](const Entry& entry) { return IsOwn(entry); });
+    const std::optional<std::wstring> previousName = ReadText(m_keyPath, ServerName);
+    std::optional<std::wstring> previousPath = ReadText(m_keyPath, ServerPath);
+    try
+    {
+        Check(WriteText(m_keyPath.c_str(), ServerName, m_name));
+        Check(WriteText(m_keyPath.c_str(), ServerPath, library));
+        if (!isListed)
+        {
+            Check(WriteText(ListPath, m_name.c_str(), m_keyPath));
+        }
+    }
+    catch (const ToolError&)
+    {
+        if (previousName)
+        {
+            WriteText(m_keyPath.c_str(), ServerName, *previousName);
+        }
+        if (previousPath)
+        {
+            WriteText(m_keyPath.c_str(), ServerPath, *previousPath);
+        }
+        if (!isListed && !previousName && !previousPath)
+        {
+            RegDeleteTreeW(HKEY_LOCAL_MACHINE, m_keyPath.c_str());
+        }
+        throw;
+    }
+    return previousPath;
+}
+
+void Registration::Remove()
+{
+    const std::vector<Entry> list = ReadList();
+    bool known = KeyExists(m_keyPath); // also when an interrupted run has left it
+    for (const Entry& entry : list)
+    {
+        if (IsOwn(entry))
+        {
+            known = true;
+            Check(RegDeleteKeyValueW(HKEY_LOCAL_MACHINE, ListPath, entry.valueName.c_str()));
+        }
+    }
+    if (!known)
+    {
+        RefuseForeign(list);
+        throw ToolError(ExitCode::NoProject, L"no such registration: " + m_name);
+    }
+    const LSTATUS status = RegDeleteTreeW(HKEY_LOCAL_MACHINE, m_keyPath.c_str());
+    Check(status == ERROR_FILE_NOT_FOUND ? ERROR_SUCCESS : status);
+}
+
+std::vector<Registration::Entry> Registration::ReadList()
+{
+    std::vector<Entry> list;
+    HKEY opened = nullptr;
+    const LSTATUS status = RegOpenKeyExW(HKEY_LOCAL_MACHINE, ListPath, 0, KEY_READ, &opened);
+    const UniqueRegistryKey key(opened);
+    if (status == ERROR_FILE_NOT_FOUND)
+    {
+        return list;
+    }
+    Check(status);
+    std::array<wchar_t, InstalledProviders::MaxValueName> name{};
+    for (DWORD index = 0;; ++index)
+    {
+        DWORD size = static_cast<DWORD>(name.size());
+        const LSTATUS found = RegEnumValueW(key.get(), index, name.data(), &size, nullptr, nullptr, nullptr, nullptr);
+        if (found == ERROR_SUCCESS)
+        {
+            list.push_back({name.data(), ReadText(ListPath, name.data()).value_or(L"")});
+        }
+        else if (found != ERROR_MORE_DATA) // a name too long for the library, too
+        {
+            return list;
+        }
+    }
+}
+
+bool Registration::IsOwn(const Entry& entry) const
+{
+    return EqualNames(entry.keyPath, m_keyPath);
+}
+
+void Registration::RefuseForeign(const std::vector<Entry>& list) const
+{
+    for (const Entry& entry : list)
+    {
+        const std::wstring serverName = ReadText(entry.keyPath, ServerName).value_or(L"");
+        if (!IsOwn(entry) && (EqualNames(entry.valueName, m_name) || EqualNames(serverName, m_name)))
+        {
+            throw ToolError(ExitCode::Failed, m_name +
+                                                  L" is registered by another program and stays as it is: "
+                                                  L"HKEY_LOCAL_MACHINE\\" +
+                                                  entry.keyPath);
+        }
+    }
+}

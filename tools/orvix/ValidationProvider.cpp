@@ -1,0 +1,149 @@
+#include "ValidationProvider.h"
+
+#include "CommandLine.h"
+#include "InstalledProviders.h"
+
+namespace
+{
+constexpr wchar_t Name[] = L"Validated";
+
+/// A key in the place of HKEY_LOCAL_MACHINE, for this process alone, under which one MSSCCI library is registered: the
+/// machine's own registry is left alone, and the services object finds this library and no other.
+class PrivateRegistration
+{
+public:
+    explicit PrivateRegistration(const std::wstring& library)
+        : m_path(L"Software\\OrvixCore\\Validation-" + std::to_wstring(GetCurrentProcessId())),
+          m_root(NewKey(HKEY_CURRENT_USER, m_path.c_str()))
+    {
+        const UniqueRegistryKey list = NewKey(m_root.get(), InstalledProviders::ListPath);
+        const UniqueRegistryKey provider = NewKey(m_root.get(), Name);
+        Write(list.get(), Name, Name);
+        Write(provider.get(), InstalledProviders::ServerName, Name);
+        Write(provider.get(), InstalledProviders::ServerPath, library);
+        RegOverridePredefKey(HKEY_LOCAL_MACHINE, m_root.get());
+    }
+    PrivateRegistration(const PrivateRegistration&) = delete;
+    PrivateRegistration& operator=(const PrivateRegistration&) = delete;
+    ~PrivateRegistration()
+    {
+        RegOverridePredefKey(HKEY_LOCAL_MACHINE, nullptr);
+        RegDeleteTreeW(HKEY_CURRENT_USER, m_path.c_str());
+    }
+
+private:
+    /// A key that would go with the session should this process be ended here.
+    static UniqueRegistryKey NewKey(HKEY parent, const wchar_t* path)
+    {
+        HKEY key = nullptr;
+        if (RegCreateKeyExW(parent, path, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &key, nullptr) !=
+            ERROR_SUCCESS)
+        {
+            throw RuleSkipped("the registry has no room for a private registration");
+        }
+        return UniqueRegistryKey(key);
+    }
+
+    static void Write(HKEY key, const wchar_t* name, const std::wstring& text)
+    {
+        RegSetValueExW(key, name, 0, REG_SZ, reinterpret_cast<const BYTE*>(text.c_str()),
+                       static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t)));
+    }
+
+    std::wstring m_path;
+    UniqueRegistryKey m_root;
+};
+} // namespace
+
+ValidationProvider::ValidationProvider(ValidationSubject& subject) : m_subject(subject)
+{
+    m_client.SetClientName(L"orvix");
+    m_client.SetUserName(L"validator");
+    m_client.SetConfigFilePath(subject.Outside().c_str());
+    m_client.SetIOrvixClientAccess(&m_access);
+    if (subject.IsMSSCCI())
+    {
+        FindInstalled();
+    }
+    else
+    {
+        FindPlugin();
+    }
+    if (m_provider == nullptr)
+    {
+        throw RuleSkipped("it gives no provider");
+    }
+}
+
+ValidationProvider::~ValidationProvider()
+{
+    const auto end = [this](const char* what, bool needed, auto work) {
+        if (needed)
+        {
+            m_subject.Tell(ValidationSubject::Step, what);
+            work();
+        }
+    };
+    try
+    {
+        end("CloseProject", m_provider->IsProjectOpen(), [this] { m_provider->CloseProject(); });
+        end("Uninitialize", m_provider->IsInitialized(), [this] { m_provider->Uninitialize(); });
+    }
+    catch (...) // what it lets out is found where a rule calls these
+    {
+    }
+    m_subject.Tell(ValidationSubject::Step, "releasing the provider");
+}
+
+void ValidationProvider::FindPlugin()
+{
+    m_library.emplace(m_subject);
+    auto* const get = m_library->Need<IOrvixProvider*()>("GetIOrvixProvider");
+    m_provider = m_subject.Call("GetIOrvixProvider", get);
+}
+
+void ValidationProvider::FindInstalled()
+{
+    const ValidationLibrary loads(m_subject);
+    loads.Need<void()>("SccGetVersion");
+    m_services.reset(GetIOrvixServices());
+    if (m_services)
+    {
+        const PrivateRegistration registration(m_subject.Library());
+        m_services->Initialize(&m_client, Source::InstalledMSSCCI);
+        m_provider = m_services->GetProvider(0);
+    }
+}
+
+int ValidationProvider::Initialize()
+{
+    return m_subject.Call("Initialize", [this] { return m_provider->Initialize(&m_client); });
+}
+
+int ValidationProvider::OpenProject()
+{
+    return m_subject.Call("OpenProject",
+                          [this] { return m_provider->OpenProject(m_subject.Project().c_str(), L"validation"); });
+}
+
+int ValidationProvider::CloseProject()
+{
+    return m_subject.Call("CloseProject", [this] { return m_provider->CloseProject(); });
+}
+
+int ValidationProvider::Uninitialize()
+{
+    return m_subject.Call("Uninitialize", [this] { return m_provider->Uninitialize(); });
+}
+
+void ValidationProvider::Begin()
+{
+    if (Initialize() != 0)
+    {
+        throw RuleSkipped("Initialize fails");
+    }
+    if (OpenProject() != 0)
+    {
+        throw RuleSkipped("OpenProject fails for the scratch project");
+    }
+}

@@ -1,0 +1,115 @@
+#include "ValidationScc.h"
+
+#include "CStr.h"
+#include "WStr.h"
+
+#include <utility>
+
+ValidationScc::~ValidationScc()
+{
+    try
+    {
+        End();
+    }
+    catch (const std::exception&) // what they answer is looked at where a rule calls them
+    {
+    }
+}
+
+void ValidationScc::Initialize()
+{
+    LONG checkoutCommentLength = 0;
+    LONG commentLength = 0;
+    const SCCRTN result =
+        Call<decltype(SccInitialize)>("SccInitialize", &m_context, HWND{nullptr}, LPCSTR{"orvix"}, m_name.Get(),
+                                      &m_capabilities, m_auxPathLabel.Get(), &checkoutCommentLength, &commentLength);
+    if (result != SCC_OK)
+    {
+        throw RuleSkipped("SccInitialize gives " + std::to_string(result));
+    }
+    m_initialized = true;
+}
+
+void ValidationScc::Begin(LPTEXTOUTPROC output)
+{
+    Initialize();
+    Open(output);
+}
+
+void ValidationScc::End()
+{
+    if (std::exchange(m_open, false))
+    {
+        Call<decltype(SccCloseProject)>("SccCloseProject", m_context);
+    }
+    if (std::exchange(m_initialized, false))
+    {
+        Call<decltype(SccUninitialize)>("SccUninitialize", m_context);
+    }
+}
+
+void ValidationScc::Open(LPTEXTOUTPROC output)
+{
+    m_localPath.Set(Narrow(m_subject.Project()));
+    SCCRTN result = TryToOpen(output);
+    if (result == SCC_E_PROJSYNTAXERR && m_library.Find<decltype(SccGetProjPath)>("SccGetProjPath") != nullptr)
+    {
+        BOOL isNew = TRUE;
+        result = Call<decltype(SccGetProjPath)>("SccGetProjPath", m_context, HWND{nullptr}, m_user.Get(),
+                                                m_projectName.Get(), m_localPath.Get(), m_auxPath.Get(), FALSE, &isNew);
+        result = result == SCC_OK ? TryToOpen(output) : result;
+    }
+    if (result != SCC_OK)
+    {
+        throw RuleSkipped("SccOpenProject gives " + std::to_string(result) + " for the scratch project");
+    }
+    m_open = true;
+}
+
+SCCRTN ValidationScc::TryToOpen(LPTEXTOUTPROC output)
+{
+    const auto projectName = m_projectName;
+    const auto localPath = m_localPath;
+    const SCCRTN result = Call<decltype(SccOpenProject)>(
+        "SccOpenProject", m_context, HWND{nullptr}, m_user.Get(), LPCSTR{m_projectName.Get()},
+        LPCSTR{m_localPath.Get()}, m_auxPath.Get(), LPCSTR{"validation"}, output, SCC_OP_CREATEIFNEW);
+    m_inputTextsKept = m_inputTextsKept && m_projectName == projectName && m_localPath == localPath;
+    return result;
+}
+
+void ValidationScc::CheckInputTexts() const
+{
+    if (!m_inputTextsKept)
+    {
+        throw RuleBroken("SccOpenProject writes to the project name or the local path");
+    }
+}
+
+void ValidationScc::CheckCodes() const
+{
+    if (!m_noCode.empty())
+    {
+        throw RuleBroken(m_noCode);
+    }
+}
+
+void ValidationScc::CheckTexts() const
+{
+    m_name.Check("the library's name");
+    m_auxPathLabel.Check("the label of the auxiliary path");
+    m_user.Check("the user");
+    m_projectName.Check("the project name");
+    m_localPath.Check("the local path");
+    m_auxPath.Check("the auxiliary path");
+}
+
+std::string ValidationScc::Narrow(const std::wstring& path)
+{
+    const CStr narrow(path.c_str());
+    const WStr back(narrow.Get());
+    if (narrow.Get() == nullptr || back.Get() == nullptr || back.Get() != path)
+    {
+        throw RuleSkipped("the ANSI code page lacks a letter of the scratch project's path");
+    }
+    return narrow.Get();
+}

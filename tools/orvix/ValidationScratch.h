@@ -1,0 +1,24 @@
+#pragma once
+
+#include <string>
+
+/// A new, empty folder below the user's temporary folder; deleted with everything in it, read-only files included.
+class ValidationScratch
+{
+public:
+    /// Throws `ToolError` when it cannot be made.
+    ValidationScratch();
+    ValidationScratch(const ValidationScratch&) = delete;
+    ValidationScratch& operator=(const ValidationScratch&) = delete;
+    ~ValidationScratch();
+
+    /// The full path.
+    const std::wstring& Path() const { return m_path; }
+
+    /// Deletes a folder with everything in it, read-only files included, as far as the system allows. A link is
+    /// deleted, never what it leads to.
+    static void RemoveTree(const std::wstring& folder);
+
+private:
+    std::wstring m_path;
+};

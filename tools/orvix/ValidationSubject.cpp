@@ -1,0 +1,29 @@
+#include "ValidationSubject.h"
+
+#include "Text.h"
+
+#include <filesystem>
+#include <fstream>
+
+ValidationSubject::ValidationSubject(std::wstring library, bool isMSSCCI, const std::wstring& scratch, HANDLE pipe)
+    : m_library(std::move(library)), m_isMSSCCI(isMSSCCI), m_project(scratch + L"\\project"),
+      m_outside(scratch + L"\\outside"), m_pipe(pipe)
+{
+    std::filesystem::create_directory(m_project);
+    std::filesystem::create_directory(m_outside);
+}
+
+std::wstring ValidationSubject::Write(const std::wstring& name, std::string_view text) const
+{
+    std::wstring path = m_project + L'\\' + name;
+    SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_NORMAL); // a provider may have made it read-only
+    std::ofstream(std::filesystem::path(path), std::ios::binary) << text;
+    return path;
+}
+
+void ValidationSubject::Tell(std::string_view word, const std::string& text)
+{
+    const std::string line = std::string(word) + ' ' + Printable(Wide(text)) + '\n';
+    DWORD written = 0;
+    WriteFile(m_pipe, line.data(), static_cast<DWORD>(line.size()), &written, nullptr);
+}

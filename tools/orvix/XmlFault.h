@@ -1,0 +1,15 @@
+#pragma once
+
+#include <optional>
+#include <string>
+
+/// Where an XML file is not well-formed, and why, as the system's XML service says.
+struct XmlFault
+{
+    /// The first fault of a file; nothing when the service names none. COM is initialised for the call.
+    static std::optional<XmlFault> Find(const std::wstring& path);
+
+    int line = 0;
+    int column = 0;
+    std::wstring reason;
+};
