@@ -12,16 +12,26 @@ set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
 set(CMAKE_SHARED_LIBRARY_PREFIX "")
 set(CMAKE_SHARED_MODULE_PREFIX "")
 
-# One C++ run-time inside each module for GCC, so that a DLL needs only Windows and its companions.
-add_library(orvix_build INTERFACE)
-target_compile_definitions(orvix_build INTERFACE UNICODE _UNICODE NOMINMAX WIN32_LEAN_AND_MEAN _WIN32_WINNT=0x0A00)
+# How a module is built; installed as well, for plug-ins and hosts outside the tree. One C++ run-time inside each module
+# for GCC, so that a DLL needs only Windows and its companions.
+add_library(BuildOptions INTERFACE)
+target_compile_features(BuildOptions INTERFACE cxx_std_20)
+target_compile_definitions(BuildOptions INTERFACE UNICODE _UNICODE NOMINMAX WIN32_LEAN_AND_MEAN _WIN32_WINNT=0x0A00)
 if(MSVC)
   # C4251: exported records hold standard containers; host and library share one tool chain.
-  target_compile_options(orvix_build INTERFACE /W4 /WX /wd4251 /utf-8 /permissive- /EHsc)
-  target_compile_definitions(orvix_build INTERFACE _CRT_SECURE_NO_WARNINGS)
+  target_compile_options(BuildOptions INTERFACE /wd4251 /utf-8 /permissive- /EHsc)
+  target_compile_definitions(BuildOptions INTERFACE _CRT_SECURE_NO_WARNINGS)
+else()
+  target_link_options(BuildOptions INTERFACE -static -static-libgcc -static-libstdc++)
+endif()
+
+# The tree's own sources, moreover, compile without a warning.
+add_library(orvix_build INTERFACE)
+target_link_libraries(orvix_build INTERFACE BuildOptions)
+if(MSVC)
+  target_compile_options(orvix_build INTERFACE /W4 /WX)
 else()
   target_compile_options(orvix_build INTERFACE -Wall -Wextra -Wshadow -Wconversion -Werror)
-  target_link_options(orvix_build INTERFACE -static -static-libgcc -static-libstdc++)
 endif()
 
 # orvix_windows_path(<variable> <path>): the path as a Windows program sees it. Wine maps "/" to drive Z.

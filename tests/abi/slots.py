@@ -1,11 +1,15 @@
 #!/usr/bin/env python3
-"""Compares the virtual tables that the public headers give under GCC's and Microsoft's ABI with slots.txt."""
+"""Compares the virtual tables that the headers give under GCC's and Microsoft's ABI with slots.txt."""
 
 import re
 import sys
 from pathlib import Path
 
 import compilers
+
+# Interfaces within the library whose order is fixed as well.
+INTERNAL_FOLDER = compilers.ROOT / "providers"
+INTERNAL_HEADERS = ["IOrvixMSSCC.h"]
 
 # Microsoft's table has one slot for the destructor, GCC's two.
 ABIS = {
@@ -44,12 +48,12 @@ def read_slots(path):
 def classes_with_virtual_operations():
     """The classes of the headers' texts, so that a class missing in the table is noticed."""
     names = set()
-    for folder in compilers.FOLDERS:
-        for header in folder.glob("*.h"):
-            for name, body in re.findall(r"^class (?:\w+_API )?(\w+)[^;{]*\n\{(.*?)^\};",
-                                         header.read_text(encoding="utf-8"), re.M | re.S):
-                if re.search(r"\bvirtual\b", re.sub(r"//.*", "", body)):
-                    names.add(name)
+    headers = [header for folder in compilers.FOLDERS for header in folder.glob("*.h")]
+    for header in [*headers, *(INTERNAL_FOLDER / name for name in INTERNAL_HEADERS)]:
+        for name, body in re.findall(r"^class (?:\w+_API )?(\w+)[^;{]*\n\{(.*?)^\};",
+                                     header.read_text(encoding="utf-8"), re.M | re.S):
+            if re.search(r"\bvirtual\b", re.sub(r"//.*", "", body)):
+                names.add(name)
     return names
 
 
@@ -86,10 +90,11 @@ def main():
     slots = read_slots(Path(__file__).with_name("slots.txt"))
     errors = [f"{name}: stands in only one of the headers and slots.txt"
               for name in sorted(classes_with_virtual_operations() ^ slots.keys())]
-    source = compilers.include_all(compilers.HEADERS)
+    source = compilers.include_all([*compilers.HEADERS, *INTERNAL_HEADERS])
     source += "".join(address_of_an_operation(name, operations) for name, operations in slots.items())
 
-    commands = [[*compilers.clang(target), "-Xclang", "-fdump-vtable-layouts", "-S", "-emit-llvm", "-o", "/dev/null"]
+    commands = [[*compilers.clang(target), f"-I{INTERNAL_FOLDER}",
+                 "-Xclang", "-fdump-vtable-layouts", "-S", "-emit-llvm", "-o", "/dev/null"]
                 for target in ABIS]
     for (target, abi), result in zip(ABIS.items(), compilers.compile_all([(command, source) for command in commands])):
         if result.returncode != 0:
