@@ -32,5 +32,6 @@ public:
 };
 
 void BenchLists(MeasureTable& table);
+void BenchMssccci(MeasureTable& table);
 void BenchFiles(MeasureTable& table);
 void BenchNotifications(MeasureTable& table);

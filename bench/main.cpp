@@ -4,6 +4,7 @@
 int main()
 {
     MeasureTable table;
+    BenchMssccci(table);
     BenchLists(table);
     BenchFiles(table);
     BenchNotifications(table);
