@@ -1,16 +1,39 @@
 # Sourced by the other scripts: where the tree is, and its own quiet Wine prefix.
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 export WINEPREFIX=${ORVIX_WINEPREFIX:-$root/build/wine-prefix}
-export WINEARCH=win64 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree=;mshtml=;winemenubuilder.exe="
+export WINEARCH=win64 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree=;mshtml=;winemenubuilder.exe=;winedbg.exe="
 export LC_ALL=C.UTF-8 # in another locale Wine has no files with foreign letters in their names
 wineserver=/usr/lib/wine/wineserver
+
+# What `at_exit COMMAND...` is given runs when the script ends, the last one first.
+at_exit() {
+    exit_commands="${*@Q};${exit_commands:-}"
+    trap "$exit_commands" EXIT
+}
+
+# One X server without a screen serves the rest of the calling script, which shows its windows there and never on the
+# user's own display. It goes before use_one_wineserver: a wineserver keeps the display that it began with. Without such
+# an X server there is no display, and the tests that need one are skipped.
+use_virtual_display() {
+    unset DISPLAY
+    local number
+    exec {number}< <(exec Xvfb -displayfd 1 -screen 0 1280x1024x24 -nolisten tcp 2>/dev/null)
+    local xvfb=$!
+    if read -r -t 30 -u "$number" DISPLAY; then
+        export DISPLAY=:$DISPLAY
+        at_exit kill "$xvfb"
+    else
+        unset DISPLAY
+        echo "no display (Xvfb does not start): the tests of the dialogs are skipped"
+    fi
+}
 
 # One wineserver serves the rest of the calling script: it starts here, with no pipe of the script in its hands, and
 # is stopped when the script ends. One that was running already stays; ORVIX_KEEP_WINESERVER=1 keeps this one too.
 use_one_wineserver() {
     if ! "$wineserver" -k0; then
         "$wineserver" -p </dev/null >/dev/null 2>&1
-        [ "${ORVIX_KEEP_WINESERVER:-0}" = 1 ] || trap '"$wineserver" -k' EXIT
+        [ "${ORVIX_KEEP_WINESERVER:-0}" = 1 ] || at_exit "$wineserver" -k
     fi
     # An idle program keeps the services up, which the first program starts and the last one stops: 1.5 s each time.
     # It ends with the script, which holds the other end of its input.
