@@ -156,6 +156,15 @@ OrvixFileIO::Node* OrvixFileIO::GetDocumentRoot()
     return m_rootNode ? std::addressof(m_rootNode) : nullptr;
 }
 
+bool OrvixFileIO::GetRootElement(Node& root, std::wstring& name)
+{
+    ComPtr<IXMLDOMElement> element;
+    if (!m_document || FAILED(m_document->get_documentElement(&element)) || !element)
+        return false;
+    root = element;
+    return GetNodeName(root.Get(), name);
+}
+
 long OrvixFileIO::NumChildNodes(IXMLDOMNode* node)
 {
     ComPtr<IXMLDOMNodeList> children;

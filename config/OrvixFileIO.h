@@ -58,6 +58,9 @@ public:
     /// The document node of an opened document; null otherwise. Owned by this object.
     Node* GetDocumentRoot();
 
+    /// The root element, whatever stands around it, and its name; false when there is none.
+    bool GetRootElement(Node& root, std::wstring& name);
+
     /// Number of child nodes; 0 when they cannot be read.
     long NumChildNodes(IXMLDOMNode* node);
 

@@ -154,24 +154,6 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
     }
 }
 
-/// Finds the root element among the document's children; null when there is none.
-OrvixFileIO::Node FindRoot(OrvixFileIO& file, IXMLDOMNode* document, ReadingLog* log)
-{
-    // By index: not every document type knows its next sibling.
-    OrvixFileIO::Node node;
-    std::wstring name;
-    for (long i = 0; file.GetChildNode(document, i, node); ++i)
-    {
-        if (!file.GetNodeName(node.Get(), name))
-            continue;
-        if (log)
-            log->root = name;
-        if (IsNamed(name, OrvixProviderConfigManager::RootName))
-            return node;
-    }
-    return nullptr;
-}
-
 /// Whether the configuration applies to a provider of this name, which is in upper case.
 bool Applies(const OrvixProviderConfig& config, const std::wstring& providerName)
 {
@@ -192,14 +174,16 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log
         if (!file.OpenDocument(path))
             return false;
         const OpenedDocument opened(file);
-        const OrvixFileIO::Node* document = file.GetDocumentRoot();
-        const OrvixFileIO::Node root = document ? FindRoot(file, document->Get(), log) : nullptr;
+        OrvixFileIO::Node root;
+        std::wstring rootName;
+        const bool hasRoot = file.GetRootElement(root, rootName) && IsNamed(rootName, RootName);
         if (log)
         {
             log->content = file.GetContent();
-            log->hasRoot = root != nullptr;
+            log->hasRoot = hasRoot;
+            log->root = rootName;
         }
-        if (!root)
+        if (!hasRoot)
             return false;
 
         Reading reading{{}, {}, ReadingPlace(log)};

@@ -41,8 +41,8 @@ void Describe(OrvixFileIO& file, ReadingLog& log)
     OrvixFileIO::Node node;
     log.content = file.GetContent();
     log.hasRoot = file.GetChildNode(nullptr, RootIndex, node) && file.GetNodeName(node.Get(), log.root);
-    for (long i = 0; !log.hasRoot && log.root.empty() && file.GetChildNode(nullptr, i, node); ++i)
-        file.GetNodeName(node.Get(), log.root);
+    if (!log.hasRoot)
+        file.GetRootElement(node, log.root);
 }
 
 /// The remarks on one node below the root.

@@ -317,7 +317,8 @@ SCCRTN OrvixMSSCC::SetOption(LONG option, LONG value)
     return Call(SccFunctions::SetOption, m_context, option, value);
 }
 
-/// Takes the auxiliary path and the project name from the settings file; what cannot be read leaves them.
+/// Takes the auxiliary path and the project name from the settings file. What cannot be read, for want of memory as
+/// well, leaves them.
 void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
 {
     if (m_settingsFileName.empty() || !folder)
@@ -329,14 +330,11 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
         const OpenedDocument opened(file);
         OrvixFileIO::Node root;
         std::wstring name;
-        bool more = file.GetFirstChild(nullptr, root);
-        while (more && !(file.GetNodeName(root.Get(), name) && EqualNames(name, RootName)))
-            more = file.GetNextSibling(root);
-        if (!more)
+        if (!file.GetRootElement(root, name) || !EqualNames(name, RootName))
             return false;
         OrvixFileIO::Node child;
         std::wstring text;
-        for (more = file.GetFirstChild(root.Get(), child); more; more = file.GetNextSibling(child))
+        for (bool more = file.GetFirstChild(root.Get(), child); more; more = file.GetNextSibling(child))
         {
             if (!file.GetNodeName(child.Get(), name) || !file.GetNodeText(child.Get(), text))
                 continue;
@@ -349,7 +347,7 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
     });
 }
 
-/// Writes both texts; failures are silent.
+/// Writes both texts; failures are silent, those of memory as well: the project is open all the same.
 void OrvixMSSCC::WriteProjectSettings(const wchar_t* folder)
 {
     if (m_settingsFileName.empty() || !folder)

@@ -22,7 +22,7 @@ struct SccFunction;
 /// Texts are cut to the field's limit, between characters on their way to the library.
 ///
 /// Where the interface leaves the choice: a library that asks for a project (`GetProjPath`) may make a new one, and
-/// the context of a failed start is dropped.
+/// the context and the capabilities of a failed start are dropped.
 class OrvixMSSCC final : public IOrvixMSSCC
 {
 public:

@@ -75,10 +75,12 @@ TEST_F(BridgeInitialize, TakesBackTheNameAndTheAuxiliaryPathLabel)
     EXPECT_STREQ(m_bridge->GetProviderName(), L"Depot");
 }
 
-TEST_F(BridgeInitialize, ThatFailsLeavesTheBridgeWithoutContextAndNewTexts)
+TEST_F(BridgeInitialize, ThatFailsLeavesTheBridgeWithoutContextCapabilitiesAndNewTexts)
 {
-    m_recorder.initialize = [](LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG, LPSTR label, LPLONG, LPLONG) {
+    m_recorder.initialize = [](LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabilities, LPSTR label, LPLONG,
+                               LPLONG) {
         *context = reinterpret_cast<LPVOID>(0x99);
+        *capabilities = SCC_CAP_ADDFROMSCC;
         std::strcpy(sccName, "Own name");
         std::strcpy(label, "Server:");
         return SCC_E_NONSPECIFICERROR;
@@ -92,6 +94,7 @@ TEST_F(BridgeInitialize, ThatFailsLeavesTheBridgeWithoutContextAndNewTexts)
         EXPECT_EQ(calls.back(), "SccInitialize(0x0, 0x1234, \"host\", \"Depot\", \"\")");
     }
     EXPECT_EQ(m_bridge->Properties("C:\\a"), SCC_OK);
+    EXPECT_EQ(m_bridge->AddFromScc(nullptr, nullptr), SCC_E_OPNOTSUPPORTED);
     EXPECT_THAT(Calls(), ElementsAre("SccProperties(0x0, 0x1234, \"C:\\a\")"));
 }
 

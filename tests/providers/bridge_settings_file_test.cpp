@@ -106,6 +106,16 @@ TEST_F(SettingsFileReading, FindsARootBehindOtherNodes)
                "a", "name");
 }
 
+TEST_F(SettingsFileReading, FindsTheRootBehindADocumentTypeThatNothingRefersTo)
+{
+    for (const char* type : {"<!DOCTYPE MSSCCProjectSettings>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)",
+                             R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
+    {
+        SCOPED_TRACE(type);
+        ExpectRead(type + Shape("server", "$/song").substr(Shape("", "").find("<MSS")), "server", "$/song");
+    }
+}
+
 TEST_F(SettingsFileReading, CutsATextAt260Characters)
 {
     ExpectRead(Shape("", std::string(261, 'p')), "", std::string(260, 'p'));

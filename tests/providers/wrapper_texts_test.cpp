@@ -209,11 +209,11 @@ TEST_F(WrapperOutput, ReachesTheHostAsWideTextOfKindZero)
 {
     InitializeFor(*m_wrapper, &Host());
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
-    for (const LONG kind :
-         {SCC_MSG_INFO, SCC_MSG_WARNING, SCC_MSG_ERROR, LONG{4}, LONG{6}, LONG{0}, LONG{-1}, LONG{999}})
+    for (LONG kind = -1; kind <= 12; ++kind)
         EXPECT_EQ(output("text", kind), 0);
+    EXPECT_EQ(output("text", 999), 0);
     EXPECT_EQ(output("", SCC_MSG_INFO), 0);
-    EXPECT_EQ(Host().lines.size(), 9u);
+    EXPECT_EQ(Host().lines.size(), 16u);
     EXPECT_EQ(Host().lines.back(), OutputHost::Line(L"", 0));
     Host().lines.pop_back();
     EXPECT_THAT(Host().lines, Each(OutputHost::Line(L"text", 0)));

@@ -3,9 +3,12 @@
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
 
+#include <cstring>
 #include <string_view>
 
+using testing::AllOf;
 using testing::ElementsAre;
+using testing::HasSubstr;
 
 namespace
 {
@@ -141,4 +144,29 @@ TEST_F(InstalledOperation, HasNothingToDoWhereNoFileAllowsIt)
 {
     EXPECT_THAT(Run(CheckOut, AllowsCheckOut, SCC_STATUS_CONTROLLED | SCC_STATUS_OUTOTHER), ElementsAre(Query()));
     EXPECT_EQ(m_files.NumActiveEntries(), 3u);
+}
+
+TEST_F(InstalledOperation, WorksOnAProjectThatItsSettingsFileNames)
+{
+    m_services->Shutdown();
+    WriteProviders("<a><Name>Recorded</Name><MSSCCProjectFile>project.xml</MSSCCProjectFile></a>");
+    WriteBytes(m_project.Path() / L"project.xml",
+               "<MSSCCProjectSettings><AuxPath>server:1</AuxPath><ProjectName>$/song</ProjectName>"
+               "</MSSCCProjectSettings>");
+    m_provider = InitializeAndGet();
+    ASSERT_NE(m_provider, nullptr);
+    ASSERT_EQ(m_provider->Initialize(&m_info), 0);
+    m_scc.Take();
+    m_scc.openProject = [](LPVOID, HWND, LPSTR, LPCSTR, LPCSTR, LPSTR auxPath, LPCSTR, LPTEXTOUTPROC, LONG) {
+        std::strcpy(auxPath, "server:2");
+        return SCC_OK;
+    };
+    ASSERT_EQ(m_provider->OpenProject(m_project.Text().c_str(), L""), 0);
+    EXPECT_THAT(m_scc.Take(), ElementsAre("SccOpenProject(0x0, 0x0, \"\", \"$/song\", \"" + m_project.Path().string() +
+                                          "\", \"server:1\", \"\", 0x1)"));
+
+    EXPECT_THAT(Run(CheckOut, AllowsCheckOut, SCC_STATUS_CONTROLLED),
+                ElementsAre(Query(), "SccCheckout(0x0, 0x0, " + Controlled() + R"(, "a comment", 0x0, 0x0))"));
+    EXPECT_THAT(ReadBytes(m_project.Path() / L"project.xml"),
+                AllOf(HasSubstr("<AuxPath>server:2</AuxPath>"), HasSubstr("<ProjectName>$/song</ProjectName>")));
 }
