@@ -29,7 +29,8 @@ public:
     /// that starts with two forward slashes gets two backslashes in their place; nothing else is changed.
     virtual void SetFile(const wchar_t* file);
 
-    /// Flags set by the host, on which `OrvixFileList::BuildActiveList` selects; 0 by default.
+    /// Flags set by the host, on which `OrvixFileList::BuildActiveList` selects; 0 by default. Bit 0x1 is set by
+    /// `IOrvixServices::RunFileListOperation` on the entries that fit.
     virtual unsigned long GetFlagsIn();
     virtual void SetFlagsIn(unsigned long flags);
 
@@ -37,7 +38,8 @@ public:
     virtual long long GetClientPtr();
     virtual void SetClientPtr(long long value);
 
-    /// State flags written by a provider (see `IOrvixProvider::QueryStatus`); 0 by default.
+    /// State flags written by a provider (see `IOrvixProvider::QueryStatus`); 0 by default. The file-list dialog
+    /// overwrites bit 0x2 with the user's tick.
     virtual unsigned long GetFlagsOut();
     virtual void SetFlagsOut(unsigned long flags);
 

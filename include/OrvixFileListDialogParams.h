@@ -21,8 +21,8 @@ public:
     OrvixFileListDialogParams& operator=(const OrvixFileListDialogParams&) = delete;
     virtual ~OrvixFileListDialogParams();
 
-    /// Bit set read and written by the dialog and by `IOrvixServices::RunFileListOperation`; 0 by default.
-    /// The setter stands first: that order is part of the published table.
+    /// Bit set read and written by the dialog and by `IOrvixServices::RunFileListOperation`; 0 by default. The bits:
+    /// docs/host.md. The setter stands first: that order is part of the published table.
     virtual void SetOptions(std::uint32_t options);
     virtual std::uint32_t GetOptions();
 

@@ -11,8 +11,8 @@ from pathlib import Path
 from typing import NamedTuple
 
 ROOT = Path(__file__).resolve().parents[2]
-GUIDES = sorted([ROOT / "README.md", *(ROOT / "docs").glob("*.md"), *(ROOT / "samples").rglob("*.md")])
-FENCE = re.compile(r"^(?:<!-- (?P<mark>\w+): (?P<value>[^\n]*) -->\n)?```(?P<language>\w+)\n(?P<text>.*?)^```$", re.M | re.S)
+GUIDES = sorted([ROOT / "README.md", *(ROOT / "docs").rglob("*.md"), *(ROOT / "samples").rglob("*.md")])
+FENCE = re.compile(r"^(?:<!-- (?P<mark>\w+): (?P<value>[^\n]*) -->\n)?```(?P<language>\w*)\n(?P<text>.*?)^```$", re.M | re.S)
 
 
 class Example(NamedTuple):

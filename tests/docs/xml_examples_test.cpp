@@ -1,7 +1,7 @@
 // Every XML example of the guides says only what the library reads.
 
 #include "Bridge.h"
-#include "Files.h"
+#include "Guides.h"
 #include "OrvixFileIO.h"
 #include "OrvixPromptTable.h"
 #include "OrvixProviderConfig.h"
@@ -10,25 +10,12 @@
 #include "ProviderFilters.h"
 #include "UpperCase.h"
 
-#include <filesystem>
 #include <functional>
-#include <ostream>
 #include <regex>
 #include <set>
 
 namespace
 {
-
-struct Example
-{
-    std::string guide;
-    std::string xml;
-};
-
-void PrintTo(const Example& example, std::ostream* stream)
-{
-    *stream << example.guide << ":\n" << example.xml;
-}
 
 /// The text with other words in the place of those that the library assumes anyway: only so is it seen that they are
 /// read.
@@ -39,31 +26,26 @@ std::string WithoutDefaults(const std::string& xml)
 }
 
 /// The fenced XML of every guide. A fragment without one of the three roots is what stands below OrvixProviders.
-std::vector<Example> Examples()
+std::vector<Guides::Fence> Examples()
 {
-    static const std::regex fence("```xml\n([^`]*)```");
     static const std::regex root("<(OrvixProviders|OrvixPrompts|MSSCCProjectSettings)\\b");
-    std::vector<Example> examples;
-    for (const auto& file : std::filesystem::directory_iterator(ORVIX_GUIDES))
+    std::vector<Guides::Fence> examples = Guides::Fences();
+    std::erase_if(examples, [](const Guides::Fence& fence) { return fence.language != "xml"; });
+    for (Guides::Fence& example : examples)
     {
-        std::string text = ReadBytes(file.path());
-        std::erase(text, '\r');
-        for (std::sregex_iterator found(text.begin(), text.end(), fence), end; found != end; ++found)
-        {
-            const std::string xml = WithoutDefaults(found->str(1));
-            examples.push_back({file.path().stem().string(),
-                                std::regex_search(xml, root) ? xml : "<OrvixProviders>" + xml + "</OrvixProviders>"});
-        }
+        example.text = WithoutDefaults(example.text);
+        if (!std::regex_search(example.text, root))
+            example.text = "<OrvixProviders>" + example.text + "</OrvixProviders>";
     }
     return examples;
 }
 
 using Texts = std::vector<std::wstring>;
 
-class XmlExample : public Bridge, public testing::WithParamInterface<Example>
+class XmlExample : public Bridge, public testing::WithParamInterface<Guides::Fence>
 {
 protected:
-    XmlExample() { WriteBytes(m_path, GetParam().xml); }
+    XmlExample() { WriteBytes(m_path, GetParam().text); }
 
     /// Calls `visit` for the example's document while it is open.
     void WithDocument(const std::function<void(OrvixFileIO& file, IXMLDOMNode* root)>& visit) const
