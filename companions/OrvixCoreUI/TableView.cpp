@@ -16,6 +16,9 @@ namespace
 /// The state image of a row with a check box: number 1 not ticked, number 2 ticked.
 constexpr UINT StateImageShift = 12;
 
+/// The control's -1: every place to set a state of, and the place before the first.
+constexpr auto AllPlaces = static_cast<std::size_t>(-1);
+
 struct DestroyMenuDeleter
 {
     void operator()(HMENU menu) const { DestroyMenu(menu); }
@@ -52,10 +55,9 @@ void TableView::AddRow(std::vector<std::wstring> cells, bool ticked)
     m_ticked.push_back(ticked);
 }
 
-void TableView::Refresh() const
+void TableView::Refresh()
 {
-    SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
-    InvalidateRect(m_window, nullptr, TRUE);
+    KeepingSelection([] {});
 }
 
 void TableView::SetCell(std::size_t row, std::size_t column, std::wstring text)
@@ -83,10 +85,8 @@ void TableView::TickShown(bool ticked)
 
 std::optional<std::size_t> TableView::Selected() const
 {
-    const auto places = SelectedPlaces();
-    if (places.empty())
-        return std::nullopt;
-    return m_table.RowAt(places.front());
+    const auto place = Next(AllPlaces, LVNI_SELECTED);
+    return place ? std::optional(m_table.RowAt(*place)) : std::nullopt;
 }
 
 void TableView::FitColumns() const
@@ -138,7 +138,7 @@ LRESULT TableView::Handle(const NMHDR& notification)
         return 0;
     case LVN_KEYDOWN:
         if (reinterpret_cast<const NMLVKEYDOWN*>(header)->wVKey == VK_SPACE)
-            ToggleSelected();
+            ToggleFocused();
         return 0;
     case NM_CLICK:
     case NM_DBLCLK:
@@ -201,30 +201,53 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
     std::vector<bool> selected(m_table.NumRows());
     for (const std::size_t place : SelectedPlaces())
         selected[m_table.RowAt(place)] = true;
-    Select(static_cast<std::size_t>(-1), false);
+    const auto focusedPlace = Next(AllPlaces, LVNI_FOCUSED);
+    const auto focusedRow = focusedPlace ? std::optional(m_table.RowAt(*focusedPlace)) : std::nullopt;
+    SetState(AllPlaces, LVIS_SELECTED, 0);
     rearrange();
-    Refresh();
+    SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
+    InvalidateRect(m_window, nullptr, TRUE);
+    if (m_table.NumShown() == 0)
+        return;
+
+    std::size_t focused = 0;
+    bool anySelected = false;
     for (std::size_t place = 0; place < m_table.NumShown(); ++place)
     {
-        if (selected[m_table.RowAt(place)])
-            Select(place, true);
+        const std::size_t row = m_table.RowAt(place);
+        if (row == focusedRow)
+            focused = place;
+        if (selected[row])
+        {
+            SetState(place, LVIS_SELECTED, LVIS_SELECTED);
+            anySelected = true;
+        }
     }
+    // The keyboard goes on from here.
+    SetState(focused, LVIS_FOCUSED, LVIS_FOCUSED);
+    if (!anySelected)
+        SetState(focused, LVIS_SELECTED, LVIS_SELECTED);
+    SendMessageW(m_window, LVM_SETSELECTIONMARK, 0, static_cast<LPARAM>(focused));
+    SendMessageW(m_window, LVM_ENSUREVISIBLE, focused, FALSE);
 }
 
-void TableView::Select(std::size_t place, bool selected) const
+void TableView::SetState(std::size_t place, UINT states, UINT value) const
 {
     LVITEMW item{};
-    item.stateMask = LVIS_SELECTED;
-    item.state = selected ? LVIS_SELECTED : 0;
+    item.stateMask = states;
+    item.state = value;
     Send(LVM_SETITEMSTATE, place, &item);
 }
 
-void TableView::ToggleSelected()
+void TableView::ToggleFocused()
 {
-    const auto places = SelectedPlaces();
-    if (places.empty())
+    const auto focused = Next(AllPlaces, LVNI_FOCUSED);
+    if (!focused)
         return;
-    const bool ticked = !m_ticked[m_table.RowAt(places.front())];
+    std::vector<std::size_t> places = SelectedPlaces();
+    if (!std::binary_search(places.begin(), places.end(), *focused))
+        places = {*focused};
+    const bool ticked = !m_ticked[m_table.RowAt(*focused)];
     for (const std::size_t place : places)
         m_ticked[m_table.RowAt(place)] = ticked;
     InvalidateRect(m_window, nullptr, FALSE);
@@ -264,13 +287,17 @@ LRESULT TableView::Find(const NMLVFINDITEMW& search) const
 std::vector<std::size_t> TableView::SelectedPlaces() const
 {
     std::vector<std::size_t> places;
-    const auto next = [this](LRESULT after) {
-        return SendMessageW(m_window, LVM_GETNEXTITEM, static_cast<WPARAM>(after), LVNI_SELECTED);
-    };
-    for (LRESULT place = next(-1); place >= 0 && static_cast<std::size_t>(place) < m_table.NumShown();
-         place = next(place))
-        places.push_back(static_cast<std::size_t>(place));
+    for (auto place = Next(AllPlaces, LVNI_SELECTED); place; place = Next(*place, LVNI_SELECTED))
+        places.push_back(*place);
     return places;
+}
+
+std::optional<std::size_t> TableView::Next(std::size_t after, UINT state) const
+{
+    const LRESULT place = SendMessageW(m_window, LVM_GETNEXTITEM, after, state);
+    if (place < 0 || static_cast<std::size_t>(place) >= m_table.NumShown())
+        return std::nullopt;
+    return static_cast<std::size_t>(place);
 }
 
 LRESULT TableView::Send(UINT message, WPARAM wParam, const void* argument) const

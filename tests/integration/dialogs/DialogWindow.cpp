@@ -238,6 +238,20 @@ bool DialogWindow::IsRowTicked(const std::wstring& list, int row) const
     return state >> 12 == 2;
 }
 
+bool DialogWindow::IsRowInView(const std::wstring& list, int row) const
+{
+    const LRESULT top = SendMessageW(Control(list), LVM_GETTOPINDEX, 0, 0);
+    return row >= top && row < top + SendMessageW(Control(list), LVM_GETCOUNTPERPAGE, 0, 0);
+}
+
+std::vector<bool> DialogWindow::Ticks(const std::wstring& list) const
+{
+    std::vector<bool> ticks;
+    for (int row = 0; row < NumRows(list); ++row)
+        ticks.push_back(IsRowTicked(list, row));
+    return ticks;
+}
+
 void DialogWindow::SelectRow(const std::wstring& list, int row) const
 {
     Focus(list);
@@ -245,10 +259,17 @@ void DialogWindow::SelectRow(const std::wstring& list, int row) const
     for (int i = 0; i < row; ++i)
         Press(VK_DOWN);
     // Home and Down leave a list alone whose focus is there already.
-    LVITEMW item{};
-    item.stateMask = LVIS_SELECTED | LVIS_FOCUSED;
-    item.state = LVIS_SELECTED | LVIS_FOCUSED;
-    SendMessageW(Control(list), LVM_SETITEMSTATE, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&item));
+    SetRowState(list, row, LVIS_SELECTED | LVIS_FOCUSED);
+}
+
+void DialogWindow::SelectEveryRow(const std::wstring& list) const
+{
+    SetRowState(list, -1, LVIS_SELECTED);
+}
+
+void DialogWindow::FocusRow(const std::wstring& list, int row) const
+{
+    SetRowState(list, row, LVIS_FOCUSED);
 }
 
 void DialogWindow::ClickHeading(const std::wstring& list, int column) const
@@ -282,6 +303,14 @@ HWND DialogWindow::FocusWindow() const
     info.cbSize = sizeof info;
     GetGUIThreadInfo(GetWindowThreadProcessId(m_window, nullptr), &info);
     return info.hwndFocus ? info.hwndFocus : m_window;
+}
+
+void DialogWindow::SetRowState(const std::wstring& list, int row, UINT states) const
+{
+    LVITEMW item{};
+    item.stateMask = states;
+    item.state = states;
+    SendMessageW(Control(list), LVM_SETITEMSTATE, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&item));
 }
 
 void DialogWindow::Post(HWND control, UINT message, WPARAM wParam, LPARAM lParam) const

@@ -58,7 +58,12 @@ public:
     std::wstring Cell(const std::wstring& list, int row, int column) const;
     std::vector<std::wstring> Column(const std::wstring& list, int column) const;
     bool IsRowTicked(const std::wstring& list, int row) const;
+    bool IsRowInView(const std::wstring& list, int row) const;
+    std::vector<bool> Ticks(const std::wstring& list) const;
     void SelectRow(const std::wstring& list, int row) const;
+    void SelectEveryRow(const std::wstring& list) const;
+    /// Moves the focus to a row and leaves the selection, as Ctrl and an arrow key do.
+    void FocusRow(const std::wstring& list, int row) const;
     void ClickHeading(const std::wstring& list, int column) const;
     /// Opens a control's menu by the keyboard and chooses the item with this number, from 1.
     void ChooseFromMenu(const std::wstring& name, int item) const;
@@ -66,6 +71,7 @@ public:
 
 private:
     HWND FocusWindow() const;
+    void SetRowState(const std::wstring& list, int row, UINT states) const;
     void Post(HWND control, UINT message, WPARAM wParam, LPARAM lParam) const;
     void ClickAt(HWND control, LONG x, LONG y) const;
 

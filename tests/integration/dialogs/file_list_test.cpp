@@ -102,6 +102,88 @@ TEST_F(FileListDialog, IsTickedByTheSpaceBar)
     EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut() & 0x2, 0U);
 }
 
+TEST_F(FileListDialog, IsTickedByTabSpaceAndArrowsAlone)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    AddFile(L"c");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.Press(VK_TAB);
+        EXPECT_EQ(dialog.Focused(), List);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, true, true}));
+        dialog.Press(VK_DOWN);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, false, true}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, TicksTheRowWithTheFocusAndNotASelectedOneElsewhere)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    AddFile(L"c");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.SelectRow(List, 0);
+        dialog.FocusRow(List, 2);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{true, true, false}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, TicksTheSelectedRowsTogether)
+{
+    AddFile(L"a", 0x2, false);
+    AddFile(L"b");
+    AddFile(L"c");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.Focus(List);
+        dialog.SelectEveryRow(List);
+        dialog.FocusRow(List, 1);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, false, false})) << "as the one with the focus";
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, LetsTheKeyboardGoOnFromTheSameRowAfterSortingAndFiltering)
+{
+    AddFile(L"b");
+    AddFile(L"a");
+    AddFile(L"x");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.ClickHeading(List, 0);
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"a", L"b", L"x"}));
+        dialog.Focus(List);
+        dialog.Press(VK_DOWN);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{true, true, false})) << "x stands below b";
+        SetWindowTextW(dialog.Control(L"Filter:"), L"x");
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{true}));
+        SetWindowTextW(dialog.Control(L"Filter:"), L"b");
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false})) << "the only row is reached without an arrow key";
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, ScrollsToTheRowWithTheFocusAfterSortingAndFiltering)
+{
+    for (int i = 999; i >= 100; --i)
+        AddFile(std::to_wstring(i).c_str());
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.ClickHeading(List, 0);
+        EXPECT_EQ(dialog.Cell(List, 899, 0), L"999");
+        EXPECT_TRUE(dialog.IsRowInView(List, 899));
+        SetWindowTextW(dialog.Control(L"Filter:"), L"9");
+        EXPECT_TRUE(dialog.IsRowInView(List, dialog.NumRows(List) - 1));
+        Cancel(dialog);
+    });
+}
+
 TEST_F(FileListDialog, TakesEveryEntryWhereNoTicksAreOffered)
 {
     OrvixFileEntry& entry = AddFile(L"a", 0x4, false);

@@ -89,7 +89,7 @@ TEST_F(PromptEditorDialog, ReportsNoChangeWhereAnAnswerIsChangedBack)
 TEST_F(PromptEditorDialog, ResetsAnAnswerToAsk)
 {
     EXPECT_EQ(ShowEditor([](const DialogWindow& dialog) {
-                  EXPECT_FALSE(dialog.IsEnabled(L"Reset to ask")) << "nothing is selected";
+                  EXPECT_TRUE(dialog.IsEnabled(L"Reset to ask")) << "the first prompt is selected from the beginning";
                   dialog.SelectRow(List, 1);
                   EXPECT_FALSE(dialog.IsEnabled(L"Reset to ask")) << "it asks already";
                   dialog.SelectRow(List, 0);
@@ -100,6 +100,29 @@ TEST_F(PromptEditorDialog, ResetsAnAnswerToAsk)
               }),
               1);
     EXPECT_EQ(m_services->GetPromptAction(1), 0x1U);
+}
+
+TEST_F(PromptEditorDialog, IsHandledByTabAndArrowsAlone)
+{
+    ShowEditor([](const DialogWindow& dialog) {
+        dialog.Press(VK_TAB);
+        EXPECT_EQ(dialog.Focused(), List);
+        EXPECT_EQ(dialog.Chosen(Answer), L"Yes");
+        dialog.Press(VK_DOWN);
+        EXPECT_EQ(dialog.Chosen(Answer), L"Ask") << "the second one's";
+        dialog.Press(VK_ESCAPE);
+    });
+}
+
+TEST_F(PromptEditorDialog, OffersNothingToChangeWhereTheSearchFindsNothing)
+{
+    ShowEditor([](const DialogWindow& dialog) {
+        dialog.Type(L"nowhere");
+        EXPECT_EQ(dialog.NumRows(List), 0);
+        EXPECT_FALSE(dialog.IsEnabled(Answer));
+        EXPECT_FALSE(dialog.IsEnabled(L"Reset to ask"));
+        dialog.Press(VK_ESCAPE);
+    });
 }
 
 TEST_F(PromptEditorDialog, OffersTheAnswersThatThePromptsOptionsName)
