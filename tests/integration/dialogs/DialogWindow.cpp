@@ -11,6 +11,9 @@
 namespace
 {
 
+/// Of a key message: a first press, with Alt.
+constexpr LPARAM AltIsDown = 0x20000001;
+
 std::wstring TextOf(HWND window)
 {
     std::wstring text(static_cast<std::size_t>(SendMessageW(window, WM_GETTEXTLENGTH, 0, 0)), L'\0');
@@ -102,8 +105,12 @@ void DialogWindow::Type(const std::wstring& text) const
 
 void DialogWindow::PressAlt(wchar_t accessKey) const
 {
-    constexpr LPARAM AltIsDown = 0x20000001;
     Post(FocusWindow(), WM_SYSCHAR, accessKey, AltIsDown);
+}
+
+void DialogWindow::PressAltDown() const
+{
+    Post(FocusWindow(), WM_SYSKEYDOWN, VK_DOWN, AltIsDown);
 }
 
 std::wstring DialogWindow::Focused() const
@@ -178,9 +185,11 @@ void DialogWindow::Choose(const std::wstring& name, const std::wstring& item) co
     const auto found = std::find(items.begin(), items.end(), item);
     if (found == items.end())
         throw std::runtime_error("the list does not offer " + std::filesystem::path(item).string());
+    PressAltDown();
     Press(VK_HOME);
     while (Chosen(name) != item)
         Press(VK_DOWN);
+    Press(VK_RETURN);
 }
 
 std::vector<std::wstring> DialogWindow::Items(const std::wstring& name) const

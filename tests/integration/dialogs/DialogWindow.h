@@ -22,6 +22,8 @@ public:
     void Press(WORD key) const;
     void Type(const std::wstring& text) const;
     void PressAlt(wchar_t accessKey) const;
+    /// Opens the drop-down list that has the focus.
+    void PressAltDown() const;
     std::wstring Focused() const;
     void Focus(const std::wstring& name) const;
 
@@ -45,7 +47,7 @@ public:
 
     std::wstring Text(const std::wstring& name) const;
 
-    /// Chooses the item of a drop-down list as a user does, and the items.
+    /// Opens a drop-down list by the keyboard and chooses an item; its items, and the one that it shows.
     void Choose(const std::wstring& name, const std::wstring& item) const;
     std::vector<std::wstring> Items(const std::wstring& name) const;
     std::wstring Chosen(const std::wstring& name) const;

@@ -312,6 +312,54 @@ TEST_F(FileListDialog, TakesTheCommentAndOffersItAgain)
     EXPECT_STREQ(m_params.GetComment(), L"second");
 }
 
+TEST_F(FileListDialog, LeavesTheTypedCommentAloneUntilARecentOneIsChosenInTheOpenList)
+{
+    AddFile(L"a");
+    m_params.SetComment(L"recent");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) { dialog.Click(L"OK"); });
+    m_params.SetComment(L"");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        constexpr const wchar_t* Recent = L"Recent comments:";
+        const HWND comment = dialog.Control(L"Comment:");
+        dialog.Focus(L"Comment:");
+        dialog.Type(L"typed");
+        dialog.Focus(Recent);
+        dialog.Press(VK_END);
+        dialog.Type(L"r");
+        PostMessageW(dialog.Control(Recent), WM_MOUSEWHEEL, MAKEWPARAM(0, -WHEEL_DELTA), 0);
+        dialog.Press(VK_UP);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "nobody opened the list";
+        dialog.Press(VK_DOWN);
+        EXPECT_TRUE(SendMessageW(dialog.Control(Recent), CB_GETDROPPEDSTATE, 0, 0));
+        dialog.Press(VK_END);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "nobody chose yet";
+        dialog.Press(VK_ESCAPE);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed");
+        dialog.Choose(Recent, L"recent");
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"recent");
+        SendMessageW(comment, EM_UNDO, 0, 0);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed");
+        dialog.Click(L"OK");
+    });
+    EXPECT_STREQ(m_params.GetComment(), L"typed");
+}
+
+TEST_F(FileListDialog, TakesARecentCommentOfAnyLength)
+{
+    AddFile(L"a");
+    std::wstring longComment;
+    while (longComment.size() < 40000)
+        longComment += std::wstring(80, L'x') + L"\r\n";
+    m_params.SetComment(longComment.c_str());
+    ShowFileList(Ticks, [](const DialogWindow& dialog) { dialog.Click(L"OK"); });
+    m_params.SetComment(L"");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.Choose(L"Recent comments:", dialog.Items(L"Recent comments:").front());
+        dialog.Click(L"OK");
+    });
+    EXPECT_TRUE(m_params.GetComment() == longComment);
+}
+
 TEST_F(FileListDialog, TakesBadRecentCommentsForNone)
 {
     AddFile(L"a");
