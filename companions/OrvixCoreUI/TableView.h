@@ -20,8 +20,8 @@ class TableView
 public:
     TableView() = default;
 
-    /// With `checkBoxes` each row can be ticked by a click on its box; the space bar ticks the row with the focus and, if
-    /// it is selected, the other selected ones with it.
+    /// With `checkBoxes` each row can be ticked by a click on its box; the space bar ticks the row with the focus and,
+    /// if it is selected, the other selected ones with it.
     TableView(HWND window, const Palette& palette, bool checkBoxes);
 
     /// Columns go before rows. `share` of the width, in percent.

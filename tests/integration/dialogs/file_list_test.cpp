@@ -62,6 +62,51 @@ TEST_F(FileListDialog, ShowsTitleMessageAndEachFileWithFolderAndState)
     });
 }
 
+TEST_F(FileListDialog, IsHighEnoughForItsMessage)
+{
+    AddFile(L"a");
+    struct Heights
+    {
+        LONG message;
+        LONG list;
+        LONG window;
+    };
+    const auto heightsWith = [this](const std::wstring& message) {
+        Heights heights{};
+        m_params.SetMessage(message.c_str());
+        ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+            const RECT place = dialog.Place(message);
+            const RECT list = dialog.Place(List);
+            EXPECT_LE(place.bottom, dialog.Place(L"Filter:").top);
+            RECT window{};
+            GetWindowRect(dialog.Handle(), &window);
+            RECT inside{};
+            GetClientRect(dialog.Handle(), &inside);
+            EXPECT_LT(dialog.Place(L"OK").bottom, inside.bottom);
+            RECT work{};
+            SystemParametersInfoW(SPI_GETWORKAREA, 0, &work, 0);
+            EXPECT_LE(window.bottom, work.bottom);
+            heights = {place.bottom - place.top, list.bottom - list.top, window.bottom - window.top};
+            Cancel(dialog);
+        });
+        return heights;
+    };
+    const auto lines = [](int count) {
+        std::wstring message = L"1";
+        for (int i = 2; i <= count; ++i)
+            message += L"\n" + std::to_wstring(i);
+        return message;
+    };
+    const Heights one = heightsWith(lines(1));
+    const Heights ten = heightsWith(lines(10));
+    const Heights twenty = heightsWith(lines(20));
+    EXPECT_NEAR(twenty.message, 2 * ten.message, 2);
+    EXPECT_EQ(ten.list, one.list);
+    EXPECT_EQ(twenty.list, one.list);
+    EXPECT_EQ(heightsWith(lines(1)).window, one.window) << "the room for a message is not remembered";
+    EXPECT_EQ(heightsWith(lines(500)).list, one.list) << "and a message has no more than the monitor";
+}
+
 TEST_F(FileListDialog, MarksTickedEntriesAndOnlyThem)
 {
     OrvixFileEntry& kept = AddFile(L"a", 0x4);
