@@ -63,17 +63,6 @@ std::vector<std::wstring> CellsOf(OrvixFileEntry& entry)
             std::wstring(path.substr(0, hasFolder ? separator : 0)), StateInWords(entry.GetFlagsOut())};
 }
 
-/// A comment on one line.
-std::wstring OneLine(std::wstring text)
-{
-    for (wchar_t& letter : text)
-    {
-        if (letter == L'\r' || letter == L'\n' || letter == L'\t')
-            letter = L' ';
-    }
-    return text;
-}
-
 } // namespace
 
 FileListDialog::FileListDialog(IOrvixCoreUIClientAccess* access, OrvixFileListDialogParams& params)

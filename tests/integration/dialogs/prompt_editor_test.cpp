@@ -48,6 +48,26 @@ TEST_F(PromptEditorDialog, ShowsEveryPromptWithItsAnswerInWords)
     });
 }
 
+TEST_F(PromptEditorDialog, ShowsTheWholeTextOfTheSelectedPrompt)
+{
+    const std::wstring lines = L"First\nsecond\r\n" + std::wstring(1000, L'x');
+    m_services->RegisterPrompt(4, lines.c_str(), 0x1, 0, true);
+    ShowEditor([](const DialogWindow& dialog) {
+        constexpr const wchar_t* Whole = L"Whole text:";
+        EXPECT_EQ(dialog.Text(Whole), L"Overwrite?");
+        dialog.SelectRow(List, 3);
+        EXPECT_EQ(dialog.Cell(List, 3, 0).substr(0, 13), L"First second ");
+        EXPECT_EQ(dialog.Text(Whole), L"First\r\nsecond\r\n" + std::wstring(1000, L'x'));
+        dialog.PressAlt(L'w');
+        EXPECT_EQ(dialog.Focused(), Whole);
+        dialog.Type(L"more");
+        EXPECT_EQ(dialog.Text(Whole).size(), 1015U) << "it can be read and not changed";
+        SetWindowTextW(dialog.Control(L"Search:"), L"nowhere");
+        EXPECT_EQ(dialog.Text(Whole), L"");
+        dialog.Press(VK_ESCAPE);
+    });
+}
+
 TEST_F(PromptEditorDialog, StoresAChangedAnswer)
 {
     EXPECT_EQ(ShowEditor([](const DialogWindow& dialog) {

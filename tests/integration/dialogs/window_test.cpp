@@ -61,6 +61,22 @@ TEST_F(DialogWindows, AreWalkedThroughByTab)
     });
 }
 
+TEST_F(DialogWindows, OfTheStoredAnswersLetTheWholeTextBeReachedByTab)
+{
+    m_services->RegisterPrompt(1, L"Open?", 0x2, 0, true);
+    ShowEditor([](const DialogWindow& dialog) {
+        const Texts stops = dialog.TabStops();
+        EXPECT_EQ(stops,
+                  (Texts{L"Search:", L"Prompts:", L"Whole text:", L"Answer:", L"Reset to ask", L"OK", L"Cancel"}));
+        for (const auto& stop : stops)
+        {
+            EXPECT_EQ(dialog.Focused(), stop);
+            dialog.Press(VK_TAB);
+        }
+        dialog.Press(VK_ESCAPE);
+    });
+}
+
 TEST_F(DialogWindows, GiveEveryControlAnAccessKeyOfItsOwn)
 {
     const auto expectKeys = [](const DialogWindow& dialog) {
