@@ -81,6 +81,7 @@ void TableView::TickShown(bool ticked)
     for (std::size_t place = 0; place < m_table.NumShown(); ++place)
         m_ticked[m_table.RowAt(place)] = ticked;
     InvalidateRect(m_window, nullptr, FALSE);
+    NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT, CHILDID_SELF);
 }
 
 std::optional<std::size_t> TableView::Selected() const
@@ -249,8 +250,7 @@ void TableView::ToggleFocused()
         places = {*focused};
     const bool ticked = !m_ticked[m_table.RowAt(*focused)];
     for (const std::size_t place : places)
-        m_ticked[m_table.RowAt(place)] = ticked;
-    InvalidateRect(m_window, nullptr, FALSE);
+        Tick(place, ticked);
 }
 
 void TableView::ToggleClicked(const NMITEMACTIVATE& click)
@@ -260,9 +260,15 @@ void TableView::ToggleClicked(const NMITEMACTIVATE& click)
     const LRESULT place = Send(LVM_HITTEST, 0, &hit);
     if (place < 0 || (hit.flags & LVHT_ONITEM) != LVHT_ONITEMSTATEICON)
         return;
-    const std::size_t row = m_table.RowAt(static_cast<std::size_t>(place));
-    m_ticked[row] = !m_ticked[row];
+    Tick(static_cast<std::size_t>(place), !m_ticked[m_table.RowAt(static_cast<std::size_t>(place))]);
+}
+
+void TableView::Tick(std::size_t place, bool ticked)
+{
+    m_ticked[m_table.RowAt(place)] = ticked;
     InvalidateRect(m_window, nullptr, FALSE);
+    // The control does not know that anything changed.
+    NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT, static_cast<LONG>(place) + 1);
 }
 
 LRESULT TableView::Find(const NMLVFINDITEMW& search) const

@@ -13,7 +13,7 @@
 /// A table of texts in a virtual list control (LVS_OWNERDATA): the control asks for what it draws, so that it is
 /// quick with any number of rows. A click on a column's heading sorts, a second one turns the order round; the context
 /// menu offers the same to the keyboard. A row that is shown always has the focus: at the beginning, and where the
-/// filter takes the one that has it away, the first.
+/// filter takes the one that has it away, the first. Screen readers are told of changed ticks.
 /// Rows are numbered from 0 as they were added.
 class TableView
 {
@@ -62,6 +62,7 @@ private:
     void KeepingSelection(const Rearrange& rearrange);
     void SetState(std::size_t place, UINT states, UINT value) const;
     void ToggleFocused();
+    void Tick(std::size_t place, bool ticked);
     void ToggleClicked(const NMITEMACTIVATE& click);
     LRESULT Find(const NMLVFINDITEMW& search) const;
     std::vector<std::size_t> SelectedPlaces() const;

@@ -193,6 +193,77 @@ TEST_F(FileListDialog, TicksTheSelectedRowsTogether)
     });
 }
 
+/// Writes down what screen readers are told of changed states in this process.
+class StateChanges
+{
+public:
+    struct Change
+    {
+        HWND window;
+        LONG object;
+        LONG child;
+    };
+
+    StateChanges()
+        : m_hook(SetWinEventHook(EVENT_OBJECT_STATECHANGE, EVENT_OBJECT_STATECHANGE, GetModuleHandleW(nullptr), &Write,
+                                 GetCurrentProcessId(), 0, WINEVENT_INCONTEXT))
+    {
+        Log().clear();
+    }
+    StateChanges(const StateChanges&) = delete;
+    StateChanges& operator=(const StateChanges&) = delete;
+    ~StateChanges() { UnhookWinEvent(m_hook); }
+
+    /// The children of a window's client area that changed since the last call.
+    static std::vector<LONG> Of(HWND window)
+    {
+        std::vector<LONG> children;
+        for (const Change& change : std::exchange(Log(), {}))
+        {
+            if (change.window == window && change.object == OBJID_CLIENT)
+                children.push_back(change.child);
+        }
+        return children;
+    }
+
+private:
+    static std::vector<Change>& Log()
+    {
+        static std::vector<Change> log;
+        return log;
+    }
+    static void CALLBACK Write(HWINEVENTHOOK, DWORD, HWND window, LONG object, LONG child, DWORD, DWORD)
+    {
+        Log().push_back({window, object, child});
+    }
+
+    HWINEVENTHOOK m_hook;
+};
+
+TEST_F(FileListDialog, TellsScreenReadersOfChangedTicks)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    AddFile(L"c");
+    const StateChanges changes;
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        const HWND list = dialog.Control(List);
+        StateChanges::Of(list);
+        dialog.SelectRow(List, 1);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{2}));
+        dialog.ClickCheckBox(List, 2);
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{3}));
+        dialog.SelectEveryRow(List);
+        StateChanges::Of(list);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{1, 2, 3}));
+        dialog.Click(L"Select none");
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{CHILDID_SELF}));
+        Cancel(dialog);
+    });
+}
+
 TEST_F(FileListDialog, LetsTheKeyboardGoOnFromTheSameRowAfterSortingAndFiltering)
 {
     AddFile(L"b");
