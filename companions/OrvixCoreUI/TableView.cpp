@@ -25,6 +25,11 @@ struct DestroyMenuDeleter
 };
 using Menu = std::unique_ptr<std::remove_pointer_t<HMENU>, DestroyMenuDeleter>;
 
+int ScrollBarWidth(HWND window)
+{
+    return GetSystemMetricsForDpi(SM_CXVSCROLL, GetDpiForWindow(window));
+}
+
 } // namespace
 
 TableView::TableView(HWND window, const Palette& palette, bool checkBoxes) : m_window(window), m_checkBoxes(checkBoxes)
@@ -44,7 +49,7 @@ void TableView::AddColumn(const std::wstring& heading, int share)
     GetClientRect(m_window, &inside);
     LVCOLUMNW column{};
     column.mask = LVCF_TEXT | LVCF_WIDTH;
-    column.cx = (inside.right - GetSystemMetrics(SM_CXVSCROLL)) * share / 100;
+    column.cx = (inside.right - ScrollBarWidth(m_window)) * share / 100;
     column.pszText = const_cast<wchar_t*>(heading.c_str());
     Send(LVM_INSERTCOLUMNW, m_columns++, &column);
 }
@@ -102,7 +107,7 @@ void TableView::FitColumns() const
         total += widths.back();
     }
     const int room =
-        inside.right - ((GetWindowLongW(m_window, GWL_STYLE) & WS_VSCROLL) != 0 ? 0 : GetSystemMetrics(SM_CXVSCROLL));
+        inside.right - ((GetWindowLongW(m_window, GWL_STYLE) & WS_VSCROLL) != 0 ? 0 : ScrollBarWidth(m_window));
     for (std::size_t column = 0; column < m_columns && total > 0; ++column)
         SendMessageW(m_window, LVM_SETCOLUMNWIDTH, column, MAKELPARAM(MulDiv(widths[column], room, total), 0));
 }
