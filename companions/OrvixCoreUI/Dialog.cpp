@@ -7,6 +7,7 @@
 #include "resource.h"
 
 #include <commctrl.h>
+#include <uxtheme.h>
 #include <windowsx.h>
 
 #include <algorithm>
@@ -15,6 +16,12 @@
 
 namespace
 {
+
+bool IsCheckBox(HWND control)
+{
+    return (SendMessageW(control, WM_GETDLGCODE, 0, 0) & DLGC_BUTTON) != 0 &&
+           (GetWindowLongW(control, GWL_STYLE) & BS_TYPEMASK) == BS_AUTOCHECKBOX;
+}
 
 LONG HeightOf(HWND window)
 {
@@ -131,12 +138,24 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
 
 void Dialog::OnOpen()
 {
+    ColorCheckBoxes();
     OnInit();
     m_layout = Layout(m_window, Rules());
     ShowWholeMessage();
     const SIZE size = (m_name ? Settings::WindowSize(m_name) : std::nullopt).value_or(SIZE{});
     const LONG height = std::min(size.cy, std::numeric_limits<LONG>::max() - m_roomForMessage) + m_roomForMessage;
     Resize(m_layout.ToPixels(size.cx), m_layout.ToPixels(height));
+}
+
+void Dialog::ColorCheckBoxes() const
+{
+    if (!m_palette.HasOwnText())
+        return;
+    for (HWND control = GetWindow(m_window, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
+    {
+        if (IsCheckBox(control))
+            SetWindowTheme(control, L" ", L" "); // a theme has its own colour for their texts
+    }
 }
 
 void Dialog::ShowWholeMessage()

@@ -69,6 +69,7 @@ private:
     INT_PTR Handle(UINT message, WPARAM wParam, LPARAM lParam);
 
     void OnOpen();
+    void ColorCheckBoxes() const;
     void ShowWholeMessage();
     RECT WorkArea() const;
 
