@@ -25,6 +25,23 @@ struct DestroyMenuDeleter
 };
 using Menu = std::unique_ptr<std::remove_pointer_t<HMENU>, DestroyMenuDeleter>;
 
+/// Lets a window change many times at the cost of one drawing.
+class DrawnOnce
+{
+public:
+    explicit DrawnOnce(HWND window) : m_window(window) { SendMessageW(m_window, WM_SETREDRAW, FALSE, 0); }
+    DrawnOnce(const DrawnOnce&) = delete;
+    DrawnOnce& operator=(const DrawnOnce&) = delete;
+    ~DrawnOnce()
+    {
+        SendMessageW(m_window, WM_SETREDRAW, TRUE, 0);
+        InvalidateRect(m_window, nullptr, TRUE);
+    }
+
+private:
+    HWND m_window;
+};
+
 int ScrollBarWidth(HWND window)
 {
     return GetSystemMetricsForDpi(SM_CXVSCROLL, GetDpiForWindow(window));
@@ -209,26 +226,27 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
         selected[m_table.RowAt(place)] = true;
     const auto focusedPlace = Next(AllPlaces, LVNI_FOCUSED);
     const auto focusedRow = focusedPlace ? std::optional(m_table.RowAt(*focusedPlace)) : std::nullopt;
-    SetState(AllPlaces, LVIS_SELECTED, 0);
-    rearrange();
-    SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
-    InvalidateRect(m_window, nullptr, TRUE);
-    if (m_table.NumShown() == 0)
-        return;
-
     std::size_t focused = 0;
     bool anySelected = false;
-    for (std::size_t place = 0; place < m_table.NumShown(); ++place)
     {
-        const std::size_t row = m_table.RowAt(place);
-        if (row == focusedRow)
-            focused = place;
-        if (selected[row])
+        const DrawnOnce all(m_window);
+        SetState(AllPlaces, LVIS_SELECTED, 0);
+        rearrange();
+        SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
+        for (std::size_t place = 0; place < m_table.NumShown(); ++place)
         {
-            SetState(place, LVIS_SELECTED, LVIS_SELECTED);
-            anySelected = true;
+            const std::size_t row = m_table.RowAt(place);
+            if (row == focusedRow)
+                focused = place;
+            if (selected[row])
+            {
+                SetState(place, LVIS_SELECTED, LVIS_SELECTED);
+                anySelected = true;
+            }
         }
     }
+    if (m_table.NumShown() == 0)
+        return;
     // The keyboard goes on from here.
     SetState(focused, LVIS_FOCUSED, LVIS_FOCUSED);
     if (!anySelected)
@@ -256,6 +274,7 @@ void TableView::ToggleFocused()
     const bool ticked = !m_ticked[m_table.RowAt(*focused)];
     for (const std::size_t place : places)
         Tick(place, ticked);
+    InvalidateRect(m_window, nullptr, FALSE);
 }
 
 void TableView::ToggleClicked(const NMITEMACTIVATE& click)
@@ -266,12 +285,12 @@ void TableView::ToggleClicked(const NMITEMACTIVATE& click)
     if (place < 0 || (hit.flags & LVHT_ONITEM) != LVHT_ONITEMSTATEICON)
         return;
     Tick(static_cast<std::size_t>(place), !m_ticked[m_table.RowAt(static_cast<std::size_t>(place))]);
+    InvalidateRect(m_window, nullptr, FALSE);
 }
 
 void TableView::Tick(std::size_t place, bool ticked)
 {
     m_ticked[m_table.RowAt(place)] = ticked;
-    InvalidateRect(m_window, nullptr, FALSE);
     // The control does not know that anything changed.
     NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT, static_cast<LONG>(place) + 1);
 }

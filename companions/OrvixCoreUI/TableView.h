@@ -62,6 +62,7 @@ private:
     void KeepingSelection(const Rearrange& rearrange);
     void SetState(std::size_t place, UINT states, UINT value) const;
     void ToggleFocused();
+    /// Does not draw.
     void Tick(std::size_t place, bool ticked);
     void ToggleClicked(const NMITEMACTIVATE& click);
     LRESULT Find(const NMLVFINDITEMW& search) const;

@@ -268,17 +268,22 @@ void DialogWindow::SelectRow(const std::wstring& list, int row) const
     for (int i = 0; i < row; ++i)
         Press(VK_DOWN);
     // Home and Down leave a list alone whose focus is there already.
-    SetRowState(list, row, LVIS_SELECTED | LVIS_FOCUSED);
+    SetRowState(list, row, LVIS_SELECTED | LVIS_FOCUSED, true);
 }
 
 void DialogWindow::SelectEveryRow(const std::wstring& list) const
 {
-    SetRowState(list, -1, LVIS_SELECTED);
+    SetRowState(list, -1, LVIS_SELECTED, true);
+}
+
+void DialogWindow::UnselectRow(const std::wstring& list, int row) const
+{
+    SetRowState(list, row, LVIS_SELECTED, false);
 }
 
 void DialogWindow::FocusRow(const std::wstring& list, int row) const
 {
-    SetRowState(list, row, LVIS_FOCUSED);
+    SetRowState(list, row, LVIS_FOCUSED, true);
 }
 
 void DialogWindow::ClickHeading(const std::wstring& list, int column) const
@@ -314,11 +319,11 @@ HWND DialogWindow::FocusWindow() const
     return info.hwndFocus ? info.hwndFocus : m_window;
 }
 
-void DialogWindow::SetRowState(const std::wstring& list, int row, UINT states) const
+void DialogWindow::SetRowState(const std::wstring& list, int row, UINT states, bool set) const
 {
     LVITEMW item{};
     item.stateMask = states;
-    item.state = states;
+    item.state = set ? states : 0;
     SendMessageW(Control(list), LVM_SETITEMSTATE, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&item));
 }
 

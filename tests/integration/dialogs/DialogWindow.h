@@ -64,6 +64,7 @@ public:
     std::vector<bool> Ticks(const std::wstring& list) const;
     void SelectRow(const std::wstring& list, int row) const;
     void SelectEveryRow(const std::wstring& list) const;
+    void UnselectRow(const std::wstring& list, int row) const;
     /// Moves the focus to a row and leaves the selection, as Ctrl and an arrow key do.
     void FocusRow(const std::wstring& list, int row) const;
     void ClickHeading(const std::wstring& list, int column) const;
@@ -73,7 +74,7 @@ public:
 
 private:
     HWND FocusWindow() const;
-    void SetRowState(const std::wstring& list, int row, UINT states) const;
+    void SetRowState(const std::wstring& list, int row, UINT states, bool set) const;
     void Post(HWND control, UINT message, WPARAM wParam, LPARAM lParam) const;
     void ClickAt(HWND control, LONG x, LONG y) const;
 

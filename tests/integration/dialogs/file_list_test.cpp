@@ -598,19 +598,43 @@ TEST_F(FileListDialog, DecidesWhatAnOperationWorksOn)
     EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), 0x8U);
 }
 
-TEST_F(FileListDialog, IsQuickWithFiftyThousandFiles)
+/// Seconds since the last call, or the construction.
+class Stopwatch
 {
-    constexpr int Count = 50000;
-    constexpr double Quick = 3; // on a busy machine and under Wine
-    for (int i = 0; i < Count; ++i)
-        AddFile((L"C:\\town\\file" + std::to_wstring(i)).c_str());
+public:
+    double operator()()
+    {
+        const auto now = Clock::now();
+        return std::chrono::duration<double>(now - std::exchange(m_last, now)).count();
+    }
+
+private:
     using Clock = std::chrono::steady_clock;
-    auto last = Clock::now();
+    Clock::time_point m_last = Clock::now();
+};
+
+class LongFileList : public FileListDialog
+{
+protected:
+    static constexpr int Count = 50000;
+    static constexpr double Quick = 3; // on a busy machine and under Wine
+
+    LongFileList()
+    {
+        for (int i = 0; i < Count; ++i)
+            AddFile((L"C:\\town\\file" + std::to_wstring(i)).c_str());
+    }
+
+    static int NumSelected(const DialogWindow& dialog)
+    {
+        return static_cast<int>(SendMessageW(dialog.Control(List), LVM_GETSELECTEDCOUNT, 0, 0));
+    }
+};
+
+TEST_F(LongFileList, IsQuick)
+{
+    Stopwatch seconds;
     ShowFileList(Ticks, [&](const DialogWindow& dialog) {
-        const auto seconds = [&last] {
-            const auto now = Clock::now();
-            return std::chrono::duration<double>(now - std::exchange(last, now)).count();
-        };
         EXPECT_LT(seconds(), Quick) << "to open";
         EXPECT_EQ(dialog.NumRows(List), Count);
         EXPECT_NE(GetWindowLongW(dialog.Control(List), GWL_STYLE) & LVS_OWNERDATA, 0);
@@ -627,6 +651,47 @@ TEST_F(FileListDialog, IsQuickWithFiftyThousandFiles)
     });
     EXPECT_EQ(m_list.GetFileEntry(Count - 1)->GetFlagsOut() & 0x2, 0x2U);
     EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0U);
+}
+
+TEST_F(LongFileList, IsQuickWithEveryRowSelected)
+{
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.SelectEveryRow(List);
+        Stopwatch seconds;
+        dialog.ClickHeading(List, 0);
+        EXPECT_LT(seconds(), Quick) << "to sort";
+        EXPECT_EQ(NumSelected(dialog), Count);
+        SetWindowTextW(dialog.Control(L"Filter:"), L"file");
+        EXPECT_LT(seconds(), Quick) << "to filter";
+        EXPECT_EQ(NumSelected(dialog), Count);
+        dialog.Focus(List);
+        dialog.Press(VK_SPACE);
+        EXPECT_LT(seconds(), Quick) << "to untick all";
+        EXPECT_FALSE(dialog.IsRowTicked(List, Count - 1));
+        dialog.SelectEveryRow(List);
+        seconds();
+        SetWindowTextW(dialog.Control(L"Filter:"), L"49999");
+        EXPECT_LT(seconds(), Quick) << "to filter down to one";
+        EXPECT_EQ(NumSelected(dialog), 1);
+        Cancel(dialog);
+    });
+}
+
+TEST_F(LongFileList, IsQuickWithMostRowsSelected)
+{
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        constexpr int Step = 100;
+        dialog.SelectEveryRow(List);
+        for (int row = 0; row < Count; row += Step)
+            dialog.UnselectRow(List, row);
+        Stopwatch seconds;
+        dialog.ClickHeading(List, 0);
+        EXPECT_LT(seconds(), Quick) << "to sort";
+        EXPECT_EQ(NumSelected(dialog), Count - Count / Step);
+        SetWindowTextW(dialog.Control(L"Filter:"), L"9");
+        EXPECT_LT(seconds(), Quick) << "to filter";
+        Cancel(dialog);
+    });
 }
 
 } // namespace
