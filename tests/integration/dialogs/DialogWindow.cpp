@@ -255,8 +255,10 @@ bool DialogWindow::IsRowInView(const std::wstring& list, int row) const
 
 std::vector<bool> DialogWindow::Ticks(const std::wstring& list) const
 {
+    const int count = NumRows(list);
     std::vector<bool> ticks;
-    for (int row = 0; row < NumRows(list); ++row)
+    ticks.reserve(static_cast<std::size_t>(count));
+    for (int row = 0; row < count; ++row)
         ticks.push_back(IsRowTicked(list, row));
     return ticks;
 }
