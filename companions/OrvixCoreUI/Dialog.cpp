@@ -4,12 +4,48 @@
 #include "DpiAwareness.h"
 #include "Module.h"
 #include "Settings.h"
+#include "resource.h"
 
 #include <commctrl.h>
+#include <uxtheme.h>
 #include <windowsx.h>
 
 #include <algorithm>
 #include <bit>
+#include <limits>
+
+namespace
+{
+
+bool IsCheckBox(HWND control)
+{
+    return (SendMessageW(control, WM_GETDLGCODE, 0, 0) & DLGC_BUTTON) != 0 &&
+           (GetWindowLongW(control, GWL_STYLE) & BS_TYPEMASK) == BS_AUTOCHECKBOX;
+}
+
+LONG HeightOf(HWND window)
+{
+    RECT place{};
+    GetWindowRect(window, &place);
+    return place.bottom - place.top;
+}
+
+/// How high a static control has to be to show its text in its width.
+LONG NeededHeight(HWND control, const std::wstring& text)
+{
+    const HDC context = GetDC(control);
+    auto* const font = std::bit_cast<HFONT>(SendMessageW(control, WM_GETFONT, 0, 0));
+    const HGDIOBJ before = SelectObject(context, font);
+    RECT area{};
+    GetClientRect(control, &area);
+    DrawTextW(context, text.c_str(), static_cast<int>(text.size()), &area,
+              DT_CALCRECT | DT_WORDBREAK | DT_EDITCONTROL | DT_NOPREFIX | DT_EXPANDTABS);
+    SelectObject(context, before);
+    ReleaseDC(control, context);
+    return area.bottom;
+}
+
+} // namespace
 
 std::int32_t Dialog::Run(HWND owner)
 {
@@ -34,23 +70,6 @@ std::wstring Dialog::GetText(int control) const
 void Dialog::SetTicked(int control, bool ticked) const
 {
     CheckDlgButton(m_window, control, ticked ? BST_CHECKED : BST_UNCHECKED);
-}
-
-void Dialog::Resize(LONG width, LONG height) const
-{
-    MONITORINFO monitor{};
-    monitor.cbSize = sizeof monitor;
-    GetMonitorInfoW(MonitorFromWindow(m_window, MONITOR_DEFAULTTONEAREST), &monitor);
-    const RECT& work = monitor.rcWork;
-    RECT now{};
-    GetWindowRect(m_window, &now);
-    const POINT smallest = m_layout.SmallestWindow();
-    width = std::max(std::min(width, work.right - work.left), smallest.x);
-    height = std::max(std::min(height, work.bottom - work.top), smallest.y);
-    const LONG left = std::min(now.left - (width - (now.right - now.left)) / 2, work.right - width);
-    const LONG top = std::min(now.top - (height - (now.bottom - now.top)) / 2, work.bottom - height);
-    SetWindowPos(m_window, nullptr, std::max(left, work.left), std::max(top, work.top), width, height,
-                 SWP_NOZORDER | SWP_NOACTIVATE);
 }
 
 void Dialog::Hide(int control) const
@@ -119,12 +138,60 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
 
 void Dialog::OnOpen()
 {
+    ColorCheckBoxes();
     OnInit();
     m_layout = Layout(m_window, Rules());
-    const auto size = m_name ? Settings::WindowSize(m_name) : std::nullopt;
-    if (size)
-        Resize(m_layout.ToPixels(size->cx), m_layout.ToPixels(size->cy));
-    OnOpened();
+    ShowWholeMessage();
+    const SIZE size = (m_name ? Settings::WindowSize(m_name) : std::nullopt).value_or(SIZE{});
+    const LONG height = std::min(size.cy, std::numeric_limits<LONG>::max() - m_roomForMessage) + m_roomForMessage;
+    Resize(m_layout.ToPixels(size.cx), m_layout.ToPixels(height));
+}
+
+void Dialog::ColorCheckBoxes() const
+{
+    if (!m_palette.HasOwnText())
+        return;
+    for (HWND control = GetWindow(m_window, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
+    {
+        if (IsCheckBox(control))
+            SetWindowTheme(control, L" ", L" "); // a theme has its own colour for their texts
+    }
+}
+
+void Dialog::ShowWholeMessage()
+{
+    const HWND message = Item(IDC_MESSAGE);
+    if (!message)
+        return;
+    const RECT work = WorkArea();
+    const LONG most = (work.bottom - work.top) * 9 / 10 - HeightOf(m_window);
+    const LONG more = std::min(NeededHeight(message, GetText(IDC_MESSAGE)) - HeightOf(message), most);
+    if (more <= 0)
+        return;
+    m_layout.MakeRoom(message, more);
+    m_roomForMessage = m_layout.FromPixels(more);
+}
+
+RECT Dialog::WorkArea() const
+{
+    MONITORINFO monitor{};
+    monitor.cbSize = sizeof monitor;
+    GetMonitorInfoW(MonitorFromWindow(m_window, MONITOR_DEFAULTTONEAREST), &monitor);
+    return monitor.rcWork;
+}
+
+void Dialog::Resize(LONG width, LONG height) const
+{
+    const RECT work = WorkArea();
+    RECT now{};
+    GetWindowRect(m_window, &now);
+    const POINT smallest = m_layout.SmallestWindow();
+    width = std::max(std::min(width, work.right - work.left), smallest.x);
+    height = std::max(std::min(height, work.bottom - work.top), smallest.y);
+    const LONG left = std::min(now.left - (width - (now.right - now.left)) / 2, work.right - width);
+    const LONG top = std::min(now.top - (height - (now.bottom - now.top)) / 2, work.bottom - height);
+    SetWindowPos(m_window, nullptr, std::max(left, work.left), std::max(top, work.top), width, height,
+                 SWP_NOZORDER | SWP_NOACTIVATE);
 }
 
 void Dialog::RememberSize() const
@@ -134,6 +201,7 @@ void Dialog::RememberSize() const
     if (!m_name || !GetWindowPlacement(m_window, &placement))
         return;
     const RECT& place = placement.rcNormalPosition; // that of a maximised window as well
-    Settings::StoreWindowSize(
-        m_name, {m_layout.FromPixels(place.right - place.left), m_layout.FromPixels(place.bottom - place.top)});
+    // Another message needs other room.
+    Settings::StoreWindowSize(m_name, {m_layout.FromPixels(place.right - place.left),
+                                       m_layout.FromPixels(place.bottom - place.top) - m_roomForMessage});
 }

@@ -9,7 +9,8 @@
 #include <span>
 #include <string>
 
-/// A modal dialog from a template of this library, which can be resized and never gets smaller than its template.
+/// A modal dialog from a template of this library, which can be resized and never gets smaller than its template. Where
+/// it has a message (IDC_MESSAGE), it is as much higher as the message needs.
 class Dialog
 {
 public:
@@ -33,9 +34,6 @@ protected:
 
     /// Fills the controls.
     virtual void OnInit() = 0;
-
-    /// The dialog has its layout and size, and is about to be seen.
-    virtual void OnOpened() {}
 
     /// A control, or a key that stands for one, was used.
     virtual void OnCommand(int control, int notification) = 0;
@@ -63,9 +61,6 @@ protected:
 
     void Focus(int control) const { SendMessageW(m_window, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(Item(control)), 1); }
 
-    /// Gives the dialog a size in pixels, as far as the monitor allows, around the middle that it has.
-    void Resize(LONG width, LONG height) const;
-
     /// Takes a control, and its access key, out of the dialog.
     void Hide(int control) const;
 
@@ -74,11 +69,18 @@ private:
     INT_PTR Handle(UINT message, WPARAM wParam, LPARAM lParam);
 
     void OnOpen();
+    void ColorCheckBoxes() const;
+    void ShowWholeMessage();
+    RECT WorkArea() const;
+
+    /// Gives the dialog a size in pixels, as far as the monitor allows, around the middle that it has.
+    void Resize(LONG width, LONG height) const;
     void RememberSize() const;
 
     int m_templateId;
     const wchar_t* m_name;
     Palette m_palette;
     Layout m_layout;
+    LONG m_roomForMessage = 0; // at 96 dots per inch
     HWND m_window = nullptr;
 };

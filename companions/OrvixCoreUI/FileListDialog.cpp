@@ -63,17 +63,6 @@ std::vector<std::wstring> CellsOf(OrvixFileEntry& entry)
             std::wstring(path.substr(0, hasFolder ? separator : 0)), StateInWords(entry.GetFlagsOut())};
 }
 
-/// A comment on one line.
-std::wstring OneLine(std::wstring text)
-{
-    for (wchar_t& letter : text)
-    {
-        if (letter == L'\r' || letter == L'\n' || letter == L'\t')
-            letter = L' ';
-    }
-    return text;
-}
-
 } // namespace
 
 FileListDialog::FileListDialog(IOrvixCoreUIClientAccess* access, OrvixFileListDialogParams& params)
@@ -96,6 +85,7 @@ void FileListDialog::OnInit()
 {
     SetTitle(m_params.GetTitle());
     SetText(IDC_MESSAGE, m_params.GetMessageW());
+    SendDlgItemMessageW(Window(), IDC_COMMENT, EM_SETLIMITTEXT, 0, 0); // as long as it may be
     SetText(IDC_COMMENT, m_params.GetComment());
     FillList();
     ShowRecentComments();
@@ -117,7 +107,8 @@ void FileListDialog::OnCommand(int control, int notification)
         m_files.TickShown(control == IDC_SELECT_ALL);
         break;
     case IDC_RECENT:
-        if (notification == CBN_SELCHANGE)
+        // In the open list alone: in the closed one keys and the wheel pass over items that nobody chose.
+        if (notification == CBN_SELENDOK && SendDlgItemMessageW(Window(), IDC_RECENT, CB_GETDROPPEDSTATE, 0, 0))
             TakeRecentComment();
         break;
     case IDOK:
@@ -182,14 +173,19 @@ void FileListDialog::ShowRecentComments()
     m_recentComments = Settings::RecentComments();
     for (const std::wstring& comment : m_recentComments)
         SendDlgItemMessageW(Window(), IDC_RECENT, CB_ADDSTRING, 0, reinterpret_cast<LPARAM>(OneLine(comment).c_str()));
+    SendDlgItemMessageW(Window(), IDC_RECENT, CB_SETEXTENDEDUI, TRUE, 0); // the Down key opens the list
     EnableWindow(Item(IDC_RECENT), !m_recentComments.empty());
 }
 
 void FileListDialog::TakeRecentComment() const
 {
     const LRESULT chosen = SendDlgItemMessageW(Window(), IDC_RECENT, CB_GETCURSEL, 0, 0);
-    if (chosen >= 0)
-        SetText(IDC_COMMENT, m_recentComments[static_cast<std::size_t>(chosen)].c_str());
+    if (chosen < 0)
+        return;
+    const std::wstring& comment = m_recentComments[static_cast<std::size_t>(chosen)];
+    // Ctrl+Z brings back what was there.
+    SendDlgItemMessageW(Window(), IDC_COMMENT, EM_SETSEL, 0, -1);
+    SendDlgItemMessageW(Window(), IDC_COMMENT, EM_REPLACESEL, TRUE, reinterpret_cast<LPARAM>(comment.c_str()));
 }
 
 void FileListDialog::InitBox(int control, bool offered, std::uint32_t tickedBit) const

@@ -38,6 +38,19 @@ Layout::Layout(HWND dialog, std::span<const Rule> rules)
         m_controls.push_back({control, PlaceOf(control, dialog), FollowsOf(control, rules)});
 }
 
+void Layout::MakeRoom(HWND control, LONG more)
+{
+    const LONG below = PlaceOf(control, m_dialog).bottom;
+    for (Control& other : m_controls)
+    {
+        if (other.window == control)
+            other.place.bottom += more;
+        else if (other.place.top >= below)
+            OffsetRect(&other.place, 0, more);
+    }
+    m_inside.cy += more;
+}
+
 void Layout::Apply() const
 {
     RECT inside{};

@@ -28,6 +28,10 @@ public:
     /// Takes the dialog as it stands now for the measure, and for the smallest size.
     Layout(HWND dialog, std::span<const Rule> rules);
 
+    /// Makes a control higher, in pixels, and the smallest dialog with it: what is below moves down. Goes before a turn
+    /// to another resolution.
+    void MakeRoom(HWND control, LONG more);
+
     /// Moves the controls to where they belong in the dialog's size.
     void Apply() const;
 

@@ -16,6 +16,9 @@ public:
     COLORREF Window() const { return m_window; }
     COLORREF WindowText() const { return m_windowText; }
 
+    /// Whether texts have another colour than the system's.
+    bool HasOwnText() const { return m_faceText != GetSysColor(COLOR_BTNTEXT); }
+
     /// Answers a WM_CTLCOLOR message: sets the colours of the device context and gives the brush for the
     /// background; null for a message of another kind.
     HBRUSH Apply(UINT message, HDC context) const;

@@ -45,20 +45,6 @@ RECT PlaceOf(HWND control)
     return place;
 }
 
-/// How high a static control of this width has to be to show its text.
-LONG NeededHeight(HWND control, const std::wstring& text, LONG width)
-{
-    const HDC context = GetDC(control);
-    auto* const font = std::bit_cast<HFONT>(SendMessageW(control, WM_GETFONT, 0, 0));
-    const HGDIOBJ before = SelectObject(context, font);
-    RECT area{0, 0, width, 0};
-    DrawTextW(context, text.c_str(), static_cast<int>(text.size()), &area,
-              DT_CALCRECT | DT_WORDBREAK | DT_EDITCONTROL | DT_NOPREFIX | DT_EXPANDTABS);
-    SelectObject(context, before);
-    ReleaseDC(control, context);
-    return area.bottom;
-}
-
 } // namespace
 
 PromptDialog::PromptDialog(IOrvixCoreUIClientAccess* access, const wchar_t* title, const wchar_t* message,
@@ -99,17 +85,6 @@ void PromptDialog::OnInit()
         else
             Hide(button);
     }
-}
-
-void PromptDialog::OnOpened()
-{
-    const RECT message = PlaceOf(Item(IDC_MESSAGE));
-    const LONG more =
-        NeededHeight(Item(IDC_MESSAGE), m_message, message.right - message.left) - (message.bottom - message.top);
-    RECT window{};
-    GetWindowRect(Window(), &window);
-    if (more > 0)
-        Resize(window.right - window.left, window.bottom - window.top + more);
 }
 
 void PromptDialog::OnCommand(int control, int)

@@ -28,7 +28,6 @@ public:
 private:
     std::span<const Layout::Rule> Rules() const override;
     void OnInit() override;
-    void OnOpened() override;
     void OnCommand(int control, int notification) override;
     bool Has(std::uint32_t option) const { return (m_options & option) != 0; }
     bool Offers(int button) const;

@@ -14,6 +14,8 @@ namespace
 
 constexpr Layout::Rule EditorRules[] = {{IDC_FILTER, Layout::GrowX},
                                         {IDC_LIST, Layout::GrowX | Layout::GrowY},
+                                        {IDC_WHOLE_TEXT_LABEL, Layout::MoveY},
+                                        {IDC_WHOLE_TEXT, Layout::GrowX | Layout::MoveY},
                                         {IDC_ANSWER_LABEL, Layout::MoveY},
                                         {IDC_ANSWER, Layout::MoveY},
                                         {IDC_RESET, Layout::MoveY},
@@ -59,7 +61,7 @@ void PromptEditorDialog::OnInit()
     m_list.AddColumn(Text(IDS_PROMPT), 70);
     m_list.AddColumn(Text(IDS_ANSWER), 30);
     for (unsigned int row = 0; row < m_actions.size(); ++row)
-        m_list.AddRow({m_prompts.GetPromptText(row), AnswerInWords(row)}, false);
+        m_list.AddRow({OneLine(m_prompts.GetPromptText(row)), AnswerInWords(row)}, false);
     m_list.Refresh();
     ShowSelected();
 }
@@ -141,6 +143,8 @@ void PromptEditorDialog::ShowSelected()
     const bool editable = selected && !m_prompts.GetLocked(static_cast<unsigned int>(*selected));
     EnableWindow(answers, editable);
     EnableWindow(Item(IDC_RESET), editable && AnswerIndex(m_actions[*selected]) != Ask);
+    const wchar_t* text = selected ? m_prompts.GetPromptText(static_cast<unsigned int>(*selected)) : L"";
+    SetText(IDC_WHOLE_TEXT, WithFieldLineEnds(text).c_str());
     if (!selected)
         return;
     const std::size_t current = AnswerIndex(m_actions[*selected]);

@@ -16,11 +16,36 @@ namespace
 /// The state image of a row with a check box: number 1 not ticked, number 2 ticked.
 constexpr UINT StateImageShift = 12;
 
+/// The control's -1: every place to set a state of, and the place before the first.
+constexpr auto AllPlaces = static_cast<std::size_t>(-1);
+
 struct DestroyMenuDeleter
 {
     void operator()(HMENU menu) const { DestroyMenu(menu); }
 };
 using Menu = std::unique_ptr<std::remove_pointer_t<HMENU>, DestroyMenuDeleter>;
+
+/// Lets a window change many times at the cost of one drawing.
+class DrawnOnce
+{
+public:
+    explicit DrawnOnce(HWND window) : m_window(window) { SendMessageW(m_window, WM_SETREDRAW, FALSE, 0); }
+    DrawnOnce(const DrawnOnce&) = delete;
+    DrawnOnce& operator=(const DrawnOnce&) = delete;
+    ~DrawnOnce()
+    {
+        SendMessageW(m_window, WM_SETREDRAW, TRUE, 0);
+        InvalidateRect(m_window, nullptr, TRUE);
+    }
+
+private:
+    HWND m_window;
+};
+
+int ScrollBarWidth(HWND window)
+{
+    return GetSystemMetricsForDpi(SM_CXVSCROLL, GetDpiForWindow(window));
+}
 
 } // namespace
 
@@ -41,7 +66,7 @@ void TableView::AddColumn(const std::wstring& heading, int share)
     GetClientRect(m_window, &inside);
     LVCOLUMNW column{};
     column.mask = LVCF_TEXT | LVCF_WIDTH;
-    column.cx = (inside.right - GetSystemMetrics(SM_CXVSCROLL)) * share / 100;
+    column.cx = (inside.right - ScrollBarWidth(m_window)) * share / 100;
     column.pszText = const_cast<wchar_t*>(heading.c_str());
     Send(LVM_INSERTCOLUMNW, m_columns++, &column);
 }
@@ -52,10 +77,9 @@ void TableView::AddRow(std::vector<std::wstring> cells, bool ticked)
     m_ticked.push_back(ticked);
 }
 
-void TableView::Refresh() const
+void TableView::Refresh()
 {
-    SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
-    InvalidateRect(m_window, nullptr, TRUE);
+    KeepingSelection([] {});
 }
 
 void TableView::SetCell(std::size_t row, std::size_t column, std::wstring text)
@@ -79,14 +103,13 @@ void TableView::TickShown(bool ticked)
     for (std::size_t place = 0; place < m_table.NumShown(); ++place)
         m_ticked[m_table.RowAt(place)] = ticked;
     InvalidateRect(m_window, nullptr, FALSE);
+    NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT, CHILDID_SELF);
 }
 
 std::optional<std::size_t> TableView::Selected() const
 {
-    const auto places = SelectedPlaces();
-    if (places.empty())
-        return std::nullopt;
-    return m_table.RowAt(places.front());
+    const auto place = Next(AllPlaces, LVNI_SELECTED);
+    return place ? std::optional(m_table.RowAt(*place)) : std::nullopt;
 }
 
 void TableView::FitColumns() const
@@ -101,7 +124,7 @@ void TableView::FitColumns() const
         total += widths.back();
     }
     const int room =
-        inside.right - ((GetWindowLongW(m_window, GWL_STYLE) & WS_VSCROLL) != 0 ? 0 : GetSystemMetrics(SM_CXVSCROLL));
+        inside.right - ((GetWindowLongW(m_window, GWL_STYLE) & WS_VSCROLL) != 0 ? 0 : ScrollBarWidth(m_window));
     for (std::size_t column = 0; column < m_columns && total > 0; ++column)
         SendMessageW(m_window, LVM_SETCOLUMNWIDTH, column, MAKELPARAM(MulDiv(widths[column], room, total), 0));
 }
@@ -138,7 +161,7 @@ LRESULT TableView::Handle(const NMHDR& notification)
         return 0;
     case LVN_KEYDOWN:
         if (reinterpret_cast<const NMLVKEYDOWN*>(header)->wVKey == VK_SPACE)
-            ToggleSelected();
+            ToggleFocused();
         return 0;
     case NM_CLICK:
     case NM_DBLCLK:
@@ -201,32 +224,56 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
     std::vector<bool> selected(m_table.NumRows());
     for (const std::size_t place : SelectedPlaces())
         selected[m_table.RowAt(place)] = true;
-    Select(static_cast<std::size_t>(-1), false);
-    rearrange();
-    Refresh();
-    for (std::size_t place = 0; place < m_table.NumShown(); ++place)
+    const auto focusedPlace = Next(AllPlaces, LVNI_FOCUSED);
+    const auto focusedRow = focusedPlace ? std::optional(m_table.RowAt(*focusedPlace)) : std::nullopt;
+    std::size_t focused = 0;
+    bool anySelected = false;
     {
-        if (selected[m_table.RowAt(place)])
-            Select(place, true);
+        const DrawnOnce all(m_window);
+        SetState(AllPlaces, LVIS_SELECTED, 0);
+        rearrange();
+        SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
+        for (std::size_t place = 0; place < m_table.NumShown(); ++place)
+        {
+            const std::size_t row = m_table.RowAt(place);
+            if (row == focusedRow)
+                focused = place;
+            if (selected[row])
+            {
+                SetState(place, LVIS_SELECTED, LVIS_SELECTED);
+                anySelected = true;
+            }
+        }
     }
+    if (m_table.NumShown() == 0)
+        return;
+    // The keyboard goes on from here.
+    SetState(focused, LVIS_FOCUSED, LVIS_FOCUSED);
+    if (!anySelected)
+        SetState(focused, LVIS_SELECTED, LVIS_SELECTED);
+    SendMessageW(m_window, LVM_SETSELECTIONMARK, 0, static_cast<LPARAM>(focused));
+    SendMessageW(m_window, LVM_ENSUREVISIBLE, focused, FALSE);
 }
 
-void TableView::Select(std::size_t place, bool selected) const
+void TableView::SetState(std::size_t place, UINT states, UINT value) const
 {
     LVITEMW item{};
-    item.stateMask = LVIS_SELECTED;
-    item.state = selected ? LVIS_SELECTED : 0;
+    item.stateMask = states;
+    item.state = value;
     Send(LVM_SETITEMSTATE, place, &item);
 }
 
-void TableView::ToggleSelected()
+void TableView::ToggleFocused()
 {
-    const auto places = SelectedPlaces();
-    if (places.empty())
+    const auto focused = Next(AllPlaces, LVNI_FOCUSED);
+    if (!focused)
         return;
-    const bool ticked = !m_ticked[m_table.RowAt(places.front())];
+    std::vector<std::size_t> places = SelectedPlaces();
+    if (!std::binary_search(places.begin(), places.end(), *focused))
+        places = {*focused};
+    const bool ticked = !m_ticked[m_table.RowAt(*focused)];
     for (const std::size_t place : places)
-        m_ticked[m_table.RowAt(place)] = ticked;
+        Tick(place, ticked);
     InvalidateRect(m_window, nullptr, FALSE);
 }
 
@@ -237,9 +284,15 @@ void TableView::ToggleClicked(const NMITEMACTIVATE& click)
     const LRESULT place = Send(LVM_HITTEST, 0, &hit);
     if (place < 0 || (hit.flags & LVHT_ONITEM) != LVHT_ONITEMSTATEICON)
         return;
-    const std::size_t row = m_table.RowAt(static_cast<std::size_t>(place));
-    m_ticked[row] = !m_ticked[row];
+    Tick(static_cast<std::size_t>(place), !m_ticked[m_table.RowAt(static_cast<std::size_t>(place))]);
     InvalidateRect(m_window, nullptr, FALSE);
+}
+
+void TableView::Tick(std::size_t place, bool ticked)
+{
+    m_ticked[m_table.RowAt(place)] = ticked;
+    // The control does not know that anything changed.
+    NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT, static_cast<LONG>(place) + 1);
 }
 
 LRESULT TableView::Find(const NMLVFINDITEMW& search) const
@@ -264,13 +317,17 @@ LRESULT TableView::Find(const NMLVFINDITEMW& search) const
 std::vector<std::size_t> TableView::SelectedPlaces() const
 {
     std::vector<std::size_t> places;
-    const auto next = [this](LRESULT after) {
-        return SendMessageW(m_window, LVM_GETNEXTITEM, static_cast<WPARAM>(after), LVNI_SELECTED);
-    };
-    for (LRESULT place = next(-1); place >= 0 && static_cast<std::size_t>(place) < m_table.NumShown();
-         place = next(place))
-        places.push_back(static_cast<std::size_t>(place));
+    for (auto place = Next(AllPlaces, LVNI_SELECTED); place; place = Next(*place, LVNI_SELECTED))
+        places.push_back(*place);
     return places;
+}
+
+std::optional<std::size_t> TableView::Next(std::size_t after, UINT state) const
+{
+    const LRESULT place = SendMessageW(m_window, LVM_GETNEXTITEM, after, state);
+    if (place < 0 || static_cast<std::size_t>(place) >= m_table.NumShown())
+        return std::nullopt;
+    return static_cast<std::size_t>(place);
 }
 
 LRESULT TableView::Send(UINT message, WPARAM wParam, const void* argument) const

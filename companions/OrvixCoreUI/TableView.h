@@ -12,14 +12,16 @@
 
 /// A table of texts in a virtual list control (LVS_OWNERDATA): the control asks for what it draws, so that it is
 /// quick with any number of rows. A click on a column's heading sorts, a second one turns the order round; the context
-/// menu offers the same to the keyboard.
+/// menu offers the same to the keyboard. A row that is shown always has the focus: at the beginning, and where the
+/// filter takes the one that has it away, the first. Screen readers are told of changed ticks.
 /// Rows are numbered from 0 as they were added.
 class TableView
 {
 public:
     TableView() = default;
 
-    /// With `checkBoxes` each row can be ticked, by a click on its box or by the space bar.
+    /// With `checkBoxes` each row can be ticked by a click on its box; the space bar ticks the row with the focus and,
+    /// if it is selected, the other selected ones with it.
     TableView(HWND window, const Palette& palette, bool checkBoxes);
 
     /// Columns go before rows. `share` of the width, in percent.
@@ -27,7 +29,7 @@ public:
     void AddRow(std::vector<std::wstring> cells, bool ticked);
 
     /// Shows the rows added since.
-    void Refresh() const;
+    void Refresh();
 
     void SetCell(std::size_t row, std::size_t column, std::wstring text);
     void Filter(const std::wstring& text);
@@ -58,11 +60,15 @@ private:
     void SortBy(std::size_t column);
     template <typename Rearrange>
     void KeepingSelection(const Rearrange& rearrange);
-    void Select(std::size_t place, bool selected) const;
-    void ToggleSelected();
+    void SetState(std::size_t place, UINT states, UINT value) const;
+    void ToggleFocused();
+    /// Does not draw.
+    void Tick(std::size_t place, bool ticked);
     void ToggleClicked(const NMITEMACTIVATE& click);
     LRESULT Find(const NMLVFINDITEMW& search) const;
     std::vector<std::size_t> SelectedPlaces() const;
+    /// The next place with a state.
+    std::optional<std::size_t> Next(std::size_t after, UINT state) const;
     LRESULT Send(UINT message, WPARAM wParam, const void* argument) const;
 
     HWND m_window = nullptr;

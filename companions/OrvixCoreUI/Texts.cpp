@@ -26,3 +26,25 @@ std::wstring FormatText(UINT id, std::initializer_list<DWORD_PTR> inserts)
     const std::unique_ptr<wchar_t, FreeLocal> owned(made);
     return {made, length};
 }
+
+std::wstring OneLine(std::wstring text)
+{
+    for (wchar_t& letter : text)
+    {
+        if (letter == L'\r' || letter == L'\n' || letter == L'\t')
+            letter = L' ';
+    }
+    return text;
+}
+
+std::wstring WithFieldLineEnds(const std::wstring& text)
+{
+    std::wstring lines;
+    for (const wchar_t letter : text)
+    {
+        if (letter == L'\n' && !lines.ends_with(L'\r'))
+            lines += L'\r';
+        lines += letter;
+    }
+    return lines;
+}

@@ -11,6 +11,9 @@
 namespace
 {
 
+/// Of a key message: a first press, with Alt.
+constexpr LPARAM AltIsDown = 0x20000001;
+
 std::wstring TextOf(HWND window)
 {
     std::wstring text(static_cast<std::size_t>(SendMessageW(window, WM_GETTEXTLENGTH, 0, 0)), L'\0');
@@ -102,8 +105,12 @@ void DialogWindow::Type(const std::wstring& text) const
 
 void DialogWindow::PressAlt(wchar_t accessKey) const
 {
-    constexpr LPARAM AltIsDown = 0x20000001;
     Post(FocusWindow(), WM_SYSCHAR, accessKey, AltIsDown);
+}
+
+void DialogWindow::PressAltDown() const
+{
+    Post(FocusWindow(), WM_SYSKEYDOWN, VK_DOWN, AltIsDown);
 }
 
 std::wstring DialogWindow::Focused() const
@@ -178,9 +185,11 @@ void DialogWindow::Choose(const std::wstring& name, const std::wstring& item) co
     const auto found = std::find(items.begin(), items.end(), item);
     if (found == items.end())
         throw std::runtime_error("the list does not offer " + std::filesystem::path(item).string());
+    PressAltDown();
     Press(VK_HOME);
     while (Chosen(name) != item)
         Press(VK_DOWN);
+    Press(VK_RETURN);
 }
 
 std::vector<std::wstring> DialogWindow::Items(const std::wstring& name) const
@@ -238,6 +247,22 @@ bool DialogWindow::IsRowTicked(const std::wstring& list, int row) const
     return state >> 12 == 2;
 }
 
+bool DialogWindow::IsRowInView(const std::wstring& list, int row) const
+{
+    const LRESULT top = SendMessageW(Control(list), LVM_GETTOPINDEX, 0, 0);
+    return row >= top && row < top + SendMessageW(Control(list), LVM_GETCOUNTPERPAGE, 0, 0);
+}
+
+std::vector<bool> DialogWindow::Ticks(const std::wstring& list) const
+{
+    const int count = NumRows(list);
+    std::vector<bool> ticks;
+    ticks.reserve(static_cast<std::size_t>(count));
+    for (int row = 0; row < count; ++row)
+        ticks.push_back(IsRowTicked(list, row));
+    return ticks;
+}
+
 void DialogWindow::SelectRow(const std::wstring& list, int row) const
 {
     Focus(list);
@@ -245,10 +270,22 @@ void DialogWindow::SelectRow(const std::wstring& list, int row) const
     for (int i = 0; i < row; ++i)
         Press(VK_DOWN);
     // Home and Down leave a list alone whose focus is there already.
-    LVITEMW item{};
-    item.stateMask = LVIS_SELECTED | LVIS_FOCUSED;
-    item.state = LVIS_SELECTED | LVIS_FOCUSED;
-    SendMessageW(Control(list), LVM_SETITEMSTATE, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&item));
+    SetRowState(list, row, LVIS_SELECTED | LVIS_FOCUSED, true);
+}
+
+void DialogWindow::SelectEveryRow(const std::wstring& list) const
+{
+    SetRowState(list, -1, LVIS_SELECTED, true);
+}
+
+void DialogWindow::UnselectRow(const std::wstring& list, int row) const
+{
+    SetRowState(list, row, LVIS_SELECTED, false);
+}
+
+void DialogWindow::FocusRow(const std::wstring& list, int row) const
+{
+    SetRowState(list, row, LVIS_FOCUSED, true);
 }
 
 void DialogWindow::ClickHeading(const std::wstring& list, int column) const
@@ -282,6 +319,14 @@ HWND DialogWindow::FocusWindow() const
     info.cbSize = sizeof info;
     GetGUIThreadInfo(GetWindowThreadProcessId(m_window, nullptr), &info);
     return info.hwndFocus ? info.hwndFocus : m_window;
+}
+
+void DialogWindow::SetRowState(const std::wstring& list, int row, UINT states, bool set) const
+{
+    LVITEMW item{};
+    item.stateMask = states;
+    item.state = set ? states : 0;
+    SendMessageW(Control(list), LVM_SETITEMSTATE, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&item));
 }
 
 void DialogWindow::Post(HWND control, UINT message, WPARAM wParam, LPARAM lParam) const

@@ -22,6 +22,8 @@ public:
     void Press(WORD key) const;
     void Type(const std::wstring& text) const;
     void PressAlt(wchar_t accessKey) const;
+    /// Opens the drop-down list that has the focus.
+    void PressAltDown() const;
     std::wstring Focused() const;
     void Focus(const std::wstring& name) const;
 
@@ -45,7 +47,7 @@ public:
 
     std::wstring Text(const std::wstring& name) const;
 
-    /// Chooses the item of a drop-down list as a user does, and the items.
+    /// Opens a drop-down list by the keyboard and chooses an item; its items, and the one that it shows.
     void Choose(const std::wstring& name, const std::wstring& item) const;
     std::vector<std::wstring> Items(const std::wstring& name) const;
     std::wstring Chosen(const std::wstring& name) const;
@@ -58,7 +60,13 @@ public:
     std::wstring Cell(const std::wstring& list, int row, int column) const;
     std::vector<std::wstring> Column(const std::wstring& list, int column) const;
     bool IsRowTicked(const std::wstring& list, int row) const;
+    bool IsRowInView(const std::wstring& list, int row) const;
+    std::vector<bool> Ticks(const std::wstring& list) const;
     void SelectRow(const std::wstring& list, int row) const;
+    void SelectEveryRow(const std::wstring& list) const;
+    void UnselectRow(const std::wstring& list, int row) const;
+    /// Moves the focus to a row and leaves the selection, as Ctrl and an arrow key do.
+    void FocusRow(const std::wstring& list, int row) const;
     void ClickHeading(const std::wstring& list, int column) const;
     /// Opens a control's menu by the keyboard and chooses the item with this number, from 1.
     void ChooseFromMenu(const std::wstring& name, int item) const;
@@ -66,6 +74,7 @@ public:
 
 private:
     HWND FocusWindow() const;
+    void SetRowState(const std::wstring& list, int row, UINT states, bool set) const;
     void Post(HWND control, UINT message, WPARAM wParam, LPARAM lParam) const;
     void ClickAt(HWND control, LONG x, LONG y) const;
 

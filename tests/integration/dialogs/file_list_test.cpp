@@ -62,6 +62,51 @@ TEST_F(FileListDialog, ShowsTitleMessageAndEachFileWithFolderAndState)
     });
 }
 
+TEST_F(FileListDialog, IsHighEnoughForItsMessage)
+{
+    AddFile(L"a");
+    struct Heights
+    {
+        LONG message;
+        LONG list;
+        LONG window;
+    };
+    const auto heightsWith = [this](const std::wstring& message) {
+        Heights heights{};
+        m_params.SetMessage(message.c_str());
+        ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+            const RECT place = dialog.Place(message);
+            const RECT list = dialog.Place(List);
+            EXPECT_LE(place.bottom, dialog.Place(L"Filter:").top);
+            RECT window{};
+            GetWindowRect(dialog.Handle(), &window);
+            RECT inside{};
+            GetClientRect(dialog.Handle(), &inside);
+            EXPECT_LT(dialog.Place(L"OK").bottom, inside.bottom);
+            RECT work{};
+            SystemParametersInfoW(SPI_GETWORKAREA, 0, &work, 0);
+            EXPECT_LE(window.bottom, work.bottom);
+            heights = {place.bottom - place.top, list.bottom - list.top, window.bottom - window.top};
+            Cancel(dialog);
+        });
+        return heights;
+    };
+    const auto lines = [](int count) {
+        std::wstring message = L"1";
+        for (int i = 2; i <= count; ++i)
+            message += L"\n" + std::to_wstring(i);
+        return message;
+    };
+    const Heights one = heightsWith(lines(1));
+    const Heights ten = heightsWith(lines(10));
+    const Heights twenty = heightsWith(lines(20));
+    EXPECT_NEAR(twenty.message, 2 * ten.message, 2);
+    EXPECT_EQ(ten.list, one.list);
+    EXPECT_EQ(twenty.list, one.list);
+    EXPECT_EQ(heightsWith(lines(1)).window, one.window) << "the room for a message is not remembered";
+    EXPECT_EQ(heightsWith(lines(500)).list, one.list) << "and a message has no more than the monitor";
+}
+
 TEST_F(FileListDialog, MarksTickedEntriesAndOnlyThem)
 {
     OrvixFileEntry& kept = AddFile(L"a", 0x4);
@@ -100,6 +145,159 @@ TEST_F(FileListDialog, IsTickedByTheSpaceBar)
     });
     EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0x2U);
     EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut() & 0x2, 0U);
+}
+
+TEST_F(FileListDialog, IsTickedByTabSpaceAndArrowsAlone)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    AddFile(L"c");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.Press(VK_TAB);
+        EXPECT_EQ(dialog.Focused(), List);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, true, true}));
+        dialog.Press(VK_DOWN);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, false, true}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, TicksTheRowWithTheFocusAndNotASelectedOneElsewhere)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    AddFile(L"c");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.SelectRow(List, 0);
+        dialog.FocusRow(List, 2);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{true, true, false}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, TicksTheSelectedRowsTogether)
+{
+    AddFile(L"a", 0x2, false);
+    AddFile(L"b");
+    AddFile(L"c");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.Focus(List);
+        dialog.SelectEveryRow(List);
+        dialog.FocusRow(List, 1);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, false, false})) << "as the one with the focus";
+        Cancel(dialog);
+    });
+}
+
+/// Writes down what screen readers are told of changed states in this process.
+class StateChanges
+{
+public:
+    struct Change
+    {
+        HWND window;
+        LONG object;
+        LONG child;
+    };
+
+    StateChanges()
+        : m_hook(SetWinEventHook(EVENT_OBJECT_STATECHANGE, EVENT_OBJECT_STATECHANGE, GetModuleHandleW(nullptr), &Write,
+                                 GetCurrentProcessId(), 0, WINEVENT_INCONTEXT))
+    {
+        Log().clear();
+    }
+    StateChanges(const StateChanges&) = delete;
+    StateChanges& operator=(const StateChanges&) = delete;
+    ~StateChanges() { UnhookWinEvent(m_hook); }
+
+    /// The children of a window's client area that changed since the last call.
+    static std::vector<LONG> Of(HWND window)
+    {
+        std::vector<LONG> children;
+        for (const Change& change : std::exchange(Log(), {}))
+        {
+            if (change.window == window && change.object == OBJID_CLIENT)
+                children.push_back(change.child);
+        }
+        return children;
+    }
+
+private:
+    static std::vector<Change>& Log()
+    {
+        static std::vector<Change> log;
+        return log;
+    }
+    static void CALLBACK Write(HWINEVENTHOOK, DWORD, HWND window, LONG object, LONG child, DWORD, DWORD)
+    {
+        Log().push_back({window, object, child});
+    }
+
+    HWINEVENTHOOK m_hook;
+};
+
+TEST_F(FileListDialog, TellsScreenReadersOfChangedTicks)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    AddFile(L"c");
+    const StateChanges changes;
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        const HWND list = dialog.Control(List);
+        StateChanges::Of(list);
+        dialog.SelectRow(List, 1);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{2}));
+        dialog.ClickCheckBox(List, 2);
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{3}));
+        dialog.SelectEveryRow(List);
+        StateChanges::Of(list);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{1, 2, 3}));
+        dialog.Click(L"Select none");
+        EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{CHILDID_SELF}));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, LetsTheKeyboardGoOnFromTheSameRowAfterSortingAndFiltering)
+{
+    AddFile(L"b");
+    AddFile(L"a");
+    AddFile(L"x");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.ClickHeading(List, 0);
+        EXPECT_EQ(dialog.Column(List, 0), (Texts{L"a", L"b", L"x"}));
+        dialog.Focus(List);
+        dialog.Press(VK_DOWN);
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{true, true, false})) << "x stands below b";
+        SetWindowTextW(dialog.Control(L"Filter:"), L"x");
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{true}));
+        SetWindowTextW(dialog.Control(L"Filter:"), L"b");
+        dialog.Press(VK_SPACE);
+        EXPECT_EQ(dialog.Ticks(List), (std::vector{false})) << "the only row is reached without an arrow key";
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, ScrollsToTheRowWithTheFocusAfterSortingAndFiltering)
+{
+    for (int i = 999; i >= 100; --i)
+        AddFile(std::to_wstring(i).c_str());
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.ClickHeading(List, 0);
+        EXPECT_EQ(dialog.Cell(List, 899, 0), L"999");
+        EXPECT_TRUE(dialog.IsRowInView(List, 899));
+        SetWindowTextW(dialog.Control(L"Filter:"), L"9");
+        EXPECT_TRUE(dialog.IsRowInView(List, dialog.NumRows(List) - 1));
+        Cancel(dialog);
+    });
 }
 
 TEST_F(FileListDialog, TakesEveryEntryWhereNoTicksAreOffered)
@@ -230,6 +428,54 @@ TEST_F(FileListDialog, TakesTheCommentAndOffersItAgain)
     EXPECT_STREQ(m_params.GetComment(), L"second");
 }
 
+TEST_F(FileListDialog, LeavesTheTypedCommentAloneUntilARecentOneIsChosenInTheOpenList)
+{
+    AddFile(L"a");
+    m_params.SetComment(L"recent");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) { dialog.Click(L"OK"); });
+    m_params.SetComment(L"");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        constexpr const wchar_t* Recent = L"Recent comments:";
+        const HWND comment = dialog.Control(L"Comment:");
+        dialog.Focus(L"Comment:");
+        dialog.Type(L"typed");
+        dialog.Focus(Recent);
+        dialog.Press(VK_END);
+        dialog.Type(L"r");
+        PostMessageW(dialog.Control(Recent), WM_MOUSEWHEEL, MAKEWPARAM(0, -WHEEL_DELTA), 0);
+        dialog.Press(VK_UP);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "nobody opened the list";
+        dialog.Press(VK_DOWN);
+        EXPECT_TRUE(SendMessageW(dialog.Control(Recent), CB_GETDROPPEDSTATE, 0, 0));
+        dialog.Press(VK_END);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "nobody chose yet";
+        dialog.Press(VK_ESCAPE);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed");
+        dialog.Choose(Recent, L"recent");
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"recent");
+        SendMessageW(comment, EM_UNDO, 0, 0);
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed");
+        dialog.Click(L"OK");
+    });
+    EXPECT_STREQ(m_params.GetComment(), L"typed");
+}
+
+TEST_F(FileListDialog, TakesARecentCommentOfAnyLength)
+{
+    AddFile(L"a");
+    std::wstring longComment;
+    while (longComment.size() < 40000)
+        longComment += std::wstring(80, L'x') + L"\r\n";
+    m_params.SetComment(longComment.c_str());
+    ShowFileList(Ticks, [](const DialogWindow& dialog) { dialog.Click(L"OK"); });
+    m_params.SetComment(L"");
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.Choose(L"Recent comments:", dialog.Items(L"Recent comments:").front());
+        dialog.Click(L"OK");
+    });
+    EXPECT_TRUE(m_params.GetComment() == longComment);
+}
+
 TEST_F(FileListDialog, TakesBadRecentCommentsForNone)
 {
     AddFile(L"a");
@@ -352,19 +598,43 @@ TEST_F(FileListDialog, DecidesWhatAnOperationWorksOn)
     EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), 0x8U);
 }
 
-TEST_F(FileListDialog, IsQuickWithFiftyThousandFiles)
+/// Seconds since the last call, or the construction.
+class Stopwatch
 {
-    constexpr int Count = 50000;
-    constexpr double Quick = 3; // on a busy machine and under Wine
-    for (int i = 0; i < Count; ++i)
-        AddFile((L"C:\\town\\file" + std::to_wstring(i)).c_str());
+public:
+    double operator()()
+    {
+        const auto now = Clock::now();
+        return std::chrono::duration<double>(now - std::exchange(m_last, now)).count();
+    }
+
+private:
     using Clock = std::chrono::steady_clock;
-    auto last = Clock::now();
+    Clock::time_point m_last = Clock::now();
+};
+
+class LongFileList : public FileListDialog
+{
+protected:
+    static constexpr int Count = 50000;
+    static constexpr double Quick = 3; // on a busy machine and under Wine
+
+    LongFileList()
+    {
+        for (int i = 0; i < Count; ++i)
+            AddFile((L"C:\\town\\file" + std::to_wstring(i)).c_str());
+    }
+
+    static int NumSelected(const DialogWindow& dialog)
+    {
+        return static_cast<int>(SendMessageW(dialog.Control(List), LVM_GETSELECTEDCOUNT, 0, 0));
+    }
+};
+
+TEST_F(LongFileList, IsQuick)
+{
+    Stopwatch seconds;
     ShowFileList(Ticks, [&](const DialogWindow& dialog) {
-        const auto seconds = [&last] {
-            const auto now = Clock::now();
-            return std::chrono::duration<double>(now - std::exchange(last, now)).count();
-        };
         EXPECT_LT(seconds(), Quick) << "to open";
         EXPECT_EQ(dialog.NumRows(List), Count);
         EXPECT_NE(GetWindowLongW(dialog.Control(List), GWL_STYLE) & LVS_OWNERDATA, 0);
@@ -381,6 +651,47 @@ TEST_F(FileListDialog, IsQuickWithFiftyThousandFiles)
     });
     EXPECT_EQ(m_list.GetFileEntry(Count - 1)->GetFlagsOut() & 0x2, 0x2U);
     EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0U);
+}
+
+TEST_F(LongFileList, IsQuickWithEveryRowSelected)
+{
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        dialog.SelectEveryRow(List);
+        Stopwatch seconds;
+        dialog.ClickHeading(List, 0);
+        EXPECT_LT(seconds(), Quick) << "to sort";
+        EXPECT_EQ(NumSelected(dialog), Count);
+        SetWindowTextW(dialog.Control(L"Filter:"), L"file");
+        EXPECT_LT(seconds(), Quick) << "to filter";
+        EXPECT_EQ(NumSelected(dialog), Count);
+        dialog.Focus(List);
+        dialog.Press(VK_SPACE);
+        EXPECT_LT(seconds(), Quick) << "to untick all";
+        EXPECT_FALSE(dialog.IsRowTicked(List, Count - 1));
+        dialog.SelectEveryRow(List);
+        seconds();
+        SetWindowTextW(dialog.Control(L"Filter:"), L"49999");
+        EXPECT_LT(seconds(), Quick) << "to filter down to one";
+        EXPECT_EQ(NumSelected(dialog), 1);
+        Cancel(dialog);
+    });
+}
+
+TEST_F(LongFileList, IsQuickWithMostRowsSelected)
+{
+    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+        constexpr int Step = 100;
+        dialog.SelectEveryRow(List);
+        for (int row = 0; row < Count; row += Step)
+            dialog.UnselectRow(List, row);
+        Stopwatch seconds;
+        dialog.ClickHeading(List, 0);
+        EXPECT_LT(seconds(), Quick) << "to sort";
+        EXPECT_EQ(NumSelected(dialog), Count - Count / Step);
+        SetWindowTextW(dialog.Control(L"Filter:"), L"9");
+        EXPECT_LT(seconds(), Quick) << "to filter";
+        Cancel(dialog);
+    });
 }
 
 } // namespace

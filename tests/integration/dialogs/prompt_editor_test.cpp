@@ -48,6 +48,26 @@ TEST_F(PromptEditorDialog, ShowsEveryPromptWithItsAnswerInWords)
     });
 }
 
+TEST_F(PromptEditorDialog, ShowsTheWholeTextOfTheSelectedPrompt)
+{
+    const std::wstring lines = L"First\nsecond\r\n" + std::wstring(1000, L'x');
+    m_services->RegisterPrompt(4, lines.c_str(), 0x1, 0, true);
+    ShowEditor([](const DialogWindow& dialog) {
+        constexpr const wchar_t* Whole = L"Whole text:";
+        EXPECT_EQ(dialog.Text(Whole), L"Overwrite?");
+        dialog.SelectRow(List, 3);
+        EXPECT_EQ(dialog.Cell(List, 3, 0).substr(0, 13), L"First second ");
+        EXPECT_EQ(dialog.Text(Whole), L"First\r\nsecond\r\n" + std::wstring(1000, L'x'));
+        dialog.PressAlt(L'w');
+        EXPECT_EQ(dialog.Focused(), Whole);
+        dialog.Type(L"more");
+        EXPECT_EQ(dialog.Text(Whole).size(), 1015U) << "it can be read and not changed";
+        SetWindowTextW(dialog.Control(L"Search:"), L"nowhere");
+        EXPECT_EQ(dialog.Text(Whole), L"");
+        dialog.Press(VK_ESCAPE);
+    });
+}
+
 TEST_F(PromptEditorDialog, StoresAChangedAnswer)
 {
     EXPECT_EQ(ShowEditor([](const DialogWindow& dialog) {
@@ -89,7 +109,7 @@ TEST_F(PromptEditorDialog, ReportsNoChangeWhereAnAnswerIsChangedBack)
 TEST_F(PromptEditorDialog, ResetsAnAnswerToAsk)
 {
     EXPECT_EQ(ShowEditor([](const DialogWindow& dialog) {
-                  EXPECT_FALSE(dialog.IsEnabled(L"Reset to ask")) << "nothing is selected";
+                  EXPECT_TRUE(dialog.IsEnabled(L"Reset to ask")) << "the first prompt is selected from the beginning";
                   dialog.SelectRow(List, 1);
                   EXPECT_FALSE(dialog.IsEnabled(L"Reset to ask")) << "it asks already";
                   dialog.SelectRow(List, 0);
@@ -100,6 +120,29 @@ TEST_F(PromptEditorDialog, ResetsAnAnswerToAsk)
               }),
               1);
     EXPECT_EQ(m_services->GetPromptAction(1), 0x1U);
+}
+
+TEST_F(PromptEditorDialog, IsHandledByTabAndArrowsAlone)
+{
+    ShowEditor([](const DialogWindow& dialog) {
+        dialog.Press(VK_TAB);
+        EXPECT_EQ(dialog.Focused(), List);
+        EXPECT_EQ(dialog.Chosen(Answer), L"Yes");
+        dialog.Press(VK_DOWN);
+        EXPECT_EQ(dialog.Chosen(Answer), L"Ask") << "the second one's";
+        dialog.Press(VK_ESCAPE);
+    });
+}
+
+TEST_F(PromptEditorDialog, OffersNothingToChangeWhereTheSearchFindsNothing)
+{
+    ShowEditor([](const DialogWindow& dialog) {
+        dialog.Type(L"nowhere");
+        EXPECT_EQ(dialog.NumRows(List), 0);
+        EXPECT_FALSE(dialog.IsEnabled(Answer));
+        EXPECT_FALSE(dialog.IsEnabled(L"Reset to ask"));
+        dialog.Press(VK_ESCAPE);
+    });
 }
 
 TEST_F(PromptEditorDialog, OffersTheAnswersThatThePromptsOptionsName)

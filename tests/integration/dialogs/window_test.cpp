@@ -1,6 +1,7 @@
 #include "DialogsTest.h"
 
 #include <commctrl.h>
+#include <uxtheme.h>
 #include <windows.h>
 
 #include <algorithm>
@@ -57,6 +58,22 @@ TEST_F(DialogWindows, AreWalkedThroughByTab)
         }
         EXPECT_EQ(walked, stops);
         EXPECT_EQ(dialog.Focused(), stops.front());
+        dialog.Press(VK_ESCAPE);
+    });
+}
+
+TEST_F(DialogWindows, OfTheStoredAnswersLetTheWholeTextBeReachedByTab)
+{
+    m_services->RegisterPrompt(1, L"Open?", 0x2, 0, true);
+    ShowEditor([](const DialogWindow& dialog) {
+        const Texts stops = dialog.TabStops();
+        EXPECT_EQ(stops,
+                  (Texts{L"Search:", L"Prompts:", L"Whole text:", L"Answer:", L"Reset to ask", L"OK", L"Cancel"}));
+        for (const auto& stop : stops)
+        {
+            EXPECT_EQ(dialog.Focused(), stop);
+            dialog.Press(VK_TAB);
+        }
         dialog.Press(VK_ESCAPE);
     });
 }
@@ -226,6 +243,20 @@ TEST_F(DialogWindows, UseTheCommonControlsOfVersionSix)
             SendMessageW(dialog.Control(L"Filter:"), EM_SETCUEBANNER, FALSE, reinterpret_cast<LPARAM>(L"name")));
         dialog.Press(VK_ESCAPE);
     });
+}
+
+TEST_F(DialogWindows, TakeCheckBoxesOutOfAThemeThatHidesTheHostsColours)
+{
+    bool themed = false;
+    const auto look = [&themed](const DialogWindow& dialog) {
+        themed = GetWindowTheme(dialog.Control(L"Keep checked out")) != nullptr;
+        dialog.Press(VK_ESCAPE);
+    };
+    ShowFileList(Everything, look);
+    EXPECT_EQ(themed, IsThemeActive() != FALSE);
+    m_host.colors = {{COLOR_BTNTEXT, 0x000000F0}};
+    ShowFileList(Everything, look);
+    EXPECT_FALSE(themed);
 }
 
 TEST_F(DialogWindows, HaveTheHostsColours)
