@@ -228,5 +228,7 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
         return TRUE;
     if (Defect::Is(L"crash-at-load"))
         Defect::Crash();
+    if (Defect::Is(L"program-moves"))
+        Defect::MoveProgram();
     return !Defect::Is(L"reload") || Defect::Count(L"ORVIX_DEFECT_LOADS") != 5;
 }
