@@ -311,6 +311,20 @@ TEST_F(Validate, LeavesNothingOnTheDiskAndInTheRegistry)
     EXPECT_EQ(keys, 0u);
 }
 
+TEST_F(Validate, SkipsWhatNeedsAPrivateRegistrationWhereTheSystemRefusesIt)
+{
+    for (const wchar_t* defect : {L"no-override", L"no-value"})
+    {
+        const Environment environment(Defect::Variable, defect);
+        const auto result = ValidateLibrary(Libraries / L"defective_scc.dll", Success, {L"--dialogs"});
+        const auto skipped = With("skip", result);
+        ASSERT_TRUE(skipped.contains("starts"));
+        EXPECT_THAT(skipped.at("starts"),
+                    AllOf(StartsWith("it cannot be registered for this process alone: "), EndsWith("(error 5)")));
+        EXPECT_THAT(result.output, HasSubstr("\n24 rules, 10 passed, 0 failed, 14 skipped\n"));
+    }
+}
+
 TEST_F(Validate, SaysWhyTheProcessOfARuleDoesNotStart)
 {
     const std::filesystem::path original = ORVIX_TOOL;
