@@ -9,6 +9,7 @@
 #include <gmock/gmock.h>
 
 #include <map>
+#include <set>
 #include <sstream>
 
 namespace
@@ -166,7 +167,7 @@ INSTANTIATE_TEST_SUITE_P(
                 {L"objects", "objects", "GetIOrvixProvider gives null"},
                 {L"state", "state", "IsProjectOpen is true after CloseProject"},
                 {L"reserved", "reserved", "ReservedC gives 0"},
-                {L"results", "results", "UndoCheckOut gives 7"},
+                {L"results", "results", "UndoCheckOut with options 0x00000001 gives 7"},
                 {L"bad-input", "bad-input", "what?.txt\" gives 3"},
                 {L"empty-list", "empty-list", "GetLatest gives 0"},
                 {L"status-bits", "status-bits", "QueryStatus sets bits that mean nothing: 0x00000046"},
@@ -178,6 +179,7 @@ INSTANTIATE_TEST_SUITE_P(
         Defects{{L"name-that-turns", "name", "gives another name when it is asked again"},
                 {L"reserved-pointers", "reserved", "ReservedD does not store 0 through both pointers"},
                 {L"status-left-out", "status-bits", "QueryStatus does not write an entry's FlagsOut"},
+                {L"option-bit", "results", "CheckOut with options 0x00000004 gives -1, and 0 with 0x00000000"},
                 {L"sessions", "sessions", "Initialize gives -1 in session 3"}},
         Defects{{L"reserved-false", "reserved", "ReservedI gives false"},
                 {L"status-contradiction", "status-bits", "QueryStatus says controlled and not controlled: 0x00000003"},
@@ -211,6 +213,24 @@ INSTANTIATE_TEST_SUITE_P(
         Defects{{L"info-overrun", "info-bits", "SccQueryInfo writes more words than there are files"},
                 {L"text-null", "text-output", "a line of kind 1 has no text"}},
         Defects{{L"starts", "starts", "Initialize gives -1"}}));
+
+TEST_F(Validate, GivesEveryOperationAllOptionsThatHostsDo)
+{
+    const std::filesystem::path file = Scratch() / L"options.txt";
+    const Environment environment(Defect::Variable, L"report-options");
+    const Environment where(L"ORVIX_DEFECT_FILE", file.wstring());
+    ValidatePlugin(Plugins / L"defective.dll", Success);
+    std::map<std::string, std::set<unsigned long>> given;
+    std::istringstream lines(ReadBytes(file));
+    unsigned long options = 0;
+    for (std::string operation; lines >> operation >> options;)
+    {
+        given[operation].insert(options);
+    }
+    const auto all = ElementsAre(0, 1, 2, 4, 5, 6);
+    EXPECT_THAT(given, ElementsAre(Pair("Add", all), Pair("CheckIn", all), Pair("CheckOut", all),
+                                   Pair("GetLatest", all), Pair("UndoCheckOut", all)));
+}
 
 TEST_F(Validate, NamesTheMissingExportOfAPlugin)
 {

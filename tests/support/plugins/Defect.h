@@ -44,6 +44,13 @@ public:
         std::ofstream(File()) << started.dwProcessId;
     }
 
+    /// Writes an operation and its options to that file, where "report-options" asks for it.
+    static void Report(const char* operation, unsigned long options)
+    {
+        if (Is(L"report-options"))
+            std::ofstream(File(), std::ios::app) << operation << ' ' << options << '\n';
+    }
+
     /// Renames this program's file, so that it cannot be started once more.
     static void MoveProgram()
     {

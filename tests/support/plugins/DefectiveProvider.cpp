@@ -60,17 +60,25 @@ public:
         return Success;
     }
 
-    int Add(OrvixFileList* list, const wchar_t*, unsigned long) override { return Become(list, Controlled); }
-
-    int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long) override
+    int Add(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
+        Defect::Report("Add", options);
+        return Become(list, Controlled);
+    }
+
+    int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long options) override
+    {
+        Defect::Report("CheckOut", options);
+        if (Defect::Is(L"option-bit") && (options & 0x4) != 0)
+            return Failure;
         if (Defect::Is(L"bad-input") && std::wstring(Last(list)).find(L'?') != std::wstring::npos)
             return 3;
         return Become(list, CheckedOut);
     }
 
-    int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long) override
+    int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
+        Defect::Report("CheckIn", options);
         if (Defect::Is(L"list-untouched") && list->NumActiveEntries() != 0)
             list->GetActiveFileEntry(0)->SetFlagsIn(0);
         return Become(list, Controlled);
@@ -78,12 +86,14 @@ public:
 
     int UndoCheckOut(OrvixFileList* list, unsigned long options) override
     {
+        Defect::Report("UndoCheckOut", options);
         const int result = Become(list, Controlled);
         return Defect::Is(L"results") && options != 0 ? 7 : result;
     }
 
-    int GetLatest(OrvixFileList* list, unsigned long) override
+    int GetLatest(OrvixFileList* list, unsigned long options) override
     {
+        Defect::Report("GetLatest", options);
         return list->NumActiveEntries() == 0 && !Defect::Is(L"empty-list") ? Failure : Success;
     }
 
