@@ -208,9 +208,11 @@ INSTANTIATE_TEST_SUITE_P(
                 {L"handles", "handles", "10 sessions leave 10 handles open"}},
         Defects{{L"no-terminator", "texts", "the label of the auxiliary path has no terminator in its 32 bytes"},
                 {L"input-texts", "input-texts", "SccOpenProject writes to the project name or the local path"},
+                {L"codes-kept", "codes", "SccAdd gives 42"},
                 {L"info-left-out", "info-bits", "SccQueryInfo leaves a file's word as it was"},
                 {L"text-without-kind", "text-output", "the kind 99 means nothing"}},
-        Defects{{L"info-overrun", "info-bits", "SccQueryInfo writes more words than there are files"},
+        Defects{{L"codes-given-back", "codes", "SccCheckin gives 42"},
+                {L"info-overrun", "info-bits", "SccQueryInfo writes more words than there are files"},
                 {L"text-null", "text-output", "a line of kind 1 has no text"}},
         Defects{{L"starts", "starts", "Initialize gives -1"}}));
 

@@ -109,15 +109,19 @@ SCCRTN SccUncheckout(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
     return Become(count, names, Controlled);
 }
 
-SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDOPTS)
+SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG options, LPCMDOPTS)
 {
+    if (Defect::Is(L"codes-given-back") && options == 0)
+        return 42;
     if (Defect::Is(L"input-names") && count > 0)
         const_cast<LPSTR>(names[0])[0] = '#';
     return Become(count, names, Controlled);
 }
 
-SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG*, LPCMDOPTS)
+SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG* options, LPCMDOPTS)
 {
+    if (Defect::Is(L"codes-kept") && count > 0 && options[0] == SCC_KEEP_CHECKEDOUT)
+        return 42;
     return Become(count, names, Controlled);
 }
 
