@@ -62,13 +62,13 @@ public:
 
     int Add(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
-        Defect::Report("Add", options);
+        Report("Add", options);
         return Become(list, Controlled);
     }
 
     int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
-        Defect::Report("CheckOut", options);
+        Report("CheckOut", options);
         if (Defect::Is(L"option-bit") && (options & 0x4) != 0)
             return Failure;
         if (Defect::Is(L"bad-input") && std::wstring(Last(list)).find(L'?') != std::wstring::npos)
@@ -78,7 +78,7 @@ public:
 
     int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
-        Defect::Report("CheckIn", options);
+        Report("CheckIn", options);
         if (Defect::Is(L"list-untouched") && list->NumActiveEntries() != 0)
             list->GetActiveFileEntry(0)->SetFlagsIn(0);
         return Become(list, Controlled);
@@ -86,14 +86,14 @@ public:
 
     int UndoCheckOut(OrvixFileList* list, unsigned long options) override
     {
-        Defect::Report("UndoCheckOut", options);
+        Report("UndoCheckOut", options);
         const int result = Become(list, Controlled);
         return Defect::Is(L"results") && options != 0 ? 7 : result;
     }
 
     int GetLatest(OrvixFileList* list, unsigned long options) override
     {
-        Defect::Report("GetLatest", options);
+        Report("GetLatest", options);
         return list->NumActiveEntries() == 0 && !Defect::Is(L"empty-list") ? Failure : Success;
     }
 
@@ -167,6 +167,13 @@ private:
     static constexpr unsigned long NotControlled = 0x1;
     static constexpr unsigned long Controlled = 0x2;
     static constexpr unsigned long CheckedOut = 0x2 | 0x4;
+
+    /// Not of the rules that go through many sessions: these pass fewer options.
+    void Report(const char* operation, unsigned long options) const
+    {
+        if (m_starts == 1)
+            Defect::Report(operation, options);
+    }
 
     static const wchar_t* Last(OrvixFileList* list)
     {
