@@ -50,7 +50,7 @@ protected:
     OrvixTool::Result ValidatePlugin(const std::filesystem::path& library, unsigned long code, Arguments more = {})
     {
         more.insert(more.begin(), {L"validate", library.wstring()});
-        const auto result = RunExactly(more);
+        auto result = RunExactly(more);
         EXPECT_EQ(result.code, code) << testing::PrintToString(more) << "\noutput:\n"
                                      << result.output << "\nerrors:\n"
                                      << result.errors;
