@@ -11,6 +11,18 @@ class OrvixFileList;
 /// File operations work on the active entries of the list, which is the host's; a provider changes nothing
 /// of it but each active entry's FlagsOut. Results: 0 success, -1 failure, -2 not offered.
 /// All operations are called on the host's user-interface thread and let no exception out.
+///
+/// The bits of `options`, where an operation has them:
+///
+/// | bit | meaning | in |
+/// |---|---|---|
+/// | 0x1 | keep the files checked out | `CheckIn`, `Add` |
+/// | 0x2 | get the latest version too | `CheckOut` (first), `UndoCheckOut` (afterwards) |
+/// | 0x4 | the stored answer confirmed it, no dialog was shown | all |
+///
+/// `IOrvixServices::RunFileListOperation` passes 0, 0x1, 0x2, 0x4, 0x5 or 0x6, the same to every operation that it
+/// calls, and a host that calls a provider itself may pass others: a provider ignores the bits that it does not know.
+///
 /// The reserved operations keep their slots; a provider returns what is listed with them.
 class IOrvixProvider : public BraeHeapOperators
 {

@@ -1,6 +1,7 @@
 // orvix validate: what it says of good libraries, and of one with a single defect.
 
 #include "Defect.h"
+#include "FilePath.h"
 #include "ToolTest.h"
 
 #include <nlohmann/json.hpp>
@@ -8,6 +9,8 @@
 #include <gmock/gmock.h>
 
 #include <map>
+#include <set>
+#include <sstream>
 
 namespace
 {
@@ -43,16 +46,21 @@ class Validate : public ToolTest
 protected:
     using Reasons = std::map<std::string, std::string>; ///< by the names of rules
 
-    OrvixTool::Result ValidatePlugin(const std::filesystem::path& library, Arguments more = {})
+    /// Runs the tool and expects this exit code.
+    OrvixTool::Result ValidatePlugin(const std::filesystem::path& library, unsigned long code, Arguments more = {})
     {
         more.insert(more.begin(), {L"validate", library.wstring()});
-        return RunExactly(more);
+        auto result = RunExactly(more);
+        EXPECT_EQ(result.code, code) << testing::PrintToString(more) << "\noutput:\n"
+                                     << result.output << "\nerrors:\n"
+                                     << result.errors;
+        return result;
     }
 
-    OrvixTool::Result ValidateLibrary(const std::filesystem::path& library, Arguments more = {})
+    OrvixTool::Result ValidateLibrary(const std::filesystem::path& library, unsigned long code, Arguments more = {})
     {
         more.insert(more.begin(), L"--mssccci");
-        return ValidatePlugin(library, std::move(more));
+        return ValidatePlugin(library, code, std::move(more));
     }
 
     /// The rules with this result, from the lines of a run.
@@ -74,8 +82,7 @@ protected:
     Reasons FailedWith(const std::wstring& defect)
     {
         const Environment environment(Defect::Variable, defect);
-        const auto result = ValidatePlugin(Plugins / L"defective.dll", {L"--dialogs"});
-        EXPECT_EQ(result.code, Failed);
+        const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--dialogs"});
         return With("fail", result);
     }
 
@@ -83,8 +90,7 @@ protected:
     Reasons LibraryFailedWith(const std::wstring& defect)
     {
         const Environment environment(Defect::Variable, defect);
-        const auto result = ValidateLibrary(Libraries / L"defective_scc.dll", {L"--dialogs"});
-        EXPECT_EQ(result.code, Failed);
+        const auto result = ValidateLibrary(Libraries / L"defective_scc.dll", Failed, {L"--dialogs"});
         return With("fail", result);
     }
 };
@@ -130,25 +136,21 @@ void ExpectExactly(const Defects& defects, const std::map<std::string, std::stri
 
 TEST_F(Validate, PassesTheSamplePluginInEveryRule)
 {
-    const auto result = ValidatePlugin(ORVIX_ARCHIVE, {L"--dialogs"});
-    EXPECT_EQ(result.code, Success) << result.output;
+    const auto result = ValidatePlugin(ORVIX_ARCHIVE, Success, {L"--dialogs"});
     EXPECT_THAT(result.output, EndsWith("\n19 rules, 19 passed, 0 failed, 0 skipped\n"));
 }
 
 TEST_F(Validate, PassesTheSampleLibraryInEveryRule)
 {
-    const auto result = ValidateLibrary(ORVIX_ARCHIVE_MSSCCI, {L"--dialogs"});
-    EXPECT_EQ(result.code, Success) << result.output;
+    const auto result = ValidateLibrary(ORVIX_ARCHIVE_MSSCCI, Success, {L"--dialogs"});
     EXPECT_THAT(result.output, EndsWith("\n24 rules, 24 passed, 0 failed, 0 skipped\n"));
 }
 
 TEST_F(Validate, PassesWhatTheDefectsAreMadeOf)
 {
-    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", {L"--dialogs"});
-    EXPECT_EQ(plugin.code, Success) << plugin.output;
+    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", Success, {L"--dialogs"});
     EXPECT_THAT(With("skip", plugin), IsEmpty());
-    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", {L"--dialogs"});
-    EXPECT_EQ(library.code, Success) << library.output;
+    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", Success, {L"--dialogs"});
     EXPECT_THAT(With("skip", library), IsEmpty());
 }
 
@@ -159,32 +161,33 @@ TEST_P(ValidateDefectivePlugin, FailsTheRulesThatItBreaksAndNoOthers)
 
 INSTANTIATE_TEST_SUITE_P(
     All, ValidateDefectivePlugin,
-    testing::Values(Defects{{L"version", "version", "GetOrvixVersion gives 201"},
-                            {L"name", "name", "GetOrvixProviderName gives no name"},
-                            {L"objects", "objects", "GetIOrvixProvider gives null"},
-                            {L"state", "state", "IsProjectOpen is true after CloseProject"},
-                            {L"reserved", "reserved", "ReservedC gives 0"},
-                            {L"results", "results", "UndoCheckOut gives 7"},
-                            {L"bad-input", "bad-input", "what?.txt\" gives 3"},
-                            {L"empty-list", "empty-list", "GetLatest gives 0"},
-                            {L"status-bits", "status-bits", "QueryStatus sets bits that mean nothing: 0x00000046"},
-                            {L"status-failure", "status-failure", "QueryStatus fails and changes FlagsOut"},
-                            {L"status-closed", "status-closed", "QueryStatus writes 0x00100001 before OpenProject"},
-                            {L"list-untouched", "list-untouched", "CheckIn changes more of the list than FlagsOut"},
-                            {L"handles", "handles", "10 sessions leave 10 handles open"},
-                            {L"dialogs", "dialogs", "ShowOptions gives 9"}},
-                    Defects{{L"name-that-turns", "name", "gives another name when it is asked again"},
-                            {L"reserved-pointers", "reserved", "ReservedD does not store 0 through both pointers"},
-                            {L"status-left-out", "status-bits", "QueryStatus does not write an entry's FlagsOut"},
-                            {L"sessions", "sessions", "Initialize gives -1 in session 3"}},
-                    Defects{{L"reserved-false", "reserved", "ReservedI gives false"},
-                            {L"status-contradiction", "status-bits",
-                             "QueryStatus says controlled and not controlled: 0x00000003"},
-                            {L"reload", "reload", "it does not load: "}},
-                    Defects{{L"starts", "starts", "Initialize gives -1"}},
-                    Defects{{L"exception", "reserved", "ReservedC lets an exception out"}},
-                    Defects{{L"crash", "reserved", "ReservedE crashes the process with exception 0xC0000005"}},
-                    Defects{{L"exit", "reserved", "ReservedG ends the process with exit code 7"}}));
+    testing::Values(
+        Defects{{L"version", "version", "GetOrvixVersion gives 201"},
+                {L"name", "name", "GetOrvixProviderName gives no name"},
+                {L"objects", "objects", "GetIOrvixProvider gives null"},
+                {L"state", "state", "IsProjectOpen is true after CloseProject"},
+                {L"reserved", "reserved", "ReservedC gives 0"},
+                {L"results", "results", "UndoCheckOut with options 0x00000001 gives 7"},
+                {L"bad-input", "bad-input", "what?.txt\" gives 3"},
+                {L"empty-list", "empty-list", "GetLatest gives 0"},
+                {L"status-bits", "status-bits", "QueryStatus sets bits that mean nothing: 0x00000046"},
+                {L"status-failure", "status-failure", "QueryStatus fails and changes FlagsOut"},
+                {L"status-closed", "status-closed", "QueryStatus writes 0x00100001 before OpenProject"},
+                {L"list-untouched", "list-untouched", "CheckIn changes more of the list than FlagsOut"},
+                {L"handles", "handles", "10 sessions leave 10 handles open"},
+                {L"dialogs", "dialogs", "ShowOptions gives 9"}},
+        Defects{{L"name-that-turns", "name", "gives another name when it is asked again"},
+                {L"reserved-pointers", "reserved", "ReservedD does not store 0 through both pointers"},
+                {L"status-left-out", "status-bits", "QueryStatus does not write an entry's FlagsOut"},
+                {L"option-bit", "results", "CheckOut with options 0x00000004 gives -1, and 0 with 0x00000000"},
+                {L"sessions", "sessions", "Initialize gives -1 in session 3"}},
+        Defects{{L"reserved-false", "reserved", "ReservedI gives false"},
+                {L"status-contradiction", "status-bits", "QueryStatus says controlled and not controlled: 0x00000003"},
+                {L"reload", "reload", "it does not load: "}},
+        Defects{{L"starts", "starts", "Initialize gives -1"}},
+        Defects{{L"exception", "reserved", "ReservedC lets an exception out"}},
+        Defects{{L"crash", "reserved", "ReservedE crashes the process with exception 0xC0000005"}},
+        Defects{{L"exit", "reserved", "ReservedG ends the process with exit code 7"}}));
 
 TEST_P(ValidateDefectiveLibrary, FailsTheRulesThatItBreaksAndNoOthers)
 {
@@ -205,19 +208,38 @@ INSTANTIATE_TEST_SUITE_P(
                 {L"handles", "handles", "10 sessions leave 10 handles open"}},
         Defects{{L"no-terminator", "texts", "the label of the auxiliary path has no terminator in its 32 bytes"},
                 {L"input-texts", "input-texts", "SccOpenProject writes to the project name or the local path"},
+                {L"codes-kept", "codes", "SccAdd gives 42"},
                 {L"info-left-out", "info-bits", "SccQueryInfo leaves a file's word as it was"},
                 {L"text-without-kind", "text-output", "the kind 99 means nothing"}},
-        Defects{{L"info-overrun", "info-bits", "SccQueryInfo writes more words than there are files"},
+        Defects{{L"codes-given-back", "codes", "SccCheckin gives 42"},
+                {L"info-overrun", "info-bits", "SccQueryInfo writes more words than there are files"},
                 {L"text-null", "text-output", "a line of kind 1 has no text"}},
         Defects{{L"starts", "starts", "Initialize gives -1"}}));
+
+TEST_F(Validate, GivesEveryOperationAllOptionsThatHostsDo)
+{
+    const std::filesystem::path file = Scratch() / L"options.txt";
+    const Environment environment(Defect::Variable, L"report-options");
+    const Environment where(L"ORVIX_DEFECT_FILE", file.wstring());
+    ValidatePlugin(Plugins / L"defective.dll", Success);
+    std::map<std::string, std::set<unsigned long>> given;
+    std::istringstream lines(ReadBytes(file));
+    unsigned long options = 0;
+    for (std::string operation; lines >> operation >> options;)
+    {
+        given[operation].insert(options);
+    }
+    const auto all = ElementsAre(0, 1, 2, 4, 5, 6);
+    EXPECT_THAT(given, ElementsAre(Pair("Add", all), Pair("CheckIn", all), Pair("CheckOut", all),
+                                   Pair("GetLatest", all), Pair("UndoCheckOut", all)));
+}
 
 TEST_F(Validate, NamesTheMissingExportOfAPlugin)
 {
     for (const wchar_t* name :
          {L"GetOrvixVersion", L"GetIOrvixProvider", L"ReleaseIOrvixProvider", L"GetOrvixProviderName"})
     {
-        const auto result = ValidatePlugin(Plugins / (std::wstring(L"defective_without_") + name + L".dll"));
-        EXPECT_EQ(result.code, Failed);
+        const auto result = ValidatePlugin(Plugins / (std::wstring(L"defective_without_") + name + L".dll"), Failed);
         EXPECT_THAT(With("fail", result),
                     ElementsAre(Pair("exports", "it lacks " + std::filesystem::path(name).string())));
     }
@@ -225,9 +247,9 @@ TEST_F(Validate, NamesTheMissingExportOfAPlugin)
 
 TEST_F(Validate, FailsALibraryForAFunctionThatIsNeededAndRemarksOneThatIsNot)
 {
-    const auto result = ValidateLibrary(Libraries / L"defective_scc_without_SccCheckin.dll");
+    const auto result = ValidateLibrary(Libraries / L"defective_scc_without_SccCheckin.dll", Failed);
     EXPECT_THAT(With("fail", result), ElementsAre(Pair("exports", "it lacks SccCheckin")));
-    const auto passed = With("pass", ValidateLibrary(Libraries / L"defective_scc.dll"));
+    const auto passed = With("pass", ValidateLibrary(Libraries / L"defective_scc.dll", Success));
     ASSERT_TRUE(passed.contains("exports"));
     EXPECT_THAT(passed.at("exports"), AllOf(StartsWith("without SccGetProjPath "), HasSubstr(" SccRunScc ")));
 }
@@ -235,11 +257,10 @@ TEST_F(Validate, FailsALibraryForAFunctionThatIsNeededAndRemarksOneThatIsNot)
 TEST_F(Validate, EndsAHangingOperationAtTheLimitAndGoesOn)
 {
     const Environment environment(Defect::Variable, L"hang");
-    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", {L"--timeout", L"5"});
-    EXPECT_EQ(plugin.code, Failed);
+    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--timeout", L"5"});
     EXPECT_THAT(With("fail", plugin), ElementsAre(Pair("reserved", "ReservedF hangs: ended after 5 s")));
     EXPECT_THAT(plugin.output, HasSubstr("\npass  handles "));
-    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", {L"--timeout", L"5"});
+    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", Failed, {L"--timeout", L"5"});
     EXPECT_THAT(With("fail", library),
                 ElementsAre(Pair("null-arguments", "SccGetCommandOptions hangs: ended after 5 s")));
 }
@@ -247,8 +268,7 @@ TEST_F(Validate, EndsAHangingOperationAtTheLimitAndGoesOn)
 TEST_F(Validate, FailsALibraryThatCrashesWhenItIsLoaded)
 {
     const Environment environment(Defect::Variable, L"crash-at-load");
-    const auto result = ValidatePlugin(Plugins / L"defective.dll");
-    EXPECT_EQ(result.code, Failed);
+    const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed);
     EXPECT_TRUE(With("fail", result).contains("loads")); // the system may make a failed load of it
     EXPECT_THAT(With("pass", result), IsEmpty());
 }
@@ -258,7 +278,7 @@ TEST_F(Validate, LeavesNoProcessBehindThatTheLibraryStarted)
     const std::filesystem::path file = Scratch() / L"descendant.txt";
     const Environment environment(Defect::Variable, L"descendant");
     const Environment where(L"ORVIX_DEFECT_FILE", file.wstring());
-    ASSERT_EQ(ValidatePlugin(Plugins / L"defective.dll").code, Success);
+    ValidatePlugin(Plugins / L"defective.dll", Success);
     const std::string number = ReadBytes(file);
     ASSERT_NE(number, "");
     const HANDLE process = OpenProcess(SYNCHRONIZE, FALSE, std::stoul(number));
@@ -269,9 +289,9 @@ TEST_F(Validate, LeavesNoProcessBehindThatTheLibraryStarted)
 TEST_F(Validate, FailsOneRuleForWhatIsNoLibraryAndSkipsTheOthers)
 {
     WriteBytes(File(L"text.dll"), "no library");
-    const auto result = ValidatePlugin(L"text.dll");
-    EXPECT_EQ(result.code, Failed);
-    EXPECT_THAT(With("fail", result), ElementsAre(Pair("loads", StartsWith("it does not load: error 193"))));
+    const auto result = ValidatePlugin(L"text.dll", Failed);
+    EXPECT_THAT(With("fail", result),
+                ElementsAre(Pair("loads", AllOf(StartsWith("it does not load: "), EndsWith("(error 193)")))));
     EXPECT_THAT(With("pass", result), IsEmpty());
     EXPECT_THAT(result.output, EndsWith("\n19 rules, 0 passed, 1 failed, 18 skipped\n"));
 }
@@ -284,16 +304,15 @@ TEST_F(Validate, FailsAPluginWhosePathNoHostFinds)
         std::filesystem::copy_file(Plugins / L"defective.dll", L"\\\\?\\" + path.wstring());
         return path;
     };
-    EXPECT_THAT(With("fail", ValidatePlugin(copy(name))),
+    EXPECT_THAT(With("fail", ValidatePlugin(copy(name), Failed)),
                 testing::Contains(Pair("loads", HasSubstr("longer than 259"))));
-    EXPECT_THAT(With("fail", ValidatePlugin(copy(name.substr(1)))), IsEmpty());
+    EXPECT_THAT(With("fail", ValidatePlugin(copy(name.substr(1)), Success)), IsEmpty());
 }
 
 TEST_F(Validate, RunsWhatMayShowWindowsOnlyWhenAskedTo)
 {
     const Environment environment(Defect::Variable, L"dialogs");
-    const auto result = ValidatePlugin(Plugins / L"defective.dll");
-    EXPECT_EQ(result.code, Success);
+    const auto result = ValidatePlugin(Plugins / L"defective.dll", Success);
     EXPECT_THAT(With("skip", result), ElementsAre(Pair("dialogs", HasSubstr("--dialogs"))));
 }
 
@@ -302,7 +321,7 @@ TEST_F(Validate, LeavesNothingOnTheDiskAndInTheRegistry)
     const std::filesystem::path temp = Scratch() / L"temp";
     std::filesystem::create_directory(temp);
     const Environment environment(L"TMP", temp.wstring());
-    ASSERT_EQ(ValidateLibrary(ORVIX_ARCHIVE_MSSCCI).code, Success);
+    ValidateLibrary(ORVIX_ARCHIVE_MSSCCI, Success);
     EXPECT_TRUE(std::filesystem::is_empty(temp));
     EXPECT_TRUE(std::filesystem::is_empty(Project()));
     HKEY key = nullptr;
@@ -314,11 +333,54 @@ TEST_F(Validate, LeavesNothingOnTheDiskAndInTheRegistry)
     EXPECT_EQ(keys, 0u);
 }
 
+TEST_F(Validate, SkipsWhatNeedsAPrivateRegistrationWhereTheSystemRefusesIt)
+{
+    for (const wchar_t* defect : {L"no-override", L"no-value"})
+    {
+        const Environment environment(Defect::Variable, defect);
+        const auto result = ValidateLibrary(Libraries / L"defective_scc.dll", Success, {L"--dialogs"});
+        const auto skipped = With("skip", result);
+        ASSERT_TRUE(skipped.contains("starts"));
+        EXPECT_THAT(skipped.at("starts"),
+                    AllOf(StartsWith("it cannot be registered for this process alone: "), EndsWith("(error 5)")));
+        EXPECT_THAT(result.output, HasSubstr("\n24 rules, 10 passed, 0 failed, 14 skipped\n"));
+    }
+}
+
+TEST_F(Validate, SaysWhyTheProcessOfARuleDoesNotStart)
+{
+    const std::filesystem::path original = ORVIX_TOOL;
+    for (const wchar_t* name : {L"orvix.exe", L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll"})
+    {
+        std::filesystem::copy_file(original.parent_path() / name, Scratch() / name);
+    }
+    UseProgram(Scratch() / L"orvix.exe");
+    const Environment environment(Defect::Variable, L"program-moves");
+    const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed);
+    EXPECT_THAT(result.output, StartsWith("pass  loads "));
+    EXPECT_THAT(result.errors, AllOf(StartsWith("orvix: no rule can be checked, a process cannot be made: "),
+                                     EndsWith("(error 2)\n")));
+}
+
+TEST_F(Validate, SaysWhyThereIsNoScratchProject)
+{
+    const Environment environment(L"TMP", (Scratch() / L"nowhere").wstring());
+    EXPECT_THAT(ValidatePlugin(Plugins / L"defective.dll", Failed).errors,
+                AllOf(StartsWith("orvix: no scratch project can be made in the folder of temporary files: "),
+                      EndsWith("(error 3)\n")));
+}
+
+TEST(LongPath, OfAShareAndOfADrive)
+{
+    EXPECT_EQ(LongPath(L"C:\\temp"), L"\\\\?\\C:\\temp");
+    EXPECT_EQ(LongPath(L"\\\\server\\share\\temp"), L"\\\\?\\UNC\\server\\share\\temp");
+    EXPECT_EQ(LongPath(L"\\\\?\\C:\\temp"), L"\\\\?\\C:\\temp");
+}
+
 TEST_F(Validate, PrintsAJsonDocumentWithTheSameResults)
 {
     const Environment environment(Defect::Variable, L"reserved");
-    const auto result = ValidatePlugin(Plugins / L"defective.dll", {L"--json"});
-    EXPECT_EQ(result.code, Failed);
+    const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--json"});
     const auto document = nlohmann::json::parse(result.output);
     EXPECT_EQ(document["library"], (Plugins / L"defective.dll").make_preferred().string());
     EXPECT_EQ(document["kind"], "plugin");
@@ -339,8 +401,7 @@ TEST_F(Validate, OfAFileThatIsNotThereEndsWithThree)
 {
     for (const wchar_t* path : {L"nowhere.dll", L"."})
     {
-        const auto result = ValidatePlugin(path);
-        EXPECT_EQ(result.code, NoProject);
+        const auto result = ValidatePlugin(path, NoProject);
         EXPECT_THAT(result.errors, StartsWith("orvix: no such library: "));
         EXPECT_EQ(result.output, "");
     }
@@ -357,6 +418,7 @@ TEST_F(Validate, BadUsageEndsWithTwo)
                                         {L"validate", L"a.dll", L"--rule"}};
     for (const Arguments& arguments : bad)
     {
-        EXPECT_EQ(RunExactly(arguments).code, BadUsage) << testing::PrintToString(arguments);
+        const auto result = RunExactly(arguments);
+        EXPECT_EQ(result.code, BadUsage) << testing::PrintToString(arguments) << '\n' << result.errors;
     }
 }

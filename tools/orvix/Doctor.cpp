@@ -16,7 +16,6 @@
 #include "Text.h"
 #include "XmlFault.h"
 
-#include <array>
 #include <cstdio>
 #include <iostream>
 #include <memory>
@@ -32,26 +31,6 @@ constexpr std::size_t EndingBytes = InstalledProviders::MaxText * sizeof(wchar_t
 std::wstring Quoted(std::wstring_view text)
 {
     return L'"' + std::wstring(text) + L'"';
-}
-
-/// The system's message for an error, with the file in the place that some of them leave for it.
-std::wstring SystemMessage(DWORD error, const std::wstring& file)
-{
-    std::array<wchar_t, 1024> buffer{};
-    const DWORD length =
-        FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS | FORMAT_MESSAGE_MAX_WIDTH_MASK,
-                       nullptr, error, 0, buffer.data(), static_cast<DWORD>(buffer.size()), nullptr);
-    std::wstring message(buffer.data(), length);
-    while (!message.empty() && (message.back() == L' ' || message.back() == L'.'))
-    {
-        message.pop_back();
-    }
-    if (const std::size_t insert = message.find(L"%1"); insert != std::wstring::npos)
-    {
-        message.replace(insert, 2, file);
-    }
-    return message + (message.empty() ? L"error " : L" (error ") + std::to_wstring(error) +
-           (message.empty() ? L"" : L")");
 }
 
 std::wstring MachineName(std::uint16_t machine)

@@ -39,6 +39,13 @@ std::wstring PathKey(const std::wstring& path)
     return key;
 }
 
+std::wstring LongPath(const std::wstring& full)
+{
+    constexpr std::wstring_view Share = L"\\\\";
+    const bool isLong = full.starts_with(L"\\\\?\\") || full.starts_with(L"\\\\.\\");
+    return isLong ? full : full.starts_with(Share) ? L"\\\\?\\UNC\\" + full.substr(Share.size()) : L"\\\\?\\" + full;
+}
+
 bool PathExists(const std::wstring& path)
 {
     return GetFileAttributesW(path.c_str()) != INVALID_FILE_ATTRIBUTES;

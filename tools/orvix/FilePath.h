@@ -13,6 +13,9 @@ std::wstring PathBelow(const std::wstring& folder, const std::wstring& path);
 /// The path in a form in which the names of one file are equal.
 std::wstring PathKey(const std::wstring& path);
 
+/// A full path in the form in which its length has no limit.
+std::wstring LongPath(const std::wstring& full);
+
 /// Whether a file or folder is there.
 bool PathExists(const std::wstring& path);
 

@@ -55,3 +55,22 @@ std::string Hexadecimal(unsigned long number)
     std::snprintf(text.data(), text.size(), "0x%08lX", number);
     return text.data();
 }
+
+std::wstring SystemMessage(unsigned long error, std::wstring_view file)
+{
+    std::array<wchar_t, 1024> buffer{};
+    const DWORD length =
+        FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS | FORMAT_MESSAGE_MAX_WIDTH_MASK,
+                       nullptr, error, 0, buffer.data(), static_cast<DWORD>(buffer.size()), nullptr);
+    std::wstring message(buffer.data(), length);
+    while (!message.empty() && (message.back() == L' ' || message.back() == L'.'))
+    {
+        message.pop_back();
+    }
+    if (const std::size_t insert = message.find(L"%1"); insert != std::wstring::npos)
+    {
+        message.replace(insert, 2, file);
+    }
+    return message + (message.empty() ? L"error " : L" (error ") + std::to_wstring(error) +
+           (message.empty() ? L"" : L")");
+}

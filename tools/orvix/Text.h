@@ -17,3 +17,6 @@ std::string PrintableLines(std::wstring_view text);
 
 /// A number as people read bits and codes: 0x and eight digits.
 std::string Hexadecimal(unsigned long number);
+
+/// The system's message for an error, with its number; `file` stands in the place that some messages leave for one.
+std::wstring SystemMessage(unsigned long error, std::wstring_view file);

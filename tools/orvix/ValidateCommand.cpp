@@ -1,6 +1,8 @@
 #include "ValidateCommand.h"
 
 #include "FilePath.h"
+#include "Terminal.h"
+#include "TextOutput.h"
 #include "ValidationProcess.h"
 
 #include <nlohmann/json.hpp>
@@ -9,6 +11,7 @@
 #include <chrono>
 #include <iomanip>
 #include <iostream>
+#include <vector>
 
 namespace
 {
@@ -19,14 +22,30 @@ const char* InWords(Verdict verdict)
     return verdict == Verdict::Pass ? "pass" : verdict == Verdict::Fail ? "fail" : "skip";
 }
 
+Listing::Tone ToneOf(Verdict verdict)
+{
+    return verdict == Verdict::Pass   ? Listing::Tone::Good
+           : verdict == Verdict::Fail ? Listing::Tone::Bad
+                                      : Listing::Tone::Quiet;
+}
+
 /// One after the other as they come: a rule may take its time.
 class Lines
 {
 public:
+    explicit Lines(const OutputStyle& style) : m_style(style), m_output(std::cout, style) {}
+
+    void Begin(const ValidationRule& rule, std::size_t number, std::size_t count)
+    {
+        m_output.Progress(L"checking " + Wide(rule.name) + L", " + std::to_wstring(number) + L" of " +
+                          std::to_wstring(count));
+    }
+
     void Add(const ValidationRule& rule, const ValidationResult& result)
     {
-        std::cout << std::left << std::setw(6) << InWords(result.verdict) << std::setw(16) << rule.name
-                  << (result.reason.empty() ? rule.demand : result.reason) << std::endl;
+        m_output.Progress({});
+        std::cout << m_style.Painted(InWords(result.verdict), ToneOf(result.verdict)) << "  " << std::left
+                  << std::setw(16) << rule.name << (result.reason.empty() ? rule.demand : result.reason) << std::endl;
     }
 
     void End(int passed, int failed, int skipped)
@@ -34,6 +53,10 @@ public:
         std::cout << passed + failed + skipped << " rules, " << passed << " passed, " << failed << " failed, "
                   << skipped << " skipped\n";
     }
+
+private:
+    OutputStyle m_style;
+    TextOutput m_output; ///< of the progress
 };
 
 /// One document at the end.
@@ -45,6 +68,8 @@ public:
     {
         m_document["rules"] = nlohmann::ordered_json::array();
     }
+
+    void Begin(const ValidationRule&, std::size_t, std::size_t) {}
 
     void Add(const ValidationRule& rule, const ValidationResult& result)
     {
@@ -74,21 +99,34 @@ ExitCode ValidateCommand::Run()
     {
         throw ToolError(ExitCode::NoProject, L"no such library: " + library);
     }
-    return m_commandLine.json ? Run(library, Document(library, m_commandLine.mssccci)) : Run(library, Lines());
+    if (m_commandLine.json)
+    {
+        Document document(library, m_commandLine.mssccci);
+        return Run(library, document);
+    }
+    const Terminal terminal;
+    Lines lines(terminal.Style(m_commandLine.noColor));
+    return Run(library, lines);
 }
 
 template <class Report>
-ExitCode ValidateCommand::Run(const std::wstring& library, Report report)
+ExitCode ValidateCommand::Run(const std::wstring& library, Report& report)
 {
     const unsigned int kind = m_commandLine.mssccci ? ValidationRule::MSSCCI : ValidationRule::Plugin;
     const ValidationProcess process(library, m_commandLine.mssccci, std::chrono::seconds(m_commandLine.timeout));
-    std::array<int, 3> counts{};
+    std::vector<const ValidationRule*> rules;
     for (const ValidationRule& rule : ValidationRule::All())
     {
-        if ((rule.kinds & kind) == 0)
+        if ((rule.kinds & kind) != 0)
         {
-            continue;
+            rules.push_back(&rule);
         }
+    }
+    std::array<int, 3> counts{};
+    for (std::size_t i = 0; i < rules.size(); ++i)
+    {
+        const ValidationRule& rule = *rules[i];
+        report.Begin(rule, i + 1, rules.size());
         const ValidationResult result =
             rule.showsDialogs && !m_commandLine.dialogs
                 ? ValidationResult{Verdict::Skip, "it may show windows: checked with --dialogs"}

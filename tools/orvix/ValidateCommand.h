@@ -19,7 +19,7 @@ public:
 
 private:
     template <class Report>
-    ExitCode Run(const std::wstring& library, Report report);
+    ExitCode Run(const std::wstring& library, Report& report);
 
     const CommandLine& m_commandLine;
 };

@@ -32,10 +32,10 @@ struct CloseHandleOf
 };
 using UniqueHandle = std::unique_ptr<HANDLE, CloseHandleOf>;
 
-[[noreturn]] void RefuseToStart(const wchar_t* what)
+[[noreturn]] void RefuseToStart(const wchar_t* what, DWORD error = GetLastError())
 {
-    throw ToolError(ExitCode::Failed,
-                    std::wstring(what) + L" cannot be made: error " + std::to_wstring(GetLastError()));
+    throw ToolError(ExitCode::Failed, L"no rule can be checked, " + std::wstring(what) + L" cannot be made: " +
+                                          SystemMessage(error, ModulePath(nullptr)));
 }
 
 struct Pipe
@@ -102,8 +102,9 @@ UniqueHandle Start(const std::wstring& program, std::wstring commandLine, const 
     const UniqueHandle thread(started.hThread);
     if (!AssignProcessToJobObject(job, process.get()))
     {
+        const DWORD error = GetLastError();
         TerminateProcess(process.get(), 1);
-        RefuseToStart(L"a process in a job");
+        RefuseToStart(L"a process in a job", error);
     }
     ResumeThread(thread.get());
     return process;

@@ -2,56 +2,72 @@
 
 #include "CommandLine.h"
 #include "InstalledProviders.h"
+#include "Text.h"
 
 namespace
 {
 constexpr wchar_t Name[] = L"Validated";
+
+void Demand(LSTATUS status)
+{
+    if (status != ERROR_SUCCESS)
+    {
+        throw RuleSkipped("it cannot be registered for this process alone: " +
+                          Utf8(SystemMessage(static_cast<DWORD>(status), L"")));
+    }
+}
+
+/// A key that would go with the session should this process be ended here.
+UniqueRegistryKey NewKey(HKEY parent, const wchar_t* path)
+{
+    HKEY key = nullptr;
+    Demand(RegCreateKeyExW(parent, path, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &key, nullptr));
+    return UniqueRegistryKey(key);
+}
+
+/// A key of the user for this process, which goes with this object.
+class PrivateKey
+{
+public:
+    PrivateKey() : m_key(NewKey(HKEY_CURRENT_USER, m_path.c_str())) {}
+    PrivateKey(const PrivateKey&) = delete;
+    PrivateKey& operator=(const PrivateKey&) = delete;
+    ~PrivateKey() { RegDeleteTreeW(HKEY_CURRENT_USER, m_path.c_str()); }
+
+    HKEY Get() const { return m_key.get(); }
+
+private:
+    std::wstring m_path = L"Software\\OrvixCore\\Validation-" + std::to_wstring(GetCurrentProcessId());
+    UniqueRegistryKey m_key;
+};
 
 /// A key in the place of HKEY_LOCAL_MACHINE, for this process alone, under which one MSSCCI library is registered: the
 /// machine's own registry is left alone, and the services object finds this library and no other.
 class PrivateRegistration
 {
 public:
+    /// Throws `RuleSkipped` when the system refuses: another library would be validated.
     explicit PrivateRegistration(const std::wstring& library)
-        : m_path(L"Software\\OrvixCore\\Validation-" + std::to_wstring(GetCurrentProcessId())),
-          m_root(NewKey(HKEY_CURRENT_USER, m_path.c_str()))
     {
-        const UniqueRegistryKey list = NewKey(m_root.get(), InstalledProviders::ListPath);
-        const UniqueRegistryKey provider = NewKey(m_root.get(), Name);
+        const UniqueRegistryKey list = NewKey(m_root.Get(), InstalledProviders::ListPath);
+        const UniqueRegistryKey provider = NewKey(m_root.Get(), Name);
         Write(list.get(), Name, Name);
         Write(provider.get(), InstalledProviders::ServerName, Name);
         Write(provider.get(), InstalledProviders::ServerPath, library);
-        RegOverridePredefKey(HKEY_LOCAL_MACHINE, m_root.get());
+        Demand(RegOverridePredefKey(HKEY_LOCAL_MACHINE, m_root.Get()));
     }
     PrivateRegistration(const PrivateRegistration&) = delete;
     PrivateRegistration& operator=(const PrivateRegistration&) = delete;
-    ~PrivateRegistration()
-    {
-        RegOverridePredefKey(HKEY_LOCAL_MACHINE, nullptr);
-        RegDeleteTreeW(HKEY_CURRENT_USER, m_path.c_str());
-    }
+    ~PrivateRegistration() { RegOverridePredefKey(HKEY_LOCAL_MACHINE, nullptr); }
 
 private:
-    /// A key that would go with the session should this process be ended here.
-    static UniqueRegistryKey NewKey(HKEY parent, const wchar_t* path)
-    {
-        HKEY key = nullptr;
-        if (RegCreateKeyExW(parent, path, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &key, nullptr) !=
-            ERROR_SUCCESS)
-        {
-            throw RuleSkipped("the registry has no room for a private registration");
-        }
-        return UniqueRegistryKey(key);
-    }
-
     static void Write(HKEY key, const wchar_t* name, const std::wstring& text)
     {
-        RegSetValueExW(key, name, 0, REG_SZ, reinterpret_cast<const BYTE*>(text.c_str()),
-                       static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t)));
+        Demand(RegSetValueExW(key, name, 0, REG_SZ, reinterpret_cast<const BYTE*>(text.c_str()),
+                              static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t))));
     }
 
-    std::wstring m_path;
-    UniqueRegistryKey m_root;
+    PrivateKey m_root;
 };
 } // namespace
 

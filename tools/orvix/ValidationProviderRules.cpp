@@ -14,6 +14,7 @@
 #include <filesystem>
 #include <fstream>
 #include <functional>
+#include <map>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -28,6 +29,11 @@ constexpr unsigned long Untouched = 0x40000100;
 // Bits of an operation's options.
 constexpr unsigned long KeepCheckedOut = 0x1;
 constexpr unsigned long WithGetLatest = 0x2;
+constexpr unsigned long NotAsked = 0x4;
+
+/// What RunFileListOperation passes, to all operations alike.
+constexpr unsigned long AllOptions[] = {
+    0, KeepCheckedOut, WithGetLatest, NotAsked, NotAsked | KeepCheckedOut, NotAsked | WithGetLatest};
 
 constexpr const wchar_t* Comment = L"validation";
 
@@ -119,9 +125,9 @@ Operation UndoCheckOut(unsigned long options)
     return {"UndoCheckOut", [=](auto& provider, auto* list, auto*) { return provider.UndoCheckOut(list, options); }};
 }
 
-Operation GetLatest()
+Operation GetLatest(unsigned long options)
 {
-    return {"GetLatest", [](auto& provider, auto* list, auto*) { return provider.GetLatest(list, 0); }};
+    return {"GetLatest", [=](auto& provider, auto* list, auto*) { return provider.GetLatest(list, options); }};
 }
 
 Operation ShowHistory()
@@ -134,22 +140,12 @@ Operation ShowProperties()
     return {"ShowProperties", [](auto& provider, auto* list, auto*) { return provider.ShowProperties(list); }};
 }
 
-/// A file's way through all states, with every option. Nothing in it is made to show windows.
-std::vector<Operation> WayOfAFile()
+/// A file's way through all states, with the same options everywhere. Nothing in it is made to show windows.
+std::vector<Operation> WayOfAFile(unsigned long options)
 {
-    return {QueryStatus(),
-            Add(0),
-            QueryStatus(),
-            CheckOut(0),
-            QueryStatus(),
-            CheckIn(KeepCheckedOut),
-            UndoCheckOut(0),
-            CheckOut(WithGetLatest),
-            UndoCheckOut(WithGetLatest),
-            CheckOut(0),
-            CheckIn(0),
-            GetLatest(),
-            QueryStatus()};
+    return {QueryStatus(),     Add(options),          QueryStatus(),      CheckOut(options),
+            QueryStatus(),     CheckIn(options),      QueryStatus(),      UndoCheckOut(options),
+            CheckOut(options), UndoCheckOut(options), GetLatest(options), QueryStatus()};
 }
 
 int Run(ValidationSubject& subject, ValidationProvider& provider, const Operation& operation, OrvixFileList* list,
@@ -164,9 +160,11 @@ void DemandResult(const std::string& what, int result)
     Demand(result == 0 || result == -1 || result == -2, what + " gives " + std::to_string(result));
 }
 
-std::vector<std::wstring> GoodFiles(const ValidationSubject& subject)
+/// Files of the project, others for each number.
+std::vector<std::wstring> GoodFiles(const ValidationSubject& subject, unsigned long number = 0)
 {
-    return {subject.Write(L"first.txt", "first\r\n"), subject.Write(L"with blanks.bin", std::string("\0\xFF", 2))};
+    return {subject.Write(L"first" + std::to_wstring(number) + L".txt", "first\r\n"),
+            subject.Write(L"with blanks " + std::to_wstring(number) + L".bin", std::string("\0\xFF", 2))};
 }
 
 /// Paths that are no files of the project, or of no project at all. All lie in the scratch folder, the current one.
@@ -183,7 +181,7 @@ std::vector<std::wstring> BadPaths(const ValidationSubject& subject)
             project + L"\\<>|\".txt",
             project + L"\\..\\outside\\other.txt",
             project + L"\\trailing. ",
-            project + L"\\first.txt:stream",
+            project + L"\\first0.txt:stream",
             project + L"\\\u5009\u5EAB.txt",
             project + L"\\\xD800.txt",
             subject.Outside() + L"\\other.txt",
@@ -198,7 +196,7 @@ std::string On(const std::wstring& path)
     return " on \"" + (path.size() > Shown ? "..." + Utf8(path.substr(path.size() - Shown)) : Utf8(path)) + '"';
 }
 
-/// A session from start to end.
+/// A session from start to end, with every bit of the options.
 void RunSession(ValidationSubject& subject, ValidationProvider& provider, int round)
 {
     const auto inRound = [round](const std::string& what, int result) {
@@ -206,10 +204,14 @@ void RunSession(ValidationSubject& subject, ValidationProvider& provider, int ro
     };
     inRound("Initialize", provider.Initialize());
     inRound("OpenProject", provider.OpenProject());
-    Files files({subject.Write(L"round" + std::to_wstring(round) + L".txt", "round")});
-    for (const Operation& operation : WayOfAFile())
+    for (const unsigned long options : {NotAsked | KeepCheckedOut, NotAsked | WithGetLatest})
     {
-        Run(subject, provider, operation, files.List());
+        const std::wstring name = L"round" + std::to_wstring(round) + L'-' + std::to_wstring(options) + L".txt";
+        Files files({subject.Write(name, "round")});
+        for (const Operation& operation : WayOfAFile(options))
+        {
+            Run(subject, provider, operation, files.List());
+        }
     }
     inRound("CloseProject", provider.CloseProject());
     inRound("Uninitialize", provider.Uninitialize());
@@ -359,10 +361,21 @@ void ProviderRules::Results(ValidationSubject& subject)
     {
         throw RuleSkipped("no project is open");
     }
-    Files files(GoodFiles(subject));
-    for (const Operation& operation : WayOfAFile())
+    std::map<unsigned long, std::vector<int>> results; // by the options
+    for (const unsigned long options : AllOptions)
     {
-        DemandResult(operation.name, Run(subject, provider, operation, files.List()));
+        Files files(GoodFiles(subject, options));
+        const std::string on = " with options " + Hexadecimal(options);
+        for (const Operation& operation : WayOfAFile(options))
+        {
+            const int result = Run(subject, provider, operation, files.List(), on);
+            const std::string what = operation.name + on;
+            DemandResult(what, result);
+            results[options].push_back(result);
+            const int asked = results[options & ~NotAsked].at(results[options].size() - 1);
+            Demand(result == asked, what + " gives " + std::to_string(result) + ", and " + std::to_string(asked) +
+                                        " with " + Hexadecimal(options & ~NotAsked));
+        }
     }
     DemandResult("CloseProject", provider.CloseProject());
     DemandResult("Uninitialize", provider.Uninitialize());
@@ -385,7 +398,7 @@ void ProviderRules::BadInput(ValidationSubject& subject)
     {
         Files files(paths);
         for (const Operation& operation :
-             {QueryStatus(), Add(0), CheckOut(0), UndoCheckOut(0), CheckIn(0), GetLatest()})
+             {QueryStatus(), Add(0), CheckOut(0), UndoCheckOut(0), CheckIn(0), GetLatest(0)})
         {
             demand(operation, files, On(paths.back()), Comment);
         }
@@ -410,7 +423,7 @@ void ProviderRules::EmptyList(ValidationSubject& subject)
     provider.Begin();
     OrvixFileList list;
     list.CreateEntry(GoodFiles(subject).front().c_str(), nullptr, Selected, 0); // in the list, but not active
-    for (const Operation& operation : {QueryStatus(), Add(0), CheckOut(0), UndoCheckOut(0), CheckIn(0), GetLatest(),
+    for (const Operation& operation : {QueryStatus(), Add(0), CheckOut(0), UndoCheckOut(0), CheckIn(0), GetLatest(0),
                                        ShowHistory(), ShowProperties()})
     {
         const int result = Run(subject, provider, operation, &list);
@@ -429,21 +442,25 @@ void ProviderRules::StatusBits(ValidationSubject& subject)
 
     ValidationProvider provider(subject);
     provider.Begin();
-    const std::vector<std::wstring> paths = GoodFiles(subject);
-    for (const Operation& operation : WayOfAFile())
+    for (const unsigned long options : AllOptions)
     {
-        Files files(paths);
-        Run(subject, provider, operation, files.List());
-        Files asked(paths);
-        if (Run(subject, provider, QueryStatus(), asked.List()) != 0)
+        const std::vector<std::wstring> paths = GoodFiles(subject, options);
+        for (const Operation& operation : WayOfAFile(options))
         {
-            throw RuleSkipped("QueryStatus fails");
-        }
-        for (const unsigned long flags : asked.Flags())
-        {
-            Demand(flags != Untouched, "QueryStatus does not write an entry's FlagsOut");
-            Demand((flags & ~Documented) == 0, "QueryStatus sets bits that mean nothing: " + Hexadecimal(flags));
-            Demand((flags & Either) != Either, "QueryStatus says controlled and not controlled: " + Hexadecimal(flags));
+            Files files(paths);
+            Run(subject, provider, operation, files.List());
+            Files asked(paths);
+            if (Run(subject, provider, QueryStatus(), asked.List()) != 0)
+            {
+                throw RuleSkipped("QueryStatus fails");
+            }
+            for (const unsigned long flags : asked.Flags())
+            {
+                Demand(flags != Untouched, "QueryStatus does not write an entry's FlagsOut");
+                Demand((flags & ~Documented) == 0, "QueryStatus sets bits that mean nothing: " + Hexadecimal(flags));
+                Demand((flags & Either) != Either,
+                       "QueryStatus says controlled and not controlled: " + Hexadecimal(flags));
+            }
         }
     }
 }
@@ -521,12 +538,15 @@ void ProviderRules::ListUntouched(ValidationSubject& subject)
 {
     ValidationProvider provider(subject);
     provider.Begin();
-    Files files(GoodFiles(subject));
-    const auto before = files.Rest();
-    for (const Operation& operation : WayOfAFile())
+    for (const unsigned long options : AllOptions)
     {
-        Run(subject, provider, operation, files.List());
-        Demand(files.Rest() == before, std::string(operation.name) + " changes more of the list than FlagsOut");
+        Files files(GoodFiles(subject, options));
+        const auto before = files.Rest();
+        for (const Operation& operation : WayOfAFile(options))
+        {
+            Run(subject, provider, operation, files.List());
+            Demand(files.Rest() == before, std::string(operation.name) + " changes more of the list than FlagsOut");
+        }
     }
 }
 

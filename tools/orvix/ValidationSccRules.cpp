@@ -1,9 +1,11 @@
+#include "SccFunctions.h"
 #include "Text.h"
 #include "ValidationRules.h"
 #include "ValidationScc.h"
 
 #include <array>
 #include <cstring>
+#include <iterator>
 #include <string>
 #include <vector>
 
@@ -18,28 +20,29 @@ struct Function
 };
 
 constexpr Function Functions[] = {
-    {"SccGetVersion", true, 0},
-    {"SccInitialize", true, 0},
-    {"SccUninitialize", true, 0},
-    {"SccOpenProject", true, 0},
-    {"SccCloseProject", true, 0},
-    {"SccGetProjPath", false, SCC_CAP_GETPROJPATH},
-    {"SccGet", true, 0},
-    {"SccCheckout", true, 0},
-    {"SccUncheckout", true, 0},
-    {"SccCheckin", true, 0},
-    {"SccAdd", true, 0},
-    {"SccBeginBatch", false, SCC_CAP_BATCH},
-    {"SccEndBatch", false, SCC_CAP_BATCH},
-    {"SccHistory", false, SCC_CAP_HISTORY},
-    {"SccProperties", false, SCC_CAP_PROPERTIES},
-    {"SccQueryInfo", true, SCC_CAP_QUERYINFO},
-    {"SccPopulateList", false, SCC_CAP_POPULATELIST},
-    {"SccRunScc", false, SCC_CAP_RUNSCC},
-    {"SccGetCommandOptions", false, SCC_CAP_GETCOMMANDOPTIONS},
-    {"SccAddFromScc", false, SCC_CAP_ADDFROMSCC},
-    {"SccSetOption", false, 0},
+    {SccFunctions::GetVersion.name, true, 0},
+    {SccFunctions::Initialize.name, true, 0},
+    {SccFunctions::Uninitialize.name, true, 0},
+    {SccFunctions::OpenProject.name, true, 0},
+    {SccFunctions::CloseProject.name, true, 0},
+    {SccFunctions::GetProjPath.name, false, SCC_CAP_GETPROJPATH},
+    {SccFunctions::Get.name, true, 0},
+    {SccFunctions::Checkout.name, true, 0},
+    {SccFunctions::Uncheckout.name, true, 0},
+    {SccFunctions::Checkin.name, true, 0},
+    {SccFunctions::Add.name, true, 0},
+    {SccFunctions::BeginBatch.name, false, SCC_CAP_BATCH},
+    {SccFunctions::EndBatch.name, false, SCC_CAP_BATCH},
+    {SccFunctions::History.name, false, SCC_CAP_HISTORY},
+    {SccFunctions::Properties.name, false, SCC_CAP_PROPERTIES},
+    {SccFunctions::QueryInfo.name, true, SCC_CAP_QUERYINFO},
+    {SccFunctions::PopulateList.name, false, SCC_CAP_POPULATELIST},
+    {SccFunctions::RunScc.name, false, SCC_CAP_RUNSCC},
+    {SccFunctions::GetCommandOptions.name, false, SCC_CAP_GETCOMMANDOPTIONS},
+    {SccFunctions::AddFromScc.name, false, SCC_CAP_ADDFROMSCC},
+    {SccFunctions::SetOption.name, false, 0},
 };
+static_assert(std::size(Functions) == std::size(SccFunctions::Names));
 
 constexpr LPCSTR Comment = "validation";
 
@@ -104,9 +107,10 @@ SCCRTN QueryInfo(ValidationScc& scc, LONG count, LPCSTR* names)
     return scc.Call<decltype(SccQueryInfo)>("SccQueryInfo", scc.Context(), count, names, status.data());
 }
 
+template <LONG Options>
 SCCRTN Add(ValidationScc& scc, LONG count, LPCSTR* names)
 {
-    std::vector<LONG> options(static_cast<std::size_t>(count) + 1);
+    std::vector<LONG> options(static_cast<std::size_t>(count) + 1, Options);
     return scc.Call<decltype(SccAdd)>("SccAdd", scc.Context(), HWND{nullptr}, count, names, Comment, options.data(),
                                       LPCMDOPTS{nullptr});
 }
@@ -117,10 +121,11 @@ SCCRTN Checkout(ValidationScc& scc, LONG count, LPCSTR* names)
                                            LPCMDOPTS{nullptr});
 }
 
+template <LONG Options>
 SCCRTN Checkin(ValidationScc& scc, LONG count, LPCSTR* names)
 {
-    return scc.Call<decltype(SccCheckin)>("SccCheckin", scc.Context(), HWND{nullptr}, count, names, Comment,
-                                          SCC_KEEP_CHECKEDOUT, LPCMDOPTS{nullptr});
+    return scc.Call<decltype(SccCheckin)>("SccCheckin", scc.Context(), HWND{nullptr}, count, names, Comment, Options,
+                                          LPCMDOPTS{nullptr});
 }
 
 SCCRTN Uncheckout(ValidationScc& scc, LONG count, LPCSTR* names)
@@ -135,15 +140,18 @@ SCCRTN Get(ValidationScc& scc, LONG count, LPCSTR* names)
                                       LPCMDOPTS{nullptr});
 }
 
-/// A file's way through all states.
+/// A file's way through all states, with the options that OrvixCore passes.
 constexpr Step WayOfAFile[] = {
     {"SccQueryInfo", QueryInfo},
-    {"SccAdd", Add},
+    {"SccAdd", Add<0>},
     {"SccQueryInfo", QueryInfo},
     {"SccCheckout", Checkout},
-    {"SccCheckin", Checkin},
+    {"SccCheckin", Checkin<SCC_KEEP_CHECKEDOUT>},
     {"SccUncheckout", Uncheckout},
+    {"SccCheckout", Checkout},
+    {"SccCheckin", Checkin<0>},
     {"SccGet", Get},
+    {"SccAdd", Add<SCC_KEEP_CHECKEDOUT>},
     {"SccQueryInfo", QueryInfo},
 };
 

@@ -1,32 +1,34 @@
 #include "ValidationScratch.h"
 
+#include "FilePath.h"
 #include "ToolError.h"
 
 #include <windows.h>
 
-#include <filesystem>
 #include <memory>
 
 ValidationScratch::ValidationScratch()
 {
-    const std::wstring name = L"orvix-validate-" + std::to_wstring(GetCurrentProcessId()) + L'-';
-    std::error_code error;
-    const std::filesystem::path root = std::filesystem::temp_directory_path(error);
-    for (int number = 1; !error; ++number) // the number of a process comes again, and what one left behind stays
+    std::wstring root(MAX_PATH + 1, L'\0');
+    root.resize(GetTempPathW(static_cast<DWORD>(root.size()), root.data()));
+    const std::wstring name = root + L"orvix-validate-" + std::to_wstring(GetCurrentProcessId()) + L'-';
+    // The number of a process comes again, and what one left behind stays.
+    for (int number = 1; m_path.empty(); ++number)
     {
-        const std::filesystem::path path = root / (name + std::to_wstring(number));
-        if (std::filesystem::create_directory(path, error))
+        const std::wstring path = name + std::to_wstring(number);
+        const bool isNew = CreateDirectoryW(path.c_str(), nullptr) != 0;
+        if (const DWORD error = GetLastError(); !isNew && error != ERROR_ALREADY_EXISTS)
         {
-            m_path = path.wstring();
-            return;
+            throw ToolError(ExitCode::Failed, L"no scratch project can be made in the folder of temporary files: " +
+                                                  SystemMessage(error, path));
         }
+        m_path = isNew ? path : L"";
     }
-    throw ToolError(ExitCode::Failed, L"no scratch project can be made in the folder of temporary files");
 }
 
 ValidationScratch::~ValidationScratch()
 {
-    RemoveTree(L"\\\\?\\" + m_path); // whatever the length of what was made in it
+    RemoveTree(LongPath(m_path)); // whatever the length of what was made in it
 }
 
 void ValidationScratch::RemoveTree(const std::wstring& folder)

@@ -2,10 +2,12 @@
 // files for as long as it is loaded, and touches none.
 
 #include "Defect.h"
+#include "ImportHook.h"
 #include "MSSCCI.h"
 
 #include <cstring>
 #include <map>
+#include <optional>
 #include <string>
 
 namespace
@@ -14,6 +16,7 @@ namespace
 constexpr LONG Controlled = SCC_STATUS_CONTROLLED;
 constexpr LONG CheckedOut = SCC_STATUS_CONTROLLED | SCC_STATUS_CHECKEDOUT;
 
+std::optional<ImportHook> refusal; // of the program's private registration
 LPTEXTOUTPROC printer = nullptr;
 std::map<std::string, LONG> statuses;
 
@@ -21,6 +24,16 @@ void Print(LPCSTR text, LONG kind)
 {
     if (printer)
         printer(text, kind);
+}
+
+LSTATUS WINAPI RefuseOverride(HKEY, HKEY)
+{
+    return ERROR_ACCESS_DENIED;
+}
+
+LSTATUS WINAPI RefuseValue(HKEY, LPCWSTR, DWORD, DWORD, const BYTE*, DWORD)
+{
+    return ERROR_ACCESS_DENIED;
 }
 
 SCCRTN Become(LONG count, LPCSTR* names, LONG status)
@@ -96,15 +109,19 @@ SCCRTN SccUncheckout(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
     return Become(count, names, Controlled);
 }
 
-SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDOPTS)
+SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG options, LPCMDOPTS)
 {
+    if (Defect::Is(L"codes-given-back") && options == 0)
+        return 42;
     if (Defect::Is(L"input-names") && count > 0)
         const_cast<LPSTR>(names[0])[0] = '#';
     return Become(count, names, Controlled);
 }
 
-SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG*, LPCMDOPTS)
+SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG* options, LPCMDOPTS)
 {
+    if (Defect::Is(L"codes-kept") && count > 0 && options[0] == SCC_KEEP_CHECKEDOUT)
+        return 42;
     return Become(count, names, Controlled);
 }
 
@@ -132,3 +149,15 @@ SCCRTN SccGetCommandOptions(LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block)
 }
 
 } // extern "C"
+
+BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
+{
+    const HMODULE program = GetModuleHandleW(nullptr);
+    if (reason == DLL_PROCESS_DETACH)
+        refusal.reset();
+    else if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"no-override"))
+        refusal.emplace(program, "RegOverridePredefKey", reinterpret_cast<void*>(&RefuseOverride));
+    else if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"no-value"))
+        refusal.emplace(program, "RegSetValueExW", reinterpret_cast<void*>(&RefuseValue));
+    return TRUE;
+}

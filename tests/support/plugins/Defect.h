@@ -41,9 +41,22 @@ public:
         if (!CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &startup,
                             &started))
             return;
-        wchar_t file[MAX_PATH] = L"";
-        GetEnvironmentVariableW(L"ORVIX_DEFECT_FILE", file, MAX_PATH);
-        std::ofstream(std::filesystem::path(file)) << started.dwProcessId;
+        std::ofstream(File()) << started.dwProcessId;
+    }
+
+    /// Writes an operation and its options to that file, where "report-options" asks for it.
+    static void Report(const char* operation, unsigned long options)
+    {
+        if (Is(L"report-options"))
+            std::ofstream(File(), std::ios::app) << operation << ' ' << options << '\n';
+    }
+
+    /// Renames this program's file, so that it cannot be started once more.
+    static void MoveProgram()
+    {
+        std::wstring program(MAX_PATH, L'\0');
+        program.resize(GetModuleFileNameW(nullptr, program.data(), MAX_PATH));
+        MoveFileW(program.c_str(), (program + L".moved").c_str());
     }
 
     /// Counts in a variable of the process, which outlives the library.
@@ -54,5 +67,13 @@ public:
         const int count = static_cast<int>(wcstol(text, nullptr, 10)) + 1;
         SetEnvironmentVariableW(variable, std::to_wstring(count).c_str());
         return count;
+    }
+
+private:
+    static std::filesystem::path File()
+    {
+        wchar_t file[MAX_PATH] = L"";
+        GetEnvironmentVariableW(L"ORVIX_DEFECT_FILE", file, MAX_PATH);
+        return file;
     }
 };

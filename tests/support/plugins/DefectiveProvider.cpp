@@ -60,17 +60,25 @@ public:
         return Success;
     }
 
-    int Add(OrvixFileList* list, const wchar_t*, unsigned long) override { return Become(list, Controlled); }
-
-    int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long) override
+    int Add(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
+        Report("Add", options);
+        return Become(list, Controlled);
+    }
+
+    int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long options) override
+    {
+        Report("CheckOut", options);
+        if (Defect::Is(L"option-bit") && (options & 0x4) != 0)
+            return Failure;
         if (Defect::Is(L"bad-input") && std::wstring(Last(list)).find(L'?') != std::wstring::npos)
             return 3;
         return Become(list, CheckedOut);
     }
 
-    int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long) override
+    int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
+        Report("CheckIn", options);
         if (Defect::Is(L"list-untouched") && list->NumActiveEntries() != 0)
             list->GetActiveFileEntry(0)->SetFlagsIn(0);
         return Become(list, Controlled);
@@ -78,12 +86,14 @@ public:
 
     int UndoCheckOut(OrvixFileList* list, unsigned long options) override
     {
+        Report("UndoCheckOut", options);
         const int result = Become(list, Controlled);
         return Defect::Is(L"results") && options != 0 ? 7 : result;
     }
 
-    int GetLatest(OrvixFileList* list, unsigned long) override
+    int GetLatest(OrvixFileList* list, unsigned long options) override
     {
+        Report("GetLatest", options);
         return list->NumActiveEntries() == 0 && !Defect::Is(L"empty-list") ? Failure : Success;
     }
 
@@ -158,6 +168,13 @@ private:
     static constexpr unsigned long Controlled = 0x2;
     static constexpr unsigned long CheckedOut = 0x2 | 0x4;
 
+    /// Not of the rules that go through many sessions: these pass fewer options.
+    void Report(const char* operation, unsigned long options) const
+    {
+        if (m_starts == 1)
+            Defect::Report(operation, options);
+    }
+
     static const wchar_t* Last(OrvixFileList* list)
     {
         const unsigned int count = list->NumActiveEntries();
@@ -228,5 +245,7 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
         return TRUE;
     if (Defect::Is(L"crash-at-load"))
         Defect::Crash();
+    if (Defect::Is(L"program-moves"))
+        Defect::MoveProgram();
     return !Defect::Is(L"reload") || Defect::Count(L"ORVIX_DEFECT_LOADS") != 5;
 }
