@@ -37,17 +37,25 @@ Codes CodesOf(const Json& place)
     return codes;
 }
 
-/// The text of the first finding with a code; empty when there is none.
-std::string TextOf(const Json& place, const std::string& code)
+/// The texts of the findings with a code.
+std::vector<std::string> TextsOf(const Json& place, const std::string& code)
 {
+    std::vector<std::string> texts;
     for (const Json& finding : place["findings"])
     {
         if (finding["code"] == code)
         {
-            return finding["text"];
+            texts.push_back(finding["text"]);
         }
     }
-    return "";
+    return texts;
+}
+
+/// The text of the first of them; empty when there is none.
+std::string TextOf(const Json& place, const std::string& code)
+{
+    const std::vector<std::string> texts = TextsOf(place, code);
+    return texts.empty() ? "" : texts.front();
 }
 
 /// A library with every function of the interface.
@@ -439,6 +447,35 @@ TEST_F(DoctorOnPlugins, NamesTheMissingFunction)
         EXPECT_EQ(CodesOf(candidate), Codes{"!missing-export"});
         EXPECT_EQ(TextOf(candidate, "missing-export"), std::string("it does not export ") + function);
     }
+}
+
+TEST_F(DoctorOnPlugins, NamesEveryMissingFunction)
+{
+    AddPlugin(L"noexports");
+    AddPlugin(L"noobjects");
+    const Json report = Report();
+    EXPECT_THAT(TextsOf(Candidate(report, "noexports.dll"), "missing-export"),
+                ElementsAre("it does not export GetOrvixVersion", "it does not export GetIOrvixProvider",
+                            "it does not export ReleaseIOrvixProvider", "it does not export GetOrvixProviderName"));
+    EXPECT_THAT(TextsOf(Candidate(report, "noobjects.dll"), "missing-export"),
+                ElementsAre("it does not export GetIOrvixProvider", "it does not export ReleaseIOrvixProvider"));
+    EXPECT_THAT(Doctor().output, HasSubstr("  problem: it does not export GetIOrvixProvider [missing-export]\n"
+                                           "  problem: it does not export ReleaseIOrvixProvider [missing-export]\n"));
+}
+
+TEST_F(DoctorOnPlugins, NamesTheMissingFunctionOfAnotherVersionToo)
+{
+    const Json candidate = ReportOnFake(L"oldnoname");
+    EXPECT_EQ(CodesOf(candidate), (Codes{"!contract-version", "!missing-export"}));
+    EXPECT_EQ(TextOf(candidate, "missing-export"), "it does not export GetOrvixProviderName");
+}
+
+TEST_F(DoctorOnPlugins, GivesAVersionOfZero)
+{
+    const Json candidate = ReportOnFake(L"version0");
+    EXPECT_EQ(candidate["contractVersion"], 0);
+    EXPECT_EQ(CodesOf(candidate), Codes{"!contract-version"});
+    EXPECT_EQ(ReportOnFake(L"noversion")["contractVersion"], Json()) << "it could not be asked";
 }
 
 TEST_F(DoctorOnPlugins, SaysThatAPluginThrows)

@@ -306,10 +306,7 @@ void Doctor::ExaminePlugin(const std::wstring& path, const ManifestContext& cont
     }
     const PluginCandidate judged = PluginCandidate::Judge(path, context, m_configs);
     candidate.listed = judged.verdict == Verdict::Listed;
-    if (judged.version != 0)
-    {
-        candidate.contractVersion = judged.version;
-    }
+    candidate.contractVersion = judged.version;
     if (judged.entry && (candidate.listed || !judged.entry->name.empty()))
     {
         candidate.name = judged.entry->name;
@@ -325,22 +322,21 @@ void Doctor::ExaminePlugin(const std::wstring& path, const ManifestContext& cont
         ExplainLoadError(candidate, path, judged.loadError);
         break;
     case Verdict::OtherVersion:
-        candidate.AddProblem("contract-version", L"it is made for version " + std::to_wstring(judged.version) +
+        candidate.AddProblem("contract-version", L"it is made for version " + std::to_wstring(*judged.version) +
                                                      L" of the contract, the library for " +
                                                      std::to_wstring(ORVIX_PLUGIN_CONTRACT_VERSION));
-        break;
-    case Verdict::Incomplete:
-        for (const char* function : judged.missing)
-        {
-            candidate.AddProblem("missing-export", L"it does not export " + Wide(function));
-        }
         break;
     case Verdict::Throws:
         candidate.AddProblem("throws", L"it throws an exception when it is asked for its version or its name");
         break;
+    case Verdict::Incomplete:
     case Verdict::SwitchedOff:
     case Verdict::Listed:
         break;
+    }
+    for (const char* function : judged.FindMissingExports())
+    {
+        candidate.AddProblem("missing-export", L"it does not export " + Wide(function));
     }
     if (candidate.listed && judged.entry->name.empty())
     {
