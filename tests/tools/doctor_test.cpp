@@ -334,6 +334,20 @@ TEST_F(DoctorTest, SaysWhatItLoadsWhenAsked)
     EXPECT_EQ(Doctor({L"--verbose"}).errors, "orvix: loading " + Plugin(L"good.dll").string() + "\n");
 }
 
+TEST_F(DoctorTest, JsonStaysOneObjectWhateverALibraryPrints)
+{
+    AddPlugin(L"talkative");
+    for (const Arguments& arguments : {Arguments{L"doctor", L"--json", L"--plugins", Plugins().wstring()},
+                                       {L"providers", L"--json", L"--plugins", Plugins().wstring()}})
+    {
+        const auto result = Run(arguments);
+        EXPECT_EQ(result.code, Success);
+        EXPECT_TRUE(Json::accept(result.output)) << result.output;
+        EXPECT_THAT(result.errors, testing::AllOf(HasSubstr("I am loaded\nI am loaded"), HasSubstr("I am unloaded\n")));
+    }
+    EXPECT_THAT(Doctor().output, HasSubstr("I am loaded"));
+}
+
 TEST_F(DoctorTest, MakesTextsFromOutsideSafeToPrint)
 {
     Install(L"bell\a", L"esc\x1B[2J", Complete());

@@ -217,7 +217,7 @@ void ExplainRemarks(DoctorReport::Place& place, const ReadingLog& log, const wch
 }
 } // namespace
 
-Doctor::Doctor(const CommandLine& commandLine) : m_commandLine(commandLine)
+Doctor::Doctor(const CommandLine& commandLine, Output& output) : m_commandLine(commandLine), m_output(output)
 {
 }
 
@@ -241,6 +241,7 @@ DoctorReport Doctor::Examine()
     {
         FindUnusedSettings();
     }
+    m_output.Progress({});
     return std::move(m_report);
 }
 
@@ -589,12 +590,14 @@ void Doctor::FindUnusedSettings()
 }
 
 /// A library that ends the process when it is loaded is the last one announced.
-void Doctor::Announce(const std::wstring& library) const
+void Doctor::Announce(const std::wstring& library)
 {
     if (m_commandLine.verbose)
     {
+        m_output.Progress({});
         std::cerr << "orvix: loading " << Printable(library) << std::endl;
     }
+    m_output.Progress(L"examining " + library);
 }
 
 std::wstring Doctor::SettingsElement(const OrvixProviderConfig* config) const

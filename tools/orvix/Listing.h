@@ -8,13 +8,14 @@
 /// What a command lists: rows under named columns, and counts that sum them up. An `Output` prints it.
 struct Listing
 {
-    /// How a cell looks where there are colours.
+    /// How a text looks where there are colours.
     enum class Tone
     {
         Plain,
         Good,
         Bad,
         Quiet,
+        Heading,
     };
 
     struct Cell

@@ -1,7 +1,11 @@
 #pragma once
 
+#include "Listing.h"
+
 #include <cstddef>
 #include <optional>
+#include <ostream>
+#include <string>
 
 /// How results are laid out: for a person at a terminal, or plain and whole for a pipe or a file.
 struct OutputStyle
@@ -17,4 +21,10 @@ struct OutputStyle
         const bool unwanted = noColorOption || (noColorVariable != nullptr && *noColorVariable != L'\0');
         return {width, width && obeysSequences && !unwanted};
     }
+
+    /// The text in the colour of a tone; as it is where there are no colours.
+    std::string Painted(const std::string& text, Listing::Tone tone) const;
+
+    /// Prints a line of UTF-8 and its end.
+    void PrintLine(std::ostream& stream, const std::string& line) const;
 };

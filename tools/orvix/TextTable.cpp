@@ -13,22 +13,14 @@ constexpr std::size_t Gap = 2;       // columns between two cells
 constexpr std::size_t Narrowest = 8; // columns that a cell keeps on the narrowest terminal
 constexpr wchar_t Ellipsis = L'\x2026';
 
-constexpr const char* HeadingSequence = "\x1b[1m";
-constexpr const char* EndSequence = "\x1b[0m";
-
-const char* Sequence(Listing::Tone tone)
+/// The text with a blank in place of each line end.
+std::wstring OnOneLine(std::wstring text)
 {
-    switch (tone)
+    for (std::size_t end = 0; (end = text.find_first_of(L"\r\n", end)) != std::wstring::npos;)
     {
-    case Listing::Tone::Good:
-        return "\x1b[32m";
-    case Listing::Tone::Bad:
-        return "\x1b[31m";
-    case Listing::Tone::Quiet:
-        return "\x1b[90m";
-    default:
-        return "";
+        text.replace(end, text.compare(end, 2, L"\r\n") == 0 ? 2 : 1, L" ");
     }
+    return text;
 }
 
 std::wstring TextOf(const Listing::Cell& cell)
@@ -38,7 +30,7 @@ std::wstring TextOf(const Listing::Cell& cell)
         std::wstring operator()(std::monostate) const { return L""; }
         std::wstring operator()(std::int64_t number) const { return std::to_wstring(number); }
         std::wstring operator()(bool yes) const { return yes ? L"yes" : L"no"; }
-        std::wstring operator()(const std::wstring& text) const { return text; }
+        std::wstring operator()(const std::wstring& text) const { return OnOneLine(text); }
     } const inWords;
     return std::visit(inWords, cell.value);
 }
@@ -62,7 +54,7 @@ TextTable::TextTable(const Listing& listing)
     std::vector<Cell>& heading = m_rows.emplace_back();
     for (const Listing::Column& column : listing.columns)
     {
-        heading.push_back({Wide(column.heading), Listing::Tone::Plain});
+        heading.push_back({Wide(column.heading), Listing::Tone::Heading});
     }
     for (const std::vector<Listing::Cell>& row : listing.rows)
     {
@@ -83,23 +75,17 @@ void TextTable::Print(std::ostream& stream, const OutputStyle& style) const
     const std::vector<std::size_t> widths = Widths(style);
     for (const std::vector<Cell>& row : m_rows)
     {
+        std::string line;
         for (std::size_t column = 0; column < row.size(); ++column)
         {
             const std::wstring text = Shortened(row[column].text, widths[column]);
-            const std::string sequence = !style.colour             ? ""
-                                         : &row == &m_rows.front() ? HeadingSequence
-                                                                   : Sequence(row[column].tone);
-            stream << sequence << Printable(text) << (sequence.empty() ? "" : EndSequence);
+            line += style.Painted(Printable(text), row[column].tone);
             if (column + 1 < row.size())
             {
-                stream << std::string(widths[column] + Gap - ColumnsOf(text), ' ');
+                line.append(widths[column] + Gap - ColumnsOf(text), ' ');
             }
         }
-        stream << '\n';
-        if (style.width)
-        {
-            stream.flush(); // in whole lines: a letter whose bytes are written apart is lost on a terminal
-        }
+        style.PrintLine(stream, line);
     }
 }
 
