@@ -798,6 +798,20 @@ TEST_F(DoctorOnSettings, SayWhyAWholeFileCountsAsEmpty)
     EXPECT_EQ(CodesOf(Place(Report(), "settings file")), Codes{"no-file"});
 }
 
+TEST_F(DoctorOnSettings, SayThatTheXmlServiceDoesNotStart)
+{
+    // A manifest beside the program names a library for the service's class that is not there.
+    const std::filesystem::path folder = UseCopy({L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll"});
+    WriteBytes(
+        folder / L"orvix.exe.manifest",
+        "<assembly xmlns=\"urn:schemas-microsoft-com:asm.v1\" manifestVersion=\"1.0\">"
+        "<assemblyIdentity type=\"win32\" name=\"orvix\" version=\"1.0.0.0\"/><file name=\"gone.dll\">"
+        "<comClass clsid=\"{F6D90F11-9C73-11D3-B32E-00C04F990BB4}\" threadingModel=\"Both\"/></file></assembly>");
+    WriteSettings("");
+    const Json settings = Place(Report(), "settings file");
+    EXPECT_EQ(CodesOf(settings), Codes{"!no-xml-service"});
+}
+
 TEST_F(DoctorOnSettings, SayThatAFileCannotBeOpened)
 {
     std::filesystem::create_directory(Config() / L"OrvixProviders.xml");

@@ -16,10 +16,13 @@
 #include "Text.h"
 #include "XmlFault.h"
 
+#include <algorithm>
 #include <array>
 #include <cstdio>
+#include <filesystem>
 #include <iostream>
 #include <memory>
+#include <system_error>
 
 namespace
 {
@@ -150,17 +153,25 @@ void ExplainContent(DoctorReport::Place& place, const ReadingLog& log, const wch
         place.AddProblem("unreadable-file",
                          L"the file cannot be opened and counts as empty: " + SystemMessage(error, place.location));
     }
+    else if (log.content == Content::Missing)
+    {
+        place.AddProblem("no-xml-service",
+                         L"the system's XML service does not start, so the file is not read and counts as empty");
+    }
     else if (log.content == Content::UsesEntities)
     {
         place.AddProblem("entities", L"the file uses entities of its own and therefore counts as empty");
     }
     else if (log.content == Content::Malformed)
     {
-        const std::optional<XmlFault> fault = XmlFault::Find(place.location);
+        // Its texts are longer than the file only where entities stand for others, and those can stand for gigabytes.
+        std::error_code unknownSize;
+        const std::optional<XmlFault> fault =
+            XmlFault::Find(place.location, std::filesystem::file_size(place.location, unknownSize));
         place.AddProblem("malformed", L"the file is not well-formed and counts as empty: " +
                                           (fault ? L"line " + std::to_wstring(fault->line) + L", column " +
                                                        std::to_wstring(fault->column) + L": " + fault->reason
-                                                 : L"the XML service gives no reason"));
+                                                 : L"where and why cannot be said"));
     }
     else if (!log.hasRoot && _wcsicmp(log.root.c_str(), root) == 0)
     {
