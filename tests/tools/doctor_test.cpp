@@ -7,6 +7,7 @@
 
 #include <list>
 #include <set>
+#include <system_error>
 
 namespace
 {
@@ -20,6 +21,7 @@ using Codes = std::vector<std::string>;
 
 constexpr const wchar_t* ServerName = L"SCCServerName";
 constexpr const wchar_t* ServerPath = L"SCCServerPath";
+constexpr const wchar_t* List32 = L"Software\\WOW6432Node\\SourceCodeControlProvider\\InstalledSCCProviders";
 constexpr std::size_t EndingBytes = 2048;
 
 /// The codes of the findings, with "!" in front of problems.
@@ -56,6 +58,21 @@ std::string TextOf(const Json& place, const std::string& code)
 {
     const std::vector<std::string> texts = TextsOf(place, code);
     return texts.empty() ? "" : texts.front();
+}
+
+void Replace(std::string& text, const std::string& what, const std::string& by)
+{
+    for (std::size_t at = 0; (at = text.find(what, at)) != std::string::npos; at += by.size())
+    {
+        text.replace(at, what.size(), by);
+    }
+}
+
+/// The system's message for an error, in its language and without its full stop.
+std::string SystemMessage(DWORD error)
+{
+    std::string message = std::system_category().message(static_cast<int>(error));
+    return message.substr(0, message.find_last_not_of(" .\r\n") + 1);
 }
 
 /// A library with every function of the interface.
@@ -307,6 +324,32 @@ TEST_F(DoctorTest, PrintsJsonOfTheShapeThatTheGuideShows)
     EXPECT_EQ(place["kind"], shown["places"][0]["kind"]);
     EXPECT_EQ(place.size(), shown["places"][0].size());
     EXPECT_EQ(report.size(), shown.size());
+}
+
+TEST_F(DoctorTest, PrintsWhatTheGuideShows)
+{
+    const std::string guide = Guide();
+    const std::string beginning = "> orvix doctor\n";
+    const std::size_t begin = guide.find(beginning) + beginning.size();
+    const std::string shown = guide.substr(begin, guide.find("```", begin) - begin);
+
+    std::filesystem::copy_file(std::filesystem::path(ORVIX_TOOL).replace_filename(L"plugins") / L"archive.dll",
+                               Plugin(L"archive.dll"));
+    std::string depot = ReadBytes(Library(L"recording_dependent.dll"));
+    const std::string needed = "scc_dependency.dll";
+    std::string other = "depotnet.dll";
+    other.resize(needed.size());
+    depot.replace(depot.find(needed), needed.size(), other);
+    WriteBytes(Plugin(L"depot.dll"), depot);
+    WriteSettings("<Provider><Name>Archive</Name></Provider>"
+                  "<Provider><Name>Depot</Name><Enabled>no</Enabled></Provider>");
+    WritePrompts(PromptsXml(GoodPrompt));
+
+    std::string printed = Doctor().output;
+    Replace(printed, Config().string(), "C:\\Users\\ada\\AppData\\Roaming\\OrvixCore");
+    Replace(printed, Plugins().string(), "C:\\Programs\\OrvixCore\\plugins");
+    Replace(printed, SystemMessage(ERROR_MOD_NOT_FOUND), "The specified module could not be found");
+    EXPECT_EQ(printed, shown);
 }
 
 TEST_F(DoctorTest, LooksOnlyWhereItIsTold)
@@ -634,6 +677,16 @@ TEST_F(DoctorOnRegistrations, LookForWhatALibraryNeedsWhereTheSettingsSay)
               (Codes{"configured", "!no-search-folder", "!does-not-load", "missing-dependency"}));
 }
 
+TEST_F(DoctorOnRegistrations, LookForALibraryOfABareNameWhereTheSettingsSay)
+{
+    std::filesystem::create_directories(Scratch() / L"libraries");
+    WriteBytes(Scratch() / L"libraries" / L"broken.dll", "no library");
+    Install(L"value", L"Bare", L"replaced by the settings");
+    WriteSettings("<a><Name>Bare</Name><MSSCCDllFullPath>broken.dll</MSSCCDllFullPath><MSSCCDllSearchPath>" +
+                  (Scratch() / L"libraries").string() + "</MSSCCDllSearchPath></a>");
+    EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"configured", "not-a-library", "!does-not-load"}));
+}
+
 TEST_F(DoctorOnRegistrations, SayThatASettingIsCut)
 {
     AddKey().SetString(ServerName, L"Recorded");
@@ -671,7 +724,6 @@ TEST_F(DoctorOnRegistrations, NameTheFunctionsThatALibraryLacks)
 
 TEST_F(DoctorOnRegistrations, FindWhatIsOnlyInThe32BitView)
 {
-    constexpr const wchar_t* List32 = L"Software\\WOW6432Node\\SourceCodeControlProvider\\InstalledSCCProviders";
     TemporaryRegistryKey list32(List32);
     TemporaryRegistryKey key32(L"Software\\WOW6432Node\\OrvixTest32");
     key32.SetString(ServerName, L"Only 32");
@@ -684,6 +736,18 @@ TEST_F(DoctorOnRegistrations, FindWhatIsOnlyInThe32BitView)
     EXPECT_EQ(candidate["listed"], false);
     EXPECT_EQ(CodesOf(candidate), Codes{"!only-32-bit"});
     EXPECT_THAT(CodesOf(Candidate(report, "both")), IsEmpty());
+}
+
+TEST_F(DoctorOnRegistrations, TakeA32BitOneForHarmlessBesideA64BitOneOfItsName)
+{
+    TemporaryRegistryKey list32(List32);
+    TemporaryRegistryKey key32(L"Software\\WOW6432Node\\OrvixTest32");
+    key32.SetString(ServerName, L"recorded");
+    list32.SetString(L"1", L"Software\\OrvixTest32");
+    TemporaryRegistryKey& key = Install(L"64", L"Recorded", Complete());
+    EXPECT_EQ(CodesOf(Candidate(Report(), "OrvixTest32")), Codes{"only-32-bit"});
+    RegDeleteKeyValueW(HKEY_LOCAL_MACHINE, key.Path().c_str(), ServerPath);
+    EXPECT_EQ(CodesOf(Candidate(Report(), "OrvixTest32")), Codes{"!only-32-bit"}) << "the 64-bit one is not listed";
 }
 
 TEST_F(DoctorOnSettings, SayWhichElementSwitchesAProviderOff)

@@ -30,6 +30,8 @@ using InstalledProviders::Step;
 using Why = ReadingLog::Why;
 using Content = OrvixFileIO::Content;
 
+constexpr const char* InstalledKind = "MSSCCI library";
+
 constexpr std::size_t EndingBytes = InstalledProviders::MaxText * sizeof(wchar_t);
 
 std::wstring Quoted(std::wstring_view text)
@@ -91,22 +93,32 @@ void CheckHeaders(DoctorReport::Place& place, const std::wstring& path)
     }
 }
 
-void ExplainLoadError(DoctorReport::Place& place, const std::wstring& path, DWORD error)
+void ExplainLoadError(DoctorReport::Place& place, const std::wstring& path, const ManifestContext& context, DWORD error)
 {
     place.AddProblem("does-not-load", L"it does not load: " + SystemMessage(error, path));
-    for (const LibraryImage::Missing& missing : LibraryImage::FindMissing(path))
+    for (const LibraryImage::Missing& missing : LibraryImage::FindMissing(path, context))
     {
         place.AddNote("missing-dependency", missing.neededBy + L" needs " + missing.name + L", which does not load: " +
                                                 SystemMessage(missing.error, missing.name));
     }
 }
 
-/// Where the system finds a library of this path or bare name; empty when it does not.
-std::wstring FindLibrary(const std::wstring& path)
+/// The file of this path or bare name in some folders, or where the system looks by itself for null; empty when there
+/// is none.
+std::wstring FindIn(const wchar_t* folders, const std::wstring& path)
 {
     std::wstring found(32768, L'\0');
-    found.resize(SearchPathW(nullptr, path.c_str(), L".dll", static_cast<DWORD>(found.size()), found.data(), nullptr));
+    found.resize(SearchPathW(folders, path.c_str(), L".dll", static_cast<DWORD>(found.size()), found.data(), nullptr));
     return found;
+}
+
+/// Where the system finds a library of this path or bare name; empty when it does not. It looks beside the program and
+/// in `searchFolder`, if there is one, before it looks anywhere else.
+std::wstring FindLibrary(const std::wstring& path, const std::wstring& searchFolder)
+{
+    const std::wstring beside = std::filesystem::path(ModulePath(nullptr)).parent_path().wstring();
+    const std::wstring found = searchFolder.empty() ? L"" : FindIn((beside + L';' + searchFolder).c_str(), path);
+    return found.empty() ? FindIn(nullptr, path) : found;
 }
 
 std::wstring EndsProcess(const std::wstring& what)
@@ -331,7 +343,7 @@ void Doctor::ExaminePlugin(const std::wstring& path, const ManifestContext& cont
                                                   std::to_wstring(PluginSearch::MaxPath));
         break;
     case Verdict::DoesNotLoad:
-        ExplainLoadError(candidate, path, judged.loadError);
+        ExplainLoadError(candidate, path, context, judged.loadError);
         break;
     case Verdict::OtherVersion:
         candidate.AddProblem("contract-version", L"it is made for version " + std::to_wstring(*judged.version) +
@@ -393,7 +405,7 @@ void Doctor::ExamineRegistration(HKEY list, DWORD index, Step step, const std::w
     name.resize(status == ERROR_SUCCESS ? nameSize : 0);
 
     DoctorReport::Candidate& candidate = m_report.candidates.emplace_back();
-    candidate.kind = "MSSCCI library";
+    candidate.kind = InstalledKind;
     candidate.location = name;
     switch (step)
     {
@@ -480,16 +492,17 @@ void Doctor::ExamineLibrary(DoctorReport::Candidate& candidate, const InstalledP
                              L"there is no folder " + Quoted(judged.searchPath) + L", which MSSCCDllSearchPath names");
     }
     const DllDirectoryScope directory(judged.searchPath);
-    const std::wstring found = FindLibrary(judged.serverPath);
+    const std::wstring found = FindLibrary(judged.serverPath, judged.searchPath);
     if (!found.empty())
     {
         CheckHeaders(candidate, found);
     }
     Announce(judged.serverPath);
-    const UniqueModule module = LoadLibraryIsolated(judged.serverPath.c_str(), ManifestContext());
+    const ManifestContext context;
+    const UniqueModule module = LoadLibraryIsolated(judged.serverPath.c_str(), context);
     if (const DWORD error = GetLastError(); !module && !found.empty())
     {
-        ExplainLoadError(candidate, found, error);
+        ExplainLoadError(candidate, found, context, error);
         return;
     }
     if (!module)
@@ -533,7 +546,7 @@ void Doctor::Examine32BitView()
             continue;
         }
         DoctorReport::Candidate& candidate = m_report.candidates.emplace_back();
-        candidate.kind = "MSSCCI library";
+        candidate.kind = InstalledKind;
         candidate.location = keyPath;
         const UniqueRegistryKey key = InstalledProviders::OpenProvider(keyPath, KEY_WOW64_32KEY);
         std::wstring name;
@@ -541,9 +554,25 @@ void Doctor::Examine32BitView()
         {
             candidate.name = name;
         }
-        candidate.AddProblem("only-32-bit", L"it is registered only in the 32-bit view of the registry, which a 64-bit "
-                                            L"host never sees");
+        if (IsInstalled(name))
+        {
+            candidate.AddNote("only-32-bit",
+                              L"this key is in the 32-bit view of the registry, which a 64-bit host never "
+                              L"sees; a 64-bit library of the same name is listed");
+        }
+        else
+        {
+            candidate.AddProblem("only-32-bit", L"it is registered only in the 32-bit view of the registry, which a "
+                                                L"64-bit host never sees");
+        }
     }
+}
+
+bool Doctor::IsInstalled(const std::wstring& name) const
+{
+    return std::any_of(m_report.candidates.begin(), m_report.candidates.end(), [&](const auto& candidate) {
+        return candidate.kind == InstalledKind && candidate.listed && PathKey(*candidate.name) == PathKey(name);
+    });
 }
 
 void Doctor::ExplainConfiguration(DoctorReport::Candidate& candidate, const OrvixProviderConfig* config,

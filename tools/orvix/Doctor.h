@@ -35,6 +35,10 @@ private:
     void ExamineKey(DoctorReport::Candidate& candidate, const std::wstring& keyPath);
     void ExamineLibrary(DoctorReport::Candidate& candidate, const InstalledProviders::Candidate& judged);
     void Examine32BitView();
+
+    /// Whether a registered library of this name is listed.
+    bool IsInstalled(const std::wstring& name) const;
+
     void ExplainConfiguration(DoctorReport::Candidate& candidate, const OrvixProviderConfig* config, bool switchedOff);
     void FindUnusedSettings();
 
