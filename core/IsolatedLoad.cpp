@@ -66,14 +66,14 @@ ManifestContext::~ManifestContext()
         ReleaseActCtx(m_context);
 }
 
-UniqueModule LoadLibraryIsolated(const wchar_t* path, const ManifestContext& context) noexcept
+UniqueModule LoadLibraryIsolated(const wchar_t* path, const ManifestContext& context, DWORD flags) noexcept
 {
     UniqueModule module;
     DWORD error = ERROR_SUCCESS;
     {
         const ActivationScope activation(context.Get());
         const SilentErrors silent;
-        module.reset(LoadLibraryExW(path, nullptr, 0));
+        module.reset(LoadLibraryExW(path, nullptr, flags));
         error = GetLastError();
     }
     SetLastError(error);

@@ -31,5 +31,6 @@ private:
 };
 
 /// Loads a library in the context, so that it binds to the same side-by-side components as this one, and without the
-/// system's error boxes. Null when it does not load; the thread's last error then says why.
-UniqueModule LoadLibraryIsolated(const wchar_t* path, const ManifestContext& context) noexcept;
+/// system's error boxes. `flags` are those of LoadLibraryExW. Null when it does not load; the thread's last error then
+/// says why.
+UniqueModule LoadLibraryIsolated(const wchar_t* path, const ManifestContext& context, DWORD flags = 0) noexcept;

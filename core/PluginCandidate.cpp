@@ -28,35 +28,43 @@ PluginCandidate PluginCandidate::Judge(const std::wstring& path, const ManifestC
     return candidate;
 }
 
+std::vector<const char*> PluginCandidate::FindMissingExports() const
+{
+    std::vector<const char*> missing;
+    for (const char* name : {GetVersion, GetProvider, ReleaseProvider, GetName})
+    {
+        if (entry && !Export<void()>(name))
+            missing.push_back(name);
+    }
+    return missing;
+}
+
 PluginCandidate::Verdict PluginCandidate::Ask(const OrvixProviderConfigManager& configs)
 {
-    auto* const getVersion = Export<std::int32_t()>("GetOrvixVersion");
+    auto* const getVersion = Export<std::int32_t()>(GetVersion);
     if (!getVersion)
         return Verdict::Incomplete;
     version = getVersion();
     if (version != ORVIX_PLUGIN_CONTRACT_VERSION)
         return Verdict::OtherVersion;
-    entry->getProvider = Export<IOrvixProvider*()>("GetIOrvixProvider");
-    entry->releaseProvider = Export<void(IOrvixProvider*)>("ReleaseIOrvixProvider");
-    if (auto* const getName = Export<const wchar_t*()>("GetOrvixProviderName"))
+    entry->getProvider = Export<IOrvixProvider*()>(GetProvider);
+    entry->releaseProvider = Export<void(IOrvixProvider*)>(ReleaseProvider);
+    auto* const getName = Export<const wchar_t*()>(GetName);
+    if (getName)
     {
         // A null name stays the empty name, to which no configuration belongs.
         const wchar_t* name = getName();
         entry->name = name ? name : L"";
         entry->config = configs.FindConfig(name);
     }
-    if (!missing.empty())
+    if (!entry->getProvider || !entry->releaseProvider || !getName)
         return Verdict::Incomplete;
     return !entry->config || entry->config->m_enabled ? Verdict::Listed : Verdict::SwitchedOff;
 }
 
 /// A function of the plug-in; null when it is missing.
 template <class Function>
-Function* PluginCandidate::Export(const char* name)
+Function* PluginCandidate::Export(const char* name) const
 {
-    auto* const function =
-        reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(entry->module.get(), name)));
-    if (!function)
-        missing.push_back(name);
-    return function;
+    return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(entry->module.get(), name)));
 }

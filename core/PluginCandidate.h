@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -23,19 +24,27 @@ struct PluginCandidate
         SwitchedOff
     };
 
+    // The functions that a plug-in has to export.
+    static constexpr const char* GetVersion = "GetOrvixVersion";
+    static constexpr const char* GetProvider = "GetIOrvixProvider";
+    static constexpr const char* ReleaseProvider = "ReleaseIOrvixProvider";
+    static constexpr const char* GetName = "GetOrvixProviderName";
+
     /// Loads the plug-in and asks for its version and its name. Throws std::bad_alloc; what the plug-in itself throws
     /// makes the verdict.
     static PluginCandidate Judge(const std::wstring& path, const ManifestContext& context,
                                  const OrvixProviderConfigManager& configs);
 
+    /// The functions that a plug-in lacks, whatever the verdict is; none of what does not load. Throws std::bad_alloc.
+    std::vector<const char*> FindMissingExports() const;
+
     Verdict verdict = Verdict::PathTooLong;
     DWORD loadError = ERROR_SUCCESS;           ///< the system's, of what does not load
-    std::int32_t version = 0;                  ///< of the contract, as the plug-in says; 0 when it was not asked
-    std::vector<const char*> missing;          ///< functions of the contract that an incomplete one lacks
+    std::optional<std::int32_t> version;       ///< of the contract, as the plug-in says; nothing when it was not asked
     std::unique_ptr<OrvixProviderEntry> entry; ///< of what loads; frees it
 
 private:
     Verdict Ask(const OrvixProviderConfigManager& configs);
     template <class Function>
-    Function* Export(const char* name);
+    Function* Export(const char* name) const;
 };

@@ -8,6 +8,8 @@
 
 #include <gtest/gtest.h>
 
+#include <initializer_list>
+
 /// orvix.exe in a project folder of its own, which goes with the test.
 class ToolTest : public testing::Test
 {
@@ -44,6 +46,23 @@ protected:
 
     /// From here on the tool is this program.
     void UseProgram(const std::filesystem::path& program) { m_program = program; }
+
+    /// From here on the tool is a copy of it, with these files from its folder beside it. Returns the folder.
+    std::filesystem::path UseCopy(std::initializer_list<const wchar_t*> files)
+    {
+        const std::filesystem::path original = ORVIX_TOOL;
+        std::filesystem::path folder = Scratch() / L"bin";
+        UseProgram(folder / original.filename());
+        std::filesystem::create_directories(folder);
+        std::filesystem::copy_file(original, m_program, std::filesystem::copy_options::overwrite_existing);
+        for (const std::filesystem::path file : files)
+        {
+            std::filesystem::create_directories((folder / file).parent_path());
+            std::filesystem::copy_file(original.parent_path() / file, folder / file,
+                                       std::filesystem::copy_options::overwrite_existing);
+        }
+        return folder;
+    }
 
     /// Runs the tool in the project folder with exactly these arguments.
     OrvixTool::Result RunExactly(const Arguments& arguments)

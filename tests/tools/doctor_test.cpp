@@ -7,6 +7,7 @@
 
 #include <list>
 #include <set>
+#include <system_error>
 
 namespace
 {
@@ -20,6 +21,7 @@ using Codes = std::vector<std::string>;
 
 constexpr const wchar_t* ServerName = L"SCCServerName";
 constexpr const wchar_t* ServerPath = L"SCCServerPath";
+constexpr const wchar_t* List32 = L"Software\\WOW6432Node\\SourceCodeControlProvider\\InstalledSCCProviders";
 constexpr std::size_t EndingBytes = 2048;
 
 /// The codes of the findings, with "!" in front of problems.
@@ -37,17 +39,40 @@ Codes CodesOf(const Json& place)
     return codes;
 }
 
-/// The text of the first finding with a code; empty when there is none.
-std::string TextOf(const Json& place, const std::string& code)
+/// The texts of the findings with a code.
+std::vector<std::string> TextsOf(const Json& place, const std::string& code)
 {
+    std::vector<std::string> texts;
     for (const Json& finding : place["findings"])
     {
         if (finding["code"] == code)
         {
-            return finding["text"];
+            texts.push_back(finding["text"]);
         }
     }
-    return "";
+    return texts;
+}
+
+/// The text of the first of them; empty when there is none.
+std::string TextOf(const Json& place, const std::string& code)
+{
+    const std::vector<std::string> texts = TextsOf(place, code);
+    return texts.empty() ? "" : texts.front();
+}
+
+void Replace(std::string& text, const std::string& what, const std::string& by)
+{
+    for (std::size_t at = 0; (at = text.find(what, at)) != std::string::npos; at += by.size())
+    {
+        text.replace(at, what.size(), by);
+    }
+}
+
+/// The system's message for an error, in its language and without its full stop.
+std::string SystemMessage(DWORD error)
+{
+    std::string message = std::system_category().message(static_cast<int>(error));
+    return message.substr(0, message.find_last_not_of(" .\r\n") + 1);
 }
 
 /// A library with every function of the interface.
@@ -301,6 +326,32 @@ TEST_F(DoctorTest, PrintsJsonOfTheShapeThatTheGuideShows)
     EXPECT_EQ(report.size(), shown.size());
 }
 
+TEST_F(DoctorTest, PrintsWhatTheGuideShows)
+{
+    const std::string guide = Guide();
+    const std::string beginning = "> orvix doctor\n";
+    const std::size_t begin = guide.find(beginning) + beginning.size();
+    const std::string shown = guide.substr(begin, guide.find("```", begin) - begin);
+
+    std::filesystem::copy_file(std::filesystem::path(ORVIX_TOOL).replace_filename(L"plugins") / L"archive.dll",
+                               Plugin(L"archive.dll"));
+    std::string depot = ReadBytes(Library(L"recording_dependent.dll"));
+    const std::string needed = "scc_dependency.dll";
+    std::string other = "depotnet.dll";
+    other.resize(needed.size());
+    depot.replace(depot.find(needed), needed.size(), other);
+    WriteBytes(Plugin(L"depot.dll"), depot);
+    WriteSettings("<Provider><Name>Archive</Name></Provider>"
+                  "<Provider><Name>Depot</Name><Enabled>no</Enabled></Provider>");
+    WritePrompts(PromptsXml(GoodPrompt));
+
+    std::string printed = Doctor().output;
+    Replace(printed, Config().string(), "C:\\Users\\ada\\AppData\\Roaming\\OrvixCore");
+    Replace(printed, Plugins().string(), "C:\\Programs\\OrvixCore\\plugins");
+    Replace(printed, SystemMessage(ERROR_MOD_NOT_FOUND), "The specified module could not be found");
+    EXPECT_EQ(printed, shown);
+}
+
 TEST_F(DoctorTest, LooksOnlyWhereItIsTold)
 {
     AddPlugin(L"good");
@@ -324,6 +375,20 @@ TEST_F(DoctorTest, SaysWhatItLoadsWhenAsked)
     AddPlugin(L"good");
     EXPECT_EQ(Doctor().errors, "");
     EXPECT_EQ(Doctor({L"--verbose"}).errors, "orvix: loading " + Plugin(L"good.dll").string() + "\n");
+}
+
+TEST_F(DoctorTest, JsonStaysOneObjectWhateverALibraryPrints)
+{
+    AddPlugin(L"talkative");
+    for (const Arguments& arguments : {Arguments{L"doctor", L"--json", L"--plugins", Plugins().wstring()},
+                                       {L"providers", L"--json", L"--plugins", Plugins().wstring()}})
+    {
+        const auto result = Run(arguments);
+        EXPECT_EQ(result.code, Success);
+        EXPECT_TRUE(Json::accept(result.output)) << result.output;
+        EXPECT_THAT(result.errors, testing::AllOf(HasSubstr("I am loaded\nI am loaded"), HasSubstr("I am unloaded\n")));
+    }
+    EXPECT_THAT(Doctor().output, HasSubstr("I am loaded"));
 }
 
 TEST_F(DoctorTest, MakesTextsFromOutsideSafeToPrint)
@@ -439,6 +504,35 @@ TEST_F(DoctorOnPlugins, NamesTheMissingFunction)
         EXPECT_EQ(CodesOf(candidate), Codes{"!missing-export"});
         EXPECT_EQ(TextOf(candidate, "missing-export"), std::string("it does not export ") + function);
     }
+}
+
+TEST_F(DoctorOnPlugins, NamesEveryMissingFunction)
+{
+    AddPlugin(L"noexports");
+    AddPlugin(L"noobjects");
+    const Json report = Report();
+    EXPECT_THAT(TextsOf(Candidate(report, "noexports.dll"), "missing-export"),
+                ElementsAre("it does not export GetOrvixVersion", "it does not export GetIOrvixProvider",
+                            "it does not export ReleaseIOrvixProvider", "it does not export GetOrvixProviderName"));
+    EXPECT_THAT(TextsOf(Candidate(report, "noobjects.dll"), "missing-export"),
+                ElementsAre("it does not export GetIOrvixProvider", "it does not export ReleaseIOrvixProvider"));
+    EXPECT_THAT(Doctor().output, HasSubstr("  problem: it does not export GetIOrvixProvider [missing-export]\n"
+                                           "  problem: it does not export ReleaseIOrvixProvider [missing-export]\n"));
+}
+
+TEST_F(DoctorOnPlugins, NamesTheMissingFunctionOfAnotherVersionToo)
+{
+    const Json candidate = ReportOnFake(L"oldnoname");
+    EXPECT_EQ(CodesOf(candidate), (Codes{"!contract-version", "!missing-export"}));
+    EXPECT_EQ(TextOf(candidate, "missing-export"), "it does not export GetOrvixProviderName");
+}
+
+TEST_F(DoctorOnPlugins, GivesAVersionOfZero)
+{
+    const Json candidate = ReportOnFake(L"version0");
+    EXPECT_EQ(candidate["contractVersion"], 0);
+    EXPECT_EQ(CodesOf(candidate), Codes{"!contract-version"});
+    EXPECT_EQ(ReportOnFake(L"noversion")["contractVersion"], Json()) << "it could not be asked";
 }
 
 TEST_F(DoctorOnPlugins, SaysThatAPluginThrows)
@@ -583,6 +677,16 @@ TEST_F(DoctorOnRegistrations, LookForWhatALibraryNeedsWhereTheSettingsSay)
               (Codes{"configured", "!no-search-folder", "!does-not-load", "missing-dependency"}));
 }
 
+TEST_F(DoctorOnRegistrations, LookForALibraryOfABareNameWhereTheSettingsSay)
+{
+    std::filesystem::create_directories(Scratch() / L"libraries");
+    WriteBytes(Scratch() / L"libraries" / L"broken.dll", "no library");
+    Install(L"value", L"Bare", L"replaced by the settings");
+    WriteSettings("<a><Name>Bare</Name><MSSCCDllFullPath>broken.dll</MSSCCDllFullPath><MSSCCDllSearchPath>" +
+                  (Scratch() / L"libraries").string() + "</MSSCCDllSearchPath></a>");
+    EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"configured", "not-a-library", "!does-not-load"}));
+}
+
 TEST_F(DoctorOnRegistrations, SayThatASettingIsCut)
 {
     AddKey().SetString(ServerName, L"Recorded");
@@ -620,7 +724,6 @@ TEST_F(DoctorOnRegistrations, NameTheFunctionsThatALibraryLacks)
 
 TEST_F(DoctorOnRegistrations, FindWhatIsOnlyInThe32BitView)
 {
-    constexpr const wchar_t* List32 = L"Software\\WOW6432Node\\SourceCodeControlProvider\\InstalledSCCProviders";
     TemporaryRegistryKey list32(List32);
     TemporaryRegistryKey key32(L"Software\\WOW6432Node\\OrvixTest32");
     key32.SetString(ServerName, L"Only 32");
@@ -633,6 +736,18 @@ TEST_F(DoctorOnRegistrations, FindWhatIsOnlyInThe32BitView)
     EXPECT_EQ(candidate["listed"], false);
     EXPECT_EQ(CodesOf(candidate), Codes{"!only-32-bit"});
     EXPECT_THAT(CodesOf(Candidate(report, "both")), IsEmpty());
+}
+
+TEST_F(DoctorOnRegistrations, TakeA32BitOneForHarmlessBesideA64BitOneOfItsName)
+{
+    TemporaryRegistryKey list32(List32);
+    TemporaryRegistryKey key32(L"Software\\WOW6432Node\\OrvixTest32");
+    key32.SetString(ServerName, L"recorded");
+    list32.SetString(L"1", L"Software\\OrvixTest32");
+    TemporaryRegistryKey& key = Install(L"64", L"Recorded", Complete());
+    EXPECT_EQ(CodesOf(Candidate(Report(), "OrvixTest32")), Codes{"only-32-bit"});
+    RegDeleteKeyValueW(HKEY_LOCAL_MACHINE, key.Path().c_str(), ServerPath);
+    EXPECT_EQ(CodesOf(Candidate(Report(), "OrvixTest32")), Codes{"!only-32-bit"}) << "the 64-bit one is not listed";
 }
 
 TEST_F(DoctorOnSettings, SayWhichElementSwitchesAProviderOff)
@@ -745,6 +860,20 @@ TEST_F(DoctorOnSettings, SayWhyAWholeFileCountsAsEmpty)
     EXPECT_EQ(CodesOf(Place(Report(), "settings file")), Codes{"!entities"});
     std::filesystem::remove(file);
     EXPECT_EQ(CodesOf(Place(Report(), "settings file")), Codes{"no-file"});
+}
+
+TEST_F(DoctorOnSettings, SayThatTheXmlServiceDoesNotStart)
+{
+    // A manifest beside the program names a library for the service's class that is not there.
+    const std::filesystem::path folder = UseCopy({L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll"});
+    WriteBytes(
+        folder / L"orvix.exe.manifest",
+        "<assembly xmlns=\"urn:schemas-microsoft-com:asm.v1\" manifestVersion=\"1.0\">"
+        "<assemblyIdentity type=\"win32\" name=\"orvix\" version=\"1.0.0.0\"/><file name=\"gone.dll\">"
+        "<comClass clsid=\"{F6D90F11-9C73-11D3-B32E-00C04F990BB4}\" threadingModel=\"Both\"/></file></assembly>");
+    WriteSettings("");
+    const Json settings = Place(Report(), "settings file");
+    EXPECT_EQ(CodesOf(settings), Codes{"!no-xml-service"});
 }
 
 TEST_F(DoctorOnSettings, SayThatAFileCannotBeOpened)

@@ -99,6 +99,12 @@ TEST(TextOutput, ControlCharactersDoNotReachATerminal)
     EXPECT_THAT(Shown(Files({L"a\x1b[2Jb"})), HasSubstr("a\xEF\xBF\xBD[2Jb"));
 }
 
+TEST(TextOutput, ALineEndInACellIsABlank)
+{
+    EXPECT_EQ(Shown(Files({L"one\ntwo\r\nthree\rfour\n\nfive"})), "State  File\n"
+                                                                  "new    one two three four  five\n");
+}
+
 TEST(TextOutput, ColoursSurroundTheTextAndNotItsPadding)
 {
     EXPECT_EQ(Shown(Files({L"a"}), {.width = 80, .colour = true}), "\x1b[1mState\x1b[0m  \x1b[1mFile\x1b[0m\n"

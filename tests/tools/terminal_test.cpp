@@ -5,6 +5,7 @@
 
 #include <gmock/gmock.h>
 
+#include <regex>
 #include <sstream>
 
 namespace
@@ -16,6 +17,8 @@ using testing::Not;
 
 constexpr const char* Bold = "\x1b[1m";
 constexpr const char* Green = "\x1b[32m";
+constexpr const char* Red = "\x1b[31m";
+constexpr const char* Grey = "\x1b[90m";
 
 constexpr const wchar_t* LongName = L"a folder with a very long name\\another one below it\\the file itself.txt";
 
@@ -30,9 +33,23 @@ protected:
 
     PseudoConsole::Result RunThere(const std::wstring& arguments)
     {
-        const std::wstring tool = L"\\\"" ORVIX_TOOL L"\\\" --config \\\"" + Config().wstring() +
-                                  L"\\\" --project \\\"" + Project().wstring() + L"\\\" --unattended " + arguments +
-                                  L" \\\"" + Project().wstring() + L"\\\"";
+        return RunToolThere(L"--project " + Quoted(Project()) + L" --unattended " + arguments + L" " +
+                            Quoted(Project()));
+    }
+
+    /// orvix doctor on a plug-in that does not load.
+    PseudoConsole::Result RunDoctorThere(const std::wstring& options = {})
+    {
+        Write(L"notes.dll", "These are notes, not a library.");
+        return RunToolThere(L"doctor --sources plugins --plugins " + Quoted(Project()) + L" " + options);
+    }
+
+private:
+    static std::wstring Quoted(const std::filesystem::path& path) { return L"\\\"" + path.wstring() + L"\\\""; }
+
+    PseudoConsole::Result RunToolThere(const std::wstring& arguments)
+    {
+        const std::wstring tool = Quoted(ORVIX_TOOL) + L" --config " + Quoted(Config()) + L" " + arguments;
         return PseudoConsole::Run(L"\"" ORVIX_IN_CONSOLE L"\" \"" + tool + L"\"");
     }
 };
@@ -77,6 +94,24 @@ TEST_F(OnATerminal, JsonIsAsInAPipe)
     const auto result = RunThere(L"status --json");
     EXPECT_THAT(result.text, HasSubstr("\"summary\": {"));
     EXPECT_THAT(result.output, Not(HasSubstr(Bold)));
+}
+
+TEST_F(OnATerminal, TheDoctorColoursWhatIsWrong)
+{
+    EXPECT_THAT(RunDoctorThere().output,
+                AllOf(HasSubstr(std::string(Red) + "problem"), HasSubstr(std::string(Grey) + "note")));
+    EXPECT_THAT(RunDoctorThere(L"--no-color").output,
+                AllOf(HasSubstr("problem"), Not(HasSubstr(Red)), Not(HasSubstr(Grey))));
+    EXPECT_THAT(RunDoctorThere(L"--json").output, AllOf(HasSubstr("problem"), Not(HasSubstr(Red))));
+}
+
+TEST_F(OnATerminal, TheDoctorShowsWhatItExaminesUntilItHasFinished)
+{
+    const std::string output = RunDoctorThere().output;
+    const std::regex shownAndErased("examining [^\r\n]*notes\\.dll([\r ]|\x1b\\[\\?25[hl])*\x1b\\[K");
+    EXPECT_TRUE(std::regex_search(output, shownAndErased)) << output;
+    EXPECT_THAT(RunDoctorThere(L"--json").output, Not(HasSubstr("examining")));
+    EXPECT_THAT(Run({L"doctor", L"--plugins", Project().wstring()}).output, Not(HasSubstr("examining")));
 }
 
 TEST_F(OnATerminal, APipeGetsNeitherColoursNorProgressAndEverythingWhole)

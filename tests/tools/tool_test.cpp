@@ -18,17 +18,9 @@ protected:
     /// From here on the tool is a copy whose dialogs are answered with these words of WrittenAnswerUI.cpp.
     void AnswerDialogs(const wchar_t* words)
     {
-        const std::filesystem::path original(ORVIX_TOOL);
-        const std::filesystem::path folder = Scratch() / L"bin";
-        if (std::filesystem::create_directories(folder / L"plugins"))
-        {
-            for (const wchar_t* name : {L"orvix.exe", L"OrvixCore.dll", L"braeutil.dll", L"plugins\\archive.dll"})
-            {
-                std::filesystem::copy_file(original.parent_path() / name, folder / name);
-            }
-            std::filesystem::copy_file(ORVIX_TOOL_USER, folder / L"OrvixCoreUI.dll");
-        }
-        UseProgram(folder / L"orvix.exe");
+        const std::filesystem::path folder = UseCopy({L"OrvixCore.dll", L"braeutil.dll", L"plugins\\archive.dll"});
+        std::filesystem::copy_file(ORVIX_TOOL_USER, folder / L"OrvixCoreUI.dll",
+                                   std::filesystem::copy_options::overwrite_existing);
         SetEnvironmentVariableW(L"ORVIX_TEST_ANSWER", words);
     }
 

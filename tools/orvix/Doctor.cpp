@@ -16,15 +16,20 @@
 #include "Text.h"
 #include "XmlFault.h"
 
+#include <algorithm>
 #include <cstdio>
+#include <filesystem>
 #include <iostream>
 #include <memory>
+#include <system_error>
 
 namespace
 {
 using InstalledProviders::Step;
 using Why = ReadingLog::Why;
 using Content = OrvixFileIO::Content;
+
+constexpr const char* InstalledKind = "MSSCCI library";
 
 constexpr std::size_t EndingBytes = InstalledProviders::MaxText * sizeof(wchar_t);
 
@@ -67,22 +72,32 @@ void CheckHeaders(DoctorReport::Place& place, const std::wstring& path)
     }
 }
 
-void ExplainLoadError(DoctorReport::Place& place, const std::wstring& path, DWORD error)
+void ExplainLoadError(DoctorReport::Place& place, const std::wstring& path, const ManifestContext& context, DWORD error)
 {
     place.AddProblem("does-not-load", L"it does not load: " + SystemMessage(error, path));
-    for (const LibraryImage::Missing& missing : LibraryImage::FindMissing(path))
+    for (const LibraryImage::Missing& missing : LibraryImage::FindMissing(path, context))
     {
         place.AddNote("missing-dependency", missing.neededBy + L" needs " + missing.name + L", which does not load: " +
                                                 SystemMessage(missing.error, missing.name));
     }
 }
 
-/// Where the system finds a library of this path or bare name; empty when it does not.
-std::wstring FindLibrary(const std::wstring& path)
+/// The file of this path or bare name in some folders, or where the system looks by itself for null; empty when there
+/// is none.
+std::wstring FindIn(const wchar_t* folders, const std::wstring& path)
 {
     std::wstring found(32768, L'\0');
-    found.resize(SearchPathW(nullptr, path.c_str(), L".dll", static_cast<DWORD>(found.size()), found.data(), nullptr));
+    found.resize(SearchPathW(folders, path.c_str(), L".dll", static_cast<DWORD>(found.size()), found.data(), nullptr));
     return found;
+}
+
+/// Where the system finds a library of this path or bare name; empty when it does not. It looks beside the program and
+/// in `searchFolder`, if there is one, before it looks anywhere else.
+std::wstring FindLibrary(const std::wstring& path, const std::wstring& searchFolder)
+{
+    const std::wstring beside = std::filesystem::path(ModulePath(nullptr)).parent_path().wstring();
+    const std::wstring found = searchFolder.empty() ? L"" : FindIn((beside + L';' + searchFolder).c_str(), path);
+    return found.empty() ? FindIn(nullptr, path) : found;
 }
 
 std::wstring EndsProcess(const std::wstring& what)
@@ -129,17 +144,25 @@ void ExplainContent(DoctorReport::Place& place, const ReadingLog& log, const wch
         place.AddProblem("unreadable-file",
                          L"the file cannot be opened and counts as empty: " + SystemMessage(error, place.location));
     }
+    else if (log.content == Content::Missing)
+    {
+        place.AddProblem("no-xml-service",
+                         L"the system's XML service does not start, so the file is not read and counts as empty");
+    }
     else if (log.content == Content::UsesEntities)
     {
         place.AddProblem("entities", L"the file uses entities of its own and therefore counts as empty");
     }
     else if (log.content == Content::Malformed)
     {
-        const std::optional<XmlFault> fault = XmlFault::Find(place.location);
+        // Its texts are longer than the file only where entities stand for others, and those can stand for gigabytes.
+        std::error_code unknownSize;
+        const std::optional<XmlFault> fault =
+            XmlFault::Find(place.location, std::filesystem::file_size(place.location, unknownSize));
         place.AddProblem("malformed", L"the file is not well-formed and counts as empty: " +
                                           (fault ? L"line " + std::to_wstring(fault->line) + L", column " +
                                                        std::to_wstring(fault->column) + L": " + fault->reason
-                                                 : L"the XML service gives no reason"));
+                                                 : L"where and why cannot be said"));
     }
     else if (!log.hasRoot && _wcsicmp(log.root.c_str(), root) == 0)
     {
@@ -196,7 +219,7 @@ void ExplainRemarks(DoctorReport::Place& place, const ReadingLog& log, const wch
 }
 } // namespace
 
-Doctor::Doctor(const CommandLine& commandLine) : m_commandLine(commandLine)
+Doctor::Doctor(const CommandLine& commandLine, Output& output) : m_commandLine(commandLine), m_output(output)
 {
 }
 
@@ -220,6 +243,7 @@ DoctorReport Doctor::Examine()
     {
         FindUnusedSettings();
     }
+    m_output.Progress({});
     return std::move(m_report);
 }
 
@@ -285,10 +309,7 @@ void Doctor::ExaminePlugin(const std::wstring& path, const ManifestContext& cont
     }
     const PluginCandidate judged = PluginCandidate::Judge(path, context, m_configs);
     candidate.listed = judged.verdict == Verdict::Listed;
-    if (judged.version != 0)
-    {
-        candidate.contractVersion = judged.version;
-    }
+    candidate.contractVersion = judged.version;
     if (judged.entry && (candidate.listed || !judged.entry->name.empty()))
     {
         candidate.name = judged.entry->name;
@@ -301,25 +322,24 @@ void Doctor::ExaminePlugin(const std::wstring& path, const ManifestContext& cont
                                                   std::to_wstring(PluginSearch::MaxPath));
         break;
     case Verdict::DoesNotLoad:
-        ExplainLoadError(candidate, path, judged.loadError);
+        ExplainLoadError(candidate, path, context, judged.loadError);
         break;
     case Verdict::OtherVersion:
-        candidate.AddProblem("contract-version", L"it is made for version " + std::to_wstring(judged.version) +
+        candidate.AddProblem("contract-version", L"it is made for version " + std::to_wstring(*judged.version) +
                                                      L" of the contract, the library for " +
                                                      std::to_wstring(ORVIX_PLUGIN_CONTRACT_VERSION));
-        break;
-    case Verdict::Incomplete:
-        for (const char* function : judged.missing)
-        {
-            candidate.AddProblem("missing-export", L"it does not export " + Wide(function));
-        }
         break;
     case Verdict::Throws:
         candidate.AddProblem("throws", L"it throws an exception when it is asked for its version or its name");
         break;
+    case Verdict::Incomplete:
     case Verdict::SwitchedOff:
     case Verdict::Listed:
         break;
+    }
+    for (const char* function : judged.FindMissingExports())
+    {
+        candidate.AddProblem("missing-export", L"it does not export " + Wide(function));
     }
     if (candidate.listed && judged.entry->name.empty())
     {
@@ -364,7 +384,7 @@ void Doctor::ExamineRegistration(HKEY list, DWORD index, Step step, const std::w
     name.resize(status == ERROR_SUCCESS ? nameSize : 0);
 
     DoctorReport::Candidate& candidate = m_report.candidates.emplace_back();
-    candidate.kind = "MSSCCI library";
+    candidate.kind = InstalledKind;
     candidate.location = name;
     switch (step)
     {
@@ -451,16 +471,17 @@ void Doctor::ExamineLibrary(DoctorReport::Candidate& candidate, const InstalledP
                              L"there is no folder " + Quoted(judged.searchPath) + L", which MSSCCDllSearchPath names");
     }
     const DllDirectoryScope directory(judged.searchPath);
-    const std::wstring found = FindLibrary(judged.serverPath);
+    const std::wstring found = FindLibrary(judged.serverPath, judged.searchPath);
     if (!found.empty())
     {
         CheckHeaders(candidate, found);
     }
     Announce(judged.serverPath);
-    const UniqueModule module = LoadLibraryIsolated(judged.serverPath.c_str(), ManifestContext());
+    const ManifestContext context;
+    const UniqueModule module = LoadLibraryIsolated(judged.serverPath.c_str(), context);
     if (const DWORD error = GetLastError(); !module && !found.empty())
     {
-        ExplainLoadError(candidate, found, error);
+        ExplainLoadError(candidate, found, context, error);
         return;
     }
     if (!module)
@@ -504,7 +525,7 @@ void Doctor::Examine32BitView()
             continue;
         }
         DoctorReport::Candidate& candidate = m_report.candidates.emplace_back();
-        candidate.kind = "MSSCCI library";
+        candidate.kind = InstalledKind;
         candidate.location = keyPath;
         const UniqueRegistryKey key = InstalledProviders::OpenProvider(keyPath, KEY_WOW64_32KEY);
         std::wstring name;
@@ -512,9 +533,25 @@ void Doctor::Examine32BitView()
         {
             candidate.name = name;
         }
-        candidate.AddProblem("only-32-bit", L"it is registered only in the 32-bit view of the registry, which a 64-bit "
-                                            L"host never sees");
+        if (IsInstalled(name))
+        {
+            candidate.AddNote("only-32-bit",
+                              L"this key is in the 32-bit view of the registry, which a 64-bit host never "
+                              L"sees; a 64-bit library of the same name is listed");
+        }
+        else
+        {
+            candidate.AddProblem("only-32-bit", L"it is registered only in the 32-bit view of the registry, which a "
+                                                L"64-bit host never sees");
+        }
     }
+}
+
+bool Doctor::IsInstalled(const std::wstring& name) const
+{
+    return std::any_of(m_report.candidates.begin(), m_report.candidates.end(), [&](const auto& candidate) {
+        return candidate.kind == InstalledKind && candidate.listed && PathKey(*candidate.name) == PathKey(name);
+    });
 }
 
 void Doctor::ExplainConfiguration(DoctorReport::Candidate& candidate, const OrvixProviderConfig* config,
@@ -572,12 +609,14 @@ void Doctor::FindUnusedSettings()
 }
 
 /// A library that ends the process when it is loaded is the last one announced.
-void Doctor::Announce(const std::wstring& library) const
+void Doctor::Announce(const std::wstring& library)
 {
     if (m_commandLine.verbose)
     {
+        m_output.Progress({});
         std::cerr << "orvix: loading " << Printable(library) << std::endl;
     }
+    m_output.Progress(L"examining " + library);
 }
 
 std::wstring Doctor::SettingsElement(const OrvixProviderConfig* config) const

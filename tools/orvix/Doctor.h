@@ -5,6 +5,7 @@
 #include "InstalledProviders.h"
 #include "IsolatedLoad.h"
 #include "OrvixProviderConfigManager.h"
+#include "Output.h"
 #include "ReadingLog.h"
 
 #include <map>
@@ -17,8 +18,8 @@
 class Doctor
 {
 public:
-    /// `commandLine` must outlive this object.
-    explicit Doctor(const CommandLine& commandLine);
+    /// What is being examined goes to `output`. The arguments must outlive this object.
+    Doctor(const CommandLine& commandLine, Output& output);
 
     /// Looks at everything; called once. Throws `ToolError` with `ExitCode::NoProject` when there is no configuration
     /// folder to look at by default, and `_com_error` when memory is exhausted.
@@ -34,13 +35,18 @@ private:
     void ExamineKey(DoctorReport::Candidate& candidate, const std::wstring& keyPath);
     void ExamineLibrary(DoctorReport::Candidate& candidate, const InstalledProviders::Candidate& judged);
     void Examine32BitView();
+
+    /// Whether a registered library of this name is listed.
+    bool IsInstalled(const std::wstring& name) const;
+
     void ExplainConfiguration(DoctorReport::Candidate& candidate, const OrvixProviderConfig* config, bool switchedOff);
     void FindUnusedSettings();
 
-    void Announce(const std::wstring& library) const;
+    void Announce(const std::wstring& library);
     std::wstring SettingsElement(const OrvixProviderConfig* config) const;
 
     const CommandLine& m_commandLine;
+    Output& m_output;
     DoctorReport m_report;
     OrvixProviderConfigManager m_configs;
     ReadingLog m_settings;

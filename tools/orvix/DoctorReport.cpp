@@ -16,12 +16,13 @@ std::size_t CountProblems(const DoctorReport::Place& place)
                                                   [](const auto& finding) { return finding.isProblem; }));
 }
 
-void PrintFindings(std::ostream& stream, const DoctorReport::Place& place)
+void PrintFindings(std::ostream& stream, const DoctorReport::Place& place, const OutputStyle& style)
 {
     for (const DoctorReport::Finding& finding : place.findings)
     {
-        stream << (finding.isProblem ? "  problem: " : "  note: ") << Printable(finding.text) << " [" << finding.code
-               << "]\n";
+        const std::string severity = finding.isProblem ? style.Painted("problem", Listing::Tone::Bad)
+                                                       : style.Painted("note", Listing::Tone::Quiet);
+        style.PrintLine(stream, "  " + severity + ": " + Printable(finding.text) + " [" + finding.code + "]");
     }
 }
 
@@ -72,27 +73,27 @@ std::size_t DoctorReport::NumProblems() const
     return count;
 }
 
-void DoctorReport::PrintText(std::ostream& stream) const
+void DoctorReport::PrintText(std::ostream& stream, const OutputStyle& style) const
 {
     for (const Place& place : places)
     {
-        stream << place.kind << ": " << Printable(place.location) << '\n';
-        PrintFindings(stream, place);
+        style.PrintLine(stream, place.kind + ": " + Printable(place.location));
+        PrintFindings(stream, place, style);
     }
     for (const Candidate& candidate : candidates)
     {
         const std::string name = candidate.name ? '"' + Printable(*candidate.name) + '"' : "";
-        stream << candidate.kind << ": " << Printable(candidate.location) << '\n'
-               << (candidate.listed ? "  listed as " + name : "  not listed" + (name.empty() ? "" : " (" + name + ")"))
-               << '\n';
+        style.PrintLine(stream, candidate.kind + ": " + Printable(candidate.location));
+        style.PrintLine(stream, candidate.listed ? "  " + style.Painted("listed", Listing::Tone::Good) + " as " + name
+                                                 : "  not listed" + (name.empty() ? "" : " (" + name + ")"));
         if (candidate.contractVersion)
         {
-            stream << "  contract version " << *candidate.contractVersion << '\n';
+            style.PrintLine(stream, "  contract version " + std::to_string(*candidate.contractVersion));
         }
-        PrintFindings(stream, candidate);
+        PrintFindings(stream, candidate, style);
     }
-    stream << Counted(candidates.size(), "candidate") << ", " << NumListed() << " listed, "
-           << Counted(NumProblems(), "problem") << '\n';
+    style.PrintLine(stream, Counted(candidates.size(), "candidate") + ", " + std::to_string(NumListed()) + " listed, " +
+                                Counted(NumProblems(), "problem"));
 }
 
 void DoctorReport::PrintJson(std::ostream& stream) const

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "OutputStyle.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <optional>
@@ -43,7 +45,7 @@ struct DoctorReport
     std::size_t NumProblems() const;
 
     /// Prints everything for people, with the summary as the last line.
-    void PrintText(std::ostream& stream) const;
+    void PrintText(std::ostream& stream, const OutputStyle& style) const;
 
     /// Prints everything as one JSON object.
     void PrintJson(std::ostream& stream) const;

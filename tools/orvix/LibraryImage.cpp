@@ -93,8 +93,8 @@ bool IsOfWindows(const std::wstring& path)
     return PathBelow(folder, path) != path;
 }
 
-void AddMissing(const std::wstring& path, const std::wstring& shownAs, std::set<std::wstring>& seen,
-                std::vector<LibraryImage::Missing>& missing)
+void AddMissing(const std::wstring& path, const std::wstring& shownAs, const ManifestContext& context,
+                std::set<std::wstring>& seen, std::vector<LibraryImage::Missing>& missing)
 {
     const std::optional<LibraryImage> image = LibraryImage::Read(path);
     if (!image)
@@ -108,14 +108,14 @@ void AddMissing(const std::wstring& path, const std::wstring& shownAs, std::set<
         {
             continue;
         }
-        const UniqueModule module(LoadLibraryExW(name.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES));
+        const UniqueModule module = LoadLibraryIsolated(name.c_str(), context, DONT_RESOLVE_DLL_REFERENCES);
         if (!module)
         {
             missing.push_back({name, shownAs, GetLastError()});
         }
         else if (const std::wstring found = ModulePath(module.get()); !IsOfWindows(found))
         {
-            AddMissing(found, name, seen, missing);
+            AddMissing(found, name, context, seen, missing);
         }
     }
 }
@@ -160,10 +160,10 @@ bool LibraryImage::IsFor64Bit() const
     return machine == IMAGE_FILE_MACHINE_AMD64;
 }
 
-std::vector<LibraryImage::Missing> LibraryImage::FindMissing(const std::wstring& path)
+std::vector<LibraryImage::Missing> LibraryImage::FindMissing(const std::wstring& path, const ManifestContext& context)
 {
     std::vector<Missing> missing;
     std::set<std::wstring> seen;
-    AddMissing(path, std::filesystem::path(path).filename().wstring(), seen, missing);
+    AddMissing(path, std::filesystem::path(path).filename().wstring(), context, seen, missing);
     return missing;
 }

@@ -13,6 +13,7 @@ namespace
 using InstalledProviders::ListPath;
 using InstalledProviders::ServerName;
 using InstalledProviders::ServerPath;
+using InstalledProviders::Step;
 
 constexpr wchar_t OwnPlace[] = L"Software\\OrvixCore\\MSSCCI\\";
 constexpr std::size_t MaxName = 255; // characters in the name of a key
@@ -41,12 +42,10 @@ bool EqualNames(const std::wstring& left, const std::wstring& right)
 /// A text that the library could read; nothing otherwise.
 std::optional<std::wstring> ReadText(const std::wstring& keyPath, const wchar_t* valueName)
 {
-    std::array<wchar_t, InstalledProviders::MaxText> text{};
-    DWORD size = sizeof text;
-    return RegGetValueW(HKEY_LOCAL_MACHINE, keyPath.c_str(), valueName, RRF_RT_REG_SZ, nullptr, text.data(), &size) ==
-                   ERROR_SUCCESS
-               ? std::optional<std::wstring>(text.data())
-               : std::nullopt;
+    const UniqueRegistryKey key = InstalledProviders::OpenProvider(keyPath);
+    std::wstring text;
+    const bool found = key && InstalledProviders::ReadText(key.get(), valueName, text) == Step::Found;
+    return found ? std::optional(text) : std::nullopt;
 }
 
 /// Writes a text and, where it is missing, its key.
@@ -54,14 +53,6 @@ LSTATUS WriteText(const wchar_t* keyPath, const wchar_t* valueName, const std::w
 {
     return RegSetKeyValueW(HKEY_LOCAL_MACHINE, keyPath, valueName, REG_SZ, text.c_str(),
                            static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t)));
-}
-
-bool KeyExists(const std::wstring& path)
-{
-    HKEY key = nullptr;
-    const bool exists = RegOpenKeyExW(HKEY_LOCAL_MACHINE, path.c_str(), 0, KEY_READ, &key) == ERROR_SUCCESS;
-    const UniqueRegistryKey closing(key);
-    return exists;
 }
 
 /// Throws `ToolError` unless a host can use the library. None of its code runs.
@@ -138,7 +129,7 @@ std::optional<std::wstring> Registration::Set(const std::wstring& library)
 void Registration::Remove()
 {
     const std::vector<Entry> list = ReadList();
-    bool known = KeyExists(m_keyPath); // also when an interrupted run has left it
+    bool known = InstalledProviders::OpenProvider(m_keyPath) != nullptr; // also when an interrupted run has left it
     for (const Entry& entry : list)
     {
         if (IsOwn(entry))
@@ -159,26 +150,25 @@ void Registration::Remove()
 std::vector<Registration::Entry> Registration::ReadList()
 {
     std::vector<Entry> list;
-    HKEY opened = nullptr;
-    const LSTATUS status = RegOpenKeyExW(HKEY_LOCAL_MACHINE, ListPath, 0, KEY_READ, &opened);
-    const UniqueRegistryKey key(opened);
-    if (status == ERROR_FILE_NOT_FOUND)
+    const UniqueRegistryKey key = InstalledProviders::OpenList();
+    if (!key && GetLastError() == ERROR_FILE_NOT_FOUND)
     {
         return list;
     }
-    Check(status);
+    Check(key ? ERROR_SUCCESS : static_cast<LSTATUS>(GetLastError()));
     std::array<wchar_t, InstalledProviders::MaxValueName> name{};
     for (DWORD index = 0;; ++index)
     {
-        DWORD size = static_cast<DWORD>(name.size());
-        const LSTATUS found = RegEnumValueW(key.get(), index, name.data(), &size, nullptr, nullptr, nullptr, nullptr);
-        if (found == ERROR_SUCCESS)
-        {
-            list.push_back({name.data(), ReadText(ListPath, name.data()).value_or(L"")});
-        }
-        else if (found != ERROR_MORE_DATA) // a name too long for the library, too
+        std::wstring keyPath;
+        if (InstalledProviders::KeyPathAt(key.get(), index, keyPath) == Step::End)
         {
             return list;
+        }
+        DWORD size = static_cast<DWORD>(name.size());
+        // A name that is too long for this is too long for the library, too.
+        if (RegEnumValueW(key.get(), index, name.data(), &size, nullptr, nullptr, nullptr, nullptr) == ERROR_SUCCESS)
+        {
+            list.push_back({name.data(), keyPath});
         }
     }
 }

@@ -7,6 +7,7 @@
 #include "PromptCommand.h"
 #include "ProviderCommand.h"
 #include "Registration.h"
+#include "ReservedOutput.h"
 #include "Terminal.h"
 #include "TextOutput.h"
 #include "ValidateCommand.h"
@@ -19,13 +20,13 @@
 
 namespace
 {
-std::unique_ptr<Output> MakeOutput(const CommandLine& commandLine, const Terminal& terminal)
+std::unique_ptr<Output> MakeOutput(const CommandLine& commandLine, const OutputStyle& style, std::ostream& stream)
 {
     if (commandLine.json)
     {
-        return std::make_unique<JsonOutput>(std::cout);
+        return std::make_unique<JsonOutput>(stream);
     }
-    return std::make_unique<TextOutput>(std::cout, terminal.Style(commandLine.noColor));
+    return std::make_unique<TextOutput>(stream, style);
 }
 
 void ListProviders(HostSession& host, Output& output)
@@ -54,18 +55,58 @@ void Unregister(const std::wstring& name)
     std::cout << "unregistered " << Printable(name) << '\n';
 }
 
-ExitCode Diagnose(const CommandLine& commandLine)
+ExitCode Diagnose(const CommandLine& commandLine, Output& output, const OutputStyle& style, std::ostream& stream)
 {
-    const DoctorReport report = Doctor(commandLine).Examine();
+    const DoctorReport report = Doctor(commandLine, output).Examine();
     if (commandLine.json)
     {
-        report.PrintJson(std::cout);
+        report.PrintJson(stream);
     }
     else
     {
-        report.PrintText(std::cout);
+        report.PrintText(stream, style);
     }
     return report.NumProblems() == 0 ? ExitCode::Success : ExitCode::Failed;
+}
+
+/// Carries out a command that has an `Output`, and prints its result on `stream`.
+ExitCode Run(const CommandLine& commandLine, const OutputStyle& style, std::ostream& stream)
+{
+    const std::unique_ptr<Output> output = MakeOutput(commandLine, style, stream);
+    if (commandLine.command == L"doctor")
+    {
+        return Diagnose(commandLine, *output, style, stream);
+    }
+    if (commandLine.command == L"prompts")
+    {
+        PromptCommand(commandLine, *output).Run();
+        return ExitCode::Success;
+    }
+    HostSession host(commandLine, *output);
+    if (commandLine.command == L"providers")
+    {
+        ListProviders(host, *output);
+        return ExitCode::Success;
+    }
+    if (commandLine.command == L"filters")
+    {
+        return FilterCommand(host, commandLine, *output).Run();
+    }
+    ProjectSession project(host, commandLine);
+    if (ProviderCommand::IsOne(commandLine.command))
+    {
+        ProviderCommand(project, commandLine).Run();
+        return ExitCode::Success;
+    }
+    return FileCommand(project, host.Client(), commandLine, *output).Run();
+}
+
+void CheckWritten(bool written)
+{
+    if (!written)
+    {
+        throw ToolError(ExitCode::Failed, L"the output cannot be written");
+    }
 }
 
 ExitCode Run(int count, wchar_t** arguments)
@@ -89,34 +130,16 @@ ExitCode Run(int count, wchar_t** arguments)
     {
         return ValidateCommand(*commandLine).Run();
     }
-    if (commandLine->command == L"doctor")
-    {
-        return Diagnose(*commandLine);
-    }
     const Terminal terminal;
-    const std::unique_ptr<Output> output = MakeOutput(*commandLine, terminal);
-    if (commandLine->command == L"prompts")
+    const OutputStyle style = terminal.Style(commandLine->noColor);
+    if (!commandLine->json)
     {
-        PromptCommand(*commandLine, *output).Run();
-        return ExitCode::Success;
+        return Run(*commandLine, style, std::cout);
     }
-    HostSession host(*commandLine, *output);
-    if (commandLine->command == L"providers")
-    {
-        ListProviders(host, *output);
-        return ExitCode::Success;
-    }
-    if (commandLine->command == L"filters")
-    {
-        return FilterCommand(host, *commandLine, *output).Run();
-    }
-    ProjectSession project(host, *commandLine);
-    if (ProviderCommand::IsOne(commandLine->command))
-    {
-        ProviderCommand(project, *commandLine).Run();
-        return ExitCode::Success;
-    }
-    return FileCommand(project, host.Client(), *commandLine, *output).Run();
+    ReservedOutput output;
+    const ExitCode code = Run(*commandLine, style, output.Stream());
+    CheckWritten(output.Print());
+    return code;
 }
 } // namespace
 
@@ -131,10 +154,7 @@ int wmain(int count, wchar_t** arguments)
     try
     {
         code = Run(count, arguments);
-        if (!std::cout.flush())
-        {
-            throw ToolError(ExitCode::Failed, L"the output cannot be written");
-        }
+        CheckWritten(static_cast<bool>(std::cout.flush()));
     }
     catch (const ToolError& error)
     {

@@ -226,6 +226,8 @@ INSTANTIATE_TEST_SUITE_P(
                     Rejected{L"noget", L"noget.load noget.version noget.name noget.unload "},
                     Rejected{L"norelease", L"norelease.load norelease.version norelease.name norelease.unload "},
                     Rejected{L"noname", L"noname.load noname.version noname.unload "},
+                    Rejected{L"noobjects", L"noobjects.load noobjects.version noobjects.name noobjects.unload "},
+                    Rejected{L"noexports", L"noexports.load noexports.unload "},
                     Rejected{L"namethrows", L"namethrows.load namethrows.version namethrows.name namethrows.unload "},
                     Rejected{L"namethrowscom",
                              L"namethrowscom.load namethrowscom.version namethrowscom.name namethrowscom.unload "}),

@@ -10,6 +10,8 @@
 #include <comdef.h>
 
 #include <cstdint>
+#include <cstdio>
+#include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <new>
@@ -38,6 +40,17 @@ void Leave(const std::wstring& text)
     file.resize(GetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST_FILE", file.data(), static_cast<DWORD>(file.size())));
     if (!file.empty())
         std::wofstream(std::filesystem::path(file)) << text;
+}
+
+/// Prints both as C code does and past its buffers.
+void Print([[maybe_unused]] const char* text)
+{
+#ifdef FAKE_PRINTS
+    std::puts(text);
+    std::fflush(stdout);
+    DWORD written = 0;
+    WriteFile(GetStdHandle(STD_OUTPUT_HANDLE), text, static_cast<DWORD>(std::strlen(text)), &written, nullptr);
+#endif
 }
 
 } // namespace
@@ -85,6 +98,7 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
     if (reason == DLL_PROCESS_ATTACH)
     {
         Note(L"load");
+        Print("I am loaded");
         SetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST", ActiveManifest().c_str());
         Leave(ActiveManifest());
 #ifdef FAKE_START_FAILS
@@ -92,6 +106,9 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
 #endif
     }
     else if (reason == DLL_PROCESS_DETACH)
+    {
         Note(L"unload");
+        Print("I am unloaded");
+    }
     return TRUE;
 }
