@@ -31,7 +31,7 @@ PluginCandidate PluginCandidate::Judge(const std::wstring& path, const ManifestC
 std::vector<const char*> PluginCandidate::FindMissingExports() const
 {
     std::vector<const char*> missing;
-    for (const char* name : {GetVersion, GetProvider, ReleaseProvider, GetName})
+    for (const char* name : Exports)
     {
         if (entry && !Export<void()>(name))
             missing.push_back(name);

@@ -2,6 +2,7 @@
 
 #include "OrvixProviderEntry.h"
 
+#include <array>
 #include <cstdint>
 #include <memory>
 #include <optional>
@@ -29,6 +30,7 @@ struct PluginCandidate
     static constexpr const char* GetProvider = "GetIOrvixProvider";
     static constexpr const char* ReleaseProvider = "ReleaseIOrvixProvider";
     static constexpr const char* GetName = "GetOrvixProviderName";
+    static constexpr std::array Exports = {GetVersion, GetProvider, ReleaseProvider, GetName};
 
     /// Loads the plug-in and asks for its version and its name. Throws std::bad_alloc; what the plug-in itself throws
     /// makes the verdict.

@@ -1,4 +1,5 @@
 #include "OrvixVersion.h"
+#include "PluginCandidate.h"
 #include "ValidationProvider.h"
 #include "ValidationRules.h"
 
@@ -7,9 +8,6 @@
 
 namespace
 {
-constexpr const char* Exports[] = {"GetOrvixVersion", "GetIOrvixProvider", "ReleaseIOrvixProvider",
-                                   "GetOrvixProviderName"};
-
 constexpr int Requests = 3;
 } // namespace
 
@@ -17,7 +15,7 @@ void PluginRules::Exports(ValidationSubject& subject)
 {
     const ValidationLibrary library(subject);
     std::string missing;
-    for (const char* name : ::Exports)
+    for (const char* name : PluginCandidate::Exports)
     {
         missing += library.Find<void()>(name) == nullptr ? std::string(" ") + name : "";
     }
