@@ -35,3 +35,4 @@ void BenchLists(MeasureTable& table);
 void BenchMssccci(MeasureTable& table);
 void BenchFiles(MeasureTable& table);
 void BenchNotifications(MeasureTable& table);
+void BenchDialogs(MeasureTable& table);

@@ -1,23 +1,16 @@
+#include "FileLists.h"
 #include "IOrvixProvider.h"
 #include "IOrvixServices.h"
 #include "Measure.h"
-#include "OrvixFileEntry.h"
-#include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
 
 #include <memory>
-#include <string>
 #include <vector>
 
 namespace
 {
 
 constexpr unsigned long Mask = 0x4;
-
-std::wstring FileName(unsigned int index)
-{
-    return L"C:\\project\\folder " + std::to_wstring(index / 100) + L"\\file " + std::to_wstring(index) + L".txt";
-}
 
 /// Every eleventh entry is a root; the ten behind it are its children. All are selected.
 std::unique_ptr<OrvixFileList> MakeTree(unsigned int count)

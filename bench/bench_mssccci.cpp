@@ -1,9 +1,8 @@
+#include "FileLists.h"
 #include "IOrvixServices.h"
 #include "MSSCCI.h"
 #include "Measure.h"
 #include "OrvixClientInfo.h"
-#include "OrvixFileEntry.h"
-#include "OrvixFileList.h"
 #include "OrvixMSSCC.h"
 #include "OrvixProviderWrapper.h"
 #include "RegistryKey.h"
@@ -36,20 +35,6 @@ std::filesystem::path ProgramFolder()
     std::wstring path(MAX_PATH, L'\0');
     path.resize(GetModuleFileNameW(nullptr, path.data(), MAX_PATH));
     return std::filesystem::path(path).parent_path();
-}
-
-/// A list of `count` files, all active.
-std::unique_ptr<OrvixFileList> MakeList(unsigned int count)
-{
-    std::unique_ptr<OrvixFileList> list(new OrvixFileList);
-    for (unsigned int i = 0; i < count; ++i)
-    {
-        const std::wstring path =
-            L"C:\\project\\folder " + std::to_wstring(i / 100) + L"\\file " + std::to_wstring(i) + L".txt";
-        list->CreateEntry(path.c_str(), nullptr, 1, 0);
-    }
-    list->BuildActiveList(1, false);
-    return list;
 }
 
 /// A provider over the library that does nothing, with an open project.
@@ -101,7 +86,7 @@ SIZE_T MemoryNow()
 void ReportMemory(IdleMssccci& mssccci, HMODULE library)
 {
     constexpr unsigned int Count = 100000;
-    const auto list = MakeList(Count);
+    const auto list = MakeActiveList(Count);
     std::size_t bytes = 0;
     for (unsigned int i = 0; i < Count; ++i)
         bytes += std::wcslen(list->GetActiveFileEntry(i)->GetFile()) + 1;
@@ -115,7 +100,7 @@ void ReportMemory(IdleMssccci& mssccci, HMODULE library)
 /// Milliseconds per file of a check-out.
 double CheckOutCostPerFile(IdleMssccci& mssccci, unsigned int count, unsigned int repeat)
 {
-    const auto list = MakeList(count);
+    const auto list = MakeActiveList(count);
     const double time = BestTime([&] {
         for (unsigned int i = 0; i < repeat; ++i)
             mssccci.Provider().CheckOut(list.get(), L"comment", 0);
@@ -217,7 +202,7 @@ void BenchMssccci(MeasureTable& table)
     const auto query = Export<decltype(SccQueryInfo)>(library.get(), "SccQueryInfo");
     for (const unsigned int count : {10000U, 100000U})
     {
-        const auto list = MakeList(count);
+        const auto list = MakeActiveList(count);
         table.Print(Compare(
             "QueryStatus through an MSSCCI library, " + std::to_string(count) + " files", 1.5,
             [&] { mssccci.Provider().QueryStatus(list.get(), 0); }, [&] { QueryByHand(*list, query); }));

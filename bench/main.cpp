@@ -8,5 +8,6 @@ int main()
     BenchLists(table);
     BenchFiles(table);
     BenchNotifications(table);
+    BenchDialogs(table);
     return 0;
 }

@@ -17,7 +17,7 @@ at_exit() {
 
 # One X server without a screen serves the rest of the calling script, which shows its windows there and never on the
 # user's own display. It goes before use_one_wineserver: a wineserver keeps the display that it began with. Without such
-# an X server there is no display, and the tests that need one are skipped.
+# an X server there is no display, and the tests and measures that need one are skipped.
 use_virtual_display() {
     unset DISPLAY
     local number
@@ -28,7 +28,7 @@ use_virtual_display() {
         at_exit kill "$xvfb"
     else
         unset DISPLAY
-        echo "no display (Xvfb does not start): the tests of the dialogs are skipped"
+        echo "no display (Xvfb does not start): what shows dialogs is skipped"
     fi
 }
 

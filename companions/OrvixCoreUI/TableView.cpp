@@ -225,7 +225,8 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
     for (const std::size_t place : SelectedPlaces())
         selected[m_table.RowAt(place)] = true;
     const auto focusedPlace = Next(AllPlaces, LVNI_FOCUSED);
-    const auto focusedRow = focusedPlace ? std::optional(m_table.RowAt(*focusedPlace)) : std::nullopt;
+    const std::size_t noRow = m_table.NumRows();
+    const std::size_t focusedRow = focusedPlace ? m_table.RowAt(*focusedPlace) : noRow;
     std::size_t focused = 0;
     bool anySelected = false;
     {

@@ -5,10 +5,9 @@
 #include <string>
 #include <vector>
 
-/// A dialog of this process as its user handles it: by keyboard and mouse messages, from another thread than the one
-/// that shows it. Controls are named by what a person sees, and a screen reader says: a button by its text, any other
-/// control by the label before it, both without the mark of the access key. What is not there throws
-/// std::runtime_error.
+/// A dialog of this process as its user handles it: by keyboard and mouse messages. Controls are named by what a person
+/// sees, and a screen reader says: a button by its text, any other control by the label before it, both without the
+/// mark of the access key. What is not there throws std::runtime_error.
 class DialogWindow
 {
 public:

@@ -1,21 +1,8 @@
 #include "DialogsTest.h"
 
+#include "Display.h"
 #include "Files.h"
 #include "OrvixClientInfo.h"
-
-namespace
-{
-
-bool HasDisplay()
-{
-    const HWND window =
-        CreateWindowExW(0, L"Static", nullptr, WS_POPUP, 0, 0, 1, 1, nullptr, nullptr, nullptr, nullptr);
-    if (window)
-        DestroyWindow(window);
-    return window != nullptr;
-}
-
-} // namespace
 
 DialogsTest::DialogsTest()
 {
