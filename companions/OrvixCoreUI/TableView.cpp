@@ -7,6 +7,7 @@
 #include <bit>
 #include <iterator>
 #include <memory>
+#include <numeric>
 #include <type_traits>
 #include <utility>
 
@@ -100,10 +101,9 @@ std::size_t TableView::NumTicked() const
 
 void TableView::TickShown(bool ticked)
 {
-    for (std::size_t place = 0; place < m_table.NumShown(); ++place)
-        m_ticked[m_table.RowAt(place)] = ticked;
-    InvalidateRect(m_window, nullptr, FALSE);
-    NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT, CHILDID_SELF);
+    std::vector<std::size_t> places(m_table.NumShown());
+    std::iota(places.begin(), places.end(), std::size_t{0});
+    Tick(places, ticked);
 }
 
 std::optional<std::size_t> TableView::Selected() const
@@ -272,28 +272,28 @@ void TableView::ToggleFocused()
     std::vector<std::size_t> places = SelectedPlaces();
     if (!std::binary_search(places.begin(), places.end(), *focused))
         places = {*focused};
-    const bool ticked = !m_ticked[m_table.RowAt(*focused)];
-    for (const std::size_t place : places)
-        Tick(place, ticked);
-    InvalidateRect(m_window, nullptr, FALSE);
+    Tick(places, !m_ticked[m_table.RowAt(*focused)]);
 }
 
 void TableView::ToggleClicked(const NMITEMACTIVATE& click)
 {
     LVHITTESTINFO hit{};
     hit.pt = click.ptAction;
-    const LRESULT place = Send(LVM_HITTEST, 0, &hit);
-    if (place < 0 || (hit.flags & LVHT_ONITEM) != LVHT_ONITEMSTATEICON)
+    const LRESULT found = Send(LVM_HITTEST, 0, &hit);
+    if (found < 0 || (hit.flags & LVHT_ONITEM) != LVHT_ONITEMSTATEICON)
         return;
-    Tick(static_cast<std::size_t>(place), !m_ticked[m_table.RowAt(static_cast<std::size_t>(place))]);
-    InvalidateRect(m_window, nullptr, FALSE);
+    const auto place = static_cast<std::size_t>(found);
+    Tick({place}, !m_ticked[m_table.RowAt(place)]);
 }
 
-void TableView::Tick(std::size_t place, bool ticked)
+/// The control does not know that anything changes. Screen readers are told of one row, or of the whole list.
+void TableView::Tick(const std::vector<std::size_t>& places, bool ticked)
 {
-    m_ticked[m_table.RowAt(place)] = ticked;
-    // The control does not know that anything changed.
-    NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT, static_cast<LONG>(place) + 1);
+    for (const std::size_t place : places)
+        m_ticked[m_table.RowAt(place)] = ticked;
+    InvalidateRect(m_window, nullptr, FALSE);
+    NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT,
+                   places.size() == 1 ? static_cast<LONG>(places.front()) + 1 : CHILDID_SELF);
 }
 
 LRESULT TableView::Find(const NMLVFINDITEMW& search) const

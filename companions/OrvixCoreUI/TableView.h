@@ -63,7 +63,7 @@ private:
     void SetState(std::size_t place, UINT states, UINT value) const;
     void ToggleFocused();
     /// Does not draw.
-    void Tick(std::size_t place, bool ticked);
+    void Tick(const std::vector<std::size_t>& places, bool ticked);
     void ToggleClicked(const NMITEMACTIVATE& click);
     LRESULT Find(const NMLVFINDITEMW& search) const;
     std::vector<std::size_t> SelectedPlaces() const;
