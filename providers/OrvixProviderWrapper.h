@@ -8,8 +8,8 @@ class IOrvixMSSCC;
 /// and turns its result into 0 (the library answered 0) or -1.
 ///
 /// Before anything is sent, an operation fails with -1 for a null or empty list, a null path, without memory, and for a
-/// path that the ANSI code page does not carry exactly: it would name another file. Comments and names may lose characters.
-/// A null comment is an empty one. What the library or the host throws during an operation makes it fail.
+/// path that the ANSI code page does not carry exactly: it would name another file. Comments and names may lose
+/// characters. A null comment is an empty one. What the library or the host throws during an operation makes it fail.
 ///
 /// The library's text output goes to the client access of the last `Initialize` of any wrapper.
 class OrvixProviderWrapper : public IOrvixProvider

@@ -5,8 +5,9 @@ export WINEARCH=win64 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree=;mshtml=;winemenu
 export LC_ALL=C.UTF-8 # in another locale Wine has no files with foreign letters in their names
 wineserver=/usr/lib/wine/wineserver
 wine=(/usr/lib/wine/wine64)
-# Wine's loader lies below 2 GiB, and Linux lays its heap at random within 1 GiB behind it: one start in some 5,000 finds
-# the heap where Windows has the data that all processes share (0x7ffe0000) and ends there. Without that randomness none.
+# Wine's loader lies below 2 GiB, and Linux lays its heap at random within 1 GiB behind it: one start in some 5,000
+# finds the heap where Windows has the data that all processes share (0x7ffe0000) and ends there. Without that
+# randomness none does.
 if setarch -R true 2>/dev/null; then wine=(setarch -R "${wine[@]}"); fi
 
 # What `at_exit COMMAND...` is given runs when the script ends, the last one first.

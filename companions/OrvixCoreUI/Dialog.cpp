@@ -12,7 +12,6 @@
 
 #include <algorithm>
 #include <bit>
-#include <limits>
 
 namespace
 {
@@ -141,10 +140,13 @@ void Dialog::OnOpen()
     ColorCheckBoxes();
     OnInit();
     m_layout = Layout(m_window, Rules());
-    ShowWholeMessage();
     const SIZE size = (m_name ? Settings::WindowSize(m_name) : std::nullopt).value_or(SIZE{});
-    const LONG height = std::min(size.cy, std::numeric_limits<LONG>::max() - m_roomForMessage) + m_roomForMessage;
-    Resize(m_layout.ToPixels(size.cx), m_layout.ToPixels(height));
+    const LONG smallest = m_layout.SmallestWindow().y;
+    const RECT work = WorkArea();
+    const LONG height = std::max(std::min<LONG>(m_layout.ToPixels(size.cy), work.bottom - work.top), smallest);
+    const LONG room = ShowWholeMessage();
+    Resize(m_layout.ToPixels(size.cx), height + room);
+    m_roomForMessage = m_layout.FromPixels(HeightOf(m_window) - height);
 }
 
 void Dialog::ColorCheckBoxes() const
@@ -158,18 +160,18 @@ void Dialog::ColorCheckBoxes() const
     }
 }
 
-void Dialog::ShowWholeMessage()
+LONG Dialog::ShowWholeMessage()
 {
     const HWND message = Item(IDC_MESSAGE);
     if (!message)
-        return;
+        return 0;
     const RECT work = WorkArea();
     const LONG most = (work.bottom - work.top) * 9 / 10 - HeightOf(m_window);
     const LONG more = std::min(NeededHeight(message, GetText(IDC_MESSAGE)) - HeightOf(message), most);
     if (more <= 0)
-        return;
+        return 0;
     m_layout.MakeRoom(message, more);
-    m_roomForMessage = m_layout.FromPixels(more);
+    return more;
 }
 
 RECT Dialog::WorkArea() const

@@ -70,7 +70,9 @@ private:
 
     void OnOpen();
     void ColorCheckBoxes() const;
-    void ShowWholeMessage();
+
+    /// Makes room for a message that needs more than the template has. Returns how much, in pixels.
+    LONG ShowWholeMessage();
     RECT WorkArea() const;
 
     /// Gives the dialog a size in pixels, as far as the monitor allows, around the middle that it has.
@@ -81,6 +83,6 @@ private:
     const wchar_t* m_name;
     Palette m_palette;
     Layout m_layout;
-    LONG m_roomForMessage = 0; // at 96 dots per inch
+    LONG m_roomForMessage = 0; // by which the window is higher, at 96 dots per inch
     HWND m_window = nullptr;
 };

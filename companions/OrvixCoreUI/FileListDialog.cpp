@@ -107,7 +107,10 @@ void FileListDialog::OnCommand(int control, int notification)
         m_files.TickShown(control == IDC_SELECT_ALL);
         break;
     case IDC_RECENT:
-        // In the open list alone: in the closed one keys and the wheel pass over items that nobody chose.
+        // In the open list alone: in the closed one keys and the wheel pass over items that nobody chose. An open list
+        // begins without a choice, since some ways to close it confirm what is chosen.
+        if (notification == CBN_DROPDOWN)
+            SendDlgItemMessageW(Window(), IDC_RECENT, CB_SETCURSEL, static_cast<WPARAM>(-1), 0);
         if (notification == CBN_SELENDOK && SendDlgItemMessageW(Window(), IDC_RECENT, CB_GETDROPPEDSTATE, 0, 0))
             TakeRecentComment();
         break;

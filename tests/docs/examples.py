@@ -12,7 +12,8 @@ from typing import NamedTuple
 
 ROOT = Path(__file__).resolve().parents[2]
 GUIDES = sorted([ROOT / "README.md", *(ROOT / "docs").rglob("*.md"), *(ROOT / "samples").rglob("*.md")])
-FENCE = re.compile(r"^(?:<!-- (?P<mark>\w+): (?P<value>[^\n]*) -->\n)?```(?P<language>\w*)\n(?P<text>.*?)^```$", re.M | re.S)
+FENCE = re.compile(r"^(?:<!-- (?P<mark>\w+): (?P<value>[^\n]*) -->\n)?"
+                   r"```(?P<language>\w*)\n(?P<text>.*?)^```$", re.M | re.S)
 
 
 class Example(NamedTuple):

@@ -108,8 +108,8 @@ TEST_F(SettingsFileReading, FindsARootBehindOtherNodes)
 
 TEST_F(SettingsFileReading, FindsTheRootBehindADocumentTypeThatNothingRefersTo)
 {
-    for (const char* type : {"<!DOCTYPE MSSCCProjectSettings>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)",
-                             R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
+    for (const char* type :
+         {"<!DOCTYPE MSSCCProjectSettings>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
     {
         SCOPED_TRACE(type);
         ExpectRead(type + Shape("server", "$/song").substr(Shape("", "").find("<MSS")), "server", "$/song");

@@ -44,15 +44,12 @@ protected:
         WriteBytes(File(name), text);
     }
 
-    /// From here on the tool is this program.
-    void UseProgram(const std::filesystem::path& program) { m_program = program; }
-
     /// From here on the tool is a copy of it, with these files from its folder beside it. Returns the folder.
     std::filesystem::path UseCopy(std::initializer_list<const wchar_t*> files)
     {
         const std::filesystem::path original = ORVIX_TOOL;
         std::filesystem::path folder = Scratch() / L"bin";
-        UseProgram(folder / original.filename());
+        m_program = folder / original.filename();
         std::filesystem::create_directories(folder);
         std::filesystem::copy_file(original, m_program, std::filesystem::copy_options::overwrite_existing);
         for (const std::filesystem::path file : files)

@@ -349,12 +349,7 @@ TEST_F(Validate, SkipsWhatNeedsAPrivateRegistrationWhereTheSystemRefusesIt)
 
 TEST_F(Validate, SaysWhyTheProcessOfARuleDoesNotStart)
 {
-    const std::filesystem::path original = ORVIX_TOOL;
-    for (const wchar_t* name : {L"orvix.exe", L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll"})
-    {
-        std::filesystem::copy_file(original.parent_path() / name, Scratch() / name);
-    }
-    UseProgram(Scratch() / L"orvix.exe");
+    UseCopy({L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll"});
     const Environment environment(Defect::Variable, L"program-moves");
     const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed);
     EXPECT_THAT(result.output, StartsWith("pass  loads "));

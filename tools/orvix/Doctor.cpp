@@ -537,7 +537,7 @@ void Doctor::Examine32BitView()
         {
             candidate.AddNote("only-32-bit",
                               L"this key is in the 32-bit view of the registry, which a 64-bit host never "
-                              L"sees; a 64-bit library of the same name is listed");
+                              L"sees; a library of the same name is registered for those");
         }
         else
         {

@@ -21,6 +21,16 @@ constexpr std::uint32_t OptionTicked = 0x10;
 constexpr std::uint32_t OfferRemember = 0x40;
 constexpr std::uint32_t Remember = 0x80;
 
+/// A click on the arrow of a drop-down list.
+void ClickArrow(HWND box)
+{
+    RECT inside{};
+    GetClientRect(box, &inside);
+    const LPARAM arrow = MAKELPARAM(inside.right - 5, inside.bottom / 2);
+    SendMessageW(box, WM_LBUTTONDOWN, MK_LBUTTON, arrow);
+    SendMessageW(box, WM_LBUTTONUP, 0, arrow);
+}
+
 class FileListDialog : public DialogsTest
 {
 protected:
@@ -106,6 +116,31 @@ TEST_F(FileListDialog, IsHighEnoughForItsMessage)
     EXPECT_EQ(twenty.list, one.list);
     EXPECT_EQ(heightsWith(lines(1)).window, one.window) << "the room for a message is not remembered";
     EXPECT_EQ(heightsWith(lines(500)).list, one.list) << "and a message has no more than the monitor";
+}
+
+TEST_F(FileListDialog, KeepsItsHeightBehindAMessageForWhichTheMonitorHasNoRoom)
+{
+    AddFile(L"a");
+    RECT work{};
+    SystemParametersInfoW(SPI_GETWORKAREA, 0, &work, 0);
+    const LONG high = (work.bottom - work.top) * 19 / 20;
+    const auto heightWith = [&](const wchar_t* message, bool resize) {
+        LONG height = 0;
+        m_params.SetMessage(message);
+        ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+            RECT place{};
+            GetWindowRect(dialog.Handle(), &place);
+            height = place.bottom - place.top;
+            if (resize)
+                SetWindowPos(dialog.Handle(), nullptr, 0, 0, place.right - place.left, high, SWP_NOZORDER);
+            Cancel(dialog);
+        });
+        return height;
+    };
+    heightWith(L"short", true);
+    EXPECT_NEAR(heightWith(L"short", false), high, 2);
+    EXPECT_GT(heightWith(L"1\n2\n3\n4\n5\n6\n7\n8\n9\n10", false), high);
+    EXPECT_NEAR(heightWith(L"short", false), high, 2);
 }
 
 TEST_F(FileListDialog, MarksTickedEntriesAndOnlyThem)
@@ -456,6 +491,12 @@ TEST_F(FileListDialog, LeavesTheTypedCommentAloneUntilARecentOneIsChosenInTheOpe
         EXPECT_EQ(dialog.Text(L"Comment:"), L"recent");
         SendMessageW(comment, EM_UNDO, 0, 0);
         EXPECT_EQ(dialog.Text(L"Comment:"), L"typed");
+        for (const bool open : {true, false})
+        {
+            ClickArrow(dialog.Control(Recent));
+            EXPECT_EQ(SendMessageW(dialog.Control(Recent), CB_GETDROPPEDSTATE, 0, 0) != 0, open);
+        }
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "the list was closed by its arrow";
         dialog.Click(L"OK");
     });
     EXPECT_STREQ(m_params.GetComment(), L"typed");
@@ -613,7 +654,11 @@ public:
     }
     DrawnChanges(const DrawnChanges&) = delete;
     DrawnChanges& operator=(const DrawnChanges&) = delete;
-    ~DrawnChanges() { Install(m_procedure); }
+    ~DrawnChanges()
+    {
+        Install(m_procedure);
+        SendMessageW(m_list, WM_NULL, 0, 0); // the window's thread has left Watch
+    }
 
     int Number() const { return m_number; }
 
