@@ -2,6 +2,7 @@
 #include "IOrvixServices.h"
 #include "MSSCCI.h"
 #include "Measure.h"
+#include "ModulePath.h"
 #include "OrvixClientInfo.h"
 #include "OrvixMSSCC.h"
 #include "OrvixProviderWrapper.h"
@@ -32,9 +33,7 @@ Function* Export(HMODULE module, const char* name)
 
 std::filesystem::path ProgramFolder()
 {
-    std::wstring path(MAX_PATH, L'\0');
-    path.resize(GetModuleFileNameW(nullptr, path.data(), MAX_PATH));
-    return std::filesystem::path(path).parent_path();
+    return std::filesystem::path(ModulePath(nullptr)).parent_path();
 }
 
 /// A provider over the library that does nothing, with an open project.

@@ -1,23 +1,16 @@
 #include "OrvixTool.h"
 
 #include "Files.h"
+#include "UniqueHandle.h"
 
 #include <windows.h>
 
 #include <algorithm>
-#include <memory>
 #include <stdexcept>
 
 namespace
 {
 constexpr DWORD Milliseconds = 60'000;
-
-struct CloseHandleOf
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE handle) const { CloseHandle(handle); }
-};
-using UniqueHandle = std::unique_ptr<HANDLE, CloseHandleOf>;
 
 UniqueHandle NewFile(const std::filesystem::path& path)
 {

@@ -1,5 +1,7 @@
 #include "PseudoConsole.h"
 
+#include "UniqueHandle.h"
+
 #include <memory>
 #include <regex>
 #include <stdexcept>
@@ -9,13 +11,6 @@ namespace
 {
 constexpr DWORD Milliseconds = 60'000;
 constexpr DWORD PipeSize = 1 << 20; // the console is read when the program has ended
-
-struct CloseHandleOf
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE handle) const { CloseHandle(handle); }
-};
-using UniqueHandle = std::unique_ptr<HANDLE, CloseHandleOf>;
 
 struct CloseConsole
 {

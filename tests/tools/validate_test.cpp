@@ -3,6 +3,7 @@
 #include "Defect.h"
 #include "FilePath.h"
 #include "ToolTest.h"
+#include "UniqueHandle.h"
 
 #include <nlohmann/json.hpp>
 
@@ -281,9 +282,8 @@ TEST_F(Validate, LeavesNoProcessBehindThatTheLibraryStarted)
     ValidatePlugin(Plugins / L"defective.dll", Success);
     const std::string number = ReadBytes(file);
     ASSERT_NE(number, "");
-    const HANDLE process = OpenProcess(SYNCHRONIZE, FALSE, std::stoul(number));
-    EXPECT_TRUE(process == nullptr || WaitForSingleObject(process, 10000) == WAIT_OBJECT_0);
-    CloseHandle(process);
+    const UniqueHandle process(OpenProcess(SYNCHRONIZE, FALSE, std::stoul(number)));
+    EXPECT_TRUE(!process || WaitForSingleObject(process.get(), 10000) == WAIT_OBJECT_0);
 }
 
 TEST_F(Validate, FailsOneRuleForWhatIsNoLibraryAndSkipsTheOthers)

@@ -1,11 +1,12 @@
 #include "User.h"
 
+#include "UniqueHandle.h"
+
 #include <gtest/gtest.h>
 
 #include <bit>
 #include <chrono>
 #include <exception>
-#include <memory>
 #include <optional>
 #include <utility>
 
@@ -16,17 +17,11 @@ using Clock = std::chrono::steady_clock;
 constexpr std::chrono::seconds Patience{20};
 constexpr UINT MarkMessage = WM_APP;
 
-struct CloseHandleDeleter
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE handle) const { CloseHandle(handle); }
-};
-
 /// A window of the dialog's thread that says when the messages posted before have had their turn.
 struct MarkWindow
 {
     HWND window = nullptr;
-    std::unique_ptr<HANDLE, CloseHandleDeleter> reached{CreateEventW(nullptr, FALSE, FALSE, nullptr)};
+    UniqueHandle reached{CreateEventW(nullptr, FALSE, FALSE, nullptr)};
 };
 
 MarkWindow& Mark()

@@ -1,4 +1,6 @@
 #include "InstalledTest.h"
+#include "ModulePath.h"
+#include "UniqueHandle.h"
 
 #include <memory>
 
@@ -14,13 +16,6 @@ struct Outcome
     std::string debugOutput;
     std::string marks; ///< how far it came
 };
-
-struct CloseAHandle
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE handle) const { CloseHandle(handle); }
-};
-using UniqueHandle = std::unique_ptr<HANDLE, CloseAHandle>;
 
 /// Listens to the debug output of all processes, as a monitor program does. (A debugger proper would not do: a library
 /// that throws and catches while it is loaded does not survive one under Wine.)
@@ -68,9 +63,8 @@ protected:
     {
         const std::filesystem::path marker = m_config.Path() / L"marks";
         SetEnvironmentVariableW(L"ORVIX_END_MARKER", marker.c_str());
-        std::wstring program(MAX_PATH, L'\0');
-        program.resize(GetModuleFileNameW(nullptr, program.data(), static_cast<DWORD>(program.size())));
-        program = (std::filesystem::path(program).parent_path() / L"discovering_process.exe").wstring();
+        const std::filesystem::path program =
+            std::filesystem::path(ModulePath(nullptr)).parent_path() / L"discovering_process.exe";
 
         DebugOutput debugOutput;
         STARTUPINFOW startup = {};

@@ -1,4 +1,5 @@
 #include "InstalledTest.h"
+#include "ModulePath.h"
 
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -28,13 +29,6 @@ public:
 private:
     std::wstring m_previous;
 };
-
-std::wstring ModulePath(const wchar_t* name)
-{
-    std::wstring path(1024, L'\0');
-    path.resize(GetModuleFileNameW(GetModuleHandleW(name), path.data(), static_cast<DWORD>(path.size())));
-    return path;
-}
 
 /// Every operation that needs the library fails; without an open project the status does not.
 void ExpectNotAvailable(IOrvixProvider& provider, OrvixClientInfo& info)
@@ -122,7 +116,7 @@ TEST_F(InstalledLibrary, IsLoadedUnderOrvixCoresManifest)
     EXPECT_EQ(provider->Initialize(&m_info), 0);
     ASSERT_TRUE(GetCurrentActCtx(&after));
     EXPECT_EQ(before, after);
-    const std::wstring core = ModulePath(L"OrvixCore.dll");
+    const std::wstring core = ModulePath(GetModuleHandleW(L"OrvixCore.dll"));
     EXPECT_EQ(CompareStringOrdinal(m_scc.manifestAtLoad.c_str(), -1, core.c_str(), -1, TRUE), CSTR_EQUAL)
         << std::filesystem::path(m_scc.manifestAtLoad);
 }

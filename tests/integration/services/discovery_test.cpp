@@ -1,3 +1,4 @@
+#include "ModulePath.h"
 #include "ServicesTest.h"
 
 namespace
@@ -26,13 +27,6 @@ Names NamesInSearchOrder(const std::filesystem::path& folder)
     } while (FindNextFileW(search, &found));
     FindClose(search);
     return names;
-}
-
-std::wstring ModulePath(HMODULE module)
-{
-    std::wstring path(1024, L'\0');
-    path.resize(GetModuleFileNameW(module, path.data(), static_cast<DWORD>(path.size())));
-    return path;
 }
 
 } // namespace
