@@ -53,8 +53,6 @@ class ReadingPlace
 public:
     explicit ReadingPlace(ReadingLog* log) : m_log(log) {}
 
-    ReadingLog* Log() const { return m_log; }
-
     void EnterItem()
     {
         ++m_item;

@@ -3,6 +3,7 @@
 #include "FilePath.h"
 #include "InstalledProviders.h"
 #include "IsolatedLoad.h"
+#include "SccFunctions.h"
 #include "ToolError.h"
 
 #include <algorithm>
@@ -73,7 +74,7 @@ void CheckLibrary(const std::wstring& path)
     {
         throw ToolError(ExitCode::NoProject, L"not a 64-bit library: " + path);
     }
-    if (GetProcAddress(module.get(), "SccGetVersion") == nullptr)
+    if (GetProcAddress(module.get(), SccFunctions::GetVersion.name) == nullptr)
     {
         throw ToolError(ExitCode::NoProject, L"no MSSCCI library, it has no SccGetVersion: " + path);
     }

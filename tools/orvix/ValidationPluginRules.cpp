@@ -28,7 +28,8 @@ void PluginRules::Exports(ValidationSubject& subject)
 void PluginRules::Version(ValidationSubject& subject)
 {
     const ValidationLibrary library(subject);
-    const std::int32_t version = subject.Call("GetOrvixVersion", library.Need<std::int32_t()>("GetOrvixVersion"));
+    const std::int32_t version =
+        subject.Call(PluginCandidate::GetVersion, library.Need<std::int32_t()>(PluginCandidate::GetVersion));
     if (version != ORVIX_PLUGIN_CONTRACT_VERSION)
     {
         throw RuleBroken("GetOrvixVersion gives " + std::to_string(version));
@@ -38,11 +39,11 @@ void PluginRules::Version(ValidationSubject& subject)
 void PluginRules::Name(ValidationSubject& subject)
 {
     const ValidationLibrary library(subject);
-    auto* const getName = library.Need<const wchar_t*()>("GetOrvixProviderName");
+    auto* const getName = library.Need<const wchar_t*()>(PluginCandidate::GetName);
     std::wstring first;
     for (int request = 0; request < Requests; ++request)
     {
-        const wchar_t* const name = subject.Call("GetOrvixProviderName", getName);
+        const wchar_t* const name = subject.Call(PluginCandidate::GetName, getName);
         if (name == nullptr || *name == L'\0')
         {
             throw RuleBroken("GetOrvixProviderName gives no name");
@@ -58,12 +59,12 @@ void PluginRules::Name(ValidationSubject& subject)
 void PluginRules::Objects(ValidationSubject& subject)
 {
     const ValidationLibrary library(subject);
-    auto* const get = library.Need<IOrvixProvider*()>("GetIOrvixProvider");
-    auto* const release = library.Need<void(IOrvixProvider*)>("ReleaseIOrvixProvider");
+    auto* const get = library.Need<IOrvixProvider*()>(PluginCandidate::GetProvider);
+    auto* const release = library.Need<void(IOrvixProvider*)>(PluginCandidate::ReleaseProvider);
     IOrvixProvider* providers[Requests] = {};
     for (IOrvixProvider*& provider : providers)
     {
-        provider = subject.Call("GetIOrvixProvider", get);
+        provider = subject.Call(PluginCandidate::GetProvider, get);
         if (provider == nullptr)
         {
             throw RuleBroken("GetIOrvixProvider gives null");
@@ -76,6 +77,6 @@ void PluginRules::Objects(ValidationSubject& subject)
     }
     for (IOrvixProvider* provider : providers)
     {
-        subject.Call("ReleaseIOrvixProvider", [&] { release(provider); });
+        subject.Call(PluginCandidate::ReleaseProvider, [&] { release(provider); });
     }
 }

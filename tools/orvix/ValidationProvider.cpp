@@ -2,6 +2,8 @@
 
 #include "CommandLine.h"
 #include "InstalledProviders.h"
+#include "PluginCandidate.h"
+#include "SccFunctions.h"
 #include "Text.h"
 
 namespace
@@ -114,14 +116,14 @@ ValidationProvider::~ValidationProvider()
 void ValidationProvider::FindPlugin()
 {
     m_library.emplace(m_subject);
-    auto* const get = m_library->Need<IOrvixProvider*()>("GetIOrvixProvider");
-    m_provider = m_subject.Call("GetIOrvixProvider", get);
+    auto* const get = m_library->Need<IOrvixProvider*()>(PluginCandidate::GetProvider);
+    m_provider = m_subject.Call(PluginCandidate::GetProvider, get);
 }
 
 void ValidationProvider::FindInstalled()
 {
     const ValidationLibrary loads(m_subject);
-    loads.Need<void()>("SccGetVersion");
+    loads.Need<void()>(SccFunctions::GetVersion.name);
     m_services.reset(GetIOrvixServices());
     if (m_services)
     {

@@ -217,7 +217,8 @@ void SccRules::Exports(ValidationSubject& subject)
 void SccRules::Version(ValidationSubject& subject)
 {
     const ValidationLibrary library(subject);
-    const LONG version = subject.Call("SccGetVersion", library.Need<decltype(SccGetVersion)>("SccGetVersion"));
+    const LONG version = subject.Call(SccFunctions::GetVersion.name,
+                                      library.Need<decltype(SccGetVersion)>(SccFunctions::GetVersion.name));
     if (HIWORD(version) != 1 || LOWORD(version) > 3)
     {
         throw RuleBroken("SccGetVersion gives " + Hexadecimal(static_cast<unsigned long>(version)));
