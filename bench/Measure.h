@@ -32,7 +32,7 @@ public:
 };
 
 void BenchLists(MeasureTable& table);
-void BenchMssccci(MeasureTable& table);
+void BenchMsscci(MeasureTable& table);
 void BenchFiles(MeasureTable& table);
 void BenchNotifications(MeasureTable& table);
 void BenchDialogs(MeasureTable& table);

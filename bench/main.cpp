@@ -4,7 +4,7 @@
 int main()
 {
     MeasureTable table;
-    BenchMssccci(table);
+    BenchMsscci(table);
     BenchLists(table);
     BenchFiles(table);
     BenchNotifications(table);

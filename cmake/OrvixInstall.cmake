@@ -6,7 +6,7 @@ install(TARGETS OrvixCore OrvixCoreUI braeutil MSSCCI BuildOptions EXPORT OrvixC
   ARCHIVE DESTINATION lib
   INCLUDES DESTINATION include)
 install(TARGETS orvix RUNTIME DESTINATION bin)
-install(FILES $<TARGET_FILE:archive_mssccci> DESTINATION bin)
+install(FILES $<TARGET_FILE:archive_msscci> DESTINATION bin)
 install(FILES $<TARGET_FILE:archive> DESTINATION bin/plugins)
 
 install(DIRECTORY include/ companions/braeutil/include/ DESTINATION include

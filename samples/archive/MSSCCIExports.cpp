@@ -1,4 +1,4 @@
-// The 21 functions of MSSCCI; archive_mssccci.def exports them under their plain names. Each is a barrier that no
+// The 21 functions of MSSCCI; archive_msscci.def exports them under their plain names. Each is a barrier that no
 // exception passes, around one call of the session that its context leads to.
 
 #include "ArchiveScc.h"

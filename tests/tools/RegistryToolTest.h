@@ -18,7 +18,7 @@ protected:
     OrvixTool::Result Unregister(const std::wstring& name) { return RunExactly({L"unregister", name}); }
 
     /// What `orvix providers` says of installed libraries.
-    OrvixTool::Result Providers() { return Run({L"providers", L"--sources", L"mssccci"}); }
+    OrvixTool::Result Providers() { return Run({L"providers", L"--sources", L"msscci"}); }
 
     /// The path that is registered for a name.
     static std::optional<std::wstring> Path(const std::wstring& name)

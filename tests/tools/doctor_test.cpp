@@ -78,7 +78,7 @@ std::string SystemMessage(DWORD error)
 /// A library with every function of the interface.
 std::wstring Complete()
 {
-    return std::filesystem::path(ORVIX_TOOL).replace_filename(L"archive_mssccci.dll").make_preferred().wstring();
+    return std::filesystem::path(ORVIX_TOOL).replace_filename(L"archive_msscci.dll").make_preferred().wstring();
 }
 
 /// A recording library, which starts in a test program alone.
@@ -301,7 +301,7 @@ TEST_F(DoctorTest, ListsWhatTheLibraryLists)
         }
     }
     EXPECT_EQ(index, 4);
-    EXPECT_EQ(Run({L"providers", L"--sources", L"plugins,mssccci", L"--plugins", Plugins().wstring()}).output,
+    EXPECT_EQ(Run({L"providers", L"--sources", L"plugins,msscci", L"--plugins", Plugins().wstring()}).output,
               expected);
 }
 
@@ -360,7 +360,7 @@ TEST_F(DoctorTest, LooksOnlyWhereItIsTold)
     const Json plugins = Report({L"--sources", L"plugins"});
     EXPECT_EQ(plugins["candidates"].size(), 1u);
     EXPECT_THAT(CodesOf(Place(plugins, "settings file")), IsEmpty()) << "it may belong to what was not looked at";
-    EXPECT_EQ(Report({L"--sources", L"mssccci"})["candidates"].size(), 1u);
+    EXPECT_EQ(Report({L"--sources", L"msscci"})["candidates"].size(), 1u);
 }
 
 TEST_F(DoctorTest, ChangesNothingAndMakesNoConfigurationFolder)
@@ -642,7 +642,7 @@ TEST_F(DoctorOnRegistrations, WarnOfATextThatEndsEveryHostAndLiveOn)
         EXPECT_THAT(TextOf(candidate, "ends-host"), testing::StartsWith(std::string(what) + " has exactly 2048 bytes"));
     }
     EXPECT_EQ(Candidate(report, "4 good")["listed"], true);
-    EXPECT_NE(Run({L"providers", L"--sources", L"mssccci"}).code, Success) << "the danger is real";
+    EXPECT_NE(Run({L"providers", L"--sources", L"msscci"}).code, Success) << "the danger is real";
 }
 
 TEST_F(DoctorOnRegistrations, SayThatALibraryThatIsListedIsNotThere)

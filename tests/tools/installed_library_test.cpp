@@ -19,7 +19,7 @@ protected:
 
     OrvixTool::Result RunInstalled(Arguments arguments)
     {
-        arguments.insert(arguments.begin(), {L"--sources", L"mssccci"});
+        arguments.insert(arguments.begin(), {L"--sources", L"msscci"});
         return Run(std::move(arguments));
     }
 
@@ -43,7 +43,7 @@ TEST_F(InstalledLibrary, IsNotLookedForUnlessAskedFor)
 
 TEST_F(InstalledLibrary, FollowsThePluginsInWhateverOrderTheSourcesAreNamed)
 {
-    for (const wchar_t* both : {L"plugins,mssccci", L"mssccci,plugins"})
+    for (const wchar_t* both : {L"plugins,msscci", L"msscci,plugins"})
     {
         EXPECT_EQ(Run({L"providers", L"--sources", both}).output, "Index  Provider\n0      Archive\n1      Talking\n");
     }
@@ -54,7 +54,7 @@ TEST_F(InstalledLibrary, NeedsNoPluginFolder)
     const auto result = RunInstalled({L"providers", L"--plugins", L"nowhere"});
     EXPECT_EQ(result.code, Success);
     EXPECT_EQ(result.output, "Index  Provider\n0      Talking\n");
-    EXPECT_EQ(Run({L"providers", L"--plugins", L"nowhere", L"--sources", L"plugins,mssccci"}).code, NoProject);
+    EXPECT_EQ(Run({L"providers", L"--plugins", L"nowhere", L"--sources", L"plugins,msscci"}).code, NoProject);
 }
 
 TEST_F(InstalledLibrary, OpensAndClosesAProject)

@@ -123,11 +123,11 @@ TEST_F(ProviderCommand, BadUsageIsExplainedAndDoesNothing)
 TEST_F(ProviderCommand, SourcesTakesOnlyTheTwoNames)
 {
     for (const wchar_t* list :
-         {L"", L"plugin", L"PLUGINS", L"1", L"plugins,", L"plugins;mssccci", L"plugins,mssccci,x", L"plugins,plugins"})
+         {L"", L"plugin", L"PLUGINS", L"1", L"plugins,", L"plugins;msscci", L"plugins,msscci,x", L"plugins,plugins"})
     {
         const auto result = Run({L"providers", L"--sources", list});
         EXPECT_EQ(result.code, BadUsage);
-        EXPECT_THAT(result.errors, HasSubstr("orvix: --sources takes plugins, mssccci or both with a comma between"));
+        EXPECT_THAT(result.errors, HasSubstr("orvix: --sources takes plugins, msscci or both with a comma between"));
     }
     EXPECT_EQ(Run({L"providers", L"--sources"}).code, BadUsage);
 }

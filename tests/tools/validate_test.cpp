@@ -60,7 +60,7 @@ protected:
 
     OrvixTool::Result ValidateLibrary(const std::filesystem::path& library, unsigned long code, Arguments more = {})
     {
-        more.insert(more.begin(), L"--mssccci");
+        more.insert(more.begin(), L"--msscci");
         return ValidatePlugin(library, code, std::move(more));
     }
 

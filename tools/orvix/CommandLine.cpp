@@ -144,9 +144,9 @@ constexpr struct
     std::uint32_t bits;
 } SourceLists[] = {
     {"plugins", Source::Plugins},
-    {"mssccci", Source::InstalledMSSCCI},
-    {"plugins,mssccci", Source::Plugins | Source::InstalledMSSCCI},
-    {"mssccci,plugins", Source::Plugins | Source::InstalledMSSCCI},
+    {"msscci", Source::InstalledMSSCCI},
+    {"plugins,msscci", Source::Plugins | Source::InstalledMSSCCI},
+    {"msscci,plugins", Source::Plugins | Source::InstalledMSSCCI},
 };
 
 std::uint32_t Sources(const std::string& text)
@@ -155,7 +155,7 @@ std::uint32_t Sources(const std::string& text)
                                      [&](const auto& list) { return text == list.text; });
     if (found == std::end(SourceLists))
     {
-        throw ToolError(ExitCode::BadUsage, L"--sources takes plugins, mssccci or both with a comma between, not " +
+        throw ToolError(ExitCode::BadUsage, L"--sources takes plugins, msscci or both with a comma between, not " +
                                                 (text.empty() ? L"an empty text" : Unmarked(text)));
     }
     return found->bits;
@@ -189,7 +189,7 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
     app.require_subcommand(1);
     app.fallthrough();
     app.add_option("--sources", sources,
-                   "Where providers come from: plugins, mssccci or both (default: plugins; doctor: both)");
+                   "Where providers come from: plugins, msscci or both (default: plugins; doctor: both)");
     app.add_option("--plugins", plugins, "Folder of provider plug-ins (default: plugins beside the program)");
     app.add_option("--config", config, "Configuration folder (default: %APPDATA%\\OrvixCore)");
     app.add_option("--provider", provider, "Provider by name or index (default: the first)");
@@ -205,11 +205,11 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
 
     AddJson(AddCommand(app, "providers", "List the providers",
                        "  orvix providers\n"
-                       "  orvix providers --sources plugins,mssccci --json"),
+                       "  orvix providers --sources plugins,msscci --json"),
             result);
     AddJson(AddCommand(app, "doctor", "Say of every possible provider whether it is listed and why, and what is wrong",
                        "  orvix doctor\n"
-                       "  orvix doctor --sources mssccci --json"),
+                       "  orvix doctor --sources msscci --json"),
             result);
     for (const Command& command : Commands)
     {
@@ -234,14 +234,14 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
 
     AddCommand(app, "open", "Open the project and close it again", "  orvix open --project D:\\Projects\\Song");
     AddCommand(app, "options", "Show the provider's own options", "  orvix options --provider Archive");
-    AddCommand(app, "client", "Start the provider's own program", "  orvix client --sources mssccci");
+    AddCommand(app, "client", "Start the provider's own program", "  orvix client --sources msscci");
     AddCommand(app, "properties", "Show the properties of a file", "  orvix properties src\\a.txt")
         ->add_option("PATH", paths, "The file")
         ->required()
         ->expected(1)
         ->allow_extra_args(false);
     CLI::App* registering = AddCommand(app, "register", "Register an MSSCCI library on this machine",
-                                       "  orvix register archive_mssccci.dll \"Archive MSSCCI\"");
+                                       "  orvix register archive_msscci.dll \"Archive MSSCCI\"");
     registering->add_option("PATH", paths, "The library, a 64-bit DLL")
         ->required()
         ->expected(1)
@@ -252,9 +252,9 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
         ->required();
     CLI::App* validating = AddCommand(app, "validate", "Check a provider plug-in or an MSSCCI library",
                                       "  orvix validate plugins\\depot.dll\n"
-                                      "  orvix validate depot_mssccci.dll --mssccci --json");
+                                      "  orvix validate depot_msscci.dll --msscci --json");
     validating->add_option("PATH", paths, "The plug-in or library")->required()->expected(1)->allow_extra_args(false);
-    validating->add_flag("--mssccci", result.mssccci, "It is an MSSCCI library");
+    validating->add_flag("--msscci", result.msscci, "It is an MSSCCI library");
     validating->add_flag("--dialogs", result.dialogs, "Check also what may show windows");
     validating->add_option("--timeout", result.timeout, "Seconds that a rule may take (default: 30)")
         ->check(CLI::Range(1, 3600));

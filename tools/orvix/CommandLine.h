@@ -37,7 +37,7 @@ struct CommandLine
     bool verbose = false;
 
     // Of validate.
-    bool mssccci = false;
+    bool msscci = false;
     bool dialogs = false;
     unsigned int timeout = 30; ///< seconds
 

@@ -64,7 +64,7 @@ class Document
 {
 public:
     Document(const std::wstring& library, bool isMSSCCI)
-        : m_document{{"library", Utf8(library)}, {"kind", isMSSCCI ? "mssccci" : "plugin"}}
+        : m_document{{"library", Utf8(library)}, {"kind", isMSSCCI ? "msscci" : "plugin"}}
     {
         m_document["rules"] = nlohmann::ordered_json::array();
     }
@@ -101,7 +101,7 @@ ExitCode ValidateCommand::Run()
     }
     if (m_commandLine.json)
     {
-        Document document(library, m_commandLine.mssccci);
+        Document document(library, m_commandLine.msscci);
         return Run(library, document);
     }
     const Terminal terminal;
@@ -112,8 +112,8 @@ ExitCode ValidateCommand::Run()
 template <class Report>
 ExitCode ValidateCommand::Run(const std::wstring& library, Report& report)
 {
-    const unsigned int kind = m_commandLine.mssccci ? ValidationRule::MSSCCI : ValidationRule::Plugin;
-    const ValidationProcess process(library, m_commandLine.mssccci, std::chrono::seconds(m_commandLine.timeout));
+    const unsigned int kind = m_commandLine.msscci ? ValidationRule::MSSCCI : ValidationRule::Plugin;
+    const ValidationProcess process(library, m_commandLine.msscci, std::chrono::seconds(m_commandLine.timeout));
     std::vector<const ValidationRule*> rules;
     for (const ValidationRule& rule : ValidationRule::All())
     {

@@ -20,7 +20,7 @@ using Verdict = ValidationResult::Verdict;
 constexpr wchar_t ChildArgument[] = L"--validate-rule"; // RULE KIND LIBRARY SCRATCH PIPE
 constexpr int ChildArguments = 7;
 constexpr wchar_t PluginKind[] = L"plugin";
-constexpr wchar_t MSSCCIKind[] = L"mssccci";
+constexpr wchar_t MSSCCIKind[] = L"msscci";
 
 constexpr DWORD PipeSize = 65536;
 constexpr DWORD PollMilliseconds = 50; // between two readings of the pipe

@@ -21,7 +21,7 @@
 namespace
 {
 
-constexpr wchar_t IdleLibrary[] = L"idle_mssccci.dll";
+constexpr wchar_t IdleLibrary[] = L"idle_msscci.dll";
 constexpr wchar_t InstalledKey[] = L"Software\\SourceCodeControlProvider\\InstalledSCCProviders";
 constexpr wchar_t ProvidersKey[] = L"Software\\OrvixCore bench";
 
@@ -37,10 +37,10 @@ std::filesystem::path ProgramFolder()
 }
 
 /// A provider over the library that does nothing, with an open project.
-class IdleMssccci
+class IdleMsscci
 {
 public:
-    IdleMssccci()
+    IdleMsscci()
     {
         auto bridge = std::make_unique<OrvixMSSCC>();
         bridge->SetProvider((ProgramFolder() / IdleLibrary).c_str(), L"", L"Idle", false);
@@ -82,7 +82,7 @@ SIZE_T MemoryNow()
 }
 
 /// Peak memory of a query, which is during the library's call.
-void ReportMemory(IdleMssccci& mssccci, HMODULE library)
+void ReportMemory(IdleMsscci& msscci, HMODULE library)
 {
     constexpr unsigned int Count = 100000;
     const auto list = MakeActiveList(Count);
@@ -90,19 +90,19 @@ void ReportMemory(IdleMssccci& mssccci, HMODULE library)
     for (unsigned int i = 0; i < Count; ++i)
         bytes += std::wcslen(list->GetActiveFileEntry(i)->GetFile()) + 1;
     const SIZE_T before = MemoryNow();
-    mssccci.Provider().QueryStatus(list.get(), 0);
+    msscci.Provider().QueryStatus(list.get(), 0);
     const SIZE_T during = Export<SIZE_T()>(library, "MemoryInQuery")();
     std::printf("QueryStatus, 100,000 files: %.1f MB more than before at its peak; the narrow paths have %.1f MB\n",
                 static_cast<double>(during - before) / 1e6, static_cast<double>(bytes) / 1e6);
 }
 
 /// Milliseconds per file of a check-out.
-double CheckOutCostPerFile(IdleMssccci& mssccci, unsigned int count, unsigned int repeat)
+double CheckOutCostPerFile(IdleMsscci& msscci, unsigned int count, unsigned int repeat)
 {
     const auto list = MakeActiveList(count);
     const double time = BestTime([&] {
         for (unsigned int i = 0; i < repeat; ++i)
-            mssccci.Provider().CheckOut(list.get(), L"comment", 0);
+            msscci.Provider().CheckOut(list.get(), L"comment", 0);
     });
     return time / count / repeat;
 }
@@ -193,20 +193,20 @@ Measure InitializeFifty()
 
 } // namespace
 
-void BenchMssccci(MeasureTable& table)
+void BenchMsscci(MeasureTable& table)
 {
-    IdleMssccci mssccci;
+    IdleMsscci msscci;
     const UniqueModule library(LoadLibraryW((ProgramFolder() / IdleLibrary).c_str()));
-    ReportMemory(mssccci, library.get());
+    ReportMemory(msscci, library.get());
     const auto query = Export<decltype(SccQueryInfo)>(library.get(), "SccQueryInfo");
     for (const unsigned int count : {10000U, 100000U})
     {
         const auto list = MakeActiveList(count);
         table.Print(Compare(
             "QueryStatus through an MSSCCI library, " + std::to_string(count) + " files", 1.5,
-            [&] { mssccci.Provider().QueryStatus(list.get(), 0); }, [&] { QueryByHand(*list, query); }));
+            [&] { msscci.Provider().QueryStatus(list.get(), 0); }, [&] { QueryByHand(*list, query); }));
     }
     table.Print({"CheckOut through an MSSCCI library, time per file: 100,000 against 1,000",
-                 CheckOutCostPerFile(mssccci, 100000, 1), CheckOutCostPerFile(mssccci, 1000, 100), 1.3});
+                 CheckOutCostPerFile(msscci, 100000, 1), CheckOutCostPerFile(msscci, 1000, 100), 1.3});
     table.Print(InitializeFifty());
 }
