@@ -16,7 +16,9 @@ inline std::unique_ptr<OrvixFileList> MakeActiveList(unsigned int count)
 {
     std::unique_ptr<OrvixFileList> list(new OrvixFileList);
     for (unsigned int i = 0; i < count; ++i)
+    {
         list->CreateEntry(FileName(i).c_str(), nullptr, 1, 0);
+    }
     list->BuildActiveList(1, false);
     return list;
 }

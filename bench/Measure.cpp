@@ -38,7 +38,9 @@ double BestTime(const std::function<void()>& work, const std::function<void()>& 
 {
     double best = std::numeric_limits<double>::max();
     for (int run = 0; run < Runs; ++run)
+    {
         best = std::min(best, TimeOnce(work, prepare));
+    }
     return best;
 }
 

@@ -30,7 +30,9 @@ void Settle(HWND dialog)
     while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE))
     {
         if (!IsDialogMessageW(dialog, &message))
+        {
             DispatchMessageW(&message);
+        }
     }
 }
 
@@ -145,7 +147,9 @@ private:
     void GiveItem(LVITEMW& item) const
     {
         if ((item.mask & LVIF_TEXT) == 0)
+        {
             return;
+        }
         const Row& row = m_rows[m_shown[static_cast<std::size_t>(item.iItem)]];
         const std::wstring_view cells[] = {row.path.substr(row.name), row.path.substr(0, row.name - 1), State};
         const std::wstring_view cell = cells[item.iSubItem];

@@ -146,15 +146,19 @@ void BenchFilters(MeasureTable& table)
     std::vector<std::wstring> paths;
     paths.reserve(PathCount);
     for (int i = 0; i < PathCount; ++i)
+    {
         paths.push_back(L"c:\\project\\scenes\\level " + std::to_wstring(i / 100) + L"\\object " + std::to_wstring(i) +
                         L".mesh");
+    }
 
     volatile bool sink = false;
     table.Print(Compare(
         "IsFileExcluded, 50 filters, 100,000 paths", 1.5,
         [&] {
             for (const std::wstring& path : paths)
+            {
                 sink = config.IsFileExcluded(path.c_str(), nullptr);
+            }
         },
         [&] {
             for (const std::wstring& path : paths)
@@ -165,9 +169,13 @@ void BenchFilters(MeasureTable& table)
                 for (const auto& filter : owned)
                 {
                     for (const std::wstring& folder : filter->m_folders)
+                    {
                         excluded |= upper.starts_with(folder);
+                    }
                     for (const std::wstring& entry : filter->m_fileTypes)
+                    {
                         excluded |= type == entry;
+                    }
                 }
                 sink = excluded;
             }

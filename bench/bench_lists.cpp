@@ -21,7 +21,9 @@ std::unique_ptr<OrvixFileList> MakeTree(unsigned int count)
     {
         OrvixFileEntry* entry = list->CreateEntry(FileName(i).c_str(), i % 11 ? root : nullptr, Mask, 0);
         if (i % 11 == 0)
+        {
             root = entry;
+        }
     }
     return list;
 }
@@ -34,7 +36,9 @@ void FloorFlat(OrvixFileList& list, std::vector<OrvixFileEntry*>& active)
     {
         OrvixFileEntry* entry = list.GetFileEntry(i);
         if (entry && (entry->GetFlagsIn() & Mask))
+        {
             active.push_back(entry);
+        }
     }
 }
 
@@ -43,10 +47,14 @@ void FloorVisit(OrvixFileEntry* entry, std::vector<OrvixFileEntry*>& active)
     for (unsigned int i = 0; i < entry->NumChildren(); ++i)
     {
         if (OrvixFileEntry* child = entry->GetChild(i))
+        {
             FloorVisit(child, active);
+        }
     }
     if (entry->GetFlagsIn() & Mask)
+    {
         active.push_back(entry);
+    }
 }
 
 void FloorTree(OrvixFileList& list, std::vector<OrvixFileEntry*>& active)
@@ -55,7 +63,9 @@ void FloorTree(OrvixFileList& list, std::vector<OrvixFileEntry*>& active)
     for (unsigned int i = 0; i < list.NumRootEntries(); ++i)
     {
         if (OrvixFileEntry* root = list.GetRootEntry(i))
+        {
             FloorVisit(root, active);
+        }
     }
 }
 
@@ -112,7 +122,9 @@ double CostPerEntry(unsigned int count, unsigned int lists, bool fromRoots)
     {
         all.push_back(MakeTree(count));
         for (unsigned int i = 0; i < count; ++i)
+        {
             all.back()->GetFileEntry(i)->SetFlagsOut(i % 2 ? Fits : 0);
+        }
     }
     OrvixFileListDialogParams params;
     params.SetDialogPromptID(Prompt);
@@ -126,7 +138,9 @@ double CostPerEntry(unsigned int count, unsigned int lists, bool fromRoots)
         },
         [&] {
             for (const auto& list : all)
+            {
                 list->BuildActiveList(Mask, fromRoots);
+            }
         });
     return time / count / lists;
 }

@@ -25,7 +25,7 @@ constexpr wchar_t IdleLibrary[] = L"idle_msscci.dll";
 constexpr wchar_t InstalledKey[] = L"Software\\SourceCodeControlProvider\\InstalledSCCProviders";
 constexpr wchar_t ProvidersKey[] = L"Software\\OrvixCore bench";
 
-template <class Function>
+template <typename Function>
 Function* Export(HMODULE module, const char* name)
 {
     return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(module, name)));
@@ -88,7 +88,9 @@ void ReportMemory(IdleMsscci& msscci, HMODULE library)
     const auto list = MakeActiveList(Count);
     std::size_t bytes = 0;
     for (unsigned int i = 0; i < Count; ++i)
+    {
         bytes += std::wcslen(list->GetActiveFileEntry(i)->GetFile()) + 1;
+    }
     const SIZE_T before = MemoryNow();
     msscci.Provider().QueryStatus(list.get(), 0);
     const SIZE_T during = Export<SIZE_T()>(library, "MemoryInQuery")();
@@ -102,7 +104,9 @@ double CheckOutCostPerFile(IdleMsscci& msscci, unsigned int count, unsigned int 
     const auto list = MakeActiveList(count);
     const double time = BestTime([&] {
         for (unsigned int i = 0; i < repeat; ++i)
+        {
             msscci.Provider().CheckOut(list.get(), L"comment", 0);
+        }
     });
     return time / count / repeat;
 }
@@ -139,7 +143,9 @@ public:
                 LoadLibraryExW((PluginFolder() + L"Bench " + std::to_wstring(i) + L".dll").c_str(), nullptr, 0));
             for (const char* name :
                  {"GetOrvixVersion", "GetIOrvixProvider", "ReleaseIOrvixProvider", "GetOrvixProviderName"})
+            {
                 GetProcAddress(modules.back().get(), name);
+            }
         }
         HKEY list = nullptr;
         RegOpenKeyExW(HKEY_LOCAL_MACHINE, InstalledKey, 0, KEY_READ, &list);

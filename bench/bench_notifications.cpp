@@ -43,7 +43,9 @@ void BenchNotifications(MeasureTable& table)
         "broadcast to 10,000 callbacks, 20 times", 1.5,
         [&] {
             for (int i = 0; i < Repeat; ++i)
+            {
                 OrvixNotification::BroadcastOrvixNotification(&params);
+            }
         },
         [&] {
             for (int i = 0; i < Repeat; ++i)
@@ -51,10 +53,14 @@ void BenchNotifications(MeasureTable& table)
                 for (std::size_t j = 0; j < callbacks.size(); ++j)
                 {
                     if (callbacks[j]->Notify(&params, userData[j]) != 0)
+                    {
                         break;
+                    }
                 }
             }
         }));
     for (IOrvixNotifyCallback* callback : callbacks)
+    {
         OrvixNotification::UnRegisterOrvixNotification(callback);
+    }
 }

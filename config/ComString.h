@@ -15,7 +15,9 @@ public:
     explicit ComString(const wchar_t* text) : m_text(SysAllocString(text))
     {
         if (text && !m_text)
+        {
             throw _com_error(E_OUTOFMEMORY);
+        }
     }
     ComString(const ComString&) = delete;
     ComString& operator=(const ComString&) = delete;

@@ -17,7 +17,9 @@ public:
     {
         V_BSTR(&m_value) = SysAllocString(text);
         if (text && !V_BSTR(&m_value))
+        {
             throw _com_error(E_OUTOFMEMORY);
+        }
         V_VT(&m_value) = VT_BSTR;
     }
     explicit ComVariant(long number) : ComVariant()
@@ -30,7 +32,9 @@ public:
         V_VT(&m_value) = VT_DISPATCH;
         V_DISPATCH(&m_value) = object;
         if (object)
+        {
             object->AddRef();
+        }
     }
     ComVariant(const ComVariant&) = delete;
     ComVariant& operator=(const ComVariant&) = delete;
@@ -38,7 +42,9 @@ public:
     {
         const HRESULT result = VariantClear(&m_value);
         if (FAILED(result) && std::uncaught_exceptions() == 0)
+        {
             throw _com_error(result);
+        }
     }
 
     const VARIANT& Get() const { return m_value; }

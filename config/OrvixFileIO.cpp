@@ -25,7 +25,9 @@ ComPtr<IXMLDOMElement> AsElement(IXMLDOMNode* node)
 {
     ComPtr<IXMLDOMElement> element;
     if (node)
+    {
         node->QueryInterface(InterfaceElement, reinterpret_cast<void**>(element.GetAddressOf()));
+    }
     return element;
 }
 
@@ -39,9 +41,13 @@ std::wstring XmlText(const wchar_t* text)
     {
         const wchar_t c = result[i];
         if (isHigh(c) && i + 1 < result.size() && isLow(result[i + 1]))
+        {
             ++i;
+        }
         else if ((c < 0x20 && c != L'\t' && c != L'\n' && c != L'\r') || (c >= 0xD800 && c <= 0xDFFF) || c >= 0xFFFE)
+        {
             result[i] = 0xFFFD;
+        }
     }
     return result;
 }
@@ -52,7 +58,9 @@ bool UsesEntities(IXMLDOMDocument* document)
 {
     ComPtr<IXMLDOMDocumentType> type;
     if (document->get_doctype(&type) != S_OK || !type)
+    {
         return false;
+    }
     ComPtr<IXMLDOMElement> root;
     document->get_documentElement(&root);
     ComPtr<IXMLDOMNode> node = root;
@@ -60,7 +68,9 @@ bool UsesEntities(IXMLDOMDocument* document)
     {
         DOMNodeType kind = NODE_INVALID;
         if (SUCCEEDED(node->get_nodeType(&kind)) && kind == NODE_ENTITY_REFERENCE)
+        {
             return true;
+        }
         ComPtr<IXMLDOMNode> next;
         node->get_firstChild(&next);
         while (!next && node)
@@ -101,11 +111,15 @@ bool OrvixFileIO::CreateDocument()
 {
     if (!MakeDocument() || FAILED(m_document->QueryInterface(
                                InterfaceNode, reinterpret_cast<void**>(m_documentNode.ReleaseAndGetAddressOf()))))
+    {
         return false;
+    }
     ComPtr<IXMLDOMProcessingInstruction> declaration;
     if (FAILED(m_document->createProcessingInstruction(
             ComString(L"xml").Get(), ComString(L"version=\"1.0\" standalone=\"yes\"").Get(), &declaration)))
+    {
         return false;
+    }
     m_documentNode->appendChild(declaration.Get(), nullptr);
     return true;
 }
@@ -113,7 +127,9 @@ bool OrvixFileIO::CreateDocument()
 bool OrvixFileIO::OpenDocument(const wchar_t* path)
 {
     if (!MakeDocument())
+    {
         return false;
+    }
     m_document->put_async(VARIANT_FALSE);
     m_document->put_validateOnParse(VARIANT_FALSE);
     m_document->put_resolveExternals(VARIANT_FALSE);
@@ -131,7 +147,9 @@ bool OrvixFileIO::OpenDocument(const wchar_t* path)
     }
     if (FAILED(m_document->QueryInterface(InterfaceNode,
                                           reinterpret_cast<void**>(m_documentNode.ReleaseAndGetAddressOf()))))
+    {
         return false;
+    }
     m_rootNode = m_documentNode;
     return true;
 }
@@ -160,7 +178,9 @@ bool OrvixFileIO::GetRootElement(Node& root, std::wstring& name)
 {
     ComPtr<IXMLDOMElement> element;
     if (!m_document || FAILED(m_document->get_documentElement(&element)) || !element)
+    {
         return false;
+    }
     root = element;
     return GetNodeName(root.Get(), name);
 }
@@ -170,7 +190,9 @@ long OrvixFileIO::NumChildNodes(IXMLDOMNode* node)
     ComPtr<IXMLDOMNodeList> children;
     long length = 0;
     if (SUCCEEDED(node->get_childNodes(&children)) && children)
+    {
         children->get_length(&length);
+    }
     return length;
 }
 
@@ -180,7 +202,9 @@ bool OrvixFileIO::GetChildNode(IXMLDOMNode* parent, long index, Node& child)
     ComPtr<IXMLDOMNodeList> children;
     long length = 0;
     if (!node || FAILED(node->get_childNodes(&children)) || !children)
+    {
         return false;
+    }
     children->get_length(&length);
     return index >= 0 && index < length && SUCCEEDED(children->get_item(index, child.ReleaseAndGetAddressOf())) &&
            child;
@@ -205,7 +229,9 @@ bool OrvixFileIO::GetNodeName(IXMLDOMNode* node, std::wstring& name)
     const ComPtr<IXMLDOMElement> element = AsElement(node);
     ComString text;
     if (!element || FAILED(element->get_nodeName(text.Out())) || !text.Get())
+    {
         return false;
+    }
     name = text.View();
     return true;
 }
@@ -215,7 +241,9 @@ bool OrvixFileIO::GetNodeText(IXMLDOMNode* node, std::wstring& text)
     // An element may declare a data type: its typed value is then no string.
     ComVariant value;
     if (FAILED(node->get_nodeTypedValue(value.Out())) || !value.String())
+    {
         return false;
+    }
     text.assign(value.String(), SysStringLen(value.String()));
     return true;
 }
@@ -235,11 +263,15 @@ bool OrvixFileIO::FindChildTexts(IXMLDOMNode* node, std::span<const std::wstring
     {
         ComString name;
         if (FAILED(child->get_nodeName(name.Out())))
+        {
             continue;
+        }
         for (std::size_t i = 0; i < names.size(); ++i)
         {
             if ((missing >> i & 1) && name.View() == names[i] && GetNodeText(child.Get(), texts[i]))
+            {
                 missing &= ~(1U << i);
+            }
         }
     }
     return missing == 0;
@@ -252,9 +284,13 @@ bool OrvixFileIO::AddElement(IXMLDOMNode* parent, const wchar_t* name, Node& ele
     m_document->createNode(ComVariant(ElementType).Get(), ComString(name).Get(), nullptr, &created);
     Node first;
     if (insertFirst && GetFirstChild(node, first))
+    {
         node->insertBefore(created.Get(), ComVariant(first.Get()).Get(), element.ReleaseAndGetAddressOf());
+    }
     else
+    {
         node->appendChild(created.Get(), element.ReleaseAndGetAddressOf());
+    }
     return true;
 }
 
@@ -268,7 +304,9 @@ bool OrvixFileIO::AddTextElement(IXMLDOMNode* parent, const wchar_t* name, const
 bool OrvixFileIO::AppendText(IXMLDOMNode* element, const wchar_t* text)
 {
     if (!AsElement(element))
+    {
         return false;
+    }
     ComPtr<IXMLDOMText> textNode;
     m_document->createTextNode(ComString(XmlText(text).c_str()).Get(), &textNode);
     element->appendChild(textNode.Get(), nullptr);
@@ -279,7 +317,9 @@ bool OrvixFileIO::SetAttribute(IXMLDOMNode* node, const wchar_t* name, const wch
 {
     const ComPtr<IXMLDOMElement> element = AsElement(node);
     if (!element)
+    {
         return false;
+    }
     element->setAttribute(ComString(name).Get(), ComVariant(value).Get());
     return true;
 }

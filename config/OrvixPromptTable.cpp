@@ -8,7 +8,9 @@ OrvixPromptTable::~OrvixPromptTable() = default;
 int OrvixPromptTable::AddPrompt(int id, const wchar_t* text, unsigned long options, unsigned long prompt, bool locked)
 {
     if (!text)
+    {
         return -1;
+    }
     const std::size_t count = m_ids.size();
     const bool added = WithBarrier(false, [&] {
         m_ids.push_back(id);
@@ -52,7 +54,9 @@ int OrvixPromptTable::GetPromptID(unsigned int index)
 bool OrvixPromptTable::SetPromptID(unsigned int index, int id)
 {
     if (index >= m_ids.size())
+    {
         return false;
+    }
     m_ids[index] = id;
     return true;
 }
@@ -75,7 +79,9 @@ unsigned long OrvixPromptTable::GetPromptOptions(unsigned int index)
 bool OrvixPromptTable::SetPromptOptions(unsigned int index, unsigned long options)
 {
     if (index >= m_options.size())
+    {
         return false;
+    }
     m_options[index] = options;
     return true;
 }
@@ -88,7 +94,9 @@ unsigned long OrvixPromptTable::GetPrompt(unsigned int index)
 bool OrvixPromptTable::SetPrompt(unsigned int index, unsigned long prompt)
 {
     if (index >= m_prompts.size())
+    {
         return false;
+    }
     m_prompts[index] = prompt;
     return true;
 }
@@ -101,7 +109,9 @@ bool OrvixPromptTable::GetLocked(unsigned int index)
 bool OrvixPromptTable::SetLocked(unsigned int index, bool locked)
 {
     if (index >= m_locked.size())
+    {
         return false;
+    }
     m_locked[index] = locked;
     return true;
 }

@@ -5,17 +5,23 @@
 FileExclusion OrvixProviderConfig::FindExclusion(const wchar_t* path) const
 {
     if (!path)
+    {
         return {};
+    }
     const FilteredPath filteredPath(path);
     const ProviderFilters* previous = nullptr;
     for (const ProviderFilters* filter : m_filters)
     {
         // The same filter again gives the same answer.
         if (filter == previous)
+        {
             continue;
+        }
         previous = filter;
         if (const Exclusion reason = filter->Judge(filteredPath); reason != Exclusion::None)
+        {
             return {filter, reason};
+        }
     }
     return {};
 }
@@ -25,7 +31,9 @@ bool OrvixProviderConfig::IsFileExcluded(const wchar_t* path, std::wstring* filt
     return WithBarrier(false, [&] {
         const FileExclusion exclusion = FindExclusion(path);
         if (exclusion.filter && filterName)
+        {
             *filterName = exclusion.filter->m_name;
+        }
         return exclusion.filter != nullptr;
     });
 }

@@ -32,7 +32,7 @@ bool IsNamed(const std::wstring& name, const wchar_t* wanted)
 }
 
 /// Calls `visit(name, child)` for every child element until it returns false.
-template <class Visit>
+template <typename Visit>
 void ForEachElement(OrvixFileIO& file, IXMLDOMNode* parent, Visit&& visit)
 {
     OrvixFileIO::Node child;
@@ -40,19 +40,23 @@ void ForEachElement(OrvixFileIO& file, IXMLDOMNode* parent, Visit&& visit)
     for (bool more = file.GetFirstChild(parent, child); more; more = file.GetNextSibling(child))
     {
         if (file.GetNodeName(child.Get(), name) && !visit(name, child.Get()))
+        {
             return;
+        }
     }
 }
 
 /// Calls `visit(name, text, child)` for every child element whose name and text can be read, until it
 /// returns false.
-template <class Visit>
+template <typename Visit>
 void ForEachReadableElement(OrvixFileIO& file, IXMLDOMNode* parent, const ReadingPlace& place, Visit&& visit)
 {
     std::wstring text;
     ForEachElement(file, parent, [&](const std::wstring& name, IXMLDOMNode* child) {
         if (file.GetNodeText(child, text))
+        {
             return visit(name, text, child);
+        }
         place.Remark(Why::NoText, name.c_str());
         return true;
     });
@@ -63,9 +67,13 @@ bool IsFirstChoice(const std::wstring& element, const std::wstring& text, const 
                    const ReadingPlace& place)
 {
     if (IsNamed(text, first))
+    {
         return true;
+    }
     if (!IsNamed(text, second))
+    {
         place.Remark(Why::UnknownValue, element.c_str(), text.c_str(), second);
+    }
     return false;
 }
 
@@ -82,7 +90,9 @@ void ReadFilter(OrvixFileIO& file, IXMLDOMNode* node, OrvixProviderConfig& confi
                                {
                                    filter->m_name = text;
                                    if (owned)
+                                   {
                                        reading.filters.push_back(std::move(owned));
+                                   }
                                }
                                else if (owned)
                                {
@@ -90,18 +100,28 @@ void ReadFilter(OrvixFileIO& file, IXMLDOMNode* node, OrvixProviderConfig& confi
                                    return false;
                                }
                                else if (IsNamed(name, L"Type"))
+                               {
                                    filter->m_exclude = IsFirstChoice(name, text, L"exclude", L"include", reading.place);
+                               }
                                else if (IsNamed(name, L"Folder"))
+                               {
                                    filter->m_folders.push_back(UpperCase(text));
+                               }
                                else if (IsNamed(name, L"FileType"))
+                               {
                                    filter->m_fileTypes.push_back(UpperCase(text));
+                               }
                                else
+                               {
                                    reading.place.Remark(Why::UnknownElement, name.c_str());
+                               }
                                config.m_filters.push_back(filter);
                                return true;
                            });
     if (owned)
+    {
         reading.place.Remark(dropped);
+    }
 }
 
 /// Reads one provider; it is kept when it has a name.
@@ -118,17 +138,29 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
                                    writtenName = text;
                                }
                                else if (IsNamed(name, L"Enabled"))
+                               {
                                    config->m_enabled = !IsFirstChoice(name, text, L"false", L"true", reading.place);
+                               }
                                else if (IsNamed(name, L"FixedProjectRoot"))
+                               {
                                    config->m_fixedProjectRoot = text;
+                               }
                                else if (IsNamed(name, L"AltProviderExecutable"))
+                               {
                                    config->m_altProviderExecutable = text;
+                               }
                                else if (IsNamed(name, L"MSSCCProjectFile"))
+                               {
                                    config->m_msSccProjectFile = text;
+                               }
                                else if (IsNamed(name, L"MSSCCDllSearchPath"))
+                               {
                                    config->m_msSccDllSearchPath = text;
+                               }
                                else if (IsNamed(name, L"MSSCCDllFullPath"))
+                               {
                                    config->m_msSccDllFullPath = text;
+                               }
                                else if (IsNamed(name, L"Filters"))
                                {
                                    ForEachElement(file, child, [&](const std::wstring&, IXMLDOMNode* filter) {
@@ -139,7 +171,9 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
                                    reading.place.LeaveFilter();
                                }
                                else
+                               {
                                    reading.place.Remark(Why::UnknownElement, name.c_str());
+                               }
                                return true;
                            });
     if (writtenName)
@@ -168,11 +202,15 @@ OrvixProviderConfigManager::~OrvixProviderConfigManager() = default;
 bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log)
 {
     if (!path)
+    {
         return false;
+    }
     return WithXmlBarrier(false, [&] {
         OrvixFileIO file;
         if (!file.OpenDocument(path))
+        {
             return false;
+        }
         const OpenedDocument opened(file);
         OrvixFileIO::Node root;
         std::wstring rootName;
@@ -184,7 +222,9 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log
             log->root = rootName;
         }
         if (!hasRoot)
+        {
             return false;
+        }
 
         Reading reading{{}, {}, ReadingPlace(log)};
         ForEachElement(file, root.Get(), [&](const std::wstring&, IXMLDOMNode* provider) {
@@ -196,9 +236,13 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log
         // From here on nothing throws, and what was read lives until the process ends.
         m_configs.reserve(m_configs.size() + reading.configs.size());
         for (auto& config : reading.configs)
+        {
             m_configs.push_back(config.release());
+        }
         for (auto& filter : reading.filters)
+        {
             static_cast<void>(filter.release());
+        }
         return true;
     });
 }
@@ -206,12 +250,16 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log
 OrvixProviderConfig* OrvixProviderConfigManager::FindConfig(const wchar_t* providerName) const
 {
     if (!providerName)
+    {
         return nullptr;
+    }
     const std::wstring name = UpperCase(providerName);
     for (OrvixProviderConfig* config : m_configs)
     {
         if (Applies(*config, name))
+        {
             return config;
+        }
     }
     return nullptr;
 }

@@ -42,7 +42,9 @@ void Describe(OrvixFileIO& file, ReadingLog& log)
     log.content = file.GetContent();
     log.hasRoot = file.GetChildNode(nullptr, RootIndex, node) && file.GetNodeName(node.Get(), log.root);
     if (!log.hasRoot)
+    {
         file.GetRootElement(node, log.root);
+    }
 }
 
 /// The remarks on one node below the root.
@@ -50,23 +52,33 @@ void Explain(OrvixFileIO& file, IXMLDOMNode* prompt, ReadingPlace& place)
 {
     std::wstring text;
     if (!file.GetNodeName(prompt, text))
+    {
         return;
+    }
     place.EnterItem();
     for (const std::wstring_view name : FieldNames)
     {
         if (!file.FindChildText(prompt, name.data(), text))
+        {
             place.Remark(Why::LacksElement, name.data());
+        }
         else if (name == FieldNames[Text] && text.size() > MaxTextLength)
+        {
             place.Remark(Why::TextCut, name.data());
+        }
         else if (name == FieldNames[Locked] && !IsUnlocked(text) && _wcsicmp(text.c_str(), L"true") != 0)
+        {
             place.Remark(Why::UnknownValue, name.data(), text.c_str(), L"true");
+        }
     }
     OrvixFileIO::Node child;
     for (bool more = file.GetFirstChild(prompt, child); more; more = file.GetNextSibling(child))
     {
         if (file.GetNodeName(child.Get(), text) &&
             std::find(FieldNames.begin(), FieldNames.end(), text) == FieldNames.end())
+        {
             place.Remark(Why::UnknownElement, text.c_str());
+        }
     }
 }
 
@@ -74,13 +86,19 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
 {
     OrvixFileIO file;
     if (!file.OpenDocument(path))
+    {
         return false;
+    }
     const OpenedDocument opened(file);
     if (log)
+    {
         Describe(file, *log);
+    }
     OrvixFileIO::Node root;
     if (!file.GetChildNode(nullptr, RootIndex, root))
+    {
         return false;
+    }
 
     ReadingPlace place(log);
     std::array<std::wstring, NumFields> fields;
@@ -88,16 +106,24 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
     for (bool more = file.GetFirstChild(root.Get(), prompt); more; more = file.GetNextSibling(prompt))
     {
         if (log)
+        {
             Explain(file, prompt.Get(), place);
+        }
         if (!file.FindChildTexts(prompt.Get(), FieldNames, fields))
+        {
             continue;
+        }
         if (fields[Text].size() > MaxTextLength)
+        {
             fields[Text].resize(MaxTextLength);
+        }
         const int id = _wtoi(fields[Id].c_str());
         const auto options = static_cast<unsigned long>(_wtoi(fields[ActionOpts].c_str()));
         const auto action = static_cast<unsigned long>(_wtoi(fields[Action].c_str()));
         if (table.AddPrompt(id, fields[Text].c_str(), options, action, !IsUnlocked(fields[Locked])) < 0)
+        {
             throw std::bad_alloc();
+        }
     }
     return true;
 }
@@ -127,29 +153,39 @@ bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path, ReadingLog* lo
 bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
 {
     if (table.NumPrompts() == 0)
+    {
         return true;
+    }
     OrvixFileIO file;
     if (!file.CreateDocument())
+    {
         return false;
+    }
     const OpenedDocument opened(file);
     OrvixFileIO::Node root;
     file.AddElement(nullptr, PromptFileRoot, root, false);
     if (!root)
+    {
         return false;
+    }
     file.SetAttribute(root.Get(), L"version", L"1.0");
     for (unsigned int i = 0; i < static_cast<unsigned int>(table.NumPrompts()); ++i)
     {
         OrvixFileIO::Node prompt;
         file.AddElement(root.Get(), L"Prompt", prompt, false);
         if (!prompt)
+        {
             return false;
+        }
         const std::array<std::wstring, NumFields> values = {
             table.GetPromptText(i), std::to_wstring(table.GetPromptID(i)), table.GetLocked(i) ? L"true" : L"false",
             Decimal(table.GetPromptOptions(i)), Decimal(table.GetPrompt(i))};
         for (std::size_t field = 0; field < NumFields; ++field)
         {
             if (!file.AddTextElement(prompt.Get(), FieldNames[field].data(), values[field].c_str()))
+            {
                 return false;
+            }
         }
     }
     return file.SaveDocument(path);

@@ -26,7 +26,9 @@ bool IsAscii(std::wstring_view text)
 bool IsSameType(std::wstring_view type, std::wstring_view pathType)
 {
     if (type.size() != pathType.size())
+    {
         return false;
+    }
     return type == pathType || (!(IsAscii(type) && IsAscii(pathType)) && _wcsicmp(type.data(), pathType.data()) == 0);
 }
 
@@ -37,7 +39,9 @@ FilteredPath::FilteredPath(const wchar_t* path) : text(UpperCase(path))
     const std::size_t dot = text.rfind(L'.');
     hasType = dot != std::wstring::npos;
     if (hasType)
+    {
         type = std::wstring_view(text).substr(dot + 1);
+    }
 }
 
 Exclusion ProviderFilters::Judge(const FilteredPath& path) const
@@ -47,10 +51,14 @@ Exclusion ProviderFilters::Judge(const FilteredPath& path) const
         const bool inFolder = std::any_of(m_folders.begin(), m_folders.end(),
                                           [&](const std::wstring& folder) { return StartsWith(path.text, folder); });
         if (inFolder == m_exclude)
+        {
             return Exclusion::ByFolder;
+        }
     }
     if (m_fileTypes.empty() || !path.hasType)
+    {
         return Exclusion::None;
+    }
     const bool hasType = std::any_of(m_fileTypes.begin(), m_fileTypes.end(),
                                      [&](const std::wstring& type) { return IsSameType(type, path.type); });
     return hasType == m_exclude ? Exclusion::ByType : Exclusion::None;

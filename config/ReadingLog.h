@@ -65,13 +65,17 @@ public:
                 const wchar_t* countsAs = L"") const
     {
         if (m_log)
+        {
             m_log->remarks.push_back({why, m_item, m_filter, element, text, countsAs});
+        }
     }
 
     void Use(const OrvixProviderConfig* config, const std::wstring& name) const
     {
         if (m_log)
+        {
             m_log->providers.push_back({config, m_item, name});
+        }
     }
 
 private:

@@ -17,7 +17,9 @@ public:
             m_saved.resize(std::min(GetDllDirectoryW(size, m_saved.data()), size));
         }
         if (!folder.empty())
+        {
             SetDllDirectoryW(folder.c_str());
+        }
     }
     DllDirectoryScope(const DllDirectoryScope&) = delete;
     DllDirectoryScope& operator=(const DllDirectoryScope&) = delete;

@@ -5,7 +5,7 @@
 #include <utility>
 
 /// The barrier at the exported edge: runs `body` and gives its result, or `onFailure` when anything is thrown.
-template <class Result, class Body>
+template <typename Result, typename Body>
 Result WithBarrier(Result onFailure, Body&& body)
 {
     try
@@ -19,7 +19,7 @@ Result WithBarrier(Result onFailure, Body&& body)
 }
 
 /// The barrier around what reads or writes an XML file: a COM error (`_com_error`) travels on to the host.
-template <class Result, class Body>
+template <typename Result, typename Body>
 Result WithXmlBarrier(Result onFailure, Body&& body)
 {
     try

@@ -17,7 +17,9 @@ extern "C" void* __real_malloc(std::size_t size); // NOLINT(readability-identifi
 extern "C" void* __wrap_malloc(std::size_t size) // NOLINT(readability-identifier-naming)
 {
     if (!failNext)
+    {
         return __real_malloc(size);
+    }
     failNext = false;
     return nullptr;
 }

@@ -60,7 +60,9 @@ const NotificationIds* IdsFor(std::uint32_t operations)
         for (const NotificationIds& ids : Notifications)
         {
             if (operations & ids.operation)
+            {
                 return &ids;
+            }
         }
     }
     return nullptr;
@@ -78,7 +80,9 @@ std::uint32_t Broadcast(std::uint32_t id, OrvixFileList& list, bool cancelled)
 void RemoveActiveEntries(OrvixFileList& list, const std::vector<OrvixFileEntry*>& entries)
 {
     for (OrvixFileEntry* entry : entries)
+    {
         list.RemoveActiveEntry(entry);
+    }
 }
 
 } // namespace
@@ -96,17 +100,27 @@ std::int32_t FileListOperation::Run(bool callProviderFirst, std::uint32_t flagsO
     if (callProviderFirst)
     {
         if (!m_provider)
+        {
             return Cancelled;
+        }
         m_provider->QueryStatus(&m_list, 0);
     }
     if (m_list.NumActiveEntries() == 0)
+    {
         return Done;
+    }
     if (!m_provider && (m_operations & AnyProviderCall))
+    {
         return Cancelled;
+    }
     if (!KeepFittingEntries(flagsOutMask))
+    {
         return Done;
+    }
     if (NotifyBefore(false))
+    {
         return Cancelled;
+    }
 
     const Confirmation confirmation = Confirm();
     if (confirmation.result == Cancelled)
@@ -132,7 +146,9 @@ bool FileListOperation::KeepFittingEntries(std::uint32_t flagsOutMask)
     {
         OrvixFileEntry* entry = m_list.GetActiveFileEntry(i);
         if (!entry)
+        {
             continue;
+        }
         if (entry->GetFlagsOut() & flagsOutMask)
         {
             entry->SetFlagsIn(entry->GetFlagsIn() | Selected);
@@ -144,7 +160,9 @@ bool FileListOperation::KeepFittingEntries(std::uint32_t flagsOutMask)
         }
     }
     if (anyFits)
+    {
         RemoveActiveEntries(m_list, others);
+    }
     return anyFits;
 }
 
@@ -155,7 +173,9 @@ void FileListOperation::RemoveUntickedEntries()
     {
         OrvixFileEntry* entry = m_list.GetActiveFileEntry(i);
         if (entry && !(entry->GetFlagsOut() & Ticked))
+        {
             unticked.push_back(entry);
+        }
     }
     RemoveActiveEntries(m_list, unticked);
 }
@@ -164,22 +184,32 @@ void FileListOperation::RemoveUntickedEntries()
 FileListOperation::Confirmation FileListOperation::Confirm()
 {
     if (m_dialogPrompt == PromptAction::NoPrompt)
+    {
         return ShowDialog(false);
+    }
 
     const bool locked = m_services.IsPromptLocked(m_dialogPrompt);
     const std::uint32_t action = m_services.GetPromptAction(m_dialogPrompt);
     const bool ask = (action & PromptAction::Ask) != 0;
     std::uint32_t optionAction = 0;
     if (!ask && m_optionPrompt != PromptAction::NoPrompt)
+    {
         optionAction = m_services.GetPromptAction(m_optionPrompt);
+    }
     if (ask && !m_services.IsUnattended())
+    {
         return ShowDialog(locked);
+    }
 
     if (!(action & PromptAction::Answer1))
+    {
         return {Cancelled, false};
+    }
     m_mode = 4;
     if (optionAction == PromptAction::Answer2)
+    {
         m_mode = m_params.GetOptions() & OptionKeepsCheckedOut ? 5 : m_params.GetOptions() & OptionGetsLatest ? 6 : 4;
+    }
     return {Done, true};
 }
 
@@ -194,40 +224,60 @@ FileListOperation::Confirmation FileListOperation::ShowDialog(bool locked)
     {
         RemoveUntickedEntries();
         if (m_operations & Notify)
+        {
             Broadcast(FilesConfirmed, m_list, false);
+        }
         run = m_list.NumActiveEntries() > 0;
         if (run && (m_params.GetOptions() & OptionTicked))
+        {
             m_mode = m_params.GetOptions() & OptionKeepsCheckedOut ? 1
                      : m_params.GetOptions() & OptionGetsLatest    ? 2
                                                                    : m_mode;
+        }
     }
     if (m_params.GetOptions() & RememberTicked)
+    {
         StoreAnswers(result);
+    }
     return {result, run};
 }
 
 void FileListOperation::StoreAnswers(std::int32_t result)
 {
     if (m_dialogPrompt != PromptAction::NoPrompt)
+    {
         m_services.SetPromptAction(m_dialogPrompt, result == Done ? PromptAction::Answer1 : PromptAction::Answer0);
+    }
     if (m_optionPrompt != PromptAction::NoPrompt)
+    {
         m_services.SetPromptAction(m_optionPrompt, m_params.GetOptions() & OptionTicked ? PromptAction::Answer2
                                                                                         : PromptAction::Answer3);
+    }
 }
 
 void FileListOperation::CallProvider()
 {
     const wchar_t* comment = m_params.GetComment();
     if (m_operations & Add)
+    {
         m_provider->Add(&m_list, comment, m_mode);
+    }
     if (m_operations & CheckIn)
+    {
         m_provider->CheckIn(&m_list, comment, m_mode);
+    }
     if (m_operations & GetLatest)
+    {
         m_provider->GetLatest(&m_list, m_mode);
+    }
     if (m_operations & CheckOut)
+    {
         m_provider->CheckOut(&m_list, comment, m_mode);
+    }
     if (m_operations & UndoCheckOut)
+    {
         m_provider->UndoCheckOut(&m_list, m_mode);
+    }
 }
 
 /// True when a listener vetoed.
@@ -240,5 +290,7 @@ bool FileListOperation::NotifyBefore(bool cancelled)
 void FileListOperation::NotifyAfter()
 {
     if (const NotificationIds* ids = IdsFor(m_operations))
+    {
         Broadcast(ids->after, m_list, false);
+    }
 }

@@ -19,7 +19,9 @@ using Buffer = std::array<wchar_t, MaxText>;
 InstalledProviders::Step TextOf(Buffer& buffer, DWORD size, std::wstring& text)
 {
     if (size >= sizeof(buffer))
+    {
         return InstalledProviders::Step::EndsProcess;
+    }
     buffer[size / sizeof(wchar_t)] = L'\0';
     text = buffer.data();
     return InstalledProviders::Step::Found;
@@ -51,9 +53,13 @@ InstalledProviders::Step InstalledProviders::KeyPathAt(HKEY list, DWORD index, s
                                          reinterpret_cast<BYTE*>(data.data()), &dataSize);
     // A key that is deleted meanwhile answers every index with this error.
     if (status == ERROR_NO_MORE_ITEMS || status == ERROR_KEY_DELETED)
+    {
         return Step::End;
+    }
     if (status != ERROR_SUCCESS)
+    {
         return Step::Unreadable;
+    }
     return type == REG_SZ ? TextOf(data, dataSize, path) : Step::NoString;
 }
 
@@ -68,7 +74,9 @@ InstalledProviders::Step InstalledProviders::ReadText(HKEY provider, const wchar
     DWORD size = sizeof(data);
     if (RegQueryValueExW(provider, valueName, nullptr, nullptr, reinterpret_cast<BYTE*>(data.data()), &size) !=
         ERROR_SUCCESS)
+    {
         return Step::Unreadable;
+    }
     return TextOf(data, size, text);
 }
 
@@ -82,13 +90,19 @@ InstalledProviders::Candidate InstalledProviders::Judge(const std::wstring& keyP
     };
     const UniqueRegistryKey key = OpenProvider(keyPath);
     if (!key)
+    {
         return candidate;
+    }
     const Step name = ReadText(key.get(), ServerName, candidate.name);
     if (name != Step::Found)
+    {
         return reject(name, Verdict::NoName);
+    }
     candidate.config = configs.FindConfig(candidate.name.c_str());
     if (candidate.config && !candidate.config->m_enabled)
+    {
         return reject(name, Verdict::SwitchedOff);
+    }
     if (candidate.config)
     {
         candidate.searchPath = candidate.config->m_msSccDllSearchPath.substr(0, MaxSearchPath);
@@ -98,7 +112,9 @@ InstalledProviders::Candidate InstalledProviders::Judge(const std::wstring& keyP
     {
         const Step path = ReadText(key.get(), ServerPath, candidate.serverPath);
         if (path != Step::Found)
+        {
             return reject(path, Verdict::NoPath);
+        }
     }
     candidate.verdict = Verdict::Listed;
     return candidate;
@@ -109,5 +125,7 @@ void InstalledProviders::EndProcess()
     OutputDebugStringW(L"OrvixCore: the process ends: a text of an installed MSSCCI provider in the registry has 2048 "
                        L"bytes and cannot be terminated.\n");
     for (;;)
+    {
         TerminateProcess(GetCurrentProcess(), FailFast);
+    }
 }

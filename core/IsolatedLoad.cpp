@@ -18,7 +18,9 @@ public:
     ~ActivationScope()
     {
         if (m_active)
+        {
             DeactivateActCtx(0, m_cookie);
+        }
     }
 
 private:
@@ -40,7 +42,9 @@ public:
     ~SilentErrors()
     {
         if (m_changed)
+        {
             SetThreadErrorMode(m_previous, nullptr);
+        }
     }
 
 private:
@@ -63,7 +67,9 @@ ManifestContext::ManifestContext() noexcept
 ManifestContext::~ManifestContext()
 {
     if (m_context != INVALID_HANDLE_VALUE)
+    {
         ReleaseActCtx(m_context);
+    }
 }
 
 UniqueModule LoadLibraryIsolated(const wchar_t* path, const ManifestContext& context, DWORD flags) noexcept

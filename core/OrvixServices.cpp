@@ -46,10 +46,14 @@ void ReleaseIOrvixServices(IOrvixServices* services)
 bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
 {
     if (!info)
+    {
         return false;
+    }
     return WithXmlBarrier(false, [&] {
         if (const wchar_t* configPath = info->GetConfigFilePath())
+        {
             m_configFolder = std::wstring(configPath) + L'\\';
+        }
         WithXmlBarrier(false, [&] {
             return m_config.LoadConfig((m_configFolder + OrvixProviderConfigManager::FileName).c_str());
         });
@@ -82,7 +86,9 @@ OrvixServices::~OrvixServices()
         ReleaseProviders();
     }
     if (m_coreUI)
+    {
         ReleaseIOrvixCoreUI(m_coreUI);
+    }
 }
 
 void OrvixServices::ReleaseProviders()
@@ -93,9 +99,13 @@ void OrvixServices::ReleaseProviders()
     for (auto& entry : providers)
     {
         if (entry->provider && entry->isMSSCCI)
+        {
             delete entry->provider;
+        }
         else if (entry->provider && entry->releaseProvider)
+        {
             entry->releaseProvider(entry->provider);
+        }
         entry.reset();
     }
 }
@@ -113,10 +123,14 @@ const wchar_t* OrvixServices::GetProviderName(std::uint32_t index)
 IOrvixProvider* OrvixServices::GetProvider(std::uint32_t index)
 {
     if (index >= GetProviderCount())
+    {
         return nullptr;
+    }
     const OrvixProviderEntry& entry = *m_providers[index];
     if (entry.isMSSCCI)
+    {
         return entry.provider;
+    }
     return WithBarrier(static_cast<IOrvixProvider*>(nullptr), [&] { return entry.getProvider(); });
 }
 
@@ -131,18 +145,28 @@ std::int32_t OrvixServices::ShowPrompt(void* a, void* b, void* c, std::uint32_t 
             const std::uint32_t action = GetPromptAction(promptID);
             const bool ask = (action & PromptAction::Ask) != 0;
             if (!ask && dontAskAgain)
+            {
                 *dontAskAgain = true;
+            }
             if (IsUnattended() || !ask)
+            {
                 return PromptAction::ToAnswer(action);
+            }
             if (locked)
+            {
                 options &= ~StopAskingOffered;
+            }
         }
         bool flag = false;
         const std::int32_t answer = CoreUI().ShowPrompt(a, b, c, options, &flag);
         if (dontAskAgain)
+        {
             *dontAskAgain = flag;
+        }
         if (stored && (options & StopAskingOffered) && flag)
+        {
             SetPromptAction(promptID, PromptAction::FromAnswer(answer));
+        }
         return answer;
     });
 }
@@ -159,7 +183,9 @@ std::int32_t OrvixServices::RunFileListOperation(void* a, OrvixFileListDialogPar
     return WithBarrier(std::int32_t{0}, [&] {
         OrvixFileList* list = params ? params->GetOrvixFileList() : nullptr;
         if (!list)
+        {
             return std::int32_t{0};
+        }
         return FileListOperation(*this, a, *params, *list, provider, operations).Run(callProviderFirst, flagsOutMask);
     });
 }
@@ -174,7 +200,9 @@ bool OrvixServices::SetPromptAction(std::uint32_t promptID, std::uint32_t action
 {
     const int row = LastPrompt(promptID);
     if (row < 0 || m_prompts.GetLocked(static_cast<unsigned int>(row)))
+    {
         return false;
+    }
     return m_prompts.SetPrompt(static_cast<unsigned int>(row), action);
 }
 
@@ -202,7 +230,9 @@ std::int32_t OrvixServices::EditPrompts(void* a, void* b)
     return WithXmlBarrier(std::int32_t{0}, [&] {
         const std::int32_t result = CoreUI().EditPrompts(a, b, &m_prompts);
         if (result == 1)
+        {
             SavePrompts();
+        }
         return result;
     });
 }
@@ -256,7 +286,9 @@ bool OrvixServices::DiscoverPlugins(OrvixClientInfo* info)
 {
     PluginSearch search(*info);
     if (search.GetState() != PluginSearch::State::Found)
+    {
         return false;
+    }
     const ManifestContext context;
     bool added = false;
     for (; search.GetState() == PluginSearch::State::Found; search.Next())
@@ -264,7 +296,9 @@ bool OrvixServices::DiscoverPlugins(OrvixClientInfo* info)
         added |= WithBarrier(false, [&] {
             PluginCandidate candidate = PluginCandidate::Judge(search.Path(), context, m_config);
             if (candidate.verdict != PluginCandidate::Verdict::Listed)
+            {
                 return false;
+            }
             m_providers.push_back(std::move(candidate.entry));
             return true;
         });
@@ -278,20 +312,28 @@ bool OrvixServices::DiscoverMSSCCIProviders()
 {
     const UniqueRegistryKey list = InstalledProviders::OpenList();
     if (!list)
+    {
         return false;
+    }
     for (DWORD index = 0;; ++index)
     {
         const bool more = WithBarrier(true, [&] {
             std::wstring keyPath;
             const InstalledProviders::Step step = InstalledProviders::KeyPathAt(list.get(), index, keyPath);
             if (step == InstalledProviders::Step::EndsProcess)
+            {
                 InstalledProviders::EndProcess();
+            }
             if (step == InstalledProviders::Step::Found)
+            {
                 AddMSSCCIProvider(keyPath);
+            }
             return step != InstalledProviders::Step::End;
         });
         if (!more)
+        {
             return true;
+        }
     }
 }
 
@@ -300,17 +342,25 @@ void OrvixServices::AddMSSCCIProvider(const std::wstring& keyPath)
 {
     const InstalledProviders::Candidate candidate = InstalledProviders::Judge(keyPath, m_config);
     if (candidate.verdict == InstalledProviders::Verdict::EndsProcess)
+    {
         InstalledProviders::EndProcess();
+    }
     if (candidate.verdict != InstalledProviders::Verdict::Listed)
+    {
         return;
+    }
 
     std::unique_ptr<OrvixProviderWrapper> wrapper(new OrvixProviderWrapper); // null without memory
     if (!wrapper)
+    {
         return;
+    }
     auto bridge = std::make_unique<OrvixMSSCC>();
     bridge->SetProvider(candidate.serverPath.c_str(), candidate.searchPath.c_str(), candidate.name.c_str(), false);
     if (candidate.config)
+    {
         bridge->SetProjectSettingsFile(candidate.config->m_msSccProjectFile);
+    }
     wrapper->SetMSSCC(bridge.release());
     auto entry = std::make_unique<OrvixProviderEntry>();
     entry->name = candidate.name;
@@ -337,7 +387,9 @@ int OrvixServices::FirstPrompt(std::uint32_t promptID)
     for (int i = 0; i < m_prompts.NumPrompts(); ++i)
     {
         if (static_cast<std::uint32_t>(m_prompts.GetPromptID(static_cast<unsigned int>(i))) == promptID)
+        {
             return i;
+        }
     }
     return -1;
 }
@@ -349,7 +401,9 @@ int OrvixServices::LastPrompt(std::uint32_t promptID)
     for (int i = m_prompts.NumPrompts() - 1; i >= 0; --i)
     {
         if (static_cast<std::uint32_t>(m_prompts.GetPromptID(static_cast<unsigned int>(i))) == promptID)
+        {
             return i;
+        }
     }
     return -1;
 }

@@ -13,7 +13,9 @@ PluginCandidate PluginCandidate::Judge(const std::wstring& path, const ManifestC
 {
     PluginCandidate candidate;
     if (path.size() > PluginSearch::MaxPath)
+    {
         return candidate;
+    }
     UniqueModule module = LoadLibraryIsolated(path.c_str(), context);
     if (!module)
     {
@@ -34,7 +36,9 @@ std::vector<const char*> PluginCandidate::FindMissingExports() const
     for (const char* name : Exports)
     {
         if (entry && !Export<void()>(name))
+        {
             missing.push_back(name);
+        }
     }
     return missing;
 }
@@ -43,10 +47,14 @@ PluginCandidate::Verdict PluginCandidate::Ask(const OrvixProviderConfigManager& 
 {
     auto* const getVersion = Export<std::int32_t()>(GetVersion);
     if (!getVersion)
+    {
         return Verdict::Incomplete;
+    }
     version = getVersion();
     if (version != ORVIX_PLUGIN_CONTRACT_VERSION)
+    {
         return Verdict::OtherVersion;
+    }
     entry->getProvider = Export<IOrvixProvider*()>(GetProvider);
     entry->releaseProvider = Export<void(IOrvixProvider*)>(ReleaseProvider);
     auto* const getName = Export<const wchar_t*()>(GetName);
@@ -58,12 +66,14 @@ PluginCandidate::Verdict PluginCandidate::Ask(const OrvixProviderConfigManager& 
         entry->config = configs.FindConfig(name);
     }
     if (!entry->getProvider || !entry->releaseProvider || !getName)
+    {
         return Verdict::Incomplete;
+    }
     return !entry->config || entry->config->m_enabled ? Verdict::Listed : Verdict::SwitchedOff;
 }
 
 /// A function of the plug-in; null when it is missing.
-template <class Function>
+template <typename Function>
 Function* PluginCandidate::Export(const char* name) const
 {
     return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(entry->module.get(), name)));

@@ -47,6 +47,6 @@ struct PluginCandidate
 
 private:
     Verdict Ask(const OrvixProviderConfigManager& configs);
-    template <class Function>
+    template <typename Function>
     Function* Export(const char* name) const;
 };

@@ -8,19 +8,27 @@ PluginSearch::PluginSearch(OrvixClientInfo& client) : m_client(client)
 {
     const std::wstring pattern = PathOf(L"*.dll");
     if (pattern.empty())
+    {
         return;
+    }
     m_state = State::FolderTooLong;
     if (pattern.size() > MaxPath)
+    {
         return;
+    }
     m_state = State::End;
     const HANDLE find = FindFirstFileW(pattern.c_str(), &m_found);
     if (find == INVALID_HANDLE_VALUE)
+    {
         return;
+    }
     m_find.reset(find);
     m_state = State::Found;
     const std::wstring_view name = m_found.cFileName;
     if (name == L"." || name == L"..")
+    {
         Next();
+    }
 }
 
 void PluginSearch::Next()

@@ -29,7 +29,9 @@ public:
     void Append(OrvixFileEntry* entry)
     {
         if (m_slots.size() == m_slots.capacity())
+        {
             CloseGap();
+        }
         m_slots.push_back(entry);
         m_distinct = false;
         m_searched = 0;

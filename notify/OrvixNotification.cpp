@@ -29,7 +29,9 @@ std::unique_ptr<Registry> theRegistry;
 Registry* GetRegistry()
 {
     if (!theRegistry)
+    {
         theRegistry.reset(new (std::nothrow) Registry);
+    }
     return theRegistry.get();
 }
 
@@ -39,10 +41,14 @@ bool OrvixNotification::RegisterOrvixNotification(IOrvixNotifyCallback* callback
 {
     Registry* registry = GetRegistry();
     if (!registry || !callback)
+    {
         return false;
+    }
     auto& callbacks = registry->callbacks;
     if (std::find(callbacks.begin(), callbacks.end(), callback) != callbacks.end())
+    {
         return true;
+    }
     return WithBarrier(false, [&] {
         callbacks.push_back(callback);
         const bool complete = WithBarrier(false, [&] {
@@ -50,7 +56,9 @@ bool OrvixNotification::RegisterOrvixNotification(IOrvixNotifyCallback* callback
             return true;
         });
         if (!complete)
+        {
             callbacks.pop_back();
+        }
         return complete;
     });
 }
@@ -59,10 +67,14 @@ bool OrvixNotification::UnRegisterOrvixNotification(IOrvixNotifyCallback* callba
 {
     Registry* registry = GetRegistry();
     if (!registry || !callback)
+    {
         return false;
+    }
     const auto found = std::find(registry->callbacks.begin(), registry->callbacks.end(), callback);
     if (found == registry->callbacks.end())
+    {
         return false;
+    }
     registry->userData.erase(registry->userData.begin() + (found - registry->callbacks.begin()));
     registry->callbacks.erase(found);
     return true;
@@ -80,18 +92,24 @@ std::uint32_t OrvixNotification::BroadcastOrvixNotification(OrvixNotifyParams* p
 {
     const Registry* registry = GetRegistry();
     if (!registry || !params)
+    {
         return 0;
+    }
     // A listener may register and unregister listeners: the arrays are read afresh at every step.
     for (std::size_t i = 0; i < registry->callbacks.size(); ++i)
     {
         const std::uint32_t answer = registry->callbacks[i]->Notify(params, registry->userData[i]);
         if (answer == 0)
+        {
             continue;
+        }
         if (answer == Cancel)
         {
             params->SetCancelled(true);
             for (std::size_t j = 0; j < i && j < registry->callbacks.size(); ++j)
+            {
                 registry->callbacks[j]->Notify(params, registry->userData[j]);
+            }
         }
         return answer;
     }

@@ -14,7 +14,9 @@ NarrowBuffer::NarrowBuffer(const wchar_t* text, std::size_t limit) noexcept
         const int bytes = WideCharToMultiByte(CP_ACP, 0, text, units, character.data(),
                                               static_cast<int>(character.size()), nullptr, nullptr);
         if (bytes <= 0 || size + static_cast<std::size_t>(bytes) > limit)
+        {
             break;
+        }
         std::copy_n(character.begin(), bytes, m_bytes.begin() + static_cast<std::ptrdiff_t>(size));
         size += static_cast<std::size_t>(bytes);
         text += units;

@@ -18,7 +18,9 @@ bool IsExact(std::wstring_view path, const char* narrow)
 {
     // Every ANSI code page carries these as they are; only the others are worth a second conversion.
     if (std::all_of(path.begin(), path.end(), [](wchar_t c) { return c < 0x80; }))
+    {
         return true;
+    }
     const WStr back(narrow);
     return back.Get() && back.Get() == path;
 }
@@ -32,7 +34,9 @@ NarrowPaths::NarrowPaths(OrvixFileList& list, unsigned int count)
     {
         OrvixFileEntry* entry = list.GetActiveFileEntry(i);
         if (!entry)
+        {
             throw std::out_of_range("active entry");
+        }
         Add(entry->GetFile());
     }
 }
@@ -46,9 +50,13 @@ void NarrowPaths::Add(const wchar_t* path)
 {
     const CStr text(path);
     if (!text.Get())
+    {
         throw std::bad_alloc();
+    }
     if (!IsExact(path, text.Get()))
+    {
         throw std::range_error("path");
+    }
     const std::size_t size = std::strlen(text.Get()) + 1;
     m_pointers.push_back(static_cast<char*>(std::memcpy(m_texts.allocate(size, 1), text.Get(), size)));
 }

@@ -36,7 +36,9 @@ bool EqualNames(const std::wstring& left, const wchar_t* right)
 OrvixMSSCC::~OrvixMSSCC()
 {
     if (m_initialized)
+    {
         Uninitialize();
+    }
 }
 
 bool OrvixMSSCC::SetProvider(const wchar_t* dllPath, const wchar_t* searchFolder, const wchar_t* providerName,
@@ -46,7 +48,9 @@ bool OrvixMSSCC::SetProvider(const wchar_t* dllPath, const wchar_t* searchFolder
     m_providerName = providerName;
     Store(m_sccName, m_providerName, FieldLimit);
     if (searchFolder)
+    {
         m_searchFolder = searchFolder;
+    }
     return !loadNow || Load();
 }
 
@@ -61,14 +65,16 @@ bool OrvixMSSCC::Load()
         m_module ? reinterpret_cast<AnyFunction>(GetProcAddress(m_module.get(), SccFunctions::GetVersion.name))
                  : nullptr;
     if (!getVersion)
+    {
         return false;
+    }
     m_entryPoints[SccFunctions::GetVersion.slot] = getVersion;
     m_version = GetVersion();
     return true;
 }
 
 /// The function, loading the library when it is not loaded; null when either is missing.
-template <class Function>
+template <typename Function>
 Function* OrvixMSSCC::Resolve(const SccFunction<Function>& entry) noexcept
 {
     AnyFunction& function = m_entryPoints[entry.slot];
@@ -76,15 +82,19 @@ Function* OrvixMSSCC::Resolve(const SccFunction<Function>& entry) noexcept
     {
         Store(m_sccName, m_providerName, FieldLimit);
         if (!WithBarrier(false, [this] { return Load(); }))
+        {
             return nullptr;
+        }
     }
     if (!function)
+    {
         function = reinterpret_cast<AnyFunction>(GetProcAddress(m_module.get(), entry.name));
+    }
     return reinterpret_cast<Function*>(function);
 }
 
 /// Calls the function; -1 when it is missing or throws.
-template <class Result, class... Parameters>
+template <typename Result, typename... Parameters>
 Result OrvixMSSCC::Call(const SccFunction<Result(Parameters...)>& entry,
                         std::type_identity_t<Parameters>... arguments) noexcept
 {
@@ -105,7 +115,9 @@ void OrvixMSSCC::Store(Field& field, std::wstring_view text, std::size_t limit) 
 void OrvixMSSCC::StoreNarrow(Field& field, const char* text, std::size_t limit) noexcept
 {
     if (const WStr wide(text); wide.Get())
+    {
         Store(field, wide.Get(), limit);
+    }
 }
 
 LONG OrvixMSSCC::GetVersion()
@@ -117,9 +129,13 @@ LONG OrvixMSSCC::GetVersion()
 SCCRTN OrvixMSSCC::Initialize(LPCSTR callerName)
 {
     if (m_initialized)
+    {
         return SCC_OK;
+    }
     if (!Resolve(SccFunctions::Initialize)) // before the fields are read: loading sets one
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     NarrowBuffer sccName(m_sccName.data(), NameLimit);
     NarrowBuffer auxPathLabel(m_auxPath.data(), AuxPathLimit);
     const SCCRTN result = Call(SccFunctions::Initialize, &m_context, m_parentWindow, callerName, sccName.Get(),
@@ -140,11 +156,17 @@ SCCRTN OrvixMSSCC::Uninitialize()
 {
     // The library is told even when it was never started: deliberate.
     if (!Resolve(SccFunctions::Uninitialize))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     if (m_projectOpen)
+    {
         CloseProject();
+    }
     for (Field* field : {&m_user, &m_spare, &m_localPath, &m_auxPath, &m_projectName})
+    {
         field->front() = L'\0';
+    }
     m_capabilities = 0;
     m_commentLength = 0; // the check-out comment's length stays: deliberate
     m_initialized = false;
@@ -158,9 +180,13 @@ SCCRTN OrvixMSSCC::Uninitialize()
 SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC output)
 {
     if (m_projectOpen)
+    {
         CloseProject();
+    }
     if (!Resolve(SccFunctions::OpenProject))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     std::string path; // with room for the longest text that a library may write
     if (!WithBarrier(false, [&] {
             path.reserve(MAX_PATH);
@@ -168,7 +194,9 @@ SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC o
             path.resize(std::max<std::size_t>(path.size(), MAX_PATH));
             return true;
         }))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     const WStr folder(localPath);
     ReadProjectSettings(folder.Get());
     NarrowBuffer user(m_user.data(), UserLimit);
@@ -183,10 +211,14 @@ SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC o
     {
         result = GetProjPath(nullptr, nullptr, nullptr, nullptr, TRUE);
         if (result == SCC_OK)
+        {
             result = open(); // with the same texts: deliberate
+        }
     }
     if (result != SCC_OK)
+    {
         return result;
+    }
     StoreNarrow(m_user, user.Get(), UserLimit);
     StoreNarrow(m_auxPath, auxPath.Get(), AuxPathLimit);
     m_projectOpen = true;
@@ -197,9 +229,13 @@ SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC o
 SCCRTN OrvixMSSCC::CloseProject()
 {
     if (!m_projectOpen)
+    {
         return SCC_E_PROJNOTOPEN;
+    }
     if (!Resolve(SccFunctions::CloseProject))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     m_projectOpen = false;
     return Call(SccFunctions::CloseProject, m_context);
 }
@@ -207,7 +243,9 @@ SCCRTN OrvixMSSCC::CloseProject()
 SCCRTN OrvixMSSCC::GetProjPath(LPSTR, LPSTR, LPSTR, LPSTR, BOOL allowChangePath)
 {
     if (!Resolve(SccFunctions::GetProjPath))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     NarrowBuffer user(m_user.data(), UserLimit);
     NarrowBuffer projectName(m_projectName.data(), ProjectNameLimit);
     NarrowBuffer localPath(m_localPath.data(), LocalPathLimit);
@@ -216,7 +254,9 @@ SCCRTN OrvixMSSCC::GetProjPath(LPSTR, LPSTR, LPSTR, LPSTR, BOOL allowChangePath)
     const SCCRTN result = Call(SccFunctions::GetProjPath, m_context, m_parentWindow, user.Get(), projectName.Get(),
                                localPath.Get(), auxPath.Get(), allowChangePath, &isNew);
     if (result != SCC_OK)
+    {
         return result;
+    }
     StoreNarrow(m_user, user.Get(), UserLimit);
     StoreNarrow(m_projectName, projectName.Get(), ProjectNameLimit);
     StoreNarrow(m_localPath, localPath.Get(), LocalPathLimit);
@@ -288,14 +328,18 @@ SCCRTN OrvixMSSCC::RunScc(LONG count, LPCSTR* names)
 SCCRTN OrvixMSSCC::GetCommandOptions()
 {
     if (!Resolve(SccFunctions::GetCommandOptions))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     const auto ask = [this](LPCMDOPTS* block) {
         return Call(SccFunctions::GetCommandOptions, m_context, m_parentWindow, SCC_COMMAND_OPTIONS, block);
     };
     if (m_commandOptionsPending)
     {
         if (ask(nullptr) != SCC_I_ADV_SUPPORT)
+        {
             return SCC_E_OPNOTSUPPORTED;
+        }
         m_commandOptionsPending = false;
     }
     return ask(&m_commandOptions);
@@ -304,11 +348,17 @@ SCCRTN OrvixMSSCC::GetCommandOptions()
 SCCRTN OrvixMSSCC::AddFromScc(LPLONG count, LPCSTR** names)
 {
     if (!(m_capabilities & SCC_CAP_ADDFROMSCC))
+    {
         return SCC_E_OPNOTSUPPORTED;
+    }
     if (!Resolve(SccFunctions::AddFromScc))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     if (SetOption(SCC_OPT_SHARESUBPROJ, 1) != SCC_I_SHARESUBPROJOK)
+    {
         return SCC_E_OPNOTSUPPORTED;
+    }
     return Call(SccFunctions::AddFromScc, m_context, m_parentWindow, count, names);
 }
 
@@ -322,26 +372,38 @@ SCCRTN OrvixMSSCC::SetOption(LONG option, LONG value)
 void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
 {
     if (m_settingsFileName.empty() || !folder)
+    {
         return;
+    }
     WithBarrier(false, [&] {
         OrvixFileIO file;
         if (!file.OpenDocument((folder + (L'\\' + m_settingsFileName)).c_str()))
+        {
             return false;
+        }
         const OpenedDocument opened(file);
         OrvixFileIO::Node root;
         std::wstring name;
         if (!file.GetRootElement(root, name) || !EqualNames(name, RootName))
+        {
             return false;
+        }
         OrvixFileIO::Node child;
         std::wstring text;
         for (bool more = file.GetFirstChild(root.Get(), child); more; more = file.GetNextSibling(child))
         {
             if (!file.GetNodeName(child.Get(), name) || !file.GetNodeText(child.Get(), text))
+            {
                 continue;
+            }
             if (EqualNames(name, AuxPathName))
+            {
                 Store(m_auxPath, text, FieldLimit);
+            }
             else if (EqualNames(name, ProjectNameName))
+            {
                 Store(m_projectName, text, FieldLimit);
+            }
         }
         return true;
     });
@@ -351,11 +413,15 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
 void OrvixMSSCC::WriteProjectSettings(const wchar_t* folder)
 {
     if (m_settingsFileName.empty() || !folder)
+    {
         return;
+    }
     WithBarrier(false, [&] {
         OrvixFileIO file;
         if (!file.CreateDocument())
+        {
             return false;
+        }
         const OpenedDocument opened(file);
         OrvixFileIO::Node root;
         file.AddElement(nullptr, RootName, root, false);

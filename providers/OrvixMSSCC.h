@@ -8,7 +8,7 @@
 #include <string_view>
 #include <type_traits>
 
-template <class Function>
+template <typename Function>
 struct SccFunction;
 
 /// The bridge to one MSSCCI library, which it loads on first use and frees when it is destroyed.
@@ -90,9 +90,9 @@ private:
     static void StoreNarrow(Field& field, const char* text, std::size_t limit) noexcept;
 
     bool Load();
-    template <class Function>
+    template <typename Function>
     Function* Resolve(const SccFunction<Function>& entry) noexcept;
-    template <class Result, class... Parameters>
+    template <typename Result, typename... Parameters>
     Result Call(const SccFunction<Result(Parameters...)>& entry,
                 std::type_identity_t<Parameters>... arguments) noexcept;
     void ReadProjectSettings(const wchar_t* folder);

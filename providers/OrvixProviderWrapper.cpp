@@ -44,7 +44,9 @@ public:
     explicit NarrowText(const wchar_t* text) : m_text(text ? text : L"")
     {
         if (!m_text.Get())
+        {
             throw std::bad_alloc();
+        }
     }
     LPCSTR Get() const { return m_text.Get(); }
 
@@ -58,19 +60,23 @@ LONG OutputText(LPCSTR text, LONG)
     return WithBarrier(LONG{0}, [text] {
         const WStr wide(text);
         if (clientAccess && wide.Get())
+        {
             clientAccess->OutputText(wide.Get(), 0);
+        }
         return LONG{0};
     });
 }
 
 /// Hands the paths of the active entries, of which there must be one, to `work` and gives its result.
-template <class Work>
+template <typename Work>
 int FileOperation(OrvixFileList* list, Work work)
 {
     return WithBarrier(Failure, [&] {
         const unsigned int count = list ? list->NumActiveEntries() : 0;
         if (count == 0)
+        {
             return Failure;
+        }
         NarrowPaths paths(*list, count);
         return work(paths);
     });
@@ -85,27 +91,49 @@ unsigned long FlagsOf(LONG status, bool projectOpen)
 
     unsigned long flags = 0;
     if (status == 0)
+    {
         flags |= 0x1;
+    }
     if (controlled)
+    {
         flags |= 0x2 | 0x200000 | 0x400000;
+    }
     if (has(SCC_STATUS_CHECKEDOUT))
+    {
         flags |= 0x4;
+    }
     if (has(SCC_STATUS_OUTOTHER))
+    {
         flags |= 0x8;
+    }
     if (has(SCC_STATUS_OUTOFDATE))
+    {
         flags |= 0x10;
+    }
     if (has(SCC_STATUS_DELETED))
+    {
         flags |= 0x20;
+    }
     if (has(SCC_STATUS_MODIFIED))
+    {
         flags |= 0x80;
+    }
     if (controlled && onlyMine)
+    {
         flags |= 0x10000 | 0x40000;
+    }
     if (controlled && !has(SCC_STATUS_CHECKEDOUT | SCC_STATUS_OUTOTHER | SCC_STATUS_OUTOFDATE))
+    {
         flags |= 0x20000;
+    }
     if (controlled && has(SCC_STATUS_CHECKEDOUT | SCC_STATUS_MODIFIED))
+    {
         flags |= 0x80000;
+    }
     if (!controlled && projectOpen)
+    {
         flags |= 0x100000;
+    }
     return flags;
 }
 
@@ -146,7 +174,9 @@ int OrvixProviderWrapper::Initialize(OrvixClientInfo* info)
 {
     return WithBarrier(Failure, [&] {
         if (!info)
+        {
             return Failure;
+        }
         static_cast<OrvixMSSCC*>(m_bridge)->SetParentWindow(info->GetParentWindow());
         clientAccess = info->GetIOrvixClientAccess();
         return ToResult(m_bridge->Initialize(NarrowText(info->GetClientName()).Get()));
@@ -194,7 +224,9 @@ int OrvixProviderWrapper::CheckOut(OrvixFileList* list, const wchar_t* comment, 
     return FileOperation(list, [&](NarrowPaths& paths) {
         const NarrowText text(comment);
         if (options & WithGetLatest)
+        {
             m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr); // a failed get does not stop the check-out
+        }
         return ToResult(m_bridge->Checkout(paths.Count(), paths.Get(), text.Get(), 0, nullptr));
     });
 }
@@ -204,7 +236,9 @@ int OrvixProviderWrapper::UndoCheckOut(OrvixFileList* list, unsigned long option
     return FileOperation(list, [&](NarrowPaths& paths) {
         SCCRTN result = m_bridge->Uncheckout(paths.Count(), paths.Get(), 0, nullptr);
         if (options & WithGetLatest)
+        {
             result = m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr);
+        }
         return ToResult(result);
     });
 }
@@ -241,7 +275,9 @@ int OrvixProviderWrapper::ShowHistory(OrvixFileList* list)
     return FileOperation(list, [&](NarrowPaths& paths) {
         const SCCRTN result = m_bridge->History(paths.Count(), paths.Get(), 0, nullptr);
         if (result < 0)
+        {
             return Failure;
+        }
         return result == SCC_I_RELOADFILE ? ReloadFile : Success;
     });
 }
@@ -250,7 +286,9 @@ int OrvixProviderWrapper::ShowProperties(OrvixFileList* list)
 {
     return WithBarrier(Failure, [&] {
         if (!list || list->NumActiveEntries() == 0)
+        {
             return Failure;
+        }
         NarrowPaths first(*list, 1);
         return ToResult(m_bridge->Properties(*first.Get()));
     });
@@ -262,12 +300,16 @@ int OrvixProviderWrapper::QueryStatus(OrvixFileList* list, unsigned long)
         // Whatever a library does not fill stays "not controlled".
         std::vector<LONG> statuses(static_cast<std::size_t>(paths.Count()), 0);
         if (IsProjectOpen() && m_bridge->QueryInfo(paths.Count(), paths.Get(), statuses.data()) != SCC_OK)
+        {
             return Failure;
+        }
         for (unsigned int i = 0; i < statuses.size(); ++i)
         {
             // A library that shows windows may have let the host shorten the list.
             if (OrvixFileEntry* entry = list->GetActiveFileEntry(i))
+            {
                 entry->SetFlagsOut(FlagsOf(statuses[i], IsProjectOpen()));
+            }
         }
         return Success;
     });

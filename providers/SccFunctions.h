@@ -5,7 +5,7 @@
 #include <cstddef>
 
 /// A function of an MSSCCI library.
-template <class Function>
+template <typename Function>
 struct SccFunction
 {
     std::size_t slot; ///< of the bridge's operation, counted from GetVersion; those between belong to reserved ones

@@ -7,10 +7,14 @@ std::unique_ptr<OrvixFileEntry> MakeEntry(const wchar_t* file, OrvixFileEntry* p
 {
     std::unique_ptr<OrvixFileEntry> entry(new OrvixFileEntry);
     if (!entry)
+    {
         return nullptr;
+    }
     entry->SetFile(file);
     if (!IsStored(file, entry->GetFile()))
+    {
         return nullptr;
+    }
     entry->SetFlagsIn(flagsIn);
     entry->SetClientPtr(clientPtr);
     entry->SetParent(parent);
@@ -21,11 +25,15 @@ std::unique_ptr<OrvixFileEntry> CopyEntry(OrvixFileEntry& source)
 {
     std::unique_ptr<OrvixFileEntry> copy(new OrvixFileEntry);
     if (!copy)
+    {
         return nullptr;
+    }
     const wchar_t* file = source.GetFile();
     copy->SetFile(file);
     if (!IsStored(file, copy->GetFile()))
+    {
         return nullptr;
+    }
     copy->SetFlagsIn(source.GetFlagsIn());
     copy->SetFlagsOut(source.GetFlagsOut());
     copy->SetClientPtr(source.GetClientPtr());

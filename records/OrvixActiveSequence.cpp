@@ -15,7 +15,9 @@ bool OrvixActiveSequence::Remove(OrvixFileEntry* entry)
 {
     const std::size_t position = PositionOf(entry);
     if (position == m_slots.size())
+    {
         return false;
+    }
 
     // Move the gap to the entry and let it swallow the entry's slot.
     const auto at = [this](std::size_t slot) { return m_slots.begin() + static_cast<std::ptrdiff_t>(slot); };
@@ -65,7 +67,9 @@ std::size_t OrvixActiveSequence::PositionOf(OrvixFileEntry* entry)
     }
     std::size_t position = find(0, m_gapBegin);
     if (position == m_slots.size())
+    {
         position = find(m_gapEnd, m_slots.size());
+    }
     m_searched += position;
     return position;
 }
@@ -76,7 +80,9 @@ bool OrvixActiveSequence::HasNoRepetition() const
         std::vector<OrvixFileEntry*> sorted;
         sorted.reserve(Size());
         for (std::size_t i = 0; i < Size(); ++i)
+        {
             sorted.push_back(At(i));
+        }
         std::sort(sorted.begin(), sorted.end());
         return std::adjacent_find(sorted.begin(), sorted.end()) == sorted.end();
     });

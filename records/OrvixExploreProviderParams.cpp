@@ -51,7 +51,9 @@ void OrvixExploreProviderParams::SetDownloadFiles(bool download)
 std::uint32_t OrvixExploreProviderParams::AddFilter(const wchar_t* name, const wchar_t* extensions)
 {
     if (!name || !extensions)
+    {
         return 0;
+    }
     const std::size_t count = m_filterNames.size();
     const bool added = WithBarrier(false, [&] {
         std::wstring copy(extensions); // may be a name of this record, which moves

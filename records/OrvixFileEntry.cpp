@@ -12,17 +12,21 @@ namespace
 void ReplaceLeadingDoubleSlash(std::wstring& file)
 {
     if (file.size() > 2 && file[0] == L'/' && file[1] == L'/')
+    {
         file[0] = file[1] = L'\\';
+    }
 }
 
 /// Appends what `make` gives; false with nothing changed when that is null or memory is exhausted.
-template <class Make>
+template <typename Make>
 bool AppendNew(std::vector<OrvixFileEntry*>& entries, Make&& make)
 {
     return WithBarrier(false, [&] {
         std::unique_ptr<OrvixFileEntry> entry = make();
         if (!entry)
+        {
             return false;
+        }
         entries.push_back(entry.get());
         entry.release();
         return true;
@@ -82,7 +86,9 @@ void OrvixFileEntry::SetFlagsOut(unsigned long flags)
 unsigned int OrvixFileEntry::AddChild(OrvixFileEntry* child)
 {
     if (!child)
+    {
         return 0;
+    }
     const bool added = WithBarrier(false, [&] {
         m_children.push_back(child);
         return true;
@@ -103,7 +109,9 @@ OrvixFileEntry* OrvixFileEntry::GetChild(unsigned int index)
 bool OrvixFileEntry::RemoveChild(unsigned int index)
 {
     if (index >= m_children.size())
+    {
         return false;
+    }
     m_children.erase(m_children.begin() + index);
     return true;
 }
@@ -117,7 +125,9 @@ bool OrvixFileEntry::RemoveAllChildren()
 unsigned int OrvixFileEntry::AddAttachment(OrvixFileEntry* source)
 {
     if (!source)
+    {
         return 0;
+    }
     return AppendNew(m_attachments, [&] { return CopyEntry(*source); }) ? NumAttachments() : 0;
 }
 
@@ -125,7 +135,9 @@ unsigned int OrvixFileEntry::AddAttachment(const wchar_t* file, OrvixFileEntry* 
                                            long long clientPtr)
 {
     if (!file)
+    {
         return 0;
+    }
     return AppendNew(m_attachments, [&] { return MakeEntry(file, parent, flagsIn, clientPtr); }) ? NumAttachments() : 0;
 }
 
@@ -142,7 +154,9 @@ OrvixFileEntry* OrvixFileEntry::GetAttachment(unsigned int index)
 bool OrvixFileEntry::RemoveAttachment(unsigned int index)
 {
     if (index >= m_attachments.size())
+    {
         return false;
+    }
     delete m_attachments[index];
     m_attachments.erase(m_attachments.begin() + index);
     return true;
@@ -151,7 +165,9 @@ bool OrvixFileEntry::RemoveAttachment(unsigned int index)
 bool OrvixFileEntry::RemoveAllAttachments()
 {
     for (OrvixFileEntry* attachment : m_attachments)
+    {
         delete attachment;
+    }
     m_attachments.clear();
     return true;
 }

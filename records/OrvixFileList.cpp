@@ -27,11 +27,15 @@ void AppendTree(OrvixFileEntry* root, unsigned long mask, std::vector<TreeStep>&
         if (step.nextChild < entry->NumChildren())
         {
             if (OrvixFileEntry* child = entry->GetChild(step.nextChild++))
+            {
                 way.push_back({child, 0});
+            }
             continue;
         }
         if (entry->GetFlagsIn() & mask)
+        {
             active.Append(entry);
+        }
         way.pop_back();
     }
 }
@@ -69,11 +73,15 @@ OrvixFileEntry* Append(std::vector<OrvixFileEntry*>& entries, std::vector<OrvixF
                        std::unique_ptr<OrvixFileEntry> entry)
 {
     if (!entry)
+    {
         return nullptr;
+    }
     entries.push_back(entry.get());
     const bool linked = WithBarrier(false, [&] {
         if (OrvixFileEntry* parent = entry->GetParent())
+        {
             return parent->AddChild(entry.get()) != 0;
+        }
         roots.push_back(entry.get());
         return true;
     });
@@ -99,18 +107,24 @@ OrvixFileEntry* OrvixFileList::CreateEntry(OrvixFileEntry& source)
     return WithBarrier(static_cast<OrvixFileEntry*>(nullptr), [&]() -> OrvixFileEntry* {
         auto copy = CopyEntry(source);
         if (!copy)
+        {
             return nullptr;
+        }
         for (unsigned int i = 0; i < source.NumChildren(); ++i)
         {
             OrvixFileEntry* child = source.GetChild(i);
             if (child && copy->AddChild(child) == 0)
+            {
                 return nullptr;
+            }
         }
         for (unsigned int i = 0; i < source.NumAttachments(); ++i)
         {
             OrvixFileEntry* attachment = source.GetAttachment(i);
             if (attachment && copy->AddAttachment(attachment) == 0)
+            {
                 return nullptr;
+            }
         }
         return Append(m_entries, m_roots, std::move(copy));
     });
@@ -120,7 +134,9 @@ OrvixFileEntry* OrvixFileList::CreateEntry(const wchar_t* file, OrvixFileEntry* 
                                            long long clientPtr)
 {
     if (!file)
+    {
         return nullptr;
+    }
     return WithBarrier(static_cast<OrvixFileEntry*>(nullptr),
                        [&] { return Append(m_entries, m_roots, MakeEntry(file, parent, flagsIn, clientPtr)); });
 }
@@ -128,19 +144,27 @@ OrvixFileEntry* OrvixFileList::CreateEntry(const wchar_t* file, OrvixFileEntry* 
 bool OrvixFileList::RemoveEntry(unsigned int index)
 {
     if (index >= m_entries.size())
+    {
         return false;
+    }
     OrvixFileEntry* entry = m_entries[index];
     const bool detached = WithBarrier(false, [&] {
         const auto root = std::find(m_roots.begin(), m_roots.end(), entry);
         if (root != m_roots.end())
+        {
             m_roots.erase(root);
+        }
         std::vector<TreeStep> way;
         for (OrvixFileEntry* remaining : m_roots)
+        {
             DetachFromTree(remaining, entry, way);
+        }
         return true;
     });
     if (!detached)
+    {
         return false;
+    }
     RemoveActiveEntry(entry);
     delete entry;
     m_entries.erase(m_entries.begin() + index);
@@ -161,7 +185,9 @@ unsigned int OrvixFileList::NumEntries()
 bool OrvixFileList::RemoveAll()
 {
     for (OrvixFileEntry* entry : m_entries)
+    {
         delete entry;
+    }
     m_entries.clear();
     m_roots.clear();
     m_active.Clear();
@@ -184,7 +210,9 @@ unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
             for (unsigned int i = 0; i < NumRootEntries(); ++i)
             {
                 if (OrvixFileEntry* root = GetRootEntry(i))
+                {
                     AppendTree(root, mask, way, m_active);
+                }
             }
             return true;
         }
@@ -192,12 +220,16 @@ unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
         {
             OrvixFileEntry* entry = GetFileEntry(i);
             if (entry && (entry->GetFlagsIn() & mask))
+            {
                 m_active.AppendDistinct(entry);
+            }
         }
         return true;
     });
     if (!built)
+    {
         m_active.Clear();
+    }
     return NumActiveEntries();
 }
 

@@ -15,7 +15,9 @@ OrvixUserEntry* Append(std::vector<OrvixUserEntry*>& entries, std::unique_ptr<Or
 {
     return WithBarrier(static_cast<OrvixUserEntry*>(nullptr), [&] {
         if (entry)
+        {
             entries.push_back(entry.get());
+        }
         return entry.release();
     });
 }
@@ -33,7 +35,9 @@ OrvixUserEntry* OrvixUserList::CreateEntry(OrvixUserEntry& source)
 {
     std::unique_ptr<OrvixUserEntry> entry(new OrvixUserEntry);
     if (!entry)
+    {
         return nullptr;
+    }
     const wchar_t* userName = source.GetUserNameW();
     entry->SetUserName(userName);
     const wchar_t* firstName = source.GetFirstName();
@@ -44,27 +48,37 @@ OrvixUserEntry* OrvixUserList::CreateEntry(OrvixUserEntry& source)
     entry->SetEmail(email);
     if (!IsStored(userName, entry->GetUserNameW()) || !IsStored(firstName, entry->GetFirstName()) ||
         !IsStored(lastName, entry->GetLastName()) || !IsStored(email, entry->GetEmail()))
+    {
         return nullptr;
+    }
     return Append(m_entries, std::move(entry));
 }
 
 OrvixUserEntry* OrvixUserList::CreateEntry(const wchar_t* userName)
 {
     if (!userName)
+    {
         return nullptr;
+    }
     std::unique_ptr<OrvixUserEntry> entry(new OrvixUserEntry);
     if (!entry)
+    {
         return nullptr;
+    }
     entry->SetUserName(userName);
     if (!IsStored(userName, entry->GetUserNameW()))
+    {
         return nullptr;
+    }
     return Append(m_entries, std::move(entry));
 }
 
 bool OrvixUserList::RemoveEntry(unsigned int index)
 {
     if (index >= m_entries.size())
+    {
         return false;
+    }
     delete m_entries[index];
     m_entries.erase(m_entries.begin() + index);
     return true;
@@ -74,7 +88,9 @@ bool OrvixUserList::RemoveEntry(OrvixUserEntry* entry)
 {
     const auto found = std::find(m_entries.begin(), m_entries.end(), entry);
     if (found == m_entries.end())
+    {
         return false;
+    }
     return RemoveEntry(static_cast<unsigned int>(found - m_entries.begin()));
 }
 
@@ -86,7 +102,9 @@ unsigned int OrvixUserList::NumEntries()
 bool OrvixUserList::RemoveAll()
 {
     for (OrvixUserEntry* entry : m_entries)
+    {
         delete entry;
+    }
     m_entries.clear();
     return true;
 }

@@ -27,7 +27,11 @@ ActivationContext::ActivationContext()
 ActivationContext::~ActivationContext()
 {
     if (m_active)
+    {
         DeactivateActCtx(0, m_cookie);
+    }
     if (m_context != INVALID_HANDLE_VALUE)
+    {
         ReleaseActCtx(m_context);
+    }
 }

@@ -16,7 +16,9 @@ std::int32_t CoreUI::ShowPrompt(void* a, void* b, void* c, std::uint32_t options
 std::int32_t CoreUI::ShowFileListDialog(void* a, OrvixFileListDialogParams* params)
 {
     if (!params || !params->GetOrvixFileList())
+    {
         return 0;
+    }
     return FileListDialog(m_access, *params).Run(static_cast<HWND>(a));
 }
 

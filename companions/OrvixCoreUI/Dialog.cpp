@@ -86,7 +86,9 @@ INT_PTR CALLBACK Dialog::Procedure(HWND window, UINT message, WPARAM wParam, LPA
     }
     auto* dialog = std::bit_cast<Dialog*>(GetWindowLongPtrW(window, DWLP_USER));
     if (!dialog)
+    {
         return FALSE;
+    }
     try
     {
         return dialog->Handle(message, wParam, lParam);
@@ -152,11 +154,15 @@ void Dialog::OnOpen()
 void Dialog::ColorCheckBoxes() const
 {
     if (!m_palette.HasOwnText())
+    {
         return;
+    }
     for (HWND control = GetWindow(m_window, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
     {
         if (IsCheckBox(control))
+        {
             SetWindowTheme(control, L" ", L" "); // a theme has its own colour for their texts
+        }
     }
 }
 
@@ -164,12 +170,16 @@ LONG Dialog::ShowWholeMessage()
 {
     const HWND message = Item(IDC_MESSAGE);
     if (!message)
+    {
         return 0;
+    }
     const RECT work = WorkArea();
     const LONG most = (work.bottom - work.top) * 9 / 10 - HeightOf(m_window);
     const LONG more = std::min(NeededHeight(message, GetText(IDC_MESSAGE)) - HeightOf(message), most);
     if (more <= 0)
+    {
         return 0;
+    }
     m_layout.MakeRoom(message, more);
     return more;
 }
@@ -201,7 +211,9 @@ void Dialog::RememberSize() const
     WINDOWPLACEMENT placement{};
     placement.length = sizeof placement;
     if (!m_name || !GetWindowPlacement(m_window, &placement))
+    {
         return;
+    }
     const RECT& place = placement.rcNormalPosition; // that of a maximised window as well
     // Another message needs other room.
     Settings::StoreWindowSize(m_name, {m_layout.FromPixels(place.right - place.left),

@@ -11,14 +11,18 @@ public:
     {
         // The first releases of Windows 10 do not know the second version.
         if (!m_previous)
+        {
             m_previous = SetThreadDpiAwarenessContext(DPI_AWARENESS_CONTEXT_PER_MONITOR_AWARE);
+        }
     }
     DpiAwareness(const DpiAwareness&) = delete;
     DpiAwareness& operator=(const DpiAwareness&) = delete;
     ~DpiAwareness()
     {
         if (m_previous)
+        {
             SetThreadDpiAwarenessContext(m_previous);
+        }
     }
 
 private:

@@ -46,10 +46,14 @@ std::wstring StateInWords(unsigned long flags)
     for (const Word& word : Words)
     {
         if ((flags & word.flag) != 0)
+        {
             state += (state.empty() ? L"" : L", ") + Text(word.text);
+        }
     }
     if (state.empty())
+    {
         return Text((flags & 0x2) != 0 ? IDS_CHECKED_IN : IDS_UNKNOWN);
+    }
     return state;
 }
 
@@ -72,7 +76,9 @@ FileListDialog::FileListDialog(IOrvixCoreUIClientAccess* access, OrvixFileListDi
     for (unsigned int i = 0; i < list.NumActiveEntries(); ++i)
     {
         if (OrvixFileEntry* entry = list.GetActiveFileEntry(i))
+        {
             m_entries.push_back(entry);
+        }
     }
 }
 
@@ -100,7 +106,9 @@ void FileListDialog::OnCommand(int control, int notification)
     {
     case IDC_FILTER:
         if (notification == EN_CHANGE)
+        {
             m_files.Filter(GetText(IDC_FILTER));
+        }
         break;
     case IDC_SELECT_ALL:
     case IDC_SELECT_NONE:
@@ -110,9 +118,13 @@ void FileListDialog::OnCommand(int control, int notification)
         // In the open list alone: in the closed one keys and the wheel pass over items that nobody chose. An open list
         // begins without a choice, since some ways to close it confirm what is chosen.
         if (notification == CBN_DROPDOWN)
+        {
             SendDlgItemMessageW(Window(), IDC_RECENT, CB_SETCURSEL, static_cast<WPARAM>(-1), 0);
+        }
         if (notification == CBN_SELENDOK && SendDlgItemMessageW(Window(), IDC_RECENT, CB_GETDROPPEDSTATE, 0, 0))
+        {
             TakeRecentComment();
+        }
         break;
     case IDOK:
         StoreOptions();
@@ -133,14 +145,18 @@ LRESULT FileListDialog::OnNotify(const NMHDR& notification)
 {
     const LRESULT result = m_files.Handle(notification);
     if (notification.code == LVN_KEYDOWN || notification.code == NM_CLICK || notification.code == NM_DBLCLK)
+    {
         ShowCount();
+    }
     return result;
 }
 
 bool FileListDialog::OnContextMenu(HWND control, POINT point)
 {
     if (control != Item(IDC_LIST))
+    {
         return false;
+    }
     m_files.ShowMenu(point);
     return true;
 }
@@ -152,7 +168,9 @@ void FileListDialog::FillList()
     m_files.AddColumn(Text(IDS_FOLDER), 34);
     m_files.AddColumn(Text(IDS_STATE), 38);
     for (OrvixFileEntry* entry : m_entries)
+    {
         m_files.AddRow(CellsOf(*entry), !Has(OfferTicks) || (entry->GetFlagsIn() & StartsTicked) != 0);
+    }
     m_files.Refresh();
     if (!Has(OfferTicks))
     {
@@ -168,14 +186,18 @@ void FileListDialog::ShowCount() const
     const auto count =
         FormatText(all ? IDS_COUNT : IDS_COUNT_SHOWN, {m_files.NumTicked(), m_files.NumRows(), m_files.NumShown()});
     if (count != GetText(IDC_COUNT))
+    {
         SetText(IDC_COUNT, count.c_str());
+    }
 }
 
 void FileListDialog::ShowRecentComments()
 {
     m_recentComments = Settings::RecentComments();
     for (const std::wstring& comment : m_recentComments)
+    {
         SendDlgItemMessageW(Window(), IDC_RECENT, CB_ADDSTRING, 0, reinterpret_cast<LPARAM>(OneLine(comment).c_str()));
+    }
     SendDlgItemMessageW(Window(), IDC_RECENT, CB_SETEXTENDEDUI, TRUE, 0); // the Down key opens the list
     EnableWindow(Item(IDC_RECENT), !m_recentComments.empty());
 }
@@ -184,7 +206,9 @@ void FileListDialog::TakeRecentComment() const
 {
     const LRESULT chosen = SendDlgItemMessageW(Window(), IDC_RECENT, CB_GETCURSEL, 0, 0);
     if (chosen < 0)
+    {
         return;
+    }
     const std::wstring& comment = m_recentComments[static_cast<std::size_t>(chosen)];
     // Ctrl+Z brings back what was there.
     SendDlgItemMessageW(Window(), IDC_COMMENT, EM_SETSEL, 0, -1);
@@ -194,15 +218,21 @@ void FileListDialog::TakeRecentComment() const
 void FileListDialog::InitBox(int control, bool offered, std::uint32_t tickedBit) const
 {
     if (offered)
+    {
         SetTicked(control, Has(tickedBit));
+    }
     else
+    {
         Hide(control);
+    }
 }
 
 void FileListDialog::StoreBox(int control, bool offered, std::uint32_t tickedBit) const
 {
     if (!offered)
+    {
         return;
+    }
     const std::uint32_t options = m_params.GetOptions();
     m_params.SetOptions(IsTicked(control) ? options | tickedBit : options & ~tickedBit);
 }

@@ -12,7 +12,9 @@ RECT PlaceOf(HWND control, HWND dialog)
     RECT place{};
     // Of a combo box, the place with its list: that is what MoveWindow sets.
     if (SendMessageW(control, CB_GETDROPPEDCONTROLRECT, 0, reinterpret_cast<LPARAM>(&place)) == 0)
+    {
         GetWindowRect(control, &place);
+    }
     MapWindowPoints(nullptr, dialog, reinterpret_cast<POINT*>(&place), 2);
     return place;
 }
@@ -35,7 +37,9 @@ Layout::Layout(HWND dialog, std::span<const Rule> rules)
     auto* const font = std::bit_cast<HFONT>(SendMessageW(dialog, WM_GETFONT, 0, 0));
     GetObjectW(font, sizeof m_letters, &m_letters);
     for (HWND control = GetWindow(dialog, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
+    {
         m_controls.push_back({control, PlaceOf(control, dialog), FollowsOf(control, rules)});
+    }
 }
 
 void Layout::MakeRoom(HWND control, LONG more)
@@ -44,9 +48,13 @@ void Layout::MakeRoom(HWND control, LONG more)
     for (Control& other : m_controls)
     {
         if (other.window == control)
+        {
             other.place.bottom += more;
+        }
         else if (other.place.top >= below)
+        {
             OffsetRect(&other.place, 0, more);
+        }
     }
     m_inside.cy += more;
 }
@@ -75,9 +83,13 @@ void Layout::SetDpi(UINT dpi)
     letters.lfHeight = Scaled(letters.lfHeight);
     GdiObject<HFONT> font(CreateFontIndirectW(&letters));
     if (!font)
+    {
         return;
+    }
     for (const Control& control : m_controls)
+    {
         SendMessageW(control.window, WM_SETFONT, reinterpret_cast<WPARAM>(font.get()), FALSE);
+    }
     m_font = std::move(font);
 }
 

@@ -66,9 +66,13 @@ void PromptDialog::OnInit()
     SendDlgItemMessageW(Window(), IDC_ICON_OF_PROMPT, STM_SETICON, reinterpret_cast<WPARAM>(LoadIconW(nullptr, Icon())),
                         0);
     if (Has(OnlyOk))
+    {
         SetText(IDYES, Text(IDS_OK).c_str());
+    }
     if (!Has(OfferDoNotAsk))
+    {
         Hide(IDC_DO_NOT_ASK);
+    }
 
     // The buttons that are offered take the places on the right.
     RECT places[std::size(Buttons)];
@@ -83,7 +87,9 @@ void PromptDialog::OnInit()
             ++place;
         }
         else
+        {
             Hide(button);
+        }
     }
 }
 
@@ -92,7 +98,9 @@ void PromptDialog::OnCommand(int control, int)
     // Where OK is all that can be said, closing says it.
     const auto answer = AnswerOf(control == IDCANCEL && Has(OnlyOk) ? IDYES : control);
     if (!answer)
+    {
         return;
+    }
     m_doNotAskAgain = IsTicked(IDC_DO_NOT_ASK);
     End(*answer);
 }

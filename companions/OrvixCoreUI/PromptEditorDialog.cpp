@@ -47,7 +47,9 @@ PromptEditorDialog::PromptEditorDialog(IOrvixCoreUIClientAccess* access, OrvixPr
 {
     const auto count = static_cast<unsigned int>(prompts.NumPrompts());
     for (unsigned int row = 0; row < count; ++row)
+    {
         m_actions.push_back(prompts.GetPrompt(row));
+    }
 }
 
 std::span<const Layout::Rule> PromptEditorDialog::Rules() const
@@ -61,7 +63,9 @@ void PromptEditorDialog::OnInit()
     m_list.AddColumn(Text(IDS_PROMPT), 70);
     m_list.AddColumn(Text(IDS_ANSWER), 30);
     for (unsigned int row = 0; row < m_actions.size(); ++row)
+    {
         m_list.AddRow({OneLine(m_prompts.GetPromptText(row)), AnswerInWords(row)}, false);
+    }
     m_list.Refresh();
     ShowSelected();
 }
@@ -72,15 +76,21 @@ void PromptEditorDialog::OnCommand(int control, int notification)
     {
     case IDC_FILTER:
         if (notification == EN_CHANGE)
+        {
             m_list.Filter(GetText(IDC_FILTER));
+        }
         break;
     case IDC_ANSWER:
         if (notification == CBN_SELCHANGE)
+        {
             TakeAnswer();
+        }
         break;
     case IDC_RESET:
         if (const auto row = m_list.Selected())
+        {
             SetAnswer(static_cast<unsigned int>(*row), Ask);
+        }
         Focus(IDC_LIST); // before the button that has it is disabled
         ShowSelected();
         break;
@@ -99,14 +109,18 @@ LRESULT PromptEditorDialog::OnNotify(const NMHDR& notification)
 {
     const LRESULT result = m_list.Handle(notification);
     if (notification.code == LVN_ITEMCHANGED)
+    {
         ShowSelected();
+    }
     return result;
 }
 
 bool PromptEditorDialog::OnContextMenu(HWND control, POINT point)
 {
     if (control != Item(IDC_LIST))
+    {
         return false;
+    }
     m_list.ShowMenu(point);
     return true;
 }
@@ -115,7 +129,9 @@ std::wstring PromptEditorDialog::AnswerInWords(unsigned int row) const
 {
     std::wstring words = Text(Answers[AnswerIndex(m_actions[row])].words);
     if (!m_prompts.GetLocked(row))
+    {
         return words;
+    }
     return FormatText(IDS_LOCKED, {reinterpret_cast<DWORD_PTR>(words.c_str())});
 }
 
@@ -146,17 +162,23 @@ void PromptEditorDialog::ShowSelected()
     const wchar_t* text = selected ? m_prompts.GetPromptText(static_cast<unsigned int>(*selected)) : L"";
     SetText(IDC_WHOLE_TEXT, WithFieldLineEnds(text).c_str());
     if (!selected)
+    {
         return;
+    }
     const std::size_t current = AnswerIndex(m_actions[*selected]);
     for (std::size_t answer = 0; answer < std::size(Answers); ++answer)
     {
         if (answer != current && !IsOffered(static_cast<unsigned int>(*selected), answer))
+        {
             continue;
+        }
         const std::wstring words = Text(Answers[answer].words);
         const LRESULT item = SendMessageW(answers, CB_ADDSTRING, 0, reinterpret_cast<LPARAM>(words.c_str()));
         SendMessageW(answers, CB_SETITEMDATA, static_cast<WPARAM>(item), static_cast<LPARAM>(answer));
         if (answer == current)
+        {
             SendMessageW(answers, CB_SETCURSEL, static_cast<WPARAM>(item), 0);
+        }
     }
 }
 
@@ -165,7 +187,9 @@ void PromptEditorDialog::TakeAnswer()
     const auto row = m_list.Selected();
     const LRESULT item = SendDlgItemMessageW(Window(), IDC_ANSWER, CB_GETCURSEL, 0, 0);
     if (!row || item < 0)
+    {
         return;
+    }
     const LRESULT answer = SendDlgItemMessageW(Window(), IDC_ANSWER, CB_GETITEMDATA, static_cast<WPARAM>(item), 0);
     SetAnswer(static_cast<unsigned int>(*row), static_cast<std::size_t>(answer));
     EnableWindow(Item(IDC_RESET), static_cast<std::size_t>(answer) != Ask);
@@ -175,7 +199,9 @@ void PromptEditorDialog::SetAnswer(unsigned int row, std::size_t answer)
 {
     // An action of several bits that reads as this answer already keeps them.
     if (AnswerIndex(m_actions[row]) != answer)
+    {
         m_actions[row] = Answers[answer].action;
+    }
     m_list.SetCell(row, 1, AnswerInWords(row));
 }
 
@@ -185,7 +211,9 @@ bool PromptEditorDialog::Store()
     for (unsigned int row = 0; row < m_actions.size(); ++row)
     {
         if (m_actions[row] != m_prompts.GetPrompt(row))
+        {
             changed = m_prompts.SetPrompt(row, m_actions[row]) || changed;
+        }
     }
     return changed;
 }

@@ -13,7 +13,9 @@ std::optional<LONG> Number(const std::wstring& name)
     DWORD number = 0;
     DWORD size = sizeof number;
     if (RegGetValueW(HKEY_CURRENT_USER, Key, name.c_str(), RRF_RT_REG_DWORD, nullptr, &number, &size) != ERROR_SUCCESS)
+    {
         return std::nullopt;
+    }
     return static_cast<LONG>(number);
 }
 
@@ -29,7 +31,9 @@ std::optional<SIZE> Settings::WindowSize(const std::wstring& dialog)
     const auto width = Number(dialog + L"Width");
     const auto height = Number(dialog + L"Height");
     if (!width || !height)
+    {
         return std::nullopt;
+    }
     return SIZE{*width, *height};
 }
 
@@ -43,11 +47,15 @@ std::vector<std::wstring> Settings::RecentComments()
 {
     DWORD size = 0;
     if (RegGetValueW(HKEY_CURRENT_USER, Key, Recent, RRF_RT_REG_MULTI_SZ, nullptr, nullptr, &size) != ERROR_SUCCESS)
+    {
         return {};
+    }
     std::wstring block(size / sizeof(wchar_t), L'\0');
     if (RegGetValueW(HKEY_CURRENT_USER, Key, Recent, RRF_RT_REG_MULTI_SZ, nullptr, block.data(), &size) !=
         ERROR_SUCCESS)
+    {
         return {};
+    }
     std::vector<std::wstring> comments;
     for (const wchar_t* text = block.c_str(); *text && comments.size() < MaxRecentComments;)
     {
@@ -60,14 +68,18 @@ std::vector<std::wstring> Settings::RecentComments()
 void Settings::AddRecentComment(const std::wstring& comment)
 {
     if (comment.empty())
+    {
         return;
+    }
     std::vector<std::wstring> comments = RecentComments();
     std::erase(comments, comment);
     comments.insert(comments.begin(), comment);
     comments.resize(std::min(comments.size(), MaxRecentComments));
     std::wstring block;
     for (const std::wstring& text : comments)
+    {
         block += text + L'\0';
+    }
     block += L'\0';
     RegSetKeyValueW(HKEY_CURRENT_USER, Key, Recent, REG_MULTI_SZ, block.data(),
                     static_cast<DWORD>(block.size() * sizeof(wchar_t)));

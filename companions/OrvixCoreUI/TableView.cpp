@@ -126,7 +126,9 @@ void TableView::FitColumns() const
     const int room =
         inside.right - ((GetWindowLongW(m_window, GWL_STYLE) & WS_VSCROLL) != 0 ? 0 : ScrollBarWidth(m_window));
     for (std::size_t column = 0; column < m_columns && total > 0; ++column)
+    {
         SendMessageW(m_window, LVM_SETCOLUMNWIDTH, column, MAKELPARAM(MulDiv(widths[column], room, total), 0));
+    }
 }
 
 void TableView::ShowMenu(POINT point)
@@ -145,7 +147,9 @@ void TableView::ShowMenu(POINT point)
     }
     const int chosen = TrackPopupMenu(menu.get(), TPM_RETURNCMD, point.x, point.y, 0, m_window, nullptr);
     if (chosen > 0)
+    {
         SortBy(static_cast<std::size_t>(chosen) - 1);
+    }
 }
 
 LRESULT TableView::Handle(const NMHDR& notification)
@@ -161,7 +165,9 @@ LRESULT TableView::Handle(const NMHDR& notification)
         return 0;
     case LVN_KEYDOWN:
         if (reinterpret_cast<const NMLVKEYDOWN*>(header)->wVKey == VK_SPACE)
+        {
             ToggleFocused();
+        }
         return 0;
     case NM_CLICK:
     case NM_DBLCLK:
@@ -189,12 +195,18 @@ void TableView::GiveItem(LVITEMW& item) const
 {
     const auto place = static_cast<std::size_t>(item.iItem);
     if (place >= m_table.NumShown())
+    {
         return;
+    }
     const std::size_t row = m_table.RowAt(place);
     if ((item.mask & LVIF_TEXT) != 0)
+    {
         item.pszText = const_cast<wchar_t*>(m_table.Cell(row, static_cast<std::size_t>(item.iSubItem)).c_str());
+    }
     if ((item.mask & LVIF_STATE) != 0 && m_checkBoxes)
+    {
         item.state = (m_ticked[row] ? 2U : 1U) << StateImageShift;
+    }
 }
 
 void TableView::SortBy(std::size_t column)
@@ -212,7 +224,9 @@ void TableView::SortBy(std::size_t column)
         SendMessageW(headings, HDM_GETITEMW, i, reinterpret_cast<LPARAM>(&heading));
         heading.fmt &= ~(HDF_SORTUP | HDF_SORTDOWN);
         if (i == column)
+        {
             heading.fmt |= m_ascending ? HDF_SORTUP : HDF_SORTDOWN;
+        }
         SendMessageW(headings, HDM_SETITEMW, i, reinterpret_cast<LPARAM>(&heading));
     }
 }
@@ -223,7 +237,9 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
     // The control remembers places, and other rows come to stand there.
     std::vector<bool> selected(m_table.NumRows());
     for (const std::size_t place : SelectedPlaces())
+    {
         selected[m_table.RowAt(place)] = true;
+    }
     const auto focusedPlace = Next(AllPlaces, LVNI_FOCUSED);
     const std::size_t noRow = m_table.NumRows();
     const std::size_t focusedRow = focusedPlace ? m_table.RowAt(*focusedPlace) : noRow;
@@ -238,7 +254,9 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
         {
             const std::size_t row = m_table.RowAt(place);
             if (row == focusedRow)
+            {
                 focused = place;
+            }
             if (selected[row])
             {
                 SetState(place, LVIS_SELECTED, LVIS_SELECTED);
@@ -247,11 +265,15 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
         }
     }
     if (m_table.NumShown() == 0)
+    {
         return;
+    }
     // The keyboard goes on from here.
     SetState(focused, LVIS_FOCUSED, LVIS_FOCUSED);
     if (!anySelected)
+    {
         SetState(focused, LVIS_SELECTED, LVIS_SELECTED);
+    }
     SendMessageW(m_window, LVM_SETSELECTIONMARK, 0, static_cast<LPARAM>(focused));
     SendMessageW(m_window, LVM_ENSUREVISIBLE, focused, FALSE);
 }
@@ -268,10 +290,14 @@ void TableView::ToggleFocused()
 {
     const auto focused = Next(AllPlaces, LVNI_FOCUSED);
     if (!focused)
+    {
         return;
+    }
     std::vector<std::size_t> places = SelectedPlaces();
     if (!std::binary_search(places.begin(), places.end(), *focused))
+    {
         places = {*focused};
+    }
     Tick(places, !m_ticked[m_table.RowAt(*focused)]);
 }
 
@@ -281,7 +307,9 @@ void TableView::ToggleClicked(const NMITEMACTIVATE& click)
     hit.pt = click.ptAction;
     const LRESULT found = Send(LVM_HITTEST, 0, &hit);
     if (found < 0 || (hit.flags & LVHT_ONITEM) != LVHT_ONITEMSTATEICON)
+    {
         return;
+    }
     const auto place = static_cast<std::size_t>(found);
     Tick({place}, !m_ticked[m_table.RowAt(place)]);
 }
@@ -290,7 +318,9 @@ void TableView::ToggleClicked(const NMITEMACTIVATE& click)
 void TableView::Tick(const std::vector<std::size_t>& places, bool ticked)
 {
     for (const std::size_t place : places)
+    {
         m_ticked[m_table.RowAt(place)] = ticked;
+    }
     InvalidateRect(m_window, nullptr, FALSE);
     NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT,
                    places.size() == 1 ? static_cast<LONG>(places.front()) + 1 : CHILDID_SELF);
@@ -299,7 +329,9 @@ void TableView::Tick(const std::vector<std::size_t>& places, bool ticked)
 LRESULT TableView::Find(const NMLVFINDITEMW& search) const
 {
     if ((search.lvfi.flags & (LVFI_STRING | LVFI_PARTIAL)) == 0 || !search.lvfi.psz)
+    {
         return -1;
+    }
     const std::wstring start = search.lvfi.psz;
     const std::size_t count = m_table.NumShown();
     const auto first = static_cast<std::size_t>(std::max(search.iStart, 0));
@@ -310,7 +342,9 @@ LRESULT TableView::Find(const NMLVFINDITEMW& search) const
         if (cell.size() >= start.size() &&
             CompareStringOrdinal(cell.c_str(), static_cast<int>(start.size()), start.c_str(),
                                  static_cast<int>(start.size()), TRUE) == CSTR_EQUAL)
+        {
             return static_cast<LRESULT>(place);
+        }
     }
     return -1;
 }
@@ -319,7 +353,9 @@ std::vector<std::size_t> TableView::SelectedPlaces() const
 {
     std::vector<std::size_t> places;
     for (auto place = Next(AllPlaces, LVNI_SELECTED); place; place = Next(*place, LVNI_SELECTED))
+    {
         places.push_back(*place);
+    }
     return places;
 }
 
@@ -327,7 +363,9 @@ std::optional<std::size_t> TableView::Next(std::size_t after, UINT state) const
 {
     const LRESULT place = SendMessageW(m_window, LVM_GETNEXTITEM, after, state);
     if (place < 0 || static_cast<std::size_t>(place) >= m_table.NumShown())
+    {
         return std::nullopt;
+    }
     return static_cast<std::size_t>(place);
 }
 

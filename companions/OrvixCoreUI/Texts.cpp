@@ -32,7 +32,9 @@ std::wstring OneLine(std::wstring text)
     for (wchar_t& letter : text)
     {
         if (letter == L'\r' || letter == L'\n' || letter == L'\t')
+        {
             letter = L' ';
+        }
     }
     return text;
 }
@@ -43,7 +45,9 @@ std::wstring WithFieldLineEnds(const std::wstring& text)
     for (const wchar_t letter : text)
     {
         if (letter == L'\n' && !lines.ends_with(L'\r'))
+        {
             lines += L'\r';
+        }
         lines += letter;
     }
     return lines;

@@ -15,7 +15,9 @@ std::uint64_t LastWrite(HANDLE file)
 {
     FILETIME time;
     if (!GetFileTime(file, nullptr, nullptr, &time))
+    {
         ArchiveFiles::ThrowLastError(L"A file's time cannot be read");
+    }
     return Join(time.dwHighDateTime, time.dwLowDateTime);
 }
 
@@ -48,7 +50,9 @@ void Write(HANDLE file, const char* bytes, std::size_t size)
     {
         DWORD written = 0;
         if (!WriteFile(file, bytes, static_cast<DWORD>(size < MaxBlock ? size : MaxBlock), &written, nullptr))
+        {
             ArchiveFiles::ThrowLastError(L"A file cannot be written");
+        }
         bytes += written;
         size -= written;
     }
@@ -57,14 +61,18 @@ void Write(HANDLE file, const char* bytes, std::size_t size)
 void Flush(HANDLE file)
 {
     if (!FlushFileBuffers(file))
+    {
         ArchiveFiles::ThrowLastError(L"A file cannot be written through to the disk");
+    }
 }
 
 ArchiveFiles::UniqueHandle Create(const std::wstring& path)
 {
     ArchiveFiles::UniqueHandle file = ArchiveFiles::Open(path, GENERIC_WRITE, 0, CREATE_ALWAYS);
     if (!file)
+    {
         ArchiveFiles::ThrowLastError(L"A file cannot be created");
+    }
     return file;
 }
 
@@ -77,7 +85,9 @@ bool Patiently(Attempt attempt)
     {
         const DWORD error = GetLastError();
         if (pauses == 0 || (error != ERROR_SHARING_VIOLATION && error != ERROR_ACCESS_DENIED))
+        {
             return false;
+        }
         Sleep(10);
     }
     return true;
@@ -92,9 +102,13 @@ void ReadBlocks(HANDLE file, Take take)
     {
         DWORD size = 0;
         if (!ReadFile(file, block.data(), static_cast<DWORD>(block.size()), &size, nullptr))
+        {
             ArchiveFiles::ThrowLastError(L"A file cannot be read");
+        }
         if (size == 0)
+        {
             return;
+        }
         take(block.data(), size);
     }
 }
@@ -127,9 +141,13 @@ std::optional<ArchiveFiles::Facts> ArchiveFiles::Find(const std::wstring& path)
 {
     WIN32_FIND_DATAW data;
     if (BeginSearch(path, data))
+    {
         return FactsOf(data);
+    }
     if (IsMissing(GetLastError()))
+    {
         return std::nullopt;
+    }
     ThrowLastError(L"A file cannot be found");
 }
 
@@ -142,10 +160,14 @@ std::vector<ArchiveFiles::Facts> ArchiveFiles::List(const std::wstring& folder)
     {
         const std::wstring_view name = data.cFileName;
         if (name != L"." && name != L"..")
+        {
             entries.push_back(FactsOf(data));
+        }
     }
     if (GetLastError() != ERROR_NO_MORE_FILES)
+    {
         ThrowLastError(L"A folder of the archive cannot be listed");
+    }
     return entries;
 }
 
@@ -159,13 +181,17 @@ std::optional<std::string> ArchiveFiles::ReadText(const std::wstring& path, std:
     if (!Patiently(open))
     {
         if (IsMissing(GetLastError()))
+        {
             return std::nullopt;
+        }
         ThrowLastError(L"A file of the archive cannot be opened");
     }
     std::string bytes;
     ReadBlocks(file.get(), [&](const char* block, std::size_t size) {
         if (size > limit - bytes.size())
+        {
             throw ArchiveFailure{ArchiveError::Damaged, L"A file of the archive is too large", {}};
+        }
         bytes.append(block, size);
     });
     return bytes;
@@ -208,7 +234,9 @@ ArchiveFiles::Contents ArchiveFiles::Copy(HANDLE source, const std::wstring& tar
     const std::uint64_t stamp = lastWrite.value_or(contents.lastWrite);
     const FILETIME time{static_cast<DWORD>(stamp), static_cast<DWORD>(stamp >> 32)};
     if (!SetFileTime(file.get(), nullptr, nullptr, &time))
+    {
         ThrowLastError(L"A file's time cannot be set");
+    }
     Flush(file.get());
     return contents;
 }
@@ -218,7 +246,9 @@ void ArchiveFiles::Replace(const std::wstring& from, const std::wstring& to)
     const DWORD attributes = GetFileAttributesW(to.c_str());
     const bool wasReadOnly = attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_READONLY) != 0;
     if (wasReadOnly)
+    {
         SetReadOnly(to, false);
+    }
 
     const auto move = [&] {
         return MoveFileExW(from.c_str(), to.c_str(), MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != FALSE;
@@ -227,7 +257,9 @@ void ArchiveFiles::Replace(const std::wstring& from, const std::wstring& to)
     {
         const DWORD error = GetLastError();
         if (wasReadOnly)
+        {
             SetReadOnly(to, true);
+        }
         ThrowError(L"A file cannot be replaced", error);
     }
 }
@@ -239,11 +271,15 @@ void ArchiveFiles::SetReadOnly(const std::wstring& path, bool readOnly)
         readOnly ? attributes | FILE_ATTRIBUTE_READONLY : attributes & ~static_cast<DWORD>(FILE_ATTRIBUTE_READONLY);
     if (attributes == INVALID_FILE_ATTRIBUTES ||
         (wanted != attributes && !SetFileAttributesW(path.c_str(), wanted == 0 ? FILE_ATTRIBUTE_NORMAL : wanted)))
+    {
         ThrowLastError(readOnly ? L"The file cannot be made read-only" : L"The file cannot be made writable");
+    }
 }
 
 void ArchiveFiles::MakeFolder(const std::wstring& path)
 {
     if (!CreateDirectoryW(path.c_str(), nullptr) && GetLastError() != ERROR_ALREADY_EXISTS)
+    {
         ThrowLastError(L"A folder cannot be made");
+    }
 }

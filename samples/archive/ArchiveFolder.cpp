@@ -25,12 +25,16 @@ std::wstring ReadLink(const std::wstring& file)
     const std::string text = ArchiveFiles::ReadText(file, MaxLinkSize).value_or("");
     std::string_view path = text;
     if (!path.starts_with(LinkFormat))
+    {
         ThrowDamaged(L"The project's link to its archive cannot be read");
+    }
     path.remove_prefix(LinkFormat.size());
     path = path.substr(0, path.find_first_of("\r\n"));
     const std::optional<std::wstring> target = ArchiveText::FromUtf8(path);
     if (!target)
+    {
         ThrowDamaged(L"The project's link to its archive cannot be read");
+    }
     return *target;
 }
 
@@ -52,17 +56,23 @@ ArchiveFolder::ArchiveFolder(const std::wstring& projectFolder, std::chrono::mil
     const std::wstring path = ArchivePlace(projectFolder);
     const std::optional<ArchiveFiles::Facts> facts = ArchiveFiles::Find(path);
     if (!facts)
+    {
         ArchiveFiles::MakeFolder(path);
+    }
     m_path = ArchivePaths::FindFolder(facts && !facts->IsFolder() ? ReadLink(path) : path);
     if (!HasFormat())
+    {
         Prepare(lockWait);
+    }
 }
 
 bool ArchiveFolder::HasFormat() const
 {
     const std::optional<std::string> format = ArchiveFiles::ReadText(FormatFile(), MaxLinkSize);
     if (format && format != Format)
+    {
         ThrowDamaged(L"The archive has a format that is not known here");
+    }
     return format.has_value();
 }
 
@@ -70,7 +80,9 @@ void ArchiveFolder::Prepare(std::chrono::milliseconds lockWait) const
 {
     const ArchiveLock lock(LockFile(), lockWait);
     if (HasFormat())
+    {
         return; // somebody else was faster
+    }
     ArchiveFiles::MakeFolder(m_path + L'\\' + Versions);
     ArchiveFiles::MakeFolder(m_path + L'\\' + Records);
     ArchiveFiles::WriteText(FormatFile(), TemporaryFile(), Format);
@@ -91,10 +103,14 @@ std::optional<ArchiveRecord> ArchiveFolder::Load(const std::string& key) const
 {
     const std::optional<std::string> text = ArchiveFiles::ReadText(Place(Records, key), MaxRecordSize);
     if (!text)
+    {
         return std::nullopt;
+    }
     std::optional<ArchiveRecord> record = ArchiveRecord::Parse(*text);
     if (!record || ArchivePaths::KeyOf(record->path) != key)
+    {
         ThrowDamaged(L"The file's record in the archive is damaged");
+    }
     return record;
 }
 
@@ -105,14 +121,18 @@ std::vector<std::wstring> ArchiveFolder::List(ArchiveFailures& failures) const
     for (const ArchiveFiles::Facts& group : ArchiveFiles::List(records))
     {
         if (!group.IsFolder())
+        {
             continue;
+        }
         for (const ArchiveFiles::Facts& file : ArchiveFiles::List(records + L'\\' + group.name))
         {
             try
             {
                 // What does not lie where its name belongs is no record.
                 if (const std::optional<ArchiveRecord> record = Load(ArchiveText::ToUtf8(file.name)))
+                {
                     paths.push_back(record->path);
+                }
             }
             catch (ArchiveFailure& failure)
             {
@@ -128,7 +148,9 @@ void ArchiveFolder::Save(const ArchiveTarget& target, const ArchiveRecord& recor
 {
     const std::string text = record.Format();
     if (text.size() > MaxRecordSize)
+    {
         throw ArchiveFailure{ArchiveError::Access, L"The file's record in the archive would become too large", {}};
+    }
     const std::wstring path = Place(Records, target.key);
     ArchiveFiles::MakeFolder(path.substr(0, path.rfind(L'\\')));
     ArchiveFiles::WriteText(path, TemporaryFile(), text);
@@ -143,7 +165,9 @@ ArchiveFiles::Contents ArchiveFolder::Store(HANDLE source) const
         return file && ArchiveFiles::Read(file.get()).sha256 == contents.sha256;
     };
     if (!isWhole(temporary.Path()))
+    {
         ThrowDamaged(L"The stored contents are not what was written");
+    }
 
     // Equal contents are kept once; a damaged copy is replaced by the good one.
     const std::wstring path = Place(Versions, contents.sha256);
@@ -162,10 +186,14 @@ void ArchiveFolder::Fetch(const ArchiveVersion& version, const std::wstring& cop
     if (!source)
     {
         if (ArchiveFiles::IsMissing(GetLastError()))
+        {
             ThrowDamaged(L"The version's contents are missing in the archive");
+        }
         ArchiveFiles::ThrowLastError(L"The version's contents cannot be opened");
     }
     const ArchiveFiles::Contents contents = ArchiveFiles::Copy(source.get(), copy, version.lastWrite);
     if (contents.sha256 != version.sha256 || contents.size != version.size)
+    {
         ThrowDamaged(L"The version's contents in the archive are damaged");
+    }
 }

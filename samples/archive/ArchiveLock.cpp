@@ -6,9 +6,13 @@ ArchiveLock::ArchiveLock(const std::wstring& lockFile, std::chrono::milliseconds
     while (!(m_file = ArchiveFiles::Open(lockFile, GENERIC_WRITE, 0, OPEN_ALWAYS)))
     {
         if (GetLastError() != ERROR_SHARING_VIOLATION)
+        {
             ArchiveFiles::ThrowLastError(L"The archive cannot be locked");
+        }
         if (std::chrono::steady_clock::now() >= end)
+        {
             throw ArchiveFailure{ArchiveError::Busy, L"Another program is working on the archive", {}};
+        }
         Sleep(5);
     }
 }

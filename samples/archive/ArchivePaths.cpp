@@ -22,7 +22,9 @@ constexpr wchar_t Outside[] = L"The file lies outside the project folder";
 bool TakePrefix(std::wstring_view& text, std::wstring_view prefix)
 {
     if (!text.starts_with(prefix))
+    {
         return false;
+    }
     text.remove_prefix(prefix.size());
     return true;
 }
@@ -30,18 +32,24 @@ bool TakePrefix(std::wstring_view& text, std::wstring_view prefix)
 void CheckName(std::wstring_view name)
 {
     if (name == L"..")
+    {
         Refuse(L"Paths with \"..\" are not taken");
+    }
     const bool hasBadCharacter = std::any_of(
         name.begin(), name.end(), [](wchar_t character) { return character < L' ' || wcschr(L"<>:\"|?*", character); });
     if (hasBadCharacter || name.back() == L'.' || name.back() == L' ')
+    {
         Refuse(L"Not a file name that can be used");
+    }
 }
 
 /// The form of a full path in which Windows neither limits the length nor changes a name.
 std::wstring LongForm(const std::wstring& given)
 {
     if (given.size() > MaxPathLength || !ArchiveText::IsValid(given))
+    {
         Refuse(L"Not a path that can be used");
+    }
     std::wstring path = given;
     std::replace(path.begin(), path.end(), L'/', L'\\');
 
@@ -50,7 +58,9 @@ std::wstring LongForm(const std::wstring& given)
     const bool isLong = !isLongShare && TakePrefix(rest, LongPrefix);
     std::wstring result;
     if (isLongShare || (!isLong && !rest.starts_with(L"\\\\.\\") && TakePrefix(rest, L"\\\\")))
+    {
         result = L"\\\\?\\UNC";
+    }
     else if (rest.size() >= 3 && ((rest[0] | 0x20) >= L'a' && (rest[0] | 0x20) <= L'z') && rest[1] == L':' &&
              rest[2] == L'\\')
     {
@@ -58,14 +68,18 @@ std::wstring LongForm(const std::wstring& given)
         rest.remove_prefix(3);
     }
     else
+    {
         Refuse(L"Not a full path");
+    }
 
     while (!rest.empty())
     {
         const std::wstring_view name = rest.substr(0, rest.find(L'\\'));
         rest.remove_prefix(std::min(rest.size(), name.size() + 1));
         if (name.empty() || name == L".")
+        {
             continue;
+        }
         CheckName(name);
         result.append(1, L'\\').append(name);
     }
@@ -84,11 +98,15 @@ std::wstring FinalPath(const std::wstring& folder, DWORD& error)
                            OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS);
     while (handle && (length = GetFinalPathNameByHandleW(handle.get(), path.data(), static_cast<DWORD>(path.size()),
                                                          FILE_NAME_NORMALIZED)) > path.size())
+    {
         path.resize(length);
+    }
     error = GetLastError();
     path.resize(length);
     if (path.ends_with(L'\\'))
+    {
         path.pop_back();
+    }
     return path;
 }
 
@@ -103,7 +121,9 @@ std::wstring FindPlace(const std::wstring& path, DWORD& error)
     {
         end = path.rfind(L'\\', end - 1);
         if (end < LongPrefix.size())
+        {
             return {};
+        }
     }
     while (end < path.size())
     {
@@ -112,7 +132,9 @@ std::wstring FindPlace(const std::wstring& path, DWORD& error)
         const std::wstring name = path.substr(begin, end - begin);
         const std::optional<ArchiveFiles::Facts> facts = ArchiveFiles::Find(place + L'\\' + name);
         if (facts && facts->isLink)
+        {
             Refuse(LinkReason);
+        }
         place.append(1, L'\\').append(facts ? facts->name : name);
     }
     return place;
@@ -138,7 +160,9 @@ std::wstring ArchivePaths::FindFolder(const std::wstring& path)
     DWORD error = GetFileAttributesW((longForm + L'\\').c_str()) == INVALID_FILE_ATTRIBUTES ? GetLastError() : 0;
     std::wstring place = error == 0 ? FindPlace(longForm, error) : L"";
     if (place.empty())
+    {
         ArchiveFiles::ThrowError(L"The folder cannot be opened", error);
+    }
     return place;
 }
 
@@ -146,7 +170,9 @@ std::wstring ArchivePaths::ShortForm(const std::wstring& path)
 {
     std::wstring_view rest = path;
     if (TakePrefix(rest, LongSharePrefix))
+    {
         return L"\\\\" + std::wstring(rest);
+    }
     TakePrefix(rest, LongPrefix);
     return std::wstring(rest);
 }
@@ -160,7 +186,9 @@ bool ArchivePaths::IsReserved(std::wstring_view path)
     {
         const std::wstring_view name = rest.substr(0, rest.find(L'\\'));
         if (name == archiveName || name == temporaryName)
+        {
             return true;
+        }
         rest.remove_prefix(std::min(rest.size(), name.size() + 1));
     }
     return false;
@@ -177,13 +205,19 @@ ArchiveTarget ArchivePaths::Resolve(const std::wstring& path)
     target.facts = ArchiveFiles::Find(folder + L'\\' + name);
     target.path = folder + L'\\' + (target.facts ? target.facts->name : name);
     if (target.facts && target.facts->IsFolder())
+    {
         Refuse(L"A folder is not a file");
+    }
     if (target.facts && target.facts->isLink)
+    {
         Refuse(LinkReason);
+    }
 
     target.relative = target.path.substr(m_project.size() + 1);
     if (IsReserved(target.relative))
+    {
         Refuse(L"The name is reserved for the archive");
+    }
     std::replace(target.relative.begin(), target.relative.end(), L'\\', L'/');
     target.key = KeyOf(target.relative);
     return target;
@@ -208,23 +242,33 @@ std::string ArchivePaths::KeyOf(std::wstring_view relative)
 void ArchivePaths::MakeFolders(const ArchiveTarget& target) const
 {
     for (std::size_t end = m_project.size(); (end = target.path.find(L'\\', end + 1)) != std::wstring::npos;)
+    {
         ArchiveFiles::MakeFolder(target.path.substr(0, end));
+    }
 }
 
 const std::wstring& ArchivePaths::ResolveFolder(const std::wstring& path)
 {
     const auto known = m_folders.find(path);
     if (known != m_folders.end())
+    {
         return known->second;
+    }
 
     DWORD error = 0;
     const std::wstring place = FindPlace(path, error);
     if (place.empty() && IsInside(ArchiveText::Fold(path), m_foldedProject))
+    {
         ArchiveFiles::ThrowError(L"The file's folder cannot be opened", error);
+    }
     const std::wstring foldedPlace = ArchiveText::Fold(place);
     if (!IsInside(foldedPlace, m_foldedProject))
+    {
         Refuse(Outside);
+    }
     if (IsInside(foldedPlace, m_foldedArchive))
+    {
         Refuse(L"The file lies in the archive");
+    }
     return m_folders.emplace(path, place).first->second;
 }

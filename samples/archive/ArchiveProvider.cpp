@@ -41,20 +41,34 @@ std::wstring Text(const wchar_t* text)
 unsigned long FlagsOf(const ArchiveStatus& status)
 {
     if (!status.controlled)
+    {
         return 0x1 | 0x100000;
+    }
     unsigned long flags = 0x2 | 0x200000 | 0x400000;
     if (status.checkedOut)
+    {
         flags |= 0x4 | 0x10000 | 0x40000;
+    }
     if (status.checkedOutByOther)
+    {
         flags |= 0x8;
+    }
     if (status.outOfDate)
+    {
         flags |= 0x10;
+    }
     if (status.modified)
+    {
         flags |= 0x80;
+    }
     if (!status.checkedOut && !status.checkedOutByOther && !status.outOfDate)
+    {
         flags |= 0x20000;
+    }
     if (status.checkedOut || status.modified)
+    {
         flags |= 0x80000;
+    }
     return flags;
 }
 
@@ -85,10 +99,14 @@ int ArchiveProvider::Initialize(OrvixClientInfo* info)
     return Guarded([&] {
         Uninitialize();
         if (!info)
+        {
             return Failed;
+        }
         m_user = Text(info->GetUserNameW());
         if (m_user.empty())
+        {
             m_user = ArchiveReport::WindowsUser();
+        }
         m_clientAccess = info->GetIOrvixClientAccess();
         m_initialized = true;
         return Success;
@@ -135,7 +153,9 @@ int ArchiveProvider::FileOperation(OrvixFileList* list, Work work)
 {
     return Guarded([&] {
         if (!list)
+        {
             return Failed;
+        }
         const unsigned int count = list->NumActiveEntries();
         Paths paths;
         paths.reserve(count);
@@ -144,7 +164,9 @@ int ArchiveProvider::FileOperation(OrvixFileList* list, Work work)
             OrvixFileEntry* entry = list->GetActiveFileEntry(i);
             const wchar_t* path = entry ? entry->GetFile() : nullptr;
             if (!path)
+            {
                 return Failed;
+            }
             paths.emplace_back(path);
         }
         return paths.empty() ? Failed : work(paths);
@@ -204,7 +226,9 @@ int ArchiveProvider::ShowHistory(OrvixFileList* list)
         std::vector<ArchiveRecord> records;
         const int result = Report(m_store.History(paths, records));
         for (const ArchiveRecord& record : records)
+        {
             Output(ArchiveReport::History(record));
+        }
         return result;
     });
 }
@@ -215,7 +239,9 @@ int ArchiveProvider::ShowProperties(OrvixFileList* list)
         std::vector<ArchiveRecord> records;
         const int result = Report(m_store.History(std::span(paths).first(1), records));
         for (const ArchiveRecord& record : records)
+        {
             Output(ArchiveReport::Properties(record));
+        }
         return result;
     });
 }
@@ -228,11 +254,15 @@ int ArchiveProvider::QueryStatus(OrvixFileList* list, unsigned long)
         {
             std::vector<ArchiveStatus> statuses;
             if (Report(m_store.Status(paths, statuses)) != Success)
+            {
                 return Failed;
+            }
             std::transform(statuses.begin(), statuses.end(), flags.begin(), FlagsOf);
         }
         for (unsigned int i = 0; i < flags.size(); ++i)
+        {
             list->GetActiveFileEntry(i)->SetFlagsOut(flags[i]);
+        }
         return Success;
     });
 }
@@ -271,14 +301,20 @@ bool ArchiveProvider::ReservedI()
 int ArchiveProvider::Report(const ArchiveFailures& failures)
 {
     for (const ArchiveFailure& failure : failures)
+    {
         Output(ArchiveReport::Failure(failure));
+    }
     return failures.empty() ? Success : Failed;
 }
 
 void ArchiveProvider::Output(const ArchiveReport::Lines& lines)
 {
     if (!m_clientAccess)
+    {
         return;
+    }
     for (const std::wstring& line : lines)
+    {
         m_clientAccess->OutputText(line.c_str(), 0);
+    }
 }

@@ -17,7 +17,9 @@ std::optional<std::string_view> TakeLine(std::string_view& text)
 {
     const std::size_t end = text.find('\n');
     if (end == std::string_view::npos)
+    {
         return std::nullopt;
+    }
     const std::string_view line = text.substr(0, end);
     text.remove_prefix(end + 1);
     return line;
@@ -31,7 +33,9 @@ Fields Split(std::string_view line)
         const std::size_t end = line.find('\t');
         fields.push_back(line.substr(0, end));
         if (end == std::string_view::npos)
+        {
             return fields;
+        }
         line.remove_prefix(end + 1);
     }
 }
@@ -41,7 +45,9 @@ bool ReadText(std::string_view field, std::wstring& text)
     const std::optional<std::string> plain = ArchiveText::Unescape(field);
     std::optional<std::wstring> wide = plain ? ArchiveText::FromUtf8(*plain) : std::nullopt;
     if (!wide || wide->find(L'\0') != std::wstring::npos)
+    {
         return false;
+    }
     text = std::move(*wide);
     return true;
 }
@@ -56,11 +62,15 @@ bool ReadTime(std::string_view field, std::string& time)
 {
     constexpr std::string_view Pattern = "dddd-dd-ddTdd:dd:ddZ";
     if (field.size() != Pattern.size())
+    {
         return false;
+    }
     for (std::size_t i = 0; i < Pattern.size(); ++i)
     {
         if (Pattern[i] == 'd' ? field[i] < '0' || field[i] > '9' : field[i] != Pattern[i])
+        {
             return false;
+        }
     }
     time = field;
     return true;
@@ -69,7 +79,9 @@ bool ReadTime(std::string_view field, std::string& time)
 bool ReadDigest(std::string_view field, std::string& digest)
 {
     if (field.size() != 64 || field.find_first_not_of("0123456789abcdef") != std::string_view::npos)
+    {
         return false;
+    }
     digest = field;
     return true;
 }
@@ -101,11 +113,15 @@ std::optional<ArchiveRecord> ArchiveRecord::Parse(std::string_view text)
     ArchiveRecord record;
     std::optional<std::string_view> line = TakeLine(text);
     if (line != FirstLine || !(line = TakeLine(text)))
+    {
         return std::nullopt;
+    }
 
     Fields fields = Split(*line);
     if (fields.size() != 2 || fields[0] != "path" || !ReadText(fields[1], record.path))
+    {
         return std::nullopt;
+    }
 
     while ((line = TakeLine(text)) && line != LastLine)
     {
@@ -113,16 +129,22 @@ std::optional<ArchiveRecord> ArchiveRecord::Parse(std::string_view text)
         if (fields[0] == "checkout" && !record.checkOut && record.versions.empty())
         {
             if (!ReadCheckOut(fields, record.checkOut.emplace()))
+            {
                 return std::nullopt;
+            }
             continue;
         }
         ArchiveVersion version;
         if (fields[0] != "version" || !ReadVersion(fields, record.versions.size() + 1, version))
+        {
             return std::nullopt;
+        }
         record.versions.push_back(std::move(version));
     }
     if (!line || !text.empty() || record.versions.empty())
+    {
         return std::nullopt;
+    }
     return record;
 }
 
@@ -131,11 +153,15 @@ std::string ArchiveRecord::Format() const
     std::string text(FirstLine);
     text += "\npath" + Field(path) + '\n';
     if (checkOut)
+    {
         text += "checkout\t" + checkOut->time + Field(checkOut->user) + Field(checkOut->comment) + '\n';
+    }
     std::size_t number = 0;
     for (const ArchiveVersion& version : versions)
+    {
         text += "version\t" + std::to_string(++number) + '\t' + version.time + Field(version.user) + '\t' +
                 version.sha256 + '\t' + std::to_string(version.size) + '\t' + std::to_string(version.lastWrite) +
                 Field(version.comment) + '\n';
+    }
     return text.append(LastLine) + '\n';
 }

@@ -16,7 +16,9 @@ void Append(ArchiveReport::Lines& lines, const std::wstring& text)
     {
         const std::size_t end = std::min(text.find_first_of(L"\r\n", begin), text.size());
         if (end > begin || begin == 0)
+        {
             lines.push_back((begin > 0 ? L"     " : L"") + text.substr(begin, end - begin));
+        }
         begin = end + 1;
     }
 }

@@ -110,16 +110,26 @@ SCCRTN ResultOf(ArchiveError error)
 LONG StatusOf(const ArchiveStatus& status)
 {
     if (!status.controlled)
+    {
         return 0;
+    }
     LONG bits = SCC_STATUS_CONTROLLED;
     if (status.checkedOut)
+    {
         bits |= SCC_STATUS_CHECKEDOUT | SCC_STATUS_OUTBYUSER | SCC_STATUS_OUTEXCLUSIVE;
+    }
     if (status.checkedOutByOther)
+    {
         bits |= SCC_STATUS_OUTOTHER | SCC_STATUS_OUTEXCLUSIVE;
+    }
     if (status.outOfDate)
+    {
         bits |= SCC_STATUS_OUTOFDATE;
+    }
     if (status.modified)
+    {
         bits |= SCC_STATUS_MODIFIED;
+    }
     return bits;
 }
 
@@ -156,16 +166,22 @@ SCCRTN ArchiveScc::OpenProject(LPSTR user, LPCSTR projectName, LPCSTR localPath,
                                LONG flags)
 {
     if (!user || !projectName || !localPath || !auxPath)
+    {
         return BadArgument;
+    }
     if (m_store.IsOpen())
+    {
         return SCC_E_PROJECTALREADYOPEN;
+    }
     m_output = output;
     m_folder = Text(localPath);
     m_user = UserOf(user);
 
     bool isProject = false;
     if (const ArchiveFailures failures = ArchiveStore::Find(m_folder, isProject); !failures.empty())
+    {
         return Report(failures);
+    }
     const bool wasChosen = m_folder == m_newFolder;
     if (!isProject && !(wasChosen && (flags & SCC_OP_CREATEIFNEW)))
     {
@@ -194,18 +210,26 @@ SCCRTN ArchiveScc::GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, L
                                LPBOOL isNew)
 {
     if (!user || !projectName || !localPath || !auxPath || !isNew)
+    {
         return BadArgument;
+    }
     // The host's local path may be that of an earlier project.
     const bool wasRefused = allowChangePath && !m_refusedFolder.empty();
     const std::wstring folder = wasRefused ? m_refusedFolder : TextIn(localPath, MAX_PATH);
     if (folder.empty())
+    {
         return SCC_E_OPNOTPERFORMED;
+    }
 
     bool isProject = false;
     if (const ArchiveFailures failures = ArchiveStore::Find(folder, isProject); !failures.empty())
+    {
         return Report(failures);
+    }
     if (!isProject && !*isNew)
+    {
         return SCC_E_UNKNOWNPROJECT;
+    }
     *isNew = isProject ? FALSE : TRUE;
     m_newFolder = isProject ? L"" : folder;
     m_refusedFolder.clear();
@@ -214,7 +238,9 @@ SCCRTN ArchiveScc::GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, L
     PutCut(projectName, SCC_PRJPATH_SIZE, LastName(folder));
     PutAuxPath(auxPath);
     if (wasRefused)
+    {
         PutWhole(localPath, MAX_PATH, folder);
+    }
     return SCC_OK;
 }
 
@@ -223,12 +249,18 @@ template <typename Work>
 SCCRTN ArchiveScc::FileOperation(LONG count, LPCSTR* names, Work work)
 {
     if (count <= 0 || !names)
+    {
         return BadArgument;
+    }
     const std::span all(names, static_cast<std::size_t>(count));
     if (std::find(all.begin(), all.end(), nullptr) != all.end())
+    {
         return BadArgument;
+    }
     if (!m_store.IsOpen())
+    {
         return SCC_E_PROJNOTOPEN;
+    }
     Paths paths(all.size());
     std::transform(all.begin(), all.end(), paths.begin(), Text);
     return work(paths);
@@ -239,7 +271,9 @@ ArchiveFailures ArchiveScc::Expand(Paths& paths, LONG options) const
 {
     ArchiveFailures failures;
     if (!(options & SCC_GET_ALL))
+    {
         return failures;
+    }
     Paths all;
     Paths files;
     for (const std::wstring& folder : paths)
@@ -284,7 +318,9 @@ SCCRTN ArchiveScc::Checkin(LONG count, LPCSTR* names, LPCSTR comment, LONG optio
 SCCRTN ArchiveScc::Add(LONG count, LPCSTR* names, LPCSTR comment, const LONG* options)
 {
     if (!options)
+    {
         return BadArgument;
+    }
     return FileOperation(count, names, [&](const Paths& paths) {
         ArchiveFailures failures;
         for (const LONG kept : {0L, SCC_KEEP_CHECKEDOUT})
@@ -293,10 +329,14 @@ SCCRTN ArchiveScc::Add(LONG count, LPCSTR* names, LPCSTR comment, const LONG* op
             for (std::size_t i = 0; i < paths.size(); ++i)
             {
                 if ((options[i] & SCC_KEEP_CHECKEDOUT) == kept)
+                {
                     files.push_back(paths[i]);
+                }
             }
             if (!files.empty())
+            {
                 Append(failures, m_store.Add(files, Text(comment), kept != 0));
+            }
         }
         return Report(failures);
     });
@@ -310,7 +350,9 @@ SCCRTN ArchiveScc::History(LONG count, LPCSTR* names)
         for (const ArchiveRecord& record : records)
         {
             if (!Output(ArchiveReport::History(record), SCC_MSG_INFO))
+            {
                 return SCC_I_OPERATIONCANCELED;
+            }
         }
         return result;
     });
@@ -322,7 +364,9 @@ SCCRTN ArchiveScc::Properties(LPCSTR name)
         std::vector<ArchiveRecord> records;
         const SCCRTN result = Report(m_store.History(paths, records));
         for (const ArchiveRecord& record : records)
+        {
             Output(ArchiveReport::Properties(record), SCC_MSG_INFO);
+        }
         return result;
     });
 }
@@ -330,7 +374,9 @@ SCCRTN ArchiveScc::Properties(LPCSTR name)
 SCCRTN ArchiveScc::QueryInfo(LONG count, LPCSTR* names, LPLONG status)
 {
     if (!status)
+    {
         return BadArgument;
+    }
     std::fill_n(status, std::max(count, 0L), SCC_STATUS_INVALID);
     return FileOperation(count, names, [&](const Paths& paths) {
         std::vector<ArchiveStatus> statuses;
@@ -344,17 +390,25 @@ SCCRTN ArchiveScc::PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, P
                                 LPLONG status, LONG options)
 {
     if (!callback)
+    {
         return BadArgument;
+    }
     if (options & SCC_PL_DIR)
+    {
         return SCC_E_OPNOTSUPPORTED;
+    }
     const SCCRTN result = QueryInfo(count, names, status);
     if (result != SCC_OK)
+    {
         return result;
+    }
     for (LONG i = 0; i < count; ++i)
     {
         std::string name = names[i];
         if (!IsFor(command, status[i]) && !callback(callerData, FALSE, status[i], name.data()))
+        {
             return SCC_I_OPERATIONCANCELED;
+        }
     }
     return SCC_OK;
 }
@@ -368,11 +422,17 @@ SCCRTN ArchiveScc::RunScc()
 SCCRTN ArchiveScc::GetCommandOptions(SCCCOMMAND command, LPCMDOPTS* block)
 {
     if (command != SCC_COMMAND_OPTIONS)
+    {
         return SCC_E_OPNOTSUPPORTED;
+    }
     if (!block)
+    {
         return SCC_I_ADV_SUPPORT;
+    }
     if (!m_store.IsOpen())
+    {
         return SCC_E_PROJNOTOPEN;
+    }
     Output({L"archive  " + m_store.ArchivePath(), L"user     " + m_user}, SCC_MSG_INFO);
     return SCC_OK;
 }
@@ -385,13 +445,19 @@ SCCRTN ArchiveScc::AddFromScc(LPLONG count, LPCSTR** names)
     m_broughtFiles.clear();
     m_broughtNames.clear();
     if (!count)
+    {
         return SCC_OK;
+    }
     if (!names)
+    {
         return BadArgument;
+    }
     *count = 0;
     *names = nullptr;
     if (!m_store.IsOpen())
+    {
         return SCC_E_PROJNOTOPEN;
+    }
 
     Paths held;
     ArchiveFailures failures = m_store.List(folder, true, held);
@@ -401,21 +467,31 @@ SCCRTN ArchiveScc::AddFromScc(LPLONG count, LPCSTR** names)
     for (std::size_t i = 0; i < statuses.size(); ++i)
     {
         if (!statuses[i].missing)
+        {
             continue;
+        }
         if (IsAnsi(held[i]))
+        {
             missing.push_back(held[i]);
+        }
         else
+        {
             failures.push_back({ArchiveError::InvalidPath, L"The ANSI code page lacks a letter of the name", held[i]});
+        }
     }
 
     const ArchiveFailures notBrought = m_store.GetLatest(missing);
     std::unordered_set<std::wstring> failed;
     for (const ArchiveFailure& failure : notBrought)
+    {
         failed.insert(failure.file);
+    }
     for (const std::wstring& file : missing)
     {
         if (!failed.contains(file) && !failed.contains(L""))
+        {
             m_broughtFiles.push_back(ArchiveText::ToAnsi(file));
+        }
     }
     std::transform(m_broughtFiles.begin(), m_broughtFiles.end(), std::back_inserter(m_broughtNames),
                    [](const std::string& file) { return file.c_str(); });
@@ -436,7 +512,9 @@ SCCRTN ArchiveScc::Report(const ArchiveFailures& failures) const
     for (const ArchiveFailure& failure : failures)
     {
         if (!Output(ArchiveReport::Failure(failure), SCC_MSG_ERROR))
+        {
             break;
+        }
     }
     return failures.empty() ? SCC_OK : ResultOf(failures.front().error);
 }

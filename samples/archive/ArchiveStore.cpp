@@ -51,7 +51,9 @@ public:
     ArchiveRecord Load(const ArchiveTarget& target) const
     {
         if (std::optional<ArchiveRecord> record = Find(target))
+        {
             return *record;
+        }
         throw Failure(ArchiveError::NotControlled, L"Not under control");
     }
 
@@ -70,14 +72,18 @@ public:
     void RefuseOthers(const ArchiveRecord& record) const
     {
         if (IsOthers(record))
+        {
             throw Failure(ArchiveError::CheckedOutByOther, L"Checked out by " + record.checkOut->user);
+        }
     }
 
     void RequireMine(const ArchiveRecord& record) const
     {
         RefuseOthers(record);
         if (!record.checkOut)
+        {
             throw Failure(ArchiveError::NotCheckedOut, L"Not checked out");
+        }
     }
 
     ArchiveCheckOut NewCheckOut(const std::wstring& comment) const
@@ -89,11 +95,15 @@ public:
     ArchiveVersion StoreVersion(const ArchiveTarget& target, const std::wstring& comment) const
     {
         if (!target.facts)
+        {
             throw Failure(ArchiveError::NoSuchFile, L"There is no such file");
+        }
         const ArchiveFiles::UniqueHandle file =
             ArchiveFiles::Open(target.path, GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING);
         if (!file)
+        {
             ArchiveFiles::ThrowLastError(L"The file cannot be opened");
+        }
         const ArchiveFiles::Contents contents = m_project.archive.Store(file.get());
         return {ArchiveText::Now(), m_project.user, contents.sha256, contents.size, contents.lastWrite, comment};
     }
@@ -102,7 +112,9 @@ public:
     void Bring(ArchiveTarget& target, const ArchiveRecord& record, bool readOnly) const
     {
         if (!target.facts)
+        {
             m_paths.MakeFolders(target);
+        }
         const std::size_t separator = target.path.rfind(L'\\');
         const ArchiveFiles::TemporaryFile copy(
             target.path.substr(0, separator + 1).append(ArchivePaths::TemporaryName));
@@ -124,27 +136,37 @@ private:
 Local ArchiveStore::Session::Compare(const ArchiveTarget& target, const ArchiveRecord& record, Proof proof)
 {
     if (!target.facts)
+    {
         return Local::Missing;
+    }
     const ArchiveFiles::Facts& facts = *target.facts;
 
     const auto findNewest = [&](auto isEqual) {
         const auto found = std::find_if(record.versions.rbegin(), record.versions.rend(), isEqual);
         if (found == record.versions.rend())
+        {
             return Local::Other;
+        }
         return found == record.versions.rbegin() ? Local::Latest : Local::Older;
     };
     const auto hasSize = [&](const ArchiveVersion& version) { return version.size == facts.size; };
     const Local byTime = findNewest(
         [&](const ArchiveVersion& version) { return hasSize(version) && version.lastWrite == facts.lastWrite; });
     if (proof == Proof::SizeAndTime && byTime != Local::Other)
+    {
         return byTime;
+    }
     if (findNewest(hasSize) == Local::Other)
+    {
         return Local::Other;
+    }
 
     const ArchiveFiles::UniqueHandle file = ArchiveFiles::Open(
         target.path, GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, OPEN_EXISTING);
     if (!file)
+    {
         ArchiveFiles::ThrowLastError(L"The file cannot be opened");
+    }
     const std::string sha256 = ArchiveFiles::Read(file.get()).sha256;
     return findNewest([&](const ArchiveVersion& version) { return version.sha256 == sha256; });
 }
@@ -153,21 +175,31 @@ void ArchiveStore::Session::GetLatest(ArchiveTarget& target, const ArchiveRecord
 {
     Local local = Compare(target, record, Proof::SizeAndTime);
     if (local == Local::Missing)
+    {
         return Bring(target, record, !IsMine(record));
+    }
     if (IsMine(record))
+    {
         return;
+    }
 
     const bool mayBeOthersCopy = IsOthers(record) && !target.facts->IsReadOnly();
     if (local == Local::Latest)
     {
         if (!mayBeOthersCopy)
+        {
             ArchiveFiles::SetReadOnly(target.path, true);
+        }
         return;
     }
     if (local == Local::Older)
+    {
         local = Compare(target, record, Proof::Contents);
+    }
     if (local == Local::Other || mayBeOthersCopy)
+    {
         throw Failure(ArchiveError::Modified, L"Changed on disk without a check-out, so it is not overwritten");
+    }
     Bring(target, record, true);
 }
 
@@ -177,10 +209,14 @@ ArchiveFailures ArchiveStore::Open(const std::wstring& projectFolder, const std:
     try
     {
         if (user.empty() || !ArchiveText::IsValid(user))
+        {
             throw Failure(ArchiveError::Access, L"The user has no name that can be used");
+        }
         const std::wstring folder = ArchivePaths::FindFolder(projectFolder);
         if (ArchivePaths::IsReserved(folder))
+        {
             throw Failure(ArchiveError::InvalidPath, L"An archive is not a project");
+        }
         m_project = Project{folder, ArchiveFolder(folder, m_lockWait), user};
     }
     catch (const ArchiveFailure& failure)
@@ -216,10 +252,14 @@ ArchiveFailures ArchiveStore::ForEachFile(std::span<const std::wstring> files, b
     try
     {
         if (!m_project)
+        {
             throw Failure(ArchiveError::NotOpen, L"No project is open");
+        }
         std::optional<ArchiveLock> lock;
         if (withLock)
+        {
             lock.emplace(m_project->archive.LockFile(), m_lockWait);
+        }
 
         Session session(*m_project);
         std::unordered_set<std::string> done;
@@ -229,7 +269,9 @@ ArchiveFailures ArchiveStore::ForEachFile(std::span<const std::wstring> files, b
             {
                 ArchiveTarget target = session.Resolve(file);
                 if (done.insert(target.key).second)
+                {
                     work(session, target);
+                }
             }
             catch (ArchiveFailure& failure)
             {
@@ -249,12 +291,16 @@ ArchiveFailures ArchiveStore::Add(std::span<const std::wstring> files, const std
 {
     return ForEachFile(files, true, [&](Session& session, ArchiveTarget& target) {
         if (session.Find(target))
+        {
             throw Failure(ArchiveError::AlreadyControlled, L"Already under control");
+        }
         ArchiveRecord record;
         record.path = target.relative;
         record.versions.push_back(session.StoreVersion(target, comment));
         if (keepCheckedOut)
+        {
             record.checkOut = session.NewCheckOut(comment);
+        }
         session.Save(target, record);
         ArchiveFiles::SetReadOnly(target.path, !keepCheckedOut);
     });
@@ -283,7 +329,9 @@ ArchiveFailures ArchiveStore::CheckOut(std::span<const std::wstring> files, cons
         const bool isMine = session.IsMine(record);
         const Local local = Session::Compare(target, record, Proof::SizeAndTime);
         if (local == Local::Missing || (local == Local::Older && !isMine))
+        {
             throw outOfDate;
+        }
         if (!isMine)
         {
             record.checkOut = session.NewCheckOut(comment);
@@ -301,7 +349,9 @@ ArchiveFailures ArchiveStore::CheckIn(std::span<const std::wstring> files, const
         session.RequireMine(record);
         record.versions.push_back(session.StoreVersion(target, comment));
         if (!keepCheckedOut)
+        {
             record.checkOut.reset();
+        }
         session.Save(target, record);
         ArchiveFiles::SetReadOnly(target.path, !keepCheckedOut);
     });
@@ -315,9 +365,13 @@ ArchiveFailures ArchiveStore::UndoCheckOut(std::span<const std::wstring> files)
 
         // Nobody else can have stored a version since, so the latest is the one checked out.
         if (Session::Compare(target, record, Proof::Contents) == Local::Latest)
+        {
             ArchiveFiles::SetReadOnly(target.path, true);
+        }
         else
+        {
             session.Bring(target, record, true);
+        }
         record.checkOut.reset();
         session.Save(target, record);
     });
@@ -340,7 +394,9 @@ ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::v
 {
     statuses.clear();
     if (!m_project)
+    {
         return {Failure(ArchiveError::NotOpen, L"No project is open")};
+    }
 
     Session session(*m_project);
     const auto statusOf = [&](const ArchiveTarget& target) {
@@ -348,7 +404,9 @@ ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::v
         status.missing = !target.facts;
         const std::optional<ArchiveRecord> record = session.Find(target);
         if (!record)
+        {
             return status;
+        }
         status.controlled = true;
         status.checkedOut = session.IsMine(*record);
         status.checkedOutByOther = session.IsOthers(*record);
@@ -378,13 +436,17 @@ ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::v
         {
             statuses.emplace_back();
             if (failure.error == ArchiveError::InvalidPath)
+            {
                 continue;
+            }
             failure.file = file;
             failures.push_back(std::move(failure));
         }
     }
     if (!failures.empty())
+    {
         statuses.clear();
+    }
     return failures;
 }
 
@@ -393,7 +455,9 @@ ArchiveFailures ArchiveStore::List(const std::wstring& folder, bool withSubfolde
 {
     files.clear();
     if (!m_project)
+    {
         return {Failure(ArchiveError::NotOpen, L"No project is open")};
+    }
 
     ArchiveFailures failures;
     try
@@ -406,7 +470,9 @@ ArchiveFailures ArchiveStore::List(const std::wstring& folder, bool withSubfolde
             std::wstring rest = path.substr(std::min(path.size(), inside.size()));
             if (!ArchiveText::Fold(path).starts_with(inside) ||
                 (!withSubfolders && rest.find(L'/') != std::wstring::npos))
+            {
                 continue;
+            }
             std::replace(rest.begin(), rest.end(), L'/', L'\\');
             files.push_back(above + rest);
         }

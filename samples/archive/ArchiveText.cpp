@@ -12,7 +12,9 @@ namespace
 int Length(std::size_t size)
 {
     if (size > INT_MAX)
+    {
         throw std::length_error("text too long");
+    }
     return static_cast<int>(size);
 }
 
@@ -30,7 +32,9 @@ std::optional<std::wstring> FromBytes(UINT codePage, DWORD flags, std::string_vi
     const int size = Length(bytes.size());
     const int length = MultiByteToWideChar(codePage, flags, bytes.data(), size, nullptr, 0);
     if (length == 0 && size != 0)
+    {
         return std::nullopt;
+    }
     std::wstring text(static_cast<std::size_t>(length), L'\0');
     MultiByteToWideChar(codePage, flags, bytes.data(), size, text.data(), length);
     return text;
@@ -69,8 +73,10 @@ std::wstring ArchiveText::Fold(std::wstring_view text)
     const int length = Length(text.size());
     std::wstring folded(text);
     if (length != 0)
+    {
         LCMapStringEx(LOCALE_NAME_INVARIANT, LCMAP_UPPERCASE, text.data(), length, folded.data(), length, nullptr,
                       nullptr, 0);
+    }
     return folded;
 }
 
@@ -114,7 +120,9 @@ std::optional<std::string> ArchiveText::Unescape(std::string_view text)
         }
         const std::size_t which = ++i < text.size() ? Letters.find(text[i]) : std::string_view::npos;
         if (which == std::string_view::npos)
+        {
             return std::nullopt;
+        }
         plain += Characters[which];
     }
     return plain;
@@ -127,7 +135,9 @@ std::wstring ArchiveText::SystemMessage(unsigned long code)
         FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS | FORMAT_MESSAGE_MAX_WIDTH_MASK,
                        nullptr, code, 0, buffer, static_cast<DWORD>(std::size(buffer)), nullptr);
     while (length > 0 && buffer[length - 1] <= L' ')
+    {
         --length;
+    }
     return length > 0 ? std::wstring(buffer, length) : L"Windows error " + std::to_wstring(code);
 }
 

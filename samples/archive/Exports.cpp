@@ -30,14 +30,20 @@ extern "C" const wchar_t* GetOrvixProviderName()
 extern "C" IOrvixProvider* GetIOrvixProvider()
 {
     if (!theProvider)
+    {
         theProvider.reset(new ArchiveProvider);
+    }
     if (theProvider)
+    {
         ++requests;
+    }
     return theProvider.get();
 }
 
 extern "C" void ReleaseIOrvixProvider(IOrvixProvider* provider)
 {
     if (provider && provider == theProvider.get() && --requests == 0)
+    {
         theProvider.reset();
+    }
 }

@@ -37,7 +37,9 @@ SCCRTN WithSession(LPVOID context, Work work) noexcept
     return Guarded([&] {
         const auto found = sessions.find(context);
         if (found == sessions.end())
+        {
             return SCC_E_INITIALIZEFAILED;
+        }
         const std::shared_ptr<ArchiveScc> session = found->second;
         return work(*session);
     });
@@ -55,7 +57,9 @@ SCCRTN SccInitialize(LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabi
 {
     return Guarded([&] {
         if (!context || !sccName || !capabilities || !auxPathLabel || !checkoutCommentLength || !commentLength)
+        {
             return SCC_E_INITIALIZEFAILED;
+        }
         const auto session = std::make_shared<ArchiveScc>();
         sessions.emplace(session.get(), session);
         *context = session.get();

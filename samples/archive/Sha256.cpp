@@ -12,7 +12,9 @@ namespace
 void Check(NTSTATUS status)
 {
     if (status < 0)
+    {
         throw ArchiveFailure{ArchiveError::Access, L"SHA-256 is not available", {}};
+    }
 }
 
 class Algorithm

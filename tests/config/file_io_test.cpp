@@ -254,7 +254,9 @@ TEST_F(OrvixFileIOChildren, AreWalkedFromTheFirstToTheLast)
     for (bool more = m_file.GetFirstChild(m_node.Get(), child); more; more = m_file.GetNextSibling(child))
     {
         if (m_file.GetNodeName(child.Get(), m_text))
+        {
             names.push_back(m_text);
+        }
     }
     EXPECT_EQ(child, nullptr);
     EXPECT_EQ(names, (std::vector<std::wstring>{L"b", L"c", L"e"}));
@@ -449,7 +451,9 @@ TEST_F(OrvixFileIOAppendText, SavesCharactersThatXmlCannotCarryAsTheReplacementC
 {
     std::wstring text;
     for (wchar_t c = 1; c < 0x20; ++c)
+    {
         text += c;
+    }
     text += L"\xD800";       // the first half of a pair alone
     text += L"-\xDC00-";     // the second half alone
     text += L"\xDC00\xD800"; // both halves in the wrong order

@@ -113,7 +113,9 @@ TEST(PromptTableAddPrompt, TakesATextThatIsTheTablesOwn)
     OrvixPromptTable table;
     table.AddPrompt(1, L"short", 0, 0, false);
     for (int count = 2; count <= 100; ++count)
+    {
         ASSERT_EQ(table.AddPrompt(1, table.GetPromptText(0), 0, 0, false), count);
+    }
     EXPECT_STREQ(table.GetPromptText(99), L"short");
 }
 
@@ -130,7 +132,9 @@ TEST(PromptTableRemoveAll, RemovesEveryRow)
     OrvixPromptTable table;
     table.RemoveAll();
     for (int n = 0; n < 3; ++n)
+    {
         Add(table, Sample);
+    }
     table.RemoveAll();
     EXPECT_EQ(table.NumPrompts(), 0);
     ExpectNoRow(table, 0);
@@ -169,7 +173,9 @@ TEST(PromptTable, SetsEveryFieldOfOneRowAlone)
     OrvixPromptTable table;
     Row changed = Sample;
     for (int n = 0; n < 3; ++n)
+    {
         Add(table, Sample);
+    }
     changed.id = -1;
     EXPECT_TRUE(table.SetPromptID(1, changed.id));
     ExpectRow(table, 1, changed);
@@ -226,7 +232,9 @@ TEST(PromptTable, KeepsTheLockOfEveryRowApart)
         ASSERT_TRUE(table.SetLocked(index, locked[index]));
     }
     for (unsigned int n = 0; n < Count; ++n)
+    {
         ASSERT_EQ(table.GetLocked(n), locked[n]);
+    }
 }
 
 TEST(PromptTable, LimitsNeitherTextsNorRows)
@@ -236,7 +244,9 @@ TEST(PromptTable, LimitsNeitherTextsNorRows)
     table.AddPrompt(1, text.c_str(), 0, 0, false);
     EXPECT_EQ(table.GetPromptText(0), text);
     for (int count = 2; count <= 20'000; ++count)
+    {
         ASSERT_EQ(table.AddPrompt(count, L"t", 0, 0, false), count);
+    }
     EXPECT_EQ(table.GetPromptID(19'999), 20'000);
 }
 
@@ -271,7 +281,9 @@ TEST(PromptTableAllocationFailure, GivesMinusOneFromAddPromptAndKeepsTheFiveFiel
         const long failures = SweepAllocations([&](AllocationRound& round) {
             OrvixPromptTable table;
             for (int n = 0; n < present; ++n)
+            {
                 Add(table, Sample);
+            }
             const Row row{present, LongText, 1, 2, false};
             const int count = round.Attempt([&] { return Add(table, row); });
             EXPECT_EQ(count, round.Failed() ? -1 : present + 1);
@@ -282,7 +294,9 @@ TEST(PromptTableAllocationFailure, GivesMinusOneFromAddPromptAndKeepsTheFiveFiel
             ExpectRow(table, static_cast<unsigned int>(next - 1), row);
             ExpectNoRow(table, static_cast<unsigned int>(next));
             for (unsigned int n = 0; n < static_cast<unsigned int>(present); ++n)
+            {
                 ExpectRow(table, n, Sample);
+            }
         });
         EXPECT_GE(failures, 2) << "the text";
     }

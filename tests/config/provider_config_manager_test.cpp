@@ -35,7 +35,9 @@ protected:
         EXPECT_TRUE(LoadProviders("<P><Name>P</Name><Filters>" + filters + "</Filters></P>"));
         const OrvixProviderConfig* config = m_manager.FindConfig(L"P");
         if (!config)
+        {
             throw std::runtime_error("the provider was dropped");
+        }
         return *config;
     }
 
@@ -54,7 +56,9 @@ std::vector<std::wstring> Names(const OrvixProviderConfig& config)
     std::vector<std::wstring> names;
     names.reserve(config.m_filters.size());
     for (const ProviderFilters* filter : config.m_filters)
+    {
         names.push_back(filter->m_name);
+    }
     return names;
 }
 

@@ -37,7 +37,9 @@ inline std::vector<std::filesystem::path> Files()
         for (const auto& entry : std::filesystem::recursive_directory_iterator(root / folder))
         {
             if (entry.path().extension() == L".md")
+            {
                 files.push_back(entry.path().lexically_relative(root));
+            }
         }
     }
     std::sort(files.begin() + 1, files.end());
@@ -57,12 +59,16 @@ inline std::vector<Fence> Fences()
         {
             ++number;
             if (line.ends_with('\r'))
+            {
                 line.pop_back();
+            }
             if (line.starts_with(mark))
             {
                 inside = !inside;
                 if (inside)
+                {
                     fences.push_back({file.generic_string(), number + 1, line.substr(mark.size()), {}});
+                }
             }
             else if (inside)
             {

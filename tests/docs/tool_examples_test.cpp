@@ -77,17 +77,23 @@ std::optional<CommandLine> Parse(const Call& call)
 bool HasShapeOf(const Json& printed, const Json& shown)
 {
     if (shown.is_null() || printed.is_null())
+    {
         return true;
+    }
     if (shown.is_object() && printed.is_object())
+    {
         return std::equal(shown.items().begin(), shown.items().end(), printed.items().begin(), printed.items().end(),
                           [](const auto& left, const auto& right) {
                               return left.key() == right.key() && HasShapeOf(right.value(), left.value());
                           });
+    }
     if (shown.is_array() && printed.is_array())
+    {
         return std::all_of(shown.begin(), shown.end(), [&](const Json& element) {
             return std::any_of(printed.begin(), printed.end(),
                                [&](const Json& other) { return HasShapeOf(other, element); });
         });
+    }
     return (shown.is_number() && printed.is_number()) || shown.type() == printed.type();
 }
 
@@ -102,7 +108,9 @@ protected:
         Write(L"plugins\\broken.dll", "no library");
         const std::wstring plugins = File(L"plugins").wstring();
         for (const wchar_t* command : {L"status", L"add", L"checkout", L"checkin", L"undo", L"get", L"history"})
+        {
             Print({command, L"a.txt"});
+        }
         Print({L"providers"});
         Print({L"filters", L"a.txt"});
         Print({L"prompts", L"list"});
@@ -150,7 +158,9 @@ TEST_F(ShownJson, HasTheKeysThatTheToolPrints)
     for (const Guides::Fence& fence : Guides::Fences())
     {
         if (fence.language != "json")
+        {
             continue;
+        }
         const Json shown = Json::parse(fence.text, nullptr, false);
         EXPECT_TRUE(std::any_of(Printed().begin(), Printed().end(),
                                 [&](const auto& printed) { return HasShapeOf(printed.second, shown); }))
@@ -165,7 +175,9 @@ TEST_F(ShownJson, BelowACallHasTheKeysThatItPrints)
     {
         const std::optional<CommandLine> commandLine = Parse(call);
         if (!commandLine || !commandLine->json || call.output.empty())
+        {
             continue;
+        }
         const Json shown = Json::parse(call.output, nullptr, false);
         ASSERT_TRUE(Printed().contains(commandLine->command)) << call.place;
         EXPECT_TRUE(HasShapeOf(Printed().at(commandLine->command), shown)) << call.place << '\n' << call.output;

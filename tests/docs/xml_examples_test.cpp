@@ -35,7 +35,9 @@ std::vector<Guides::Fence> Examples()
     {
         example.text = WithoutDefaults(example.text);
         if (!std::regex_search(example.text, root))
+        {
             example.text = "<OrvixProviders>" + example.text + "</OrvixProviders>";
+        }
     }
     return examples;
 }
@@ -58,7 +60,9 @@ protected:
         for (long i = 0; file.GetChildNode(nullptr, i, node); ++i)
         {
             if (file.GetNodeName(node.Get(), name))
+            {
                 return visit(file, node.Get());
+            }
         }
         ADD_FAILURE() << "not well-formed";
     }
@@ -78,13 +82,19 @@ protected:
         const std::function<bool(OrvixFileIO&, IXMLDOMNode*)> visit = [&](OrvixFileIO& file, IXMLDOMNode* node) {
             std::wstring text;
             if (!file.GetNodeName(node, text))
+            {
                 return false;
+            }
             bool holdsElements = false;
             OrvixFileIO::Node child;
             for (bool more = file.GetFirstChild(node, child); more; more = file.GetNextSibling(child))
+            {
                 holdsElements = visit(file, child.Get()) || holdsElements;
+            }
             if (!holdsElements && file.GetNodeText(node, text))
+            {
                 texts.push_back(UpperCase(text));
+            }
             return true;
         };
         WithDocument(visit);
@@ -102,7 +112,9 @@ protected:
             for (bool more = file.GetFirstChild(root, provider); more; more = file.GetNextSibling(provider))
             {
                 if (file.FindChildText(provider.Get(), L"Name", name))
+                {
                     configs.insert(manager.FindConfig(name.c_str()));
+                }
             }
         });
         configs.erase(nullptr);
@@ -131,10 +143,12 @@ protected:
         EXPECT_TRUE(ReadPromptFile(table, m_path.c_str()));
         Texts texts;
         for (unsigned i = 0; i < static_cast<unsigned>(table.NumPrompts()); ++i)
+        {
             texts.insert(texts.end(),
                          {table.GetPromptText(i), std::to_wstring(table.GetPromptID(i)),
                           table.GetLocked(i) ? L"true" : L"false", std::to_wstring(table.GetPromptOptions(i)),
                           std::to_wstring(table.GetPrompt(i))});
+        }
         return texts;
     }
 
@@ -166,7 +180,9 @@ TEST_P(XmlExample, SaysOnlyWhatTheLibraryReads)
                  : root == L"MSSCCProjectSettings" ? ReadProjectSettings()
                                                    : Texts();
     for (std::wstring& text : read)
+    {
         text = UpperCase(text);
+    }
     EXPECT_FALSE(written.empty());
     EXPECT_THAT(written, testing::IsSubsetOf(read));
 }

@@ -49,7 +49,9 @@ public:
     {
         m_log += m_name;
         if (params->IsCancelled())
+        {
             m_log += '!';
+        }
         userData.push_back(data);
         return m_answer(params, data);
     }
@@ -126,8 +128,9 @@ TEST_F(Notification, AllocationFailureRefusesARegistrationAndKeepsTheOthers)
         const auto join = [&] { return added.back().Join(static_cast<std::int64_t>(added.size())); };
         heap.Fail(1, true);
         do
+        {
             added.emplace_back(log, 'L');
-        while (join());
+        } while (join());
         heap.Stop();
 
         const bool accepted = round.Attempt(join);
@@ -137,7 +140,9 @@ TEST_F(Notification, AllocationFailureRefusesARegistrationAndKeepsTheOthers)
         EXPECT_EQ(Broadcast(), 0u);
         EXPECT_EQ(log, "A" + std::string(joined, 'L'));
         for (std::size_t n = 0; n < joined; ++n)
+        {
             EXPECT_EQ(added[n].userData, std::vector<std::int64_t>{static_cast<std::int64_t>(n + 1)});
+        }
         EXPECT_TRUE(join());
         EXPECT_TRUE(added.back().Leave());
     });
@@ -169,7 +174,9 @@ TEST_F(Notification, IsAcceptedWithoutListenersAndLeavesTheRecordAlone)
 TEST_F(Notification, ReachesListenersInOrderOfRegistration)
 {
     for (const char name : {'A', 'B', 'C'})
+    {
         Add(name);
+    }
     EXPECT_EQ(Broadcast(), 0u);
     EXPECT_EQ(log, "ABC");
     EXPECT_EQ(Broadcast(), 0u);
@@ -253,7 +260,9 @@ TEST_F(Notification, CancelledIsToldInAscendingOrderWhateverTheAnswers)
 {
     bool first = true;
     for (const char name : {'A', 'B', 'C'})
+    {
         Add(name, [&](OrvixNotifyParams* params, std::int64_t) { return params->IsCancelled() ? 1u : 0u; });
+    }
     Add('D', [&](OrvixNotifyParams*, std::int64_t) { return first ? 1u : 0u; });
     Add('E');
     EXPECT_EQ(Broadcast(), 1u);
@@ -362,11 +371,15 @@ TEST_F(Notification, GivesEveryListenerItsOwnUserData)
 {
     const std::int64_t values[] = {LLONG_MIN, -1, 0, 1, LLONG_MAX};
     for (const std::int64_t value : values)
+    {
         EXPECT_TRUE(listeners.emplace_back(log, 'L').Join(value));
+    }
     listeners.emplace_back(log, 'V', Give(1)).Join(7);
     Broadcast();
     for (std::size_t n = 0; n < std::size(values); ++n)
+    {
         EXPECT_EQ(listeners[n].userData, (std::vector<std::int64_t>{values[n], values[n]}));
+    }
     EXPECT_EQ(listeners.back().userData, std::vector<std::int64_t>{7});
 }
 
@@ -400,7 +413,9 @@ TEST_F(Notification, ForgetsUserDataWithItsListener)
 TEST_F(Notification, KeepsTheOrderOfTheOthersWhenOneLeaves)
 {
     for (const char name : {'A', 'B', 'C', 'D'})
+    {
         Add(name);
+    }
     EXPECT_TRUE(listeners[1].Leave());
     Broadcast();
     EXPECT_EQ(log, "ACD");
@@ -423,16 +438,22 @@ TEST_F(Notification, ReachesTenThousandListenersThatAreRegisteredMeanwhile)
     constexpr int Count = 10'000;
     std::deque<Listener> many;
     for (int n = 0; n < Count; ++n)
+    {
         many.emplace_back(log, 'L');
+    }
     Add('A', [&](OrvixNotifyParams*, std::int64_t) {
         for (int n = 0; n < Count; ++n)
+        {
             many[static_cast<std::size_t>(n)].Join(n);
+        }
         return 0u;
     });
     EXPECT_EQ(Broadcast(), 0u);
     EXPECT_EQ(log, "A" + std::string(Count, 'L'));
     for (int n = 0; n < Count; ++n)
+    {
         ASSERT_EQ(many[static_cast<std::size_t>(n)].userData, std::vector<std::int64_t>{n});
+    }
 }
 
 TEST_F(Notification, ReachesAChainOfListenersOfWhichEachRegistersTheNext)
@@ -440,7 +461,9 @@ TEST_F(Notification, ReachesAChainOfListenersOfWhichEachRegistersTheNext)
     Answer addAnother;
     addAnother = [&](OrvixNotifyParams*, std::int64_t) {
         if (listeners.size() < 1'000)
+        {
             Add('L', addAnother);
+        }
         return 0u;
     };
     Add('L', addAnother);
@@ -481,7 +504,9 @@ TEST_F(Notification, EndsWhenAListenerRemovesEverybody)
     Add('A');
     Add('B', [&](OrvixNotifyParams*, std::int64_t) {
         for (Listener& listener : listeners)
+        {
             listener.Leave();
+        }
         return 0u;
     });
     Add('C');
@@ -497,7 +522,9 @@ TEST_F(Notification, CancelledByAListenerThatRemovesEverybodyCallsNobodyAgain)
     Add('B');
     Add('C', [&](OrvixNotifyParams*, std::int64_t) {
         for (Listener& listener : listeners)
+        {
             listener.Leave();
+        }
         return 1u;
     });
     OrvixNotifyParams params;
@@ -510,8 +537,12 @@ TEST_F(Notification, SurvivesThatEverybodyIsRemovedWhileACancelIsTold)
 {
     Add('A', [&](OrvixNotifyParams* params, std::int64_t) {
         if (params->IsCancelled())
+        {
             for (Listener& listener : listeners)
+            {
                 listener.Leave();
+            }
+        }
         return 0u;
     });
     Add('B');
@@ -543,7 +574,9 @@ TEST_F(Notification, LetsAnExceptionOutThatIsThrownWhileACancelIsTold)
 {
     Add('A', [](OrvixNotifyParams* params, std::int64_t) {
         if (params->IsCancelled())
+        {
             throw std::runtime_error("from A");
+        }
         return 0u;
     });
     Add('B', Give(1));

@@ -25,7 +25,9 @@ public:
     ActiveList(std::initializer_list<const wchar_t*> files)
     {
         for (const wchar_t* file : files)
+        {
             Append(file);
+        }
     }
 
     OrvixFileEntry* Append(const wchar_t* file)

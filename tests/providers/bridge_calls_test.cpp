@@ -216,7 +216,9 @@ TEST_F(BridgeCalls, OfReservedOperationsSucceedAndLoadNothing)
 {
     for (const Slot slot : {Reserved1, Reserved2, Reserved3, Reserved4, Reserved5, Reserved6, Reserved7, Reserved8,
                             Reserved9, Reserved10})
+    {
         EXPECT_EQ(Call(slot), SCC_OK) << slot;
+    }
     EXPECT_THAT(AllCalls(), IsEmpty());
 }
 
@@ -243,9 +245,13 @@ TEST_F(BridgeCommandOptions, AreTheLibrarysBlockUntilItIsEnded)
 {
     m_recorder.getCommandOptions = [](LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block) {
         if (!block)
+        {
             return SCC_I_ADV_SUPPORT;
+        }
         if (!*block)
+        {
             *block = Block;
+        }
         return SCC_OK;
     };
     Start();
@@ -291,7 +297,9 @@ TEST_F(BridgeAddFromScc, LetsTheLibraryFillTheHostsPlaces)
         EXPECT_EQ(context, reinterpret_cast<LPVOID>(0x77));
         EXPECT_EQ(window, reinterpret_cast<HWND>(0x1234));
         if (!count)
+        {
             return SCC_I_OPERATIONCANCELED; // the names are freed
+        }
         EXPECT_EQ(*count, 1);
         *count = 2;
         *names = m_names;

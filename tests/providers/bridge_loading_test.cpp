@@ -142,7 +142,9 @@ TEST_F(BridgeLoading, HappensWithWhicheverOperationComesFirst)
     for (const Operation& operation : Operations)
     {
         if (operation.function == "SccAddFromScc" || operation.function == "SccCloseProject")
+        {
             continue; // they have nothing to do for a library that was not started
+        }
         SCOPED_TRACE(operation.function);
         NewBridge(L"recording_full");
         operation.run(*m_bridge);
@@ -299,11 +301,17 @@ TEST_F(BridgeFunctions, ThatIsMissingFailsItsOwnOperationAlone)
             };
             SCCRTN expected = operation.result;
             if (operation.function == missing.function)
+            {
                 expected = operation.function == "SccGetVersion" ? 0 : SCC_E_INITIALIZEFAILED;
+            }
             else if (is("SccInitialize", "SccAddFromScc") || is("SccSetOption", "SccAddFromScc"))
+            {
                 expected = SCC_E_OPNOTSUPPORTED; // no capability, no answer to the option
+            }
             else if (is("SccOpenProject", "SccCloseProject"))
+            {
                 expected = SCC_E_PROJNOTOPEN;
+            }
             EXPECT_EQ(operation.run(*m_bridge), expected);
             const std::vector<std::string> calls = Calls();
             if (operation.function == missing.function)
@@ -349,10 +357,16 @@ TEST_F(BridgeFunctions, ThatIsFoundIsLookedForOnceForGood)
     AllowEverything();
     const AskedNames asked;
     for (int round = 0; round < 2; ++round)
+    {
         for (const Operation& operation : Operations)
+        {
             EXPECT_EQ(operation.run(*m_bridge), operation.result) << operation.function;
+        }
+    }
     for (const Operation& operation : Operations)
+    {
         EXPECT_EQ(AskedNames::Count(operation.function), 1) << operation.function;
+    }
 }
 
 TEST_F(BridgeFunctions, ThatThrowsFailsItsOperationAndLetsNothingOut)
@@ -365,7 +379,9 @@ TEST_F(BridgeFunctions, ThatThrowsFailsItsOperationAndLetsNothingOut)
         for (const Operation& operation : Operations)
         {
             if (operation.function == throwing.function)
+            {
                 break;
+            }
             EXPECT_EQ(operation.run(*m_bridge), operation.result) << operation.function;
         }
         m_recorder.throwing = {throwing.function};

@@ -63,7 +63,9 @@ protected:
             SCOPED_TRACE("allocation " + std::to_string(n));
             check(result, FailingAllocation::WasMet());
             if (HasFailure() || !FailingAllocation::WasMet())
+            {
                 return n - 1;
+            }
         }
     }
 };

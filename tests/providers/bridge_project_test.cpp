@@ -105,7 +105,9 @@ TEST_F(BridgeOpenProject, ThatIsRefusedForItsTextsAsksForNewOnesAndTriesTheOldOn
                                  LPTEXTOUTPROC, LONG) {
         buffers.insert(buffers.end(), {user, projectName, auxPath});
         if (++attempts == 2)
+        {
             return SCC_OK;
+        }
         std::strcpy(user, "first");
         std::strcpy(auxPath, "try");
         return SCC_E_PROJSYNTAXERR;
@@ -201,7 +203,9 @@ TEST_F(BridgeGetProjPath, LetsTheLibraryMakeANewProjectAndWritesNoneOfTheHostsPl
             EXPECT_EQ(*isNew, TRUE);
             *isNew = FALSE;
             for (LPSTR text : {user, projectName, localPath, auxPath})
+            {
                 std::strcpy(text, "new");
+            }
             return SCC_OK;
         };
         char user[] = "a";
@@ -241,7 +245,9 @@ TEST_F(BridgeGetProjPath, ThatFailsKeepsNothing)
     m_recorder.getProjPath = [](LPVOID, HWND, LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath, BOOL,
                                 LPBOOL) {
         for (LPSTR text : {user, projectName, localPath, auxPath})
+        {
             std::strcpy(text, "new");
+        }
         return SCC_I_OPERATIONCANCELED;
     };
     EXPECT_EQ(m_bridge->GetProjPath(nullptr, nullptr, nullptr, nullptr, TRUE), SCC_I_OPERATIONCANCELED);

@@ -143,7 +143,9 @@ TEST_F(SettingsFileReading, OfAFileThatCannotBeUsedChangesNothing)
                                             entity +
                                                 "<MSSCCProjectSettings><AuxPath>&e;</AuxPath></MSSCCProjectSettings>"};
     for (const std::string& xml : files)
+    {
         ExpectRead(xml, "old", "name");
+    }
 }
 
 TEST_F(SettingsFileReading, OfAMissingFileChangesNothing)

@@ -24,7 +24,9 @@ std::string Repeat(const std::string& text, int times)
 {
     std::string repeated;
     for (int n = 0; n < times; ++n)
+    {
         repeated += text;
+    }
     return repeated;
 }
 
@@ -59,7 +61,9 @@ protected:
         m_recorder.getProjPath = [write](LPVOID, HWND, LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath,
                                          BOOL, LPBOOL) {
             for (char* text : {user, projectName, localPath, auxPath})
+            {
                 write(text);
+            }
             return SCC_OK;
         };
     }
@@ -280,7 +284,9 @@ TEST_F(BridgeWildLibrary, FindsTheProjectNameThatItWroteInTheSecondAttempt)
     m_recorder.openProject = [&attempts](LPVOID, HWND, LPSTR, LPCSTR projectName, LPCSTR, LPSTR, LPCSTR, LPTEXTOUTPROC,
                                          LONG) {
         if (++attempts == 2)
+        {
             return SCC_OK;
+        }
         std::fill_n(const_cast<char*>(projectName), 301, 'x');
         return SCC_E_PROJSYNTAXERR;
     };

@@ -20,7 +20,9 @@ std::wstring Repeat(const std::wstring& text, int times)
 {
     std::wstring repeated;
     for (int n = 0; n < times; ++n)
+    {
         repeated += text;
+    }
     return repeated;
 }
 
@@ -95,7 +97,9 @@ TEST(NarrowBufferMemory, HoldsTheLongestTextOfTheInterfaceAndIsZeroBehindTheText
     static_assert(sizeof(NarrowBuffer) >= 301 + 1);
     NarrowBuffer buffer(L"abc", 31);
     for (std::size_t n = 3; n < sizeof(NarrowBuffer); ++n)
+    {
         EXPECT_EQ(buffer.Get()[n], '\0') << n;
+    }
 }
 
 } // namespace

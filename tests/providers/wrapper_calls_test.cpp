@@ -26,7 +26,9 @@ std::vector<SCCRTN> CodesOtherThanOK()
     for (SCCRTN code = -31; code <= 7; ++code)
     {
         if (code != SCC_OK)
+        {
             codes.push_back(code);
+        }
     }
     return codes;
 }
@@ -262,7 +264,9 @@ TEST_F(Wrapper, ShowHistoryTellsThatAFileIsToBeReloaded)
     for (const SCCRTN code : CodesOtherThanOK())
     {
         if (code == 5)
+        {
             continue;
+        }
         m_scc.results["SccHistory"] = code;
         EXPECT_EQ(m_wrapper->ShowHistory(list.Get()), code < 0 ? -1 : 0) << code;
     }
@@ -359,7 +363,9 @@ TEST_P(WrapperOperation, FailsForEveryOtherAnswerThanZero)
     for (const SCCRTN code : CodesOtherThanOK())
     {
         if (code > 0 && GetParam().name == std::string_view("ShowHistory"))
+        {
             continue;
+        }
         m_scc.results[GetParam().function] = code;
         EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), -1) << code;
     }

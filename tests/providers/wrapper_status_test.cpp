@@ -32,7 +32,9 @@ unsigned long ExpectedFlags(unsigned long status)
     for (const FlagRow& row : OpenProjectRows)
     {
         if ((status & row.set) == row.set && (status & row.clear) == 0 && (row.any == 0 || (status & row.any) != 0))
+        {
             flags |= row.flags;
+        }
     }
     return flags;
 }
@@ -66,7 +68,9 @@ TEST_P(WrapperStatusBits, AreTranslatedInEveryCombination)
     m_scc.queryInfo = Answer(words);
     ASSERT_EQ(m_wrapper->QueryStatus(list.Get(), 0), 0);
     for (unsigned int low = 0; low < Count; ++low)
+    {
         ASSERT_EQ(list->GetActiveFileEntry(low)->GetFlagsOut(), ExpectedFlags(GetParam() | low)) << std::hex << low;
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(Under, WrapperStatusBits, testing::Values(0, 0x1000, 0x80000000, 0x7FFFF000, 0xFFFFF000),

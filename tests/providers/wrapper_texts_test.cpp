@@ -18,7 +18,9 @@ protected:
     void SetUp() override
     {
         if (GetACP() != 1252)
+        {
             GTEST_SKIP() << "another ANSI code page";
+        }
     }
 };
 
@@ -100,7 +102,9 @@ TEST_F(WrapperTexts, ProjectFolderMustBeExact)
     ASSERT_EQ(m_wrapper->Initialize(&m_info), 0);
     m_scc.Take();
     for (const wchar_t* path : InexactPaths)
+    {
         EXPECT_EQ(m_wrapper->OpenProject(path, L""), -1);
+    }
     EXPECT_THAT(m_scc.Take(), IsEmpty());
     EXPECT_EQ(m_wrapper->OpenProject(L"C:\\Caf\u00E9", L""), 0);
     EXPECT_THAT(m_scc.Take(), ElementsAre(HasSubstr("\"C:\\Caf\xE9\"")));
@@ -188,7 +192,9 @@ TEST_F(WrapperTest, ManyPathsArriveInTheOrderOfTheList)
 TEST_F(WrapperOutput, BeforeAnyInitializeIsIgnored)
 {
     if (testing::UnitTest::GetInstance()->test_to_run_count() != 1)
+    {
         GTEST_SKIP() << "needs a process of its own";
+    }
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
     ASSERT_NE(output, nullptr);
     EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
@@ -210,7 +216,9 @@ TEST_F(WrapperOutput, ReachesTheHostAsWideTextOfKindZero)
     InitializeFor(*m_wrapper, &Host());
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
     for (LONG kind = -1; kind <= 12; ++kind)
+    {
         EXPECT_EQ(output("text", kind), 0);
+    }
     EXPECT_EQ(output("text", 999), 0);
     EXPECT_EQ(output("", SCC_MSG_INFO), 0);
     EXPECT_EQ(Host().lines.size(), 16u);
@@ -222,7 +230,9 @@ TEST_F(WrapperOutput, ReachesTheHostAsWideTextOfKindZero)
 TEST_F(WrapperOutput, IsTakenForAnsiText)
 {
     if (GetACP() != 1252)
+    {
         GTEST_SKIP() << "another ANSI code page";
+    }
     InitializeFor(*m_wrapper, &Host());
     EXPECT_EQ(OpenForOutput(*m_wrapper)("caf\xE9 \x80", SCC_MSG_INFO), 0);
     EXPECT_THAT(Host().lines, ElementsAre(OutputHost::Line(L"caf\u00E9 \u20AC", 0)));

@@ -26,7 +26,9 @@ Entries Active(OrvixFileList& list)
 {
     Entries active;
     for (unsigned int n = 0; n < list.NumActiveEntries(); ++n)
+    {
         active.push_back(list.GetActiveFileEntry(n));
+    }
     return active;
 }
 
@@ -279,7 +281,9 @@ TEST(RemoveActiveEntry, RemovesTheFirstOccurrenceAndMovesLaterOnesDown)
     OrvixFileEntry b;
     OrvixFileEntry c;
     for (OrvixFileEntry* entry : {&b, &a, &c, &a})
+    {
         list.AddActiveEntry(entry);
+    }
     EXPECT_TRUE(list.RemoveActiveEntry(&a));
     EXPECT_EQ(Active(list), (Entries{&b, &c, &a}));
     EXPECT_TRUE(list.RemoveActiveEntry(&a));
@@ -342,7 +346,9 @@ public:
             break;
         case 5:
             if (Below(10) == 0)
+            {
                 RemoveAll();
+            }
             break;
         case 6:
             RemoveActive(nullptr);
@@ -363,15 +369,21 @@ public:
         ASSERT_EQ(m_list.GetActiveFileEntry(static_cast<unsigned int>(m_active.size())), nullptr);
         ASSERT_EQ(m_list.NumEntries(), m_entries.size());
         for (unsigned int n = 0; n < m_entries.size(); ++n)
+        {
             ASSERT_EQ(m_list.GetFileEntry(n), m_entries[n]);
+        }
         ASSERT_EQ(m_list.NumRootEntries(), m_roots.size());
         for (unsigned int n = 0; n < m_roots.size(); ++n)
+        {
             ASSERT_EQ(m_list.GetRootEntry(n), m_roots[n]);
+        }
         for (OrvixFileEntry* entry : m_entries)
         {
             ASSERT_EQ(entry->NumChildren(), m_children[entry].size());
             for (unsigned int n = 0; n < entry->NumChildren(); ++n)
+            {
                 ASSERT_EQ(entry->GetChild(n), m_children[entry][n]);
+            }
         }
     }
 
@@ -382,7 +394,9 @@ private:
     void CreateEntry()
     {
         if (m_entries.size() == 12)
+        {
             return;
+        }
         OrvixFileEntry* parent = m_entries.empty() || Below(3) == 0 ? nullptr : AnyEntry();
         OrvixFileEntry* entry = Create(m_list, parent, Below(8));
         m_entries.push_back(entry);
@@ -394,10 +408,14 @@ private:
     {
         const unsigned int child = Below(m_entries.size());
         if (child == 0)
+        {
             return;
+        }
         OrvixFileEntry* parent = m_entries[Below(child)];
         if (m_children[parent].size() >= 3)
+        {
             return;
+        }
         parent->AddChild(m_entries[child]);
         m_children[parent].push_back(m_entries[child]);
     }
@@ -414,7 +432,9 @@ private:
         const bool found = place != m_active.end();
         ASSERT_EQ(m_list.RemoveActiveEntry(entry), found);
         if (found)
+        {
             m_active.erase(place);
+        }
     }
 
     /// As an operation does that drops the files whose state does not fit.
@@ -426,9 +446,13 @@ private:
         {
             const std::size_t place = backwards ? m_active.size() - 1 - n : n;
             if (Below(oneIn) == 0)
+            {
                 RemoveActive(m_list.GetActiveFileEntry(static_cast<unsigned int>(place)));
+            }
             else
+            {
                 ++n;
+            }
         }
     }
 
@@ -439,17 +463,25 @@ private:
         m_active.clear();
         const auto select = [&](OrvixFileEntry* entry) {
             if (entry->GetFlagsIn() & mask)
+            {
                 m_active.push_back(entry);
+            }
         };
         const std::function<void(OrvixFileEntry*)> visit = [&](OrvixFileEntry* entry) {
             for (OrvixFileEntry* child : m_children[entry])
+            {
                 visit(child);
+            }
             select(entry);
         };
         if (fromRoots)
+        {
             std::for_each(m_roots.begin(), m_roots.end(), visit);
+        }
         else
+        {
             std::for_each(m_entries.begin(), m_entries.end(), select);
+        }
         ASSERT_EQ(m_list.BuildActiveList(mask, fromRoots), m_active.size());
     }
 
@@ -467,9 +499,13 @@ private:
         m_entries.erase(m_entries.begin() + index);
         std::erase(m_roots, removed);
         for (OrvixFileEntry* root : m_roots)
+        {
             Detach(root, removed);
+        }
         if (const auto place = std::find(m_active.begin(), m_active.end(), removed); place != m_active.end())
+        {
             m_active.erase(place);
+        }
         m_children.erase(removed);
         Compare();
         ForgetLeftLinks(removed);
@@ -495,8 +531,12 @@ private:
         for (OrvixFileEntry* entry : m_entries)
         {
             for (unsigned int n = entry->NumChildren(); n-- > 0;)
+            {
                 if (entry->GetChild(n) == removed)
+                {
                     entry->RemoveChild(n);
+                }
+            }
             std::erase(m_children[entry], removed);
         }
         while (m_list.RemoveActiveEntry(removed))
@@ -534,7 +574,9 @@ TEST(FileListOperations, LeaveWhatPlainVectorsWouldHoldInManyRandomSequences)
             both.Step();
             both.Compare();
             if (HasFatalFailure())
+            {
                 FAIL() << "sequence " << seed << ", step " << step;
+            }
         }
     }
     EXPECT_EQ(BraeDiagnostics::LiveBlocks(), blocks);
@@ -546,16 +588,22 @@ TEST(RemoveActiveEntry, KeepsTheOrderWhateverTheOrderOfRemovalInAListOfDistinctE
     std::mt19937 random(1);
     OrvixFileList list;
     for (unsigned int n = 0; n < Count; ++n)
+    {
         Create(list, nullptr, 1);
+    }
     for (int sequence = 0; sequence < 40; ++sequence)
     {
         list.BuildActiveList(1, false);
         Entries expected = Active(list);
         Entries order = expected;
         if (sequence == 1)
+        {
             std::reverse(order.begin(), order.end());
+        }
         else if (sequence > 1)
+        {
             std::shuffle(order.begin(), order.end(), random);
+        }
         for (OrvixFileEntry* entry : order)
         {
             ASSERT_TRUE(list.RemoveActiveEntry(entry));

@@ -50,14 +50,20 @@ std::vector<const void*> Snapshot(OrvixFileList& list)
         OrvixFileEntry* entry = list.GetFileEntry(n);
         snapshot.push_back(entry);
         for (unsigned int child = 0; child < entry->NumChildren(); ++child)
+        {
             snapshot.push_back(entry->GetChild(child));
+        }
         snapshot.push_back(nullptr);
     }
     for (unsigned int n = 0; n < list.NumRootEntries(); ++n)
+    {
         snapshot.push_back(list.GetRootEntry(n));
+    }
     snapshot.push_back(nullptr);
     for (unsigned int n = 0; n < list.NumActiveEntries(); ++n)
+    {
         snapshot.push_back(list.GetActiveFileEntry(n));
+    }
     return snapshot;
 }
 
@@ -149,16 +155,20 @@ TEST(AllocationFailure, GivesZeroFromAddChildAndChangesNothing)
 {
     long failures = 0;
     for (unsigned int present = 0; present < MostElements; ++present)
+    {
         failures += SweepAllocations([&](AllocationRound& round) {
             OrvixFileEntry child;
             OrvixFileEntry parent;
             for (unsigned int n = 0; n < present; ++n)
+            {
                 parent.AddChild(&child);
+            }
             const unsigned int count = round.Attempt([&] { return parent.AddChild(&child); });
             EXPECT_EQ(count, round.Failed() ? 0 : present + 1);
             EXPECT_EQ(parent.NumChildren(), round.Failed() ? present : present + 1);
             EXPECT_EQ(parent.AddChild(&child), round.Failed() ? present + 1 : present + 2);
         });
+    }
     EXPECT_GT(failures, 0);
 }
 
@@ -169,7 +179,9 @@ TEST(AllocationFailure, GivesZeroFromAddAttachmentOfAPathAndChangesNothing)
         const long failures = SweepAllocations([&](AllocationRound& round) {
             OrvixFileEntry owner;
             for (unsigned int n = 0; n < present; ++n)
+            {
                 owner.AddAttachment(L"a", NoParent, 0, 0);
+            }
             const unsigned int count = round.Attempt([&] { return owner.AddAttachment(LongText, NoParent, 1, 2); });
             EXPECT_EQ(count, round.Failed() ? 0 : present + 1);
             EXPECT_EQ(owner.NumAttachments(), round.Failed() ? present : present + 1);
@@ -189,7 +201,9 @@ TEST(AllocationFailure, GivesZeroFromAddAttachmentOfAnEntryAndChangesNothing)
             source.SetFile(LongText);
             OrvixFileEntry owner;
             for (unsigned int n = 0; n < present; ++n)
+            {
                 owner.AddAttachment(L"a", NoParent, 0, 0);
+            }
             const unsigned int count = round.Attempt([&] { return owner.AddAttachment(&source); });
             EXPECT_EQ(count, round.Failed() ? 0 : present + 1);
             EXPECT_EQ(owner.NumAttachments(), round.Failed() ? present : present + 1);
@@ -203,13 +217,16 @@ TEST(AllocationFailure, GivesZeroFromAddAttachmentOfAnEntryAndChangesNothing)
 TEST(AllocationFailure, GivesNullFromCreateEntryOfAPathAndLeavesListAndParentAlone)
 {
     for (const bool withParent : {false, true})
+    {
         for (unsigned int present = 0; present < MostElements; ++present)
         {
             const long failures = SweepAllocations([&](AllocationRound& round) {
                 OrvixFileList list;
                 OrvixFileEntry* parent = withParent ? list.CreateEntry(L"p", NoParent, 1, 0) : NoParent;
                 for (unsigned int n = 0; n < present; ++n)
+                {
                     list.CreateEntry(L"a", parent, 1, 0);
+                }
                 list.BuildActiveList(1, false);
                 const std::vector<const void*> before = Snapshot(list);
                 const unsigned int count = list.NumEntries();
@@ -228,6 +245,7 @@ TEST(AllocationFailure, GivesNullFromCreateEntryOfAPathAndLeavesListAndParentAlo
             });
             EXPECT_GE(failures, 4) << "the entry and its text";
         }
+    }
 }
 
 TEST(AllocationFailure, GivesNullFromCreateEntryOfAnEntryAndLeavesListSourceAndParentAlone)
@@ -271,7 +289,9 @@ TEST(AllocationFailure, LeavesTheActiveListEmptyAfterBuildActiveList)
             OrvixFileList list;
             OrvixFileEntry* entry = NoParent;
             for (unsigned int n = 0; n < 20; ++n)
+            {
                 entry = list.CreateEntry(L"f", n % 3 == 0 ? NoParent : entry, 1, 0);
+            }
             list.AddActiveEntry(entry);
             const unsigned int count = round.Attempt([&] { return list.BuildActiveList(1, fromRoots); });
             EXPECT_EQ(count, round.Failed() ? 0u : 20u);
@@ -304,31 +324,40 @@ TEST(AllocationFailure, GivesTheUnchangedCountFromAddActiveEntry)
 {
     long failures = 0;
     for (unsigned int present = 0; present < MostElements; ++present)
+    {
         failures += SweepAllocations([&](AllocationRound& round) {
             OrvixFileEntry entry;
             OrvixFileList list;
             for (unsigned int n = 0; n < present; ++n)
+            {
                 list.AddActiveEntry(&entry);
+            }
             const unsigned int count = round.Attempt([&] { return list.AddActiveEntry(&entry); });
             EXPECT_EQ(count, round.Failed() ? present : present + 1);
             EXPECT_EQ(list.NumActiveEntries(), count);
             EXPECT_EQ(list.AddActiveEntry(&entry), count + 1);
         });
+    }
     EXPECT_GT(failures, 0);
 }
 
 TEST(AllocationFailure, NeverStandsInTheWayOfRemoveActiveEntry)
 {
     for (const bool distinct : {false, true})
+    {
         for (unsigned int place = 0; place < MostElements; ++place)
         {
             const long failures = SweepAllocations([&](AllocationRound& round) {
                 OrvixFileList list;
                 for (unsigned int n = 0; n < MostElements; ++n)
+                {
                     list.CreateEntry(L"f", NoParent, 1, 0);
+                }
                 list.BuildActiveList(1, false);
                 if (!distinct)
+                {
                     list.AddActiveEntry(list.GetFileEntry(place));
+                }
                 const unsigned int before = list.NumActiveEntries();
                 OrvixFileEntry* entry = list.GetActiveFileEntry(place);
                 EXPECT_TRUE(round.Attempt([&] { return list.RemoveActiveEntry(entry); }));
@@ -337,6 +366,7 @@ TEST(AllocationFailure, NeverStandsInTheWayOfRemoveActiveEntry)
             });
             EXPECT_EQ(failures, 0) << "nothing to allocate";
         }
+    }
 }
 
 TEST(AllocationFailure, LeavesTheEntryInTheListWhenRemoveEntryCannotSearchTheTrees)
@@ -346,7 +376,9 @@ TEST(AllocationFailure, LeavesTheEntryInTheListWhenRemoveEntryCannotSearchTheTre
         OrvixFileEntry* root = list.CreateEntry(L"root", NoParent, 1, 0);
         OrvixFileEntry* entry = root;
         for (int n = 0; n < 50; ++n)
+        {
             entry = list.CreateEntry(L"f", entry, 1, 0);
+        }
         OrvixFileEntry* other = list.CreateEntry(L"other", NoParent, 1, 0);
         other->AddChild(entry);
         OrvixFileEntry* parent = entry->GetParent();
@@ -373,7 +405,9 @@ TEST(AllocationFailure, LeavesARootInTheListWhenRemoveEntryCannotSearchTheOtherT
         OrvixFileEntry* removed = list.CreateEntry(L"removed", NoParent, 1, 0);
         OrvixFileEntry* entry = list.CreateEntry(L"other", NoParent, 1, 0);
         for (int n = 0; n < 50; ++n)
+        {
             entry = list.CreateEntry(L"f", entry, 1, 0);
+        }
         entry->AddChild(removed);
         const bool done = round.Attempt([&] { return list.RemoveEntry(removed); });
         EXPECT_EQ(done, !round.Failed());
@@ -420,7 +454,9 @@ TEST(ActiveListStorage, IsSizedOnceForAListInOrderOfCreation)
     const long failures = SweepAllocations([](AllocationRound& round) {
         OrvixFileList list;
         for (int n = 0; n < 1000; ++n)
+        {
             list.CreateEntry(L"f", NoParent, 1, 0);
+        }
         round.Attempt([&] { list.BuildActiveList(1, false); });
     });
     EXPECT_EQ(failures, 2) << "one allocation, failing once and for good";
@@ -432,13 +468,17 @@ TEST(ActiveListStorage, IsKeptByBuildActiveListAndRemoveAll)
         OrvixFileEntry stranger;
         OrvixFileList list;
         for (int n = 0; n < 100; ++n)
+        {
             list.CreateEntry(L"f", NoParent, 1, 0);
+        }
         list.BuildActiveList(1, false);
         round.Attempt([&] {
             list.BuildActiveList(1, false);
             list.RemoveAll();
             for (int n = 0; n < 100; ++n)
+            {
                 list.AddActiveEntry(&stranger);
+            }
         });
         EXPECT_EQ(list.NumActiveEntries(), 100u);
     });
@@ -452,7 +492,9 @@ TEST(ActiveListStorage, DoesNotGrowWhenEntriesComeAndGo)
         OrvixFileEntry second;
         OrvixFileList list;
         for (OrvixFileEntry* entry : {&first, &second, &first, &second})
+        {
             list.AddActiveEntry(entry);
+        }
         round.Attempt([&] {
             for (int n = 0; n < 1000; ++n)
             {
@@ -472,7 +514,9 @@ TEST(AllocationFailure, GivesNullFromCreateEntryOfAUserNameAndLeavesTheListAlone
         const long failures = SweepAllocations([&](AllocationRound& round) {
             OrvixUserList list;
             for (unsigned int n = 0; n < present; ++n)
+            {
                 list.CreateEntry(L"a");
+            }
             OrvixUserEntry* user = round.Attempt([&] { return list.CreateEntry(LongText); });
             EXPECT_EQ(user == nullptr, round.Failed());
             EXPECT_EQ(list.NumEntries(), round.Failed() ? present : present + 1);
@@ -495,7 +539,9 @@ TEST(AllocationFailure, GivesNullFromCreateEntryOfAUserAndLeavesTheListAlone)
             source.SetEmail(OtherLongText);
             OrvixUserList list;
             for (unsigned int n = 0; n < present; ++n)
+            {
                 list.CreateEntry(L"a");
+            }
             OrvixUserEntry* user = round.Attempt([&] { return list.CreateEntry(source); });
             EXPECT_EQ(user == nullptr, round.Failed());
             EXPECT_EQ(list.NumEntries(), round.Failed() ? present : present + 1);
@@ -513,7 +559,9 @@ TEST(AllocationFailure, GivesZeroFromAddFilterAndKeepsNamesAndExtensionsTogether
         const long failures = SweepAllocations([&](AllocationRound& round) {
             OrvixExploreProviderParams params;
             for (std::uint32_t n = 0; n < present; ++n)
+            {
                 params.AddFilter(L"n", L"e");
+            }
             const std::uint32_t count = round.Attempt([&] { return params.AddFilter(LongText, OtherLongText); });
             EXPECT_EQ(count, round.Failed() ? 0 : present + 1);
             EXPECT_EQ(params.NumFilters(), round.Failed() ? present : present + 1);

@@ -198,7 +198,9 @@ TEST(FileEntryChildren, RemovingOneMovesTheLaterOnesDown)
     OrvixFileEntry parent;
     std::array<OrvixFileEntry, 3> children;
     for (OrvixFileEntry& child : children)
+    {
         parent.AddChild(&child);
+    }
     EXPECT_TRUE(parent.RemoveChild(0));
     ASSERT_EQ(parent.NumChildren(), 2u);
     EXPECT_EQ(parent.GetChild(0), &children[1]);
@@ -340,7 +342,9 @@ TEST(FileEntryAttachmentOfAnEntry, MayBeACopyOfTheOwnerOrOfItsOwnAttachment)
     owner.SetFile(L"owner.txt");
     EXPECT_EQ(owner.AddAttachment(&owner), 1u);
     for (unsigned int n = 2; n < 40; ++n)
+    {
         ASSERT_EQ(owner.AddAttachment(owner.GetAttachment(0)), n);
+    }
     EXPECT_STREQ(owner.GetAttachment(38)->GetFile(), L"owner.txt");
 }
 
@@ -402,7 +406,9 @@ TEST(FileEntryAttachments, RemovingOneDeletesItAndClosesTheGap)
 {
     OrvixFileEntry owner;
     for (const wchar_t* name : {L"a", L"b", L"c"})
+    {
         owner.AddAttachment(name, nullptr, 0, 0);
+    }
     const long blocks = BraeDiagnostics::LiveBlocks();
     EXPECT_TRUE(owner.RemoveAttachment(1));
     EXPECT_EQ(BraeDiagnostics::LiveBlocks(), blocks - 1);
@@ -426,7 +432,9 @@ TEST(FileEntryAttachments, RemovingAllDeletesThem)
     OrvixFileEntry owner;
     const long blocks = BraeDiagnostics::LiveBlocks();
     for (const wchar_t* name : {L"a", L"b", L"c"})
+    {
         owner.AddAttachment(name, nullptr, 0, 0);
+    }
     EXPECT_EQ(BraeDiagnostics::LiveBlocks(), blocks + 3);
     EXPECT_TRUE(owner.RemoveAllAttachments());
     EXPECT_TRUE(owner.RemoveAllAttachments());

@@ -514,7 +514,9 @@ TEST(FileListRemoveEntryByIndex, TakesOneOccurrenceOffTheActiveList)
     OrvixFileEntry* a = Create(list, L"a");
     OrvixFileEntry* b = Create(list, L"b");
     for (OrvixFileEntry* entry : {a, b, a})
+    {
         list.AddActiveEntry(entry);
+    }
     list.RemoveEntry(a);
     ASSERT_EQ(list.NumActiveEntries(), 2u);
     EXPECT_EQ(list.GetActiveFileEntry(0), b);
@@ -627,7 +629,9 @@ OrvixFileEntry* CreateDeepTree(OrvixFileList& list)
 {
     OrvixFileEntry* deepest = nullptr;
     for (unsigned int n = 0; n < Depth; ++n)
+    {
         deepest = Create(list, L"f", deepest);
+    }
     return deepest;
 }
 
@@ -654,5 +658,7 @@ TEST(DeepTree, BecomesAnActiveListFromTheDeepestPlaceUp)
     ASSERT_TRUE(ComesBack([&] { count = list.BuildActiveList(1, true); }));
     ASSERT_EQ(count, Depth);
     for (unsigned int n = 0; n < Depth; ++n)
+    {
         ASSERT_EQ(list.GetActiveFileEntry(n), list.GetFileEntry(Depth - 1 - n));
+    }
 }

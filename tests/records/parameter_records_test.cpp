@@ -305,7 +305,9 @@ TEST(ExploreProviderParamsAddFilter, TakesTextsThatAreTheRecordsOwn)
     OrvixExploreProviderParams params;
     params.AddFilter(L"Text", L"*.txt");
     for (std::uint32_t n = 2; n <= 100; ++n)
+    {
         ASSERT_EQ(params.AddFilter(params.GetFilterName(0), params.GetFilterExtensions(0)), n);
+    }
     EXPECT_STREQ(params.GetFilterName(99), L"Text");
     EXPECT_STREQ(params.GetFilterExtensions(99), L"*.txt");
 }
@@ -314,7 +316,9 @@ TEST(ExploreProviderParamsAddFilter, TakesManyFiltersWithinTheTimeLimit)
 {
     OrvixExploreProviderParams params;
     for (std::uint32_t i = 1; i <= 200000; ++i)
+    {
         ASSERT_EQ(params.AddFilter(L"Text", L"*.txt"), i);
+    }
 }
 
 TEST(ExploreProviderParamsGetFilter, GivesNullForAnIndexOutOfRange)

@@ -146,9 +146,13 @@ TEST(UserEntrySlots, StandInThePublishedOrder)
 {
     Slots<OrvixUserEntry> user;
     for (const std::size_t get : {0u, 2u, 4u, 6u})
+    {
         user.ExpectText(get, get + 1);
+    }
     for (const std::size_t get : {0u, 2u, 4u, 6u})
+    {
         user.ExpectTextKept(get);
+    }
     auto* record = static_cast<OrvixUserEntry*>(user.Object());
     EXPECT_STREQ(record->GetUserNameW(), L"slot 0");
     EXPECT_STREQ(record->GetFirstName(), L"slot 2");
@@ -182,7 +186,9 @@ TEST(ClientInfoSlots, StandInThePublishedOrder)
 {
     Slots<OrvixClientInfo> info;
     for (const std::size_t get : {0u, 2u, 6u, 8u})
+    {
         info.ExpectText(get, get + 1);
+    }
     info.ExpectField<Address>(4, 5, SomeAddress);
     info.ExpectField<Address>(10, 11, SomeAddress);
     auto* record = static_cast<OrvixClientInfo*>(info.Object());
@@ -199,7 +205,9 @@ TEST(FileListDialogParamsSlots, StandInThePublishedOrderWithTheOptionsSetterFirs
     Slots<OrvixFileListDialogParams> params;
     params.ExpectField<std::uint32_t>(1, 0, 0x80000001);
     for (const std::size_t get : {2u, 4u, 8u})
+    {
         params.ExpectText(get, get + 1);
+    }
     params.ExpectField<Address>(6, 7, SomeAddress);
     params.ExpectField<std::int32_t>(10, 11, -10);
     params.ExpectField<std::int32_t>(12, 13, -12);

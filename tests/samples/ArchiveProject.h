@@ -57,7 +57,9 @@ public:
              entry.increment(error))
         {
             if (!entry->is_directory(error))
+            {
                 SetReadOnly(entry->path(), false);
+            }
         }
         std::filesystem::remove_all(folder, error);
     }

@@ -18,7 +18,9 @@ public:
     void Unload()
     {
         if (m_module)
+        {
             FreeLibrary(m_module);
+        }
         m_module = nullptr;
     }
 
@@ -43,7 +45,9 @@ public:
         const auto* names = reinterpret_cast<const DWORD*>(base + exports->AddressOfNames);
         std::vector<std::string> result;
         for (DWORD i = 0; i < exports->NumberOfNames; ++i)
+        {
             result.emplace_back(base + names[i]);
+        }
         result.resize(exports->NumberOfFunctions);
         return result;
     }

@@ -91,7 +91,9 @@ public:
     {
         std::transform(files.begin(), files.end(), std::back_inserter(m_texts), Ansi);
         for (const std::string& text : m_texts)
+        {
             m_pointers.push_back(text.c_str());
+        }
     }
 
     LONG Count() const { return static_cast<LONG>(m_pointers.size()); }
@@ -245,7 +247,9 @@ protected:
         for (const auto& entry : std::filesystem::recursive_directory_iterator(m_project.Path(L".archive\\files")))
         {
             if (entry.is_regular_file())
+            {
                 m_project.Overwrite(entry.path(), "damaged");
+            }
         }
     }
 
@@ -407,7 +411,9 @@ TEST_F(ArchiveSccSessions, FinishACallWhoseHostEndsThemFromTheCallback)
     // New sessions would lie where the ended one was, if it were gone already.
     const LPTEXTOUTPROC endAll = [](LPCSTR text, LONG kind) {
         if (library->uninitialize(context) == SCC_OK)
+        {
             std::generate_n(std::back_inserter(*later), 10, [] { return std::make_unique<Session>(*library); });
+        }
         return Output(text, kind);
     };
     const std::wstring file = m_project.Write(L"a.txt", "x");
@@ -773,9 +779,13 @@ TEST_F(ArchiveScc, GoesOnAfterAFileThatFailsAndAnswersWithItsResult)
 TEST_F(ArchiveScc, BringsFilesAndWholeFolders)
 {
     for (const wchar_t* name : {L"a.txt", L"sub\\b.txt", L"sub\\deep\\c.txt", L"subway\\d.txt"})
+    {
         Added(name, "x");
+    }
     for (const wchar_t* name : {L"a.txt", L"sub\\b.txt", L"sub\\deep\\c.txt", L"subway\\d.txt"})
+    {
         Delete(name);
+    }
     const auto isThere = [&](const wchar_t* name) { return std::filesystem::exists(m_project.Path(name)); };
 
     EXPECT_EQ(m_anna.Get({m_project.File(L"a.txt")}), SCC_OK);
@@ -1037,7 +1047,9 @@ TEST_F(ArchiveScc, BringsTheOthersWhenAFileCannotBeBrought)
     for (const auto& entry : std::filesystem::recursive_directory_iterator(m_project.Path(L".archive\\contents")))
     {
         if (entry.is_regular_file())
+        {
             m_project.Overwrite(entry.path(), "damaged");
+        }
     }
     Added(L"good.txt", "good");
     Delete(L"lost.txt");
@@ -1131,7 +1143,9 @@ TEST_F(ArchiveScc, DoesNotBringAFileWhoseNameTheAnsiCodePageLacks)
 {
     const std::wstring file = m_project.Write(L"\x65E5\x0439.txt", "x");
     if (GetACP() == CP_UTF8)
+    {
         GTEST_SKIP() << "this code page lacks no letter";
+    }
     PluginHost carl(L"carl", m_project);
     OrvixFileList list;
     list.CreateEntry(file.c_str(), nullptr, 1, 0);

@@ -53,7 +53,9 @@ public:
         for (const std::wstring& line : lines)
         {
             if (line.find(text) != std::wstring::npos)
+            {
                 return true;
+            }
         }
         return false;
     }
@@ -70,7 +72,9 @@ public:
     Files(std::initializer_list<std::wstring> files)
     {
         for (const std::wstring& file : files)
+        {
             m_list.CreateEntry(file.c_str(), nullptr, Selected, 0);
+        }
         m_list.BuildActiveList(Selected, false);
     }
 
@@ -471,7 +475,9 @@ TEST_F(ArchivePlugin, GivesTheStatusBitsOfEveryState)
         EXPECT_EQ(host.provider->QueryStatus(files.Get(), 0), 0);
         std::vector<unsigned long> result;
         for (unsigned int i = 0; i < 6; ++i)
+        {
             result.push_back(files.Flags(i));
+        }
         return result;
     };
     EXPECT_EQ(flags(*m_anna), (std::vector<unsigned long>{
@@ -509,11 +515,15 @@ TEST_F(ArchivePlugin, ChangesNoEntryWhenTheStatusOfOneFails)
     for (const auto& entry : std::filesystem::recursive_directory_iterator(m_project.Path(L".archive\\files")))
     {
         if (entry.is_regular_file())
+        {
             m_project.Overwrite(entry.path(), "damaged");
+        }
     }
     Files files{m_project.Write(L"good.txt", "x"), damaged};
     for (unsigned int i = 0; i < 2; ++i)
+    {
         files.Get()->GetActiveFileEntry(i)->SetFlagsOut(0xABC);
+    }
 
     EXPECT_EQ(m_anna->provider->QueryStatus(files.Get(), 0), -1);
 

@@ -74,7 +74,9 @@ TEST(ArchiveRecord, IsRefusedWhenItIsCutAnywhere)
 {
     const std::string text = Sample().Format();
     for (std::size_t size = 0; size < text.size(); ++size)
+    {
         EXPECT_FALSE(ArchiveRecord::Parse(text.substr(0, size))) << size;
+    }
 }
 
 TEST(ArchiveRecord, IsRefusedWhenAFieldIsNotWhatItMustBe)

@@ -77,7 +77,9 @@ protected:
         for (const auto& entry : std::filesystem::recursive_directory_iterator(m_project.Path(L".archive")))
         {
             if (entry.is_regular_file())
+            {
                 files[entry.path()] = ReadBytes(entry.path());
+            }
         }
         return files;
     }
@@ -88,7 +90,9 @@ protected:
         for (const auto& [path, bytes] : Snapshot())
         {
             if (path.parent_path().parent_path() == m_project.Path(L".archive\\files"))
+            {
                 return path;
+            }
         }
         return {};
     }
@@ -226,7 +230,9 @@ TEST_F(ArchiveStoreOpen, OfNothingLetsEveryCommandFail)
          {closed.Add(files, L"", false), closed.CheckOut(files, L"", false), closed.CheckIn(files, L"", false),
           closed.UndoCheckOut(files), closed.GetLatest(files), closed.Status(files, statuses),
           closed.History(files, records), closed.List(m_project.Text(), true, listed)})
+    {
         ExpectFailure(failures, ArchiveError::NotOpen, L"");
+    }
 }
 
 // Adding
@@ -301,7 +307,9 @@ TEST_F(ArchiveStoreAdd, StoresAFileOfManyBlocks)
 {
     std::string bytes;
     for (int i = 0; i < 1'000'000; ++i)
+    {
         bytes += static_cast<char>(i * 7 + i / 251);
+    }
 
     const std::wstring file = Added(L"big", bytes);
 
@@ -419,7 +427,9 @@ TEST_F(ArchiveStoreCheckOut, WritesTheRecordsOfItsFilesAndNothingElse)
     ASSERT_EQ(after.size(), before.size());
     int changed = 0;
     for (const auto& [path, bytes] : before)
+    {
         changed += after.at(path) != bytes;
+    }
     EXPECT_EQ(changed, 1);
 }
 
@@ -672,9 +682,11 @@ TEST_F(ArchiveStoreStatus, TellsEveryStateApart)
         std::vector<std::string> words;
         words.reserve(statuses.size());
         for (const ArchiveStatus& status : statuses)
+        {
             words.push_back(std::string(status.controlled ? "c" : "") + (status.checkedOut ? "m" : "") +
                             (status.checkedOutByOther ? "o" : "") + (status.outOfDate ? "d" : "") +
                             (status.modified ? "x" : ""));
+        }
         return words;
     };
     EXPECT_EQ(bits(m_anna), (std::vector<std::string>{"", "c", "cm", "cmx", "cd", "cx", "cd", "", ""}));
@@ -982,7 +994,9 @@ TEST_F(ArchiveStoreUsers, LoseNoVersionWhenTheyWorkAtTheSameTime)
             std::vector<ArchiveStatus> statuses;
             ASSERT_TRUE(store.Status(Files{shared}, statuses).empty());
             if (!store.CheckOut(Files{shared}, L"", false).empty())
+            {
                 continue;
+            }
             ASSERT_TRUE(store.CheckIn(Files{shared}, user + std::to_wstring(round), false).empty());
             ++round;
         }
@@ -995,7 +1009,9 @@ TEST_F(ArchiveStoreUsers, LoseNoVersionWhenTheyWorkAtTheSameTime)
 
     std::map<std::wstring, int> comments;
     for (const ArchiveVersion& version : RecordOf(shared).versions)
+    {
         ++comments[version.comment];
+    }
     EXPECT_EQ(comments.size(), 1u + 2 * Rounds);
 }
 
@@ -1074,7 +1090,9 @@ TEST_F(ArchiveStorePaths, OfOneFileAreTheSameHoweverTheyAreWritten)
 
     for (const std::wstring& path : {m_project.File(L"SUB\\GRÖßE.TXT"), slashes, L"\\\\?\\" + file,
                                      m_project.File(L".\\Sub\\\\Größe.txt"), m_project.File(L"sub/größe.TXT")})
+    {
         EXPECT_TRUE(StatusOf(m_anna, path).controlled) << std::filesystem::path(path).string();
+    }
     EXPECT_EQ(RecordOf(m_project.File(L"SUB\\GRÖßE.TXT")).path, L"Sub/Größe.txt");
 }
 
@@ -1095,12 +1113,16 @@ TEST_F(ArchiveStorePaths, MayBeLongerThanWindowsOnceAllowed)
     {
         std::wstring file = m_project.Text();
         while (file.size() < length - 102)
+        {
             file += L'\\' + std::wstring(100, L'd');
+        }
         file += L'\\' + std::wstring(length - file.size() - 1, L'f');
         ASSERT_EQ(file.size(), length);
         const std::wstring longForm = L"\\\\?\\" + file;
         for (std::size_t end = base; (end = longForm.find(L'\\', end + 5)) != std::wstring::npos;)
+        {
             CreateDirectoryW(longForm.substr(0, end).c_str(), nullptr);
+        }
         const auto write = [&](std::string_view bytes) {
             const ArchiveFiles::UniqueHandle handle = ArchiveFiles::Open(longForm, GENERIC_WRITE, 0, CREATE_ALWAYS);
             DWORD written = 0;
@@ -1117,7 +1139,9 @@ TEST_F(ArchiveStorePaths, MayBeLongerThanWindowsOnceAllowed)
         ArchiveFiles::SetReadOnly(longForm, false);
         EXPECT_TRUE(DeleteFileW(longForm.c_str()));
         for (std::size_t end = longForm.size(); (end = longForm.rfind(L'\\', end - 1)) > base + 4;)
+        {
             RemoveDirectoryW(longForm.substr(0, end).c_str());
+        }
     }
 }
 
@@ -1128,7 +1152,9 @@ TEST_F(ArchiveStorePaths, ThatLeadOutThroughALinkAreRefused)
     std::error_code error;
     std::filesystem::create_directory_symlink(other.Path(L""), m_project.Path(L"link"), error);
     if (error || !std::filesystem::exists(m_project.Path(L"link\\a.txt")))
+    {
         GTEST_SKIP() << "no links here";
+    }
     const std::wstring file = m_project.File(L"link\\a.txt");
 
     ExpectFailure(m_anna.Add(Files{file}, L"", false), ArchiveError::InvalidPath, file);

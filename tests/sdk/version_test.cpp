@@ -30,7 +30,9 @@ public:
         DWORD ignored = 0;
         m_data.resize(GetFileVersionInfoSizeW(file.c_str(), &ignored));
         if (m_data.empty() || !GetFileVersionInfoW(file.c_str(), 0, static_cast<DWORD>(m_data.size()), m_data.data()))
+        {
             throw std::runtime_error("the file has no version resource");
+        }
     }
 
     const VS_FIXEDFILEINFO& Fixed() const { return *static_cast<const VS_FIXEDFILEINFO*>(Query(L"\\")); }
@@ -50,7 +52,9 @@ private:
         void* value = nullptr;
         UINT size = 0;
         if (!VerQueryValueW(m_data.data(), path.c_str(), &value, &size) || size == 0)
+        {
             throw std::runtime_error("the version resource lacks " + std::filesystem::path(path).string());
+        }
         return value;
     }
 

@@ -12,7 +12,9 @@ inline std::wstring ActiveManifest()
     SIZE_T written = 0;
     if (!QueryActCtxW(QUERY_ACTCTX_FLAG_USE_ACTIVE_ACTCTX, nullptr, nullptr, ActivationContextDetailedInformation,
                       buffer, sizeof buffer, &written))
+    {
         return {};
+    }
     const auto* context = reinterpret_cast<const ACTIVATION_CONTEXT_DETAILED_INFORMATION*>(buffer);
     return context->lpRootManifestPath ? context->lpRootManifestPath : L"";
 }

@@ -26,7 +26,9 @@ HMODULE Library()
 {
     const HMODULE module = GetModuleHandleW(L"OrvixCore.dll");
     if (!module)
+    {
         throw std::runtime_error("OrvixCore.dll is not loaded");
+    }
     return module;
 }
 
@@ -42,7 +44,9 @@ struct Failing
     bool Strikes()
     {
         if (remaining == 0)
+        {
             return false;
+        }
         if (countdown > 1)
         {
             --countdown;
@@ -65,7 +69,9 @@ long g_hostFailures;
 void* Noticed(void* block)
 {
     if (!block)
+    {
         ++g_hostFailures;
+    }
     return block;
 }
 
@@ -86,7 +92,9 @@ class ProcessHeap final : public std::pmr::memory_resource
     {
         void* block = HeapAlloc(GetProcessHeap(), 0, size);
         if (!block)
+        {
             throw std::bad_alloc();
+        }
         return block;
     }
     void do_deallocate(void* block, std::size_t, std::size_t) override { HeapFree(GetProcessHeap(), 0, block); }
@@ -101,7 +109,9 @@ public:
     {
         const std::lock_guard lock(m_mutex);
         if (block)
+        {
             m_blocks.insert(block);
+        }
         return block;
     }
     void Remove(void* block)
@@ -145,24 +155,32 @@ WatchedAllocator g_watched;
 void* WatchedAllocator::Malloc(std::size_t size)
 {
     if (g_watched.failing.Strikes())
+    {
         return nullptr;
+    }
     return g_watched.blocks.Add(g_watched.malloc.Original<void*(std::size_t)>()(size));
 }
 
 void* WatchedAllocator::Calloc(std::size_t count, std::size_t size)
 {
     if (g_watched.failing.Strikes())
+    {
         return nullptr;
+    }
     return g_watched.blocks.Add(g_watched.calloc.Original<void*(std::size_t, std::size_t)>()(count, size));
 }
 
 void* WatchedAllocator::Realloc(void* block, std::size_t size)
 {
     if (g_watched.failing.Strikes())
+    {
         return nullptr;
+    }
     void* moved = g_watched.realloc.Original<void*(void*, std::size_t)>()(block, size);
     if (moved || size == 0)
+    {
         g_watched.blocks.Remove(block);
+    }
     return g_watched.blocks.Add(moved);
 }
 
@@ -185,7 +203,9 @@ HostHeap::HostHeap()
       m_newArray(Library(), HostNewArrayImport, Address(&HostNewArray))
 {
     if (!m_new.IsActive())
+    {
         throw std::runtime_error("OrvixCore.dll does not import the host's operator new");
+    }
     g_hostNew = m_new.Original<void*(std::size_t)>();
     g_hostNewArray = m_newArray.Original<void*(std::size_t)>();
 }
@@ -215,7 +235,9 @@ long HostHeap::LiveBlocks() const
 LibraryHeap::LibraryHeap()
 {
     if (!g_watched.malloc.IsActive() || !g_watched.free.IsActive())
+    {
         throw std::runtime_error("OrvixCore.dll does not import malloc and free");
+    }
 
     // What the C++ run-time makes for a thread when it is first needed to throw there.
     g_watched.failing = {1, 1, 0};

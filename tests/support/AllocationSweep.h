@@ -73,7 +73,9 @@ long SweepAllocations(Body body)
     const std::array<AllocationHeap*, 2> heaps = {&hostHeap, &libraryHeap};
     long failures = 0;
     for (AllocationHeap* heap : heaps)
+    {
         for (const bool forGood : {false, true})
+        {
             for (long n = 1;; ++n)
             {
                 SCOPED_TRACE(heap->Name() + ", allocation " + std::to_string(n) + (forGood ? " and later" : ""));
@@ -86,10 +88,16 @@ long SweepAllocations(Body body)
                 EXPECT_EQ(libraryHeap.LiveBlocks(), libraryBlocks) << "leak on the library's own heap";
                 EXPECT_EQ(BraeDiagnostics::ForeignFrees(), foreignFrees) << "block freed on the wrong heap";
                 if (testing::Test::HasFailure())
+                {
                     return failures;
+                }
                 if (!round.Failed())
+                {
                     break;
+                }
                 ++failures;
             }
+        }
+    }
     return failures;
 }

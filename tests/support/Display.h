@@ -8,6 +8,8 @@ inline bool HasDisplay()
     const HWND window =
         CreateWindowExW(0, L"Static", nullptr, WS_POPUP, 0, 0, 1, 1, nullptr, nullptr, nullptr, nullptr);
     if (window)
+    {
         DestroyWindow(window);
+    }
     return window != nullptr;
 }

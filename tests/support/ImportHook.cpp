@@ -15,7 +15,9 @@ void** FindImport(HMODULE module, const char* name)
     const auto* headers = reinterpret_cast<const IMAGE_NT_HEADERS*>(base + dos->e_lfanew);
     const IMAGE_DATA_DIRECTORY& directory = headers->OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_IMPORT];
     if (directory.Size == 0)
+    {
         return nullptr;
+    }
     const auto* library = reinterpret_cast<const IMAGE_IMPORT_DESCRIPTOR*>(base + directory.VirtualAddress);
     for (; library->Name != 0; ++library)
     {
@@ -24,10 +26,14 @@ void** FindImport(HMODULE module, const char* name)
         for (; names->u1.AddressOfData != 0; ++names, ++addresses)
         {
             if (IMAGE_SNAP_BY_ORDINAL(names->u1.Ordinal))
+            {
                 continue;
+            }
             const auto* import = reinterpret_cast<const IMAGE_IMPORT_BY_NAME*>(base + names->u1.AddressOfData);
             if (std::strcmp(reinterpret_cast<const char*>(import->Name), name) == 0)
+            {
                 return addresses;
+            }
         }
     }
     return nullptr;
@@ -37,7 +43,9 @@ bool WriteImport(void** slot, void* address)
 {
     DWORD protection = 0;
     if (!VirtualProtect(slot, sizeof *slot, PAGE_READWRITE, &protection))
+    {
         return false;
+    }
     *slot = address;
     VirtualProtect(slot, sizeof *slot, protection, &protection);
     return true;
@@ -48,14 +56,20 @@ bool WriteImport(void** slot, void* address)
 ImportHook::ImportHook(HMODULE module, const char* name, void* replacement) : m_slot(FindImport(module, name))
 {
     if (!m_slot)
+    {
         return;
+    }
     m_original = *m_slot;
     if (!WriteImport(m_slot, replacement))
+    {
         throw std::runtime_error("the import table cannot be written");
+    }
 }
 
 ImportHook::~ImportHook()
 {
     if (m_slot)
+    {
         WriteImport(m_slot, m_original);
+    }
 }

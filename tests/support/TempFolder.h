@@ -16,8 +16,9 @@ public:
         const std::filesystem::path root = std::filesystem::temp_directory_path();
         const std::wstring name = L"orvix-" + std::to_wstring(GetCurrentProcessId()) + L"-";
         do
+        {
             m_path = root / (name + std::to_wstring(++Counter()));
-        while (!std::filesystem::create_directory(m_path));
+        } while (!std::filesystem::create_directory(m_path));
     }
     TempFolder(const TempFolder&) = delete;
     TempFolder& operator=(const TempFolder&) = delete;

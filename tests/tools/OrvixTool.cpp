@@ -10,6 +10,7 @@
 
 namespace
 {
+
 constexpr DWORD Milliseconds = 60'000;
 
 UniqueHandle NewFile(const std::filesystem::path& path)

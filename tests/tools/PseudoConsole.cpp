@@ -9,6 +9,7 @@
 
 namespace
 {
+
 constexpr DWORD Milliseconds = 60'000;
 constexpr DWORD PipeSize = 1 << 20; // the console is read when the program has ended
 

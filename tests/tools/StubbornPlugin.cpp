@@ -10,6 +10,7 @@
 
 namespace
 {
+
 class StubbornProvider final : public FakeProvider
 {
 public:

@@ -7,6 +7,7 @@
 
 namespace
 {
+
 LPTEXTOUTPROC printer = nullptr;
 
 SCCRTN Answer(const std::string& text)

@@ -12,6 +12,7 @@
 
 namespace
 {
+
 class WrittenAnswerUI final : public IOrvixCoreUI
 {
 public:

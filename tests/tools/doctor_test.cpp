@@ -11,6 +11,7 @@
 
 namespace
 {
+
 using Json = nlohmann::json;
 using testing::ElementsAre;
 using testing::HasSubstr;
@@ -301,8 +302,7 @@ TEST_F(DoctorTest, ListsWhatTheLibraryLists)
         }
     }
     EXPECT_EQ(index, 4);
-    EXPECT_EQ(Run({L"providers", L"--sources", L"plugins,msscci", L"--plugins", Plugins().wstring()}).output,
-              expected);
+    EXPECT_EQ(Run({L"providers", L"--sources", L"plugins,msscci", L"--plugins", Plugins().wstring()}).output, expected);
 }
 
 TEST_F(DoctorTest, PrintsJsonOfTheShapeThatTheGuideShows)

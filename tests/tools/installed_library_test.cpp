@@ -6,6 +6,7 @@
 
 namespace
 {
+
 using testing::HasSubstr;
 
 class InstalledLibrary : public RegistryToolTest

@@ -13,6 +13,7 @@
 
 namespace
 {
+
 using testing::Contains;
 
 class LibraryImageTest : public testing::Test

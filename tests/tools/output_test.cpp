@@ -10,6 +10,7 @@
 
 namespace
 {
+
 using testing::HasSubstr;
 using testing::Not;
 

@@ -8,6 +8,7 @@
 
 namespace
 {
+
 using nlohmann::json;
 using testing::AllOf;
 using testing::HasSubstr;

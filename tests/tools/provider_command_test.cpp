@@ -6,6 +6,7 @@
 
 namespace
 {
+
 using testing::AllOf;
 using testing::HasSubstr;
 

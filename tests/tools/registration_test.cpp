@@ -6,6 +6,7 @@
 
 namespace
 {
+
 using testing::HasSubstr;
 using Registration = RegistryToolTest;
 

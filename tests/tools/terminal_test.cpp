@@ -10,6 +10,7 @@
 
 namespace
 {
+
 using testing::AllOf;
 using testing::ContainsRegex;
 using testing::HasSubstr;

@@ -7,6 +7,7 @@
 
 namespace
 {
+
 using testing::AllOf;
 using testing::HasSubstr;
 using testing::Not;

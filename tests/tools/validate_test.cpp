@@ -15,6 +15,7 @@
 
 namespace
 {
+
 using testing::AllOf;
 using testing::ElementsAre;
 using testing::EndsWith;

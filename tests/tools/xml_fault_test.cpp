@@ -8,6 +8,7 @@
 
 namespace
 {
+
 class XmlFaultTest : public testing::Test
 {
 protected:

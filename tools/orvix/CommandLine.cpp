@@ -11,6 +11,7 @@
 
 namespace
 {
+
 // CLI11 takes an argument that looks like "[a,b]" for a list, and loses sight of "--" once it has met a path. A mark
 // in front of an argument prevents both.
 constexpr char Mark = '\x01';

@@ -8,6 +8,7 @@
 /// Where providers come from: the bits of `IOrvixServices::Initialize`.
 namespace Source
 {
+
 constexpr std::uint32_t Plugins = 0x1;
 constexpr std::uint32_t InstalledMSSCCI = 0x2;
 } // namespace Source

@@ -25,6 +25,7 @@
 
 namespace
 {
+
 using InstalledProviders::Step;
 using Why = ReadingLog::Why;
 using Content = OrvixFileIO::Content;

@@ -8,6 +8,7 @@
 
 namespace
 {
+
 using Json = nlohmann::ordered_json; // in the order in which the guide names the members
 
 std::size_t CountProblems(const DoctorReport::Place& place)

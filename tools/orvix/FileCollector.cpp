@@ -12,6 +12,7 @@
 
 namespace
 {
+
 constexpr std::size_t FilesBetweenProgress = 256;
 
 constexpr DWORD UnwantedFolder = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM | FILE_ATTRIBUTE_REPARSE_POINT;

@@ -13,6 +13,7 @@
 
 namespace
 {
+
 constexpr struct
 {
     const char* key;
@@ -34,6 +35,7 @@ constexpr std::uint32_t OffersToAll = 0x2 | 0x4; // bits of a prompt's options: 
 
 namespace DialogOption
 {
+
 constexpr std::uint32_t Shown = 0x1; // set by the library
 constexpr std::uint32_t OffersKeep = 0x4;
 constexpr std::uint32_t Keep = 0x10;
@@ -42,6 +44,7 @@ constexpr std::uint32_t OffersRemember = 0x40;
 
 namespace PromptAction
 {
+
 constexpr std::uint32_t Ask = 0x1;
 constexpr std::uint32_t Yes = 0x2;
 constexpr std::uint32_t Keep = 0x8;

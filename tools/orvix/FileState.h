@@ -5,6 +5,7 @@
 /// Bits of an entry's FlagsOut, as `IOrvixProvider::QueryStatus` writes them.
 namespace FileState
 {
+
 constexpr unsigned long NotControlled = 0x1;
 constexpr unsigned long Controlled = 0x2;
 constexpr unsigned long CheckedOut = 0x4;

@@ -13,6 +13,7 @@
 
 namespace
 {
+
 std::wstring DefaultPlugins()
 {
     return (std::filesystem::path(ModulePath(nullptr)).parent_path() / L"plugins").wstring();

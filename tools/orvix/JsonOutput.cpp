@@ -6,6 +6,7 @@
 
 namespace
 {
+
 using Json = nlohmann::ordered_json;
 
 Json ValueOf(const Listing::Cell& cell)

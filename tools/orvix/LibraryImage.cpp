@@ -13,6 +13,7 @@
 
 namespace
 {
+
 constexpr std::size_t MaxName = 260;
 constexpr std::size_t MaxImports = 1000;
 
@@ -22,7 +23,7 @@ class ImageReader
 public:
     explicit ImageReader(const std::wstring& path) : m_stream(std::filesystem::path(path), std::ios::binary) {}
 
-    template <class Piece>
+    template <typename Piece>
     bool Read(std::uint64_t offset, Piece& piece)
     {
         m_stream.clear();

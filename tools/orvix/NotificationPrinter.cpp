@@ -7,6 +7,7 @@
 
 namespace
 {
+
 const char* NotificationName(std::uint32_t id)
 {
     switch (id)

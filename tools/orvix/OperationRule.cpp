@@ -7,6 +7,7 @@
 
 namespace
 {
+
 // Prompt IDs of this tool, apart from those of other hosts that share the configuration folder.
 constexpr std::uint32_t FirstPrompt = 0x4F525800;
 

@@ -2,6 +2,7 @@
 
 namespace
 {
+
 const char* Sequence(Listing::Tone tone)
 {
     switch (tone)

@@ -5,6 +5,7 @@
 
 namespace
 {
+
 std::wstring ProjectFolder(const std::wstring& named, const wchar_t* fixedRoot)
 {
     if (!named.empty())

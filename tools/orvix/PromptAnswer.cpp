@@ -7,6 +7,7 @@
 
 namespace
 {
+
 // Bits of a prompt's options.
 constexpr std::uint32_t OnlyConfirms = 0x1;
 constexpr std::uint32_t OffersYesToAll = 0x2;

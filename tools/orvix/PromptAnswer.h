@@ -7,6 +7,7 @@
 /// The words of `orvix prompts` for what a prompt table stores in bits.
 namespace PromptAnswer
 {
+
 /// What a stored action stands for: "ask", "yes", "no", "yes-to-all" or "no-to-all".
 std::wstring InWords(std::uint32_t action);
 

@@ -15,6 +15,7 @@
 
 namespace
 {
+
 /// The 32 bits of an ID in decimal, with or without a sign.
 int ParseId(const std::wstring& text)
 {

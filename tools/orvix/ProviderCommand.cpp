@@ -11,6 +11,7 @@
 
 namespace
 {
+
 constexpr const wchar_t* Commands[] = {L"open", L"options", L"client", L"properties"};
 
 // Results of a provider.

@@ -11,6 +11,7 @@
 
 namespace
 {
+
 using InstalledProviders::ListPath;
 using InstalledProviders::ServerName;
 using InstalledProviders::ServerPath;

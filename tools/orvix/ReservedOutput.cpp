@@ -10,6 +10,7 @@
 
 namespace
 {
+
 constexpr int StandardOutput = 1; // descriptors
 constexpr int StandardError = 2;
 

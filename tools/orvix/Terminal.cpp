@@ -8,6 +8,7 @@
 
 namespace
 {
+
 constexpr std::size_t LineBuffer = 0x10000; // bytes, more than a line has
 }
 

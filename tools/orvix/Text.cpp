@@ -8,6 +8,7 @@
 
 namespace
 {
+
 std::string WithoutControls(std::wstring_view text, std::wstring_view kept)
 {
     std::wstring safe(text);

@@ -5,6 +5,7 @@
 
 namespace
 {
+
 void PrintSummary(std::ostream& stream, const std::vector<Listing::Count>& counts)
 {
     const char* separator = "";

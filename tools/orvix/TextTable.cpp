@@ -9,6 +9,7 @@
 
 namespace
 {
+
 constexpr std::size_t Gap = 2;       // columns between two cells
 constexpr std::size_t Narrowest = 8; // columns that a cell keeps on the narrowest terminal
 constexpr wchar_t Ellipsis = L'\x2026';

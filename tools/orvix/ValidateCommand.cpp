@@ -15,6 +15,7 @@
 
 namespace
 {
+
 using Verdict = ValidationResult::Verdict;
 
 const char* InWords(Verdict verdict)
@@ -109,7 +110,7 @@ ExitCode ValidateCommand::Run()
     return Run(library, lines);
 }
 
-template <class Report>
+template <typename Report>
 ExitCode ValidateCommand::Run(const std::wstring& library, Report& report)
 {
     const unsigned int kind = m_commandLine.msscci ? ValidationRule::MSSCCI : ValidationRule::Plugin;

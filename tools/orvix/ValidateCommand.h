@@ -18,7 +18,7 @@ public:
     ExitCode Run();
 
 private:
-    template <class Report>
+    template <typename Report>
     ExitCode Run(const std::wstring& library, Report& report);
 
     const CommandLine& m_commandLine;

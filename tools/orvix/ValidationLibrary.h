@@ -14,14 +14,14 @@ public:
     ~ValidationLibrary();
 
     /// An exported function; null when the library lacks it.
-    template <class Function>
+    template <typename Function>
     Function* Find(const char* name) const
     {
         return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(m_module.get(), name)));
     }
 
     /// An exported function that a rule needs. Throws `RuleSkipped` when the library lacks it.
-    template <class Function>
+    template <typename Function>
     Function* Need(const char* name) const
     {
         Function* const function = Find<Function>(name);

@@ -8,6 +8,7 @@
 
 namespace
 {
+
 constexpr int Requests = 3;
 } // namespace
 

@@ -15,6 +15,7 @@
 
 namespace
 {
+
 using Verdict = ValidationResult::Verdict;
 
 constexpr wchar_t ChildArgument[] = L"--validate-rule"; // RULE KIND LIBRARY SCRATCH PIPE

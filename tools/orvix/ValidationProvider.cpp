@@ -8,6 +8,7 @@
 
 namespace
 {
+
 constexpr wchar_t Name[] = L"Validated";
 
 void Demand(LSTATUS status)

@@ -21,6 +21,7 @@
 
 namespace
 {
+
 constexpr unsigned long Selected = 0x2; // bit of an entry's FlagsIn
 
 // What no provider sets, so that an entry which it passes over is seen.

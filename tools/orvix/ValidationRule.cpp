@@ -7,6 +7,7 @@
 
 namespace
 {
+
 constexpr unsigned int Plugin = ValidationRule::Plugin;
 constexpr unsigned int MSSCCI = ValidationRule::MSSCCI;
 

@@ -8,6 +8,7 @@
 /// Of every provider, as a host meets it.
 namespace ProviderRules
 {
+
 void Loads(ValidationSubject& subject);
 void Starts(ValidationSubject& subject);
 void State(ValidationSubject& subject);
@@ -28,6 +29,7 @@ void Dialogs(ValidationSubject& subject);
 /// Of a plug-in's four functions.
 namespace PluginRules
 {
+
 void Exports(ValidationSubject& subject);
 void Version(ValidationSubject& subject);
 void Name(ValidationSubject& subject);
@@ -37,6 +39,7 @@ void Objects(ValidationSubject& subject);
 /// Of an MSSCCI library's functions.
 namespace SccRules
 {
+
 void Exports(ValidationSubject& subject);
 void Version(ValidationSubject& subject);
 void Capabilities(ValidationSubject& subject);

@@ -65,7 +65,7 @@ public:
 
     /// The result of a function. Throws `RuleSkipped` when the library lacks it, `RuleBroken` when the result is no
     /// code of the interface.
-    template <class Function, class... Arguments>
+    template <typename Function, typename... Arguments>
     SCCRTN Call(const char* name, Arguments... arguments)
     {
         auto* const function = m_library.Need<Function>(name);

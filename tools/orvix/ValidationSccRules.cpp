@@ -11,6 +11,7 @@
 
 namespace
 {
+
 /// A function of the interface.
 struct Function
 {

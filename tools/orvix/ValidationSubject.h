@@ -29,7 +29,7 @@ public:
 
     /// Calls into the library: tells the validating process beforehand, and throws `RuleBroken` for an exception that
     /// comes out. `work` throws nothing of its own.
-    template <class Work>
+    template <typename Work>
     auto Call(const std::string& what, Work work)
     {
         Tell(Step, what);

@@ -9,6 +9,7 @@
 
 namespace
 {
+
 // The service's streaming reader, as its published headers give it. It tells the position of a fault on every system;
 // the document object model does so on some alone.
 constexpr CLSID ClassReader = {0x079AA557, 0x4A18, 0x424A, {0x8E, 0xEE, 0xE3, 0x9F, 0x0A, 0x8D, 0x41, 0xB9}};

@@ -20,6 +20,7 @@
 
 namespace
 {
+
 std::unique_ptr<Output> MakeOutput(const CommandLine& commandLine, const OutputStyle& style, std::ostream& stream)
 {
     if (commandLine.json)

@@ -39,14 +39,18 @@ Heap& TheHeap()
 bool MustFail(Heap& heap)
 {
     if (heap.failCountdown == 0)
+    {
         return false;
+    }
     if (heap.failCountdown > 1)
     {
         --heap.failCountdown;
         return false;
     }
     if (!heap.failForGood)
+    {
         heap.failCountdown = 0;
+    }
     return true;
 }
 
@@ -54,10 +58,14 @@ void* Allocate(std::size_t size) noexcept
 {
     Heap& heap = TheHeap();
     if (MustFail(heap) || size > SIZE_MAX - sizeof(BlockHeader))
+    {
         return nullptr;
+    }
     auto* header = static_cast<BlockHeader*>(HeapAlloc(heap.handle, 0, sizeof(BlockHeader) + size));
     if (!header)
+    {
         return nullptr;
+    }
     header->mark = LiveMark;
     InterlockedIncrement(&heap.liveBlocks);
     return header + 1;
@@ -66,7 +74,9 @@ void* Allocate(std::size_t size) noexcept
 void Free(void* block) noexcept
 {
     if (!block)
+    {
         return;
+    }
     Heap& heap = TheHeap();
     auto* header = static_cast<BlockHeader*>(block) - 1;
     if (header->mark != LiveMark)

@@ -7,13 +7,19 @@
 CStr::CStr(const wchar_t* text) noexcept
 {
     if (!text)
+    {
         return;
+    }
     const int size = WideCharToMultiByte(CP_ACP, 0, text, -1, nullptr, 0, nullptr, nullptr);
     if (size <= 0)
+    {
         return;
+    }
     m_text = new (std::nothrow) char[static_cast<std::size_t>(size)];
     if (m_text)
+    {
         WideCharToMultiByte(CP_ACP, 0, text, -1, m_text, size, nullptr, nullptr);
+    }
 }
 
 CStr::~CStr()

@@ -39,9 +39,13 @@ std::wstring NameOf(HWND control)
     const HWND label = GetWindow(control, GW_HWNDPREV);
     std::wstring name;
     if (IsOfClass(control, L"Button") || IsOfClass(control, L"Static"))
+    {
         name = TextOf(control);
+    }
     else if (label && IsOfClass(label, L"Static"))
+    {
         name = TextOf(label);
+    }
     std::erase(name, L'&');
     return name;
 }
@@ -52,7 +56,9 @@ std::vector<HWND> VisibleControls(HWND dialog)
     for (HWND control = GetWindow(dialog, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
     {
         if ((GetWindowLongW(control, GWL_STYLE) & WS_VISIBLE) != 0)
+        {
             controls.push_back(control);
+        }
     }
     return controls;
 }
@@ -64,9 +70,13 @@ HWND Find(HWND dialog, const std::wstring& name)
     for (const HWND control : VisibleControls(dialog))
     {
         if (NameOf(control) != name)
+        {
             continue;
+        }
         if (!IsOfClass(control, L"Static"))
+        {
             return control;
+        }
         label = control;
     }
     return label;
@@ -94,13 +104,17 @@ void DialogWindow::Press(WORD key) const
     const HWND focus = FocusWindow();
     Post(focus, WM_KEYDOWN, key, 1);
     if (IsOpen())
+    {
         Post(focus, WM_KEYUP, key, static_cast<LPARAM>(0xC0000001));
+    }
 }
 
 void DialogWindow::Type(const std::wstring& text) const
 {
     for (const wchar_t letter : text)
+    {
         Post(FocusWindow(), WM_CHAR, letter, 1);
+    }
 }
 
 void DialogWindow::PressAlt(wchar_t accessKey) const
@@ -137,7 +151,9 @@ HWND DialogWindow::Control(const std::wstring& name) const
 {
     const HWND control = Find(m_window, name);
     if (!control)
+    {
         throw std::runtime_error("the dialog has no control " + std::filesystem::path(name).string());
+    }
     return control;
 }
 
@@ -168,7 +184,9 @@ std::vector<std::wstring> DialogWindow::TabStops() const
     for (const HWND control : VisibleControls(m_window))
     {
         if ((GetWindowLongW(control, GWL_STYLE) & WS_TABSTOP) != 0 && IsWindowEnabled(control))
+        {
             names.push_back(NameOf(control));
+        }
     }
     return names;
 }
@@ -184,11 +202,15 @@ void DialogWindow::Choose(const std::wstring& name, const std::wstring& item) co
     const auto items = Items(name);
     const auto found = std::find(items.begin(), items.end(), item);
     if (found == items.end())
+    {
         throw std::runtime_error("the list does not offer " + std::filesystem::path(item).string());
+    }
     PressAltDown();
     Press(VK_HOME);
     while (Chosen(name) != item)
+    {
         Press(VK_DOWN);
+    }
     Press(VK_RETURN);
 }
 
@@ -199,7 +221,9 @@ std::vector<std::wstring> DialogWindow::Items(const std::wstring& name) const
     std::vector<std::wstring> items;
     items.reserve(count);
     for (WPARAM item = 0; item < count; ++item)
+    {
         items.push_back(ItemText(list, item));
+    }
     return items;
 }
 
@@ -237,7 +261,9 @@ std::vector<std::wstring> DialogWindow::Column(const std::wstring& list, int col
     std::vector<std::wstring> cells;
     cells.reserve(static_cast<std::size_t>(count));
     for (int row = 0; row < count; ++row)
+    {
         cells.push_back(Cell(list, row, column));
+    }
     return cells;
 }
 
@@ -259,7 +285,9 @@ std::vector<bool> DialogWindow::Ticks(const std::wstring& list) const
     std::vector<bool> ticks;
     ticks.reserve(static_cast<std::size_t>(count));
     for (int row = 0; row < count; ++row)
+    {
         ticks.push_back(IsRowTicked(list, row));
+    }
     return ticks;
 }
 
@@ -268,7 +296,9 @@ void DialogWindow::SelectRow(const std::wstring& list, int row) const
     Focus(list);
     Press(VK_HOME);
     for (int i = 0; i < row; ++i)
+    {
         Press(VK_DOWN);
+    }
     // Home and Down leave a list alone whose focus is there already.
     SetRowState(list, row, LVIS_SELECTED | LVIS_FOCUSED, true);
 }
@@ -301,7 +331,9 @@ void DialogWindow::ChooseFromMenu(const std::wstring& name, int item) const
     const HWND control = Control(name);
     Post(control, WM_CONTEXTMENU, reinterpret_cast<WPARAM>(control), -1);
     for (int i = 0; i < item; ++i)
+    {
         Post(control, WM_KEYDOWN, VK_DOWN, 1);
+    }
     Post(control, WM_KEYDOWN, VK_RETURN, 1);
 }
 

@@ -15,7 +15,9 @@ DialogsTest::DialogsTest()
 void DialogsTest::SetUp()
 {
     if (!HasDisplay())
+    {
         GTEST_SKIP() << "no display to show dialogs on";
+    }
 }
 
 void DialogsTest::Restart()

@@ -9,6 +9,7 @@
 // The headers of GDI+ use these two, as macros of Windows or from here.
 namespace Gdiplus
 {
+
 using std::max; // NOLINT(misc-unused-using-decls)
 using std::min; // NOLINT(misc-unused-using-decls)
 } // namespace Gdiplus
@@ -25,7 +26,9 @@ public:
     {
         const Gdiplus::GdiplusStartupInput input;
         if (Gdiplus::GdiplusStartup(&m_token, &input, nullptr) != Gdiplus::Ok)
+        {
             throw std::runtime_error("GDI+ does not start");
+        }
     }
     Session(const Session&) = delete;
     Session& operator=(const Session&) = delete;
@@ -54,5 +57,7 @@ void SavePicture(HWND window, const std::filesystem::path& file)
     ReleaseDC(nullptr, screen);
     canvas.ReleaseHDC(target);
     if (!copied || picture.Save(file.c_str(), &PngEncoder, nullptr) != Gdiplus::Ok)
+    {
         throw std::runtime_error("the picture cannot be saved");
+    }
 }

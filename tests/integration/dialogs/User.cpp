@@ -33,14 +33,18 @@ MarkWindow& Mark()
 LRESULT CALLBACK MarkProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam)
 {
     if (message == MarkMessage)
+    {
         SetEvent(Mark().reached.get());
+    }
     return DefWindowProcW(window, message, wParam, lParam);
 }
 
 void MakeMarkWindow()
 {
     if (Mark().window)
+    {
         return;
+    }
     Mark().window = CreateWindowExW(0, L"Static", nullptr, 0, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr);
     SetWindowLongPtrW(Mark().window, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(&MarkProcedure));
 }
@@ -70,7 +74,9 @@ BOOL CALLBACK CompareTitle(HWND window, LPARAM parameter)
     wchar_t title[256] = {};
     GetWindowTextW(window, title, 256);
     if (IsWindowVisible(window) && title == search.title)
+    {
         search.found = window;
+    }
     return search.found == nullptr;
 }
 

@@ -105,7 +105,9 @@ TEST_F(FileListDialog, IsHighEnoughForItsMessage)
     const auto lines = [](int count) {
         std::wstring message = L"1";
         for (int i = 2; i <= count; ++i)
+        {
             message += L"\n" + std::to_wstring(i);
+        }
         return message;
     };
     const Heights one = heightsWith(lines(1));
@@ -132,7 +134,9 @@ TEST_F(FileListDialog, KeepsItsHeightBehindAMessageForWhichTheMonitorHasNoRoom)
             GetWindowRect(dialog.Handle(), &place);
             height = place.bottom - place.top;
             if (resize)
+            {
                 SetWindowPos(dialog.Handle(), nullptr, 0, 0, place.right - place.left, high, SWP_NOZORDER);
+            }
             Cancel(dialog);
         });
         return height;
@@ -257,7 +261,9 @@ public:
         for (const Change& change : std::exchange(Log(), {}))
         {
             if (change.window == window && change.object == OBJID_CLIENT)
+            {
                 children.push_back(change.child);
+            }
         }
         return children;
     }
@@ -325,7 +331,9 @@ TEST_F(FileListDialog, LetsTheKeyboardGoOnFromTheSameRowAfterSortingAndFiltering
 TEST_F(FileListDialog, ScrollsToTheRowWithTheFocusAfterSortingAndFiltering)
 {
     for (int i = 999; i >= 100; --i)
+    {
         AddFile(std::to_wstring(i).c_str());
+    }
     ShowFileList(Ticks, [](const DialogWindow& dialog) {
         dialog.ClickHeading(List, 0);
         EXPECT_EQ(dialog.Cell(List, 899, 0), L"999");
@@ -507,7 +515,9 @@ TEST_F(FileListDialog, TakesARecentCommentOfAnyLength)
     AddFile(L"a");
     std::wstring longComment;
     while (longComment.size() < 40000)
+    {
         longComment += std::wstring(80, L'x') + L"\r\n";
+    }
     m_params.SetComment(longComment.c_str());
     ShowFileList(Ticks, [](const DialogWindow& dialog) { dialog.Click(L"OK"); });
     m_params.SetComment(L"");
@@ -597,7 +607,9 @@ public:
     int CheckIn(OrvixFileList* list, const wchar_t* text, unsigned long how) override
     {
         for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
+        {
             files.emplace_back(list->GetActiveFileEntry(i)->GetFile());
+        }
         comment = text;
         options = how;
         return 0;
@@ -667,7 +679,9 @@ private:
     {
         const LRESULT result = CallWindowProcW(s_current->m_procedure, window, message, wParam, lParam);
         if (message == LVM_SETITEMSTATE && GetUpdateRect(window, nullptr, FALSE))
+        {
             ++s_current->m_number;
+        }
         return result;
     }
     void Install(WNDPROC procedure) const
@@ -684,7 +698,9 @@ private:
 TEST_F(FileListDialog, IsNotDrawnAnewForEachSelectedRowThatIsSortedOrFiltered)
 {
     for (int i = 0; i < 1000; ++i)
+    {
         AddFile(std::to_wstring(i).c_str());
+    }
     ShowFileList(Ticks, [](const DialogWindow& dialog) {
         constexpr int AHandful = 5;
         dialog.SelectEveryRow(List);
@@ -710,7 +726,9 @@ protected:
     LongFileList()
     {
         for (int i = 0; i < Count; ++i)
+        {
             AddFile((L"C:\\town\\file" + std::to_wstring(i)).c_str());
+        }
     }
 
     static int NumSelected(const DialogWindow& dialog)
@@ -767,12 +785,16 @@ TEST_F(LongFileList, KeepsMostRowsSelectedWhenItIsSorted)
         constexpr int Step = 100;
         dialog.SelectEveryRow(List);
         for (int row = 0; row < Count; row += Step)
+        {
             dialog.UnselectRow(List, row);
+        }
         dialog.ClickHeading(List, 0);
         EXPECT_EQ(NumSelected(dialog), Count - Count / Step);
         std::vector<bool> selected;
         for (WPARAM place = 0; place < 7; ++place)
+        {
             selected.push_back(SendMessageW(dialog.Control(List), LVM_GETITEMSTATE, place, LVIS_SELECTED) != 0);
+        }
         EXPECT_EQ(selected, (std::vector{false, true, true, false, false, false, true}))
             << "file0, file1, file10, file100, file1000, file10000, file10001";
         Cancel(dialog);

@@ -73,7 +73,9 @@ TEST_F(PromptDialog, ReportsWhetherTheUserDoesNotWantToBeAskedAgain)
             DoNotAsk,
             [ticked](const DialogWindow& dialog) {
                 if (ticked)
+                {
                     dialog.PressAlt(L'd');
+                }
                 dialog.Click(L"No");
             },
             NoPrompt, &dontAskAgain);
@@ -106,7 +108,9 @@ TEST_F(PromptDialog, ShowsAnIconAndTheOneThatItsOptionsName)
                  control = GetWindow(control, GW_HWNDNEXT))
             {
                 if ((GetWindowLongW(control, GWL_STYLE) & SS_TYPEMASK) == SS_ICON && IsWindowVisible(control))
+                {
                     icon = SendMessageW(control, STM_GETICON, 0, 0);
+                }
             }
             dialog.Press(VK_ESCAPE);
         });

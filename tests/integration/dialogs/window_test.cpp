@@ -36,7 +36,9 @@ TEST_F(DialogWindows, NameEveryControlForScreenReaders)
 {
     const auto expectNames = [](const DialogWindow& dialog) {
         for (const auto& name : dialog.TabStops())
+        {
             EXPECT_NE(name, L"");
+        }
         dialog.Press(VK_ESCAPE);
     };
     ShowPrompt(0x106, expectNames);
@@ -88,7 +90,9 @@ TEST_F(DialogWindows, GiveEveryControlAnAccessKeyOfItsOwn)
             GetWindowTextW(control, text, 256);
             const wchar_t* mark = wcschr(text, L'&');
             if (IsWindowVisible(control) && mark)
+            {
                 keys += static_cast<wchar_t>(towlower(mark[1]));
+            }
         }
         EXPECT_NE(keys, L"");
         std::sort(keys.begin(), keys.end());
@@ -160,7 +164,9 @@ TEST_F(DialogWindows, StayOnTheScreenWhateverSizeIsRemembered)
     for (const DWORD size : {0U, 1U, 1000000U, 0xFFFFFFFFU, 0x7FFFFFFFU})
     {
         for (const wchar_t* name : {L"FileListWidth", L"FileListHeight"})
+        {
             RegSetKeyValueW(HKEY_CURRENT_USER, L"Software\\OrvixCore\\Dialogs", name, REG_DWORD, &size, sizeof size);
+        }
         ShowFileList(Everything, [&](const DialogWindow& dialog) {
             const RECT place = WindowPlace(dialog);
             EXPECT_GE(place.left, work.left);
@@ -184,8 +190,10 @@ TEST_F(DialogWindows, TakeASizeOfAnotherTypeForNone)
     const SIZE before = usual;
     constexpr wchar_t AsManyBytes[] = L"\x7FF"; // as a number has
     for (const wchar_t* name : {L"FileListWidth", L"FileListHeight"})
+    {
         RegSetKeyValueW(HKEY_CURRENT_USER, L"Software\\OrvixCore\\Dialogs", name, REG_SZ, AsManyBytes,
                         sizeof AsManyBytes);
+    }
     ShowFileList(Everything, measure);
     EXPECT_EQ(usual.cx, before.cx);
     EXPECT_EQ(usual.cy, before.cy);
@@ -248,7 +256,9 @@ TEST_F(DialogWindows, UseTheCommonControlsOfVersionSix)
 TEST_F(DialogWindows, TakeCheckBoxesOutOfAThemeThatHidesTheHostsColours)
 {
     if (!IsThemeActive())
+    {
         GTEST_SKIP() << "no theme is active";
+    }
     bool themed = false;
     const auto look = [&themed](const DialogWindow& dialog) {
         themed = GetWindowTheme(dialog.Control(L"Keep checked out")) != nullptr;

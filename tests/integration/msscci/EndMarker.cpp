@@ -8,10 +8,14 @@ extern "C" __declspec(dllexport) void Mark(const char* word)
 {
     wchar_t path[MAX_PATH];
     if (GetEnvironmentVariableW(L"ORVIX_END_MARKER", path, MAX_PATH) == 0)
+    {
         return;
+    }
     const HANDLE file = CreateFileW(path, FILE_APPEND_DATA, 0, nullptr, OPEN_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
     if (file == INVALID_HANDLE_VALUE)
+    {
         return;
+    }
     DWORD written = 0;
     WriteFile(file, word, static_cast<DWORD>(std::strlen(word)), &written, nullptr);
     CloseHandle(file);
@@ -20,6 +24,8 @@ extern "C" __declspec(dllexport) void Mark(const char* word)
 BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
 {
     if (reason == DLL_PROCESS_DETACH)
+    {
         Mark("detached ");
+    }
     return TRUE;
 }

@@ -33,7 +33,9 @@ public:
             SetEvent(m_free.get());
             event = WaitForMultipleObjects(2, events, FALSE, 60000);
             if (event == WAIT_OBJECT_0 && m_buffer->process == process.dwProcessId)
+            {
                 output += m_buffer->text;
+            }
         }
         EXPECT_EQ(event, WAIT_OBJECT_0 + 1) << "the process does not end";
         return output;

@@ -187,7 +187,9 @@ TEST_F(InstalledLibrary, MayLetTheHostCallBackWhileItIsEnded)
     ASSERT_TRUE(Initialize(Installed));
     ASSERT_EQ(m_services->GetProviderCount(), 2u);
     for (std::uint32_t i = 0; i < 2; ++i)
+    {
         ASSERT_EQ(m_services->GetProvider(i)->Initialize(&m_info), 0);
+    }
     int called = 0;
     m_scc.uninitialize = [&](LPVOID) {
         ++called;

@@ -66,7 +66,9 @@ protected:
         ASSERT_EQ(m_provider->Initialize(&m_info), 0);
         ASSERT_EQ(m_provider->OpenProject(L"C:\\p", L""), 0);
         for (const wchar_t* file : {L"C:\\\u00E9", L"C:\\b"})
+        {
             m_files.AddActiveEntry(m_files.CreateEntry(file, nullptr, 0, 0));
+        }
         m_scc.Take();
     }
 

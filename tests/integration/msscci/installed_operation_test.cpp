@@ -66,7 +66,9 @@ protected:
     {
         m_scc.queryInfo = [status](LPVOID, LONG count, LPCSTR* names, LPLONG words) {
             for (LONG i = 0; i < count; ++i)
+            {
                 words[i] = std::string_view(names[i]).ends_with("new.txt") ? 0 : status;
+            }
             return SCC_OK;
         };
         m_params.SetOptions(options);
@@ -101,7 +103,9 @@ TEST_F(InstalledOperation, ChecksOutBehindAGetThatChangesTheFiles)
 {
     m_scc.get = [](LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS) {
         for (LONG i = 0; i < count; ++i)
+        {
             WriteBytes(names[i], "latest");
+        }
         return SCC_OK;
     };
     EXPECT_THAT(Run(CheckOut, AllowsCheckOut, SCC_STATUS_CONTROLLED, OptionGetsLatest),

@@ -23,7 +23,9 @@ Names EnumeratedTexts()
     Names texts;
     HKEY key = nullptr;
     if (RegOpenKeyExW(HKEY_LOCAL_MACHINE, ListPath, 0, KEY_READ, &key) != ERROR_SUCCESS)
+    {
         return texts;
+    }
     for (DWORD index = 0;; ++index)
     {
         wchar_t name[64];
@@ -32,7 +34,9 @@ Names EnumeratedTexts()
         DWORD dataSize = sizeof data;
         if (RegEnumValueW(key, index, name, &nameSize, nullptr, nullptr, reinterpret_cast<BYTE*>(data), &dataSize) !=
             ERROR_SUCCESS)
+        {
             break;
+        }
         texts.emplace_back(data);
     }
     RegCloseKey(key);
@@ -57,7 +61,9 @@ private:
         {
             const LSTATUS status = s_trouble(index);
             if (status != ERROR_SUCCESS)
+            {
                 return status;
+            }
         }
         return RegEnumValueW(key, index, name, nameSize, reserved, type, data, dataSize);
     }
@@ -179,7 +185,9 @@ TEST_F(InstalledList, KeepsTheRegistrysOrder)
     }
     Names expected;
     for (const std::wstring& path : EnumeratedTexts())
+    {
         expected.push_back(nameOfKey[path]);
+    }
     ASSERT_EQ(expected.size(), 5u);
     EXPECT_TRUE(Initialize(Installed));
     EXPECT_EQ(ProviderNames(), expected);
@@ -285,7 +293,9 @@ TEST_F(InstalledProvider, MayHaveItsTextsInValuesOfAnyType)
     ASSERT_TRUE(Initialize(Installed));
     EXPECT_EQ(ProviderNames(), Names(5, L"%TEMP%"));
     for (std::uint32_t i = 0; i < 5; ++i)
+    {
         EXPECT_EQ(m_services->GetProvider(i)->RunProviderClient(), 0) << i;
+    }
 }
 
 TEST_F(InstalledProvider, NeedsNoTerminatorsInTheRegistry)

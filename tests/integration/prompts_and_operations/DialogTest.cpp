@@ -33,8 +33,12 @@ std::uint32_t DialogTest::LastAction(std::uint32_t id)
     std::uint32_t action = 0;
     EditTable(*m_services, m_script, [&](OrvixPromptTable& table) {
         for (unsigned int i = 0; i < static_cast<unsigned int>(table.NumPrompts()); ++i)
+        {
             if (table.GetPromptID(i) == static_cast<int>(id))
+            {
                 action = table.GetPrompt(i);
+            }
+        }
     });
     return action;
 }

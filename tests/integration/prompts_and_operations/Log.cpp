@@ -6,12 +6,16 @@
 std::string ActiveNames(OrvixFileList* list)
 {
     if (!list)
+    {
         return "no list";
+    }
     std::string names = "[";
     for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
     {
         if (i != 0)
+        {
             names += ' ';
+        }
         OrvixFileEntry* entry = list->GetActiveFileEntry(i);
         names += entry ? Narrow(entry->GetFile()) : "null";
     }
@@ -22,6 +26,8 @@ std::string Narrow(const wchar_t* text)
 {
     std::string narrow;
     for (; *text != L'\0'; ++text)
+    {
         narrow += static_cast<char>(*text);
+    }
     return narrow;
 }

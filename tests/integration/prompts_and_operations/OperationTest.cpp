@@ -16,12 +16,16 @@ OperationTest::OperationTest()
         {
             OrvixFileEntry* entry = list.GetActiveFileEntry(i);
             if (!entry)
+            {
                 continue;
+            }
             const bool ticked = m_unticked.count(Narrow(entry->GetFile())) == 0;
             entry->SetFlagsOut(ticked ? entry->GetFlagsOut() | 0x2 : entry->GetFlagsOut() & ~0x2UL);
         }
         if (m_onDialog)
+        {
             m_onDialog(params);
+        }
         return m_dialogResult;
     };
 }

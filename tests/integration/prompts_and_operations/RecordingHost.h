@@ -41,7 +41,9 @@ public:
     bool IsUnattended() override
     {
         if (onUnattended)
+        {
             onUnattended();
+        }
         return unattended;
     }
     std::intptr_t RelayB(void* a, void* b, void* c, void* d) override

@@ -34,6 +34,8 @@ int RecordingProvider::Record(const char* operation, OrvixFileList* list, const 
 {
     m_log.push_back(std::string(operation) + " " + ActiveNames(list) + " " + arguments);
     if (onCall)
+    {
         onCall(operation, *list);
+    }
     return result;
 }

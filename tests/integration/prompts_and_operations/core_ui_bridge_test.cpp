@@ -61,7 +61,9 @@ TEST_F(CoreUIBridge, IsObtainedAndGivenItsClientAccessByTheFirstDialogOfEveryKin
         showFirst(*services);
         EXPECT_TRUE(accessCameFirst);
         for (const auto& showLater : dialogs)
+        {
             showLater(*services);
+        }
         EXPECT_EQ(m_script.obtained.size(), 1U);
         ASSERT_EQ(m_script.accesses.size(), 1U);
         EXPECT_NE(m_script.accesses.front(), nullptr);
@@ -105,7 +107,9 @@ TEST_F(CoreUIBridge, FallsBackToTheSystemBeforeInitialize)
     const ServicesPointer services{GetIOrvixServices()};
     IOrvixCoreUIClientAccess& access = Access(*services);
     for (const std::int32_t index : {COLOR_WINDOW, COLOR_WINDOWTEXT, COLOR_HIGHLIGHT, COLOR_BTNFACE})
+    {
         EXPECT_EQ(access.GetColor(index), GetSysColor(index));
+    }
     EXPECT_EQ(access.ClientRelayA(m_tokens[0], m_tokens[1], m_tokens[2], m_tokens[3]), 0);
     EXPECT_EQ(access.ClientRelayB(m_tokens[0], m_tokens[1], m_tokens[2], m_tokens[3]), 0);
 }

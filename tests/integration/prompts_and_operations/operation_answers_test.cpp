@@ -80,7 +80,9 @@ TEST_F(OperationAnswers, TakeTheOptionForExactlyOneStoredAction)
     UsePrompts();
     AddPrompt(DialogPrompt, AnswerOne);
     for (const std::uint32_t action : {0x0U, 0x1U, 0x2U, 0x4U, 0x9U, 0xAU, 0x10U, 0x18U, 0x80000008U})
+    {
         EXPECT_EQ(Mode(action, KeepOption | LatestOption | OptionTicked), "CheckIn [a] comment 4") << action;
+    }
 }
 
 TEST_F(OperationAnswers, LeaveTheOptionAloneWhereItsPromptHasNoRowOrIsNotNamed)

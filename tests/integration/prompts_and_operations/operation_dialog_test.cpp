@@ -77,7 +77,9 @@ TEST_F(OperationDialog, LooksForNoLockWhereNoPromptIsNamed)
 TEST_F(OperationDialog, DropsTheEntriesThatTheUserUnticked)
 {
     for (const wchar_t* name : {L"b", L"c", L"d", L"e"})
+    {
         AddFile(name);
+    }
     m_unticked = {"a", "b", "d"};
     EXPECT_EQ(Run(CheckIn), 1);
     EXPECT_EQ(m_log, (Lines{"Dialog [a b c d e] 1", "CheckIn [c e] comment 0"}));
@@ -132,7 +134,9 @@ TEST_F(OperationDialog, TakesTheOptionAsItStandsAfterTheNotification)
 {
     m_listener.onNotify = [this](OrvixNotifyParams& params) {
         if (params.GetID() == 27)
+        {
             m_params.SetOptions(OptionTicked | KeepOption);
+        }
         return 0;
     };
     EXPECT_EQ(Run(Notify | CheckIn), 1);
@@ -191,6 +195,7 @@ TEST_F(OperationDialog, RemembersTheAnswerAndTheOptionForEveryResult)
     const std::vector<std::pair<std::int32_t, std::uint32_t>> actionOfResult = {
         {1, AnswerOne}, {0, AnswerZero}, {2, AnswerZero}, {-1, AnswerZero}};
     for (const auto& [result, action] : actionOfResult)
+    {
         for (const std::uint32_t option : {0U, OptionTicked})
         {
             m_services->SetPromptAction(DialogPrompt, Ask);
@@ -200,6 +205,7 @@ TEST_F(OperationDialog, RemembersTheAnswerAndTheOptionForEveryResult)
             EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), action) << result;
             EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), option != 0 ? AnswerTwo : AnswerThree) << result;
         }
+    }
 }
 
 TEST_F(OperationDialog, RemembersTheAnswerOfAUserWhoUntickedEverything)

@@ -45,30 +45,38 @@ protected:
 TEST_F(OperationFailures, AProviderThatThrowsEndsTheOperationWithZero)
 {
     for (const auto& fail : m_exceptions)
+    {
         for (const char* failing : {"QueryStatus", "CheckIn"})
         {
             m_provider.onCall = [&](const std::string& operation, OrvixFileList&) {
                 if (operation == failing)
+                {
                     fail();
+                }
             };
             EXPECT_EQ(RunAll(), 0) << failing;
             ExpectUsable();
         }
+    }
 }
 
 TEST_F(OperationFailures, AListenerThatThrowsEndsTheOperationWithZero)
 {
     for (const auto& fail : m_exceptions)
+    {
         for (const std::uint32_t id : {13U, 27U, 14U})
         {
             m_listener.onNotify = [&](OrvixNotifyParams& params) {
                 if (params.GetID() == id)
+                {
                     fail();
+                }
                 return 0;
             };
             EXPECT_EQ(RunAll(), 0) << id;
             ExpectUsable();
         }
+    }
 }
 
 TEST_F(OperationFailures, ADialogThatThrowsEndsTheOperationWithZero)
@@ -107,9 +115,11 @@ TEST_F(OperationFailures, AHostThatThrowsEndsTheOperationWithZero)
 TEST_F(OperationFailures, ARecordThatIsMissingIsCancelledAtOnce)
 {
     for (const bool callProviderFirst : {false, true})
+    {
         EXPECT_EQ(m_services->RunFileListOperation(nullptr, nullptr, callProviderFirst, &m_provider, Notify | CheckIn,
                                                    Controlled),
                   0);
+    }
     EXPECT_TRUE(m_log.empty());
 }
 
@@ -124,8 +134,10 @@ TEST_F(OperationFailures, AProviderThatIsMissingIsCancelledAtOnceWhereItWouldBeC
 {
     EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, true, nullptr, 0, Controlled), 0);
     for (const std::uint32_t operation : {CheckIn, Add, GetLatest, CheckOut, UndoCheckOut})
+    {
         EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, false, nullptr, Notify | operation, Controlled),
                   0);
+    }
     EXPECT_TRUE(m_log.empty());
     EXPECT_EQ(ActiveNames(&m_list), "[a]");
 }

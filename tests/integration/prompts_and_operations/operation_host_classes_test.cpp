@@ -37,7 +37,9 @@ public:
     {
         const auto found = std::find(m_entries.begin(), m_entries.end(), entry);
         if (found == m_entries.end())
+        {
             return false;
+        }
         m_entries.erase(found);
         return true;
     }
@@ -79,7 +81,9 @@ protected:
     HostClasses()
     {
         for (OrvixFileEntry* entry : std::initializer_list<OrvixFileEntry*>{nullptr, &m_a, &m_b, nullptr, &m_c})
+        {
             m_own.AddActiveEntry(entry);
+        }
     }
 
     std::int32_t RunOwn(std::uint32_t operations)
@@ -133,7 +137,9 @@ TEST_F(HostClasses, StoreTheAnswersOfTheirOwnPrompts)
 TEST_F(HostClasses, AreDoneAtOnceWhereOnlyNullEntriesAreActive)
 {
     for (OrvixFileEntry* entry : {&m_a, &m_b, &m_c})
+    {
         m_own.RemoveActiveEntry(entry);
+    }
     EXPECT_EQ(RunOwn(Notify | CheckIn), 1);
     EXPECT_TRUE(m_log.empty());
     EXPECT_EQ(ActiveNames(&m_own), "[null null]");

@@ -35,8 +35,12 @@ constexpr std::array<std::uint32_t, 5> ByCall = {Add, CheckIn, GetLatest, CheckO
 const OperationRow& RowOf(std::uint32_t bit)
 {
     for (const OperationRow& row : ByPrecedence)
+    {
         if (row.bit == bit)
+        {
             return row;
+        }
+    }
     throw std::out_of_range("no such operation");
 }
 
@@ -47,12 +51,20 @@ TEST_F(OperationNotifications, NameTheFirstOperationAndTheProviderRunsAllInItsOw
         const std::uint32_t operations = bits << 1;
         const OperationRow* first = nullptr;
         for (const OperationRow& row : ByPrecedence)
+        {
             if (!first && (operations & row.bit) != 0)
+            {
                 first = &row;
+            }
+        }
         Lines expected = {"Dialog [a] 1"};
         for (const std::uint32_t bit : ByCall)
+        {
             if ((operations & bit) != 0)
+            {
                 expected.emplace_back(RowOf(bit).provider);
+            }
+        }
 
         m_params.SetOptions(0);
         m_log.clear();
@@ -215,7 +227,9 @@ TEST_F(OperationNotifications, LetAListenerTakeEntriesAwayAfterTheDialog)
 {
     m_listener.onNotify = [this](OrvixNotifyParams& params) {
         if (params.GetID() == 27)
+        {
             m_list.RemoveActiveEntry(m_list.GetFileEntry(0));
+        }
         return 0;
     };
     EXPECT_EQ(Run(Notify | CheckIn), 1);

@@ -22,7 +22,9 @@ TEST_F(OperationSelection, SelectsByTheStateThatTheProviderReports)
     AddFile(L"b", 0x20000);
     m_provider.onCall = [](const std::string& operation, OrvixFileList& list) {
         if (operation != "QueryStatus")
+        {
             return;
+        }
         list.GetActiveFileEntry(0)->SetFlagsOut(0x20000);
         list.GetActiveFileEntry(1)->SetFlagsOut(0x1);
     };
@@ -76,7 +78,9 @@ TEST_F(OperationSelection, LeavesTheActiveListUntouchedWhereNoEntryMatches)
     AddFile(L"a", 0x10).SetFlagsIn(0x8);
     AddFile(L"b", 0x20).SetFlagsIn(0x8);
     for (const std::uint32_t mask : {0x0U, 0x4U, ~0x30U})
+    {
         EXPECT_EQ(Run(Notify | CheckIn, mask), 1);
+    }
     EXPECT_TRUE(m_log.empty());
     EXPECT_EQ(ActiveNames(&m_list), "[a b]");
     EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsIn(), 0x8U);

@@ -34,9 +34,13 @@ protected:
     void TearDown() override
     {
         if (m_coreUI)
+        {
             Function<decltype(&ReleaseIOrvixCoreUI)>("ReleaseIOrvixCoreUI")(m_coreUI);
+        }
         if (m_module)
+        {
             FreeLibrary(m_module);
+        }
     }
 
     template <typename Pointer>

@@ -33,9 +33,11 @@ inline std::string PromptsXml(const std::vector<StoredPrompt>& prompts)
 {
     std::string xml = R"(<?xml version="1.0" standalone="yes"?><OrvixPrompts version="1.0">)";
     for (const StoredPrompt& prompt : prompts)
+    {
         xml += "<Prompt><Text>" + prompt.text + "</Text><ID>" + prompt.id + "</ID><Locked>" + prompt.locked +
                "</Locked><ActionOpts>" + prompt.options + "</ActionOpts><Action>" + prompt.action +
                "</Action></Prompt>";
+    }
     return xml + "</OrvixPrompts>";
 }
 
@@ -84,7 +86,9 @@ protected:
     {
         std::vector<std::wstring> names;
         for (std::uint32_t i = 0; i < m_services->GetProviderCount(); ++i)
+        {
             names.emplace_back(m_services->GetProviderName(i));
+        }
         return names;
     }
 

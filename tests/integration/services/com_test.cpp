@@ -29,7 +29,9 @@ bool LeavesComAlone(const std::function<HRESULT()>& before, const std::function<
         work();
         unchanged = Apartment() == apartment;
         if (initialized)
+        {
             CoUninitialize();
+        }
         // A thread that is in no apartment can enter either kind, and is the first to do so.
         unchanged = unchanged && CoInitializeEx(nullptr, COINIT_MULTITHREADED) == S_OK;
         CoUninitialize();
@@ -69,7 +71,9 @@ protected:
             const ServicesPointer services(GetIOrvixServices());
             services->Initialize(&m_info, 0);
             if (action)
+            {
                 *action = services->GetPromptAction(1);
+            }
             services->RegisterPrompt(2, L"second", 4, 0, true);
             services->Shutdown();
         };
@@ -150,7 +154,9 @@ private:
     {
         const long n = --s_failure->m_countdown;
         if (n == 0 || (n < 0 && s_failure->m_forGood))
+        {
             return nullptr;
+        }
         return s_failure->m_hook.Original<decltype(SysAllocString)>()(text);
     }
 
@@ -284,7 +290,9 @@ TEST_F(ComError, LeavesShutdownAndNothingStoredIsLost)
             ++errors;
         }
         if (!failure.HasFailed())
+        {
             break;
+        }
         ASSERT_EQ(ReadBytes(PromptsFile()), before) << "text " << n;
     }
     EXPECT_GT(errors, 10);

@@ -14,16 +14,24 @@ Names NamesInSearchOrder(const std::filesystem::path& folder)
     WIN32_FIND_DATAW found;
     const HANDLE search = FindFirstFileW((folder / L"*.dll").c_str(), &found);
     if (search == INVALID_HANDLE_VALUE)
+    {
         return names;
+    }
     do
     {
         const std::wstring file = found.cFileName;
         if (file == L"good.dll")
+        {
             names.push_back(L"Fake Depot");
+        }
         else if (file == L"other.dll")
+        {
             names.push_back(L"Other");
+        }
         else if (file == L"foreign.dll")
+        {
             names.push_back(L"D\u00E9p\u00F4t \u5009\u5EAB");
+        }
     } while (FindNextFileW(search, &found));
     FindClose(search);
     return names;
@@ -152,7 +160,9 @@ TEST_F(Discovery, SkipsEveryBadCandidateAndStillFindsTheGoodOnes)
     std::sort(names.begin(), names.end());
     EXPECT_EQ(names, (Names{L"Fake Depot", L"Other"}));
     for (const std::filesystem::path& library : bad)
+    {
         EXPECT_FALSE(IsLoaded(library)) << library.filename();
+    }
 }
 
 TEST_F(Discovery, DoesNotLookIntoSubfolders)
@@ -166,7 +176,9 @@ TEST_F(Discovery, DoesNotLookIntoSubfolders)
 TEST_F(Discovery, SkipsA32BitLibrary)
 {
     if (!std::filesystem::exists(std::filesystem::path(ORVIX_FAKE_PLUGINS) / L"wrongbitness.dll"))
+    {
         GTEST_SKIP() << "built without a 32-bit compiler";
+    }
     const std::filesystem::path wrong = AddPlugin(L"wrongbitness");
     EXPECT_FALSE(Initialize());
     AddPlugin(L"good");

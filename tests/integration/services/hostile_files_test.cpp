@@ -13,7 +13,9 @@ std::string Repeated(std::string_view text, std::size_t count)
     std::string result;
     result.reserve(text.size() * count);
     for (; count > 0; --count)
+    {
         result += text;
+    }
     return result;
 }
 
@@ -27,7 +29,9 @@ std::string NestedEntities()
 {
     std::string dtd = "<!DOCTYPE a [<!ENTITY e0 \"lol\">";
     for (int i = 1; i < 12; ++i)
+    {
         dtd += "<!ENTITY e" + std::to_string(i) + " \"" + Repeated("&e" + std::to_string(i - 1) + ";", 10) + "\">";
+    }
     return dtd + "]>";
 }
 
@@ -203,7 +207,9 @@ TEST_F(HostileFile, WithManyRowsIsReadWhole)
 {
     std::vector<StoredPrompt> prompts(20000);
     for (std::size_t i = 0; i < prompts.size(); ++i)
+    {
         prompts[i].id = std::to_string(i);
+    }
     prompts.back().action = "2";
     WritePrompts(prompts);
     Initialize(0);

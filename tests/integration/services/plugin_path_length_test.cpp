@@ -17,7 +17,9 @@ protected:
     PluginPathLength() : m_folder(m_plugins.Text() + L"\\")
     {
         while (m_folder.size() < 220)
+        {
             m_folder += std::wstring(std::min<std::size_t>(40, 221 - m_folder.size()), L'f') + L"\\";
+        }
         std::filesystem::create_directories(m_folder);
         m_info.SetProviderPluginPath(m_folder.c_str());
     }
@@ -80,7 +82,9 @@ TEST_F(PluginPathLength, OfTheFolderAloneBeyondTheLimitFindsNothing)
     {
         std::wstring folder = m_folder;
         while (folder.size() < length)
+        {
             folder += L'x';
+        }
         m_info.SetProviderPluginPath(folder.c_str());
         EXPECT_FALSE(Initialize()) << length;
     }

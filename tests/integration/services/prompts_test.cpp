@@ -324,7 +324,9 @@ TEST_F(PromptsFileSave, TextThatXmlCannotCarryNeverCostsTheStoredAnswers)
     m_services.reset(GetIOrvixServices());
     Initialize(0);
     for (; id != 0; --id)
+    {
         EXPECT_EQ(m_services->GetPromptAction(id), 0x10 + id);
+    }
 }
 
 TEST_F(PromptsFileSave, ReplacesTextThatXmlCannotCarry)

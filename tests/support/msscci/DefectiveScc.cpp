@@ -23,7 +23,9 @@ std::map<std::string, LONG> statuses;
 void Print(LPCSTR text, LONG kind)
 {
     if (printer)
+    {
         printer(text, kind);
+    }
 }
 
 LSTATUS WINAPI RefuseOverride(HKEY, HKEY)
@@ -39,7 +41,9 @@ LSTATUS WINAPI RefuseValue(HKEY, LPCWSTR, DWORD, DWORD, const BYTE*, DWORD)
 SCCRTN Become(LONG count, LPCSTR* names, LONG status)
 {
     for (LONG i = 0; i < count; ++i)
+    {
         statuses[names[i]] = status;
+    }
     return SCC_OK;
 }
 
@@ -56,14 +60,20 @@ SCCRTN SccInitialize(LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabi
                      LPLONG checkoutCommentLength, LPLONG commentLength)
 {
     if (Defect::Is(L"handles"))
+    {
         CreateEventW(nullptr, FALSE, FALSE, nullptr);
+    }
     if (Defect::Is(L"starts"))
+    {
         return SCC_E_INITIALIZEFAILED;
+    }
     *context = &statuses;
     std::memset(sccName, 0, Defect::Is(L"texts") ? 260 : SCC_NAME_SIZE);
     std::strcpy(sccName, "Defective");
     if (Defect::Is(L"no-terminator"))
+    {
         std::memset(auxPathLabel, 'x', SCC_AUXLABEL_SIZE);
+    }
     *capabilities = SCC_CAP_QUERYINFO | (Defect::Is(L"capabilities") ? SCC_CAP_POPULATELIST : 0);
     *checkoutCommentLength = 100;
     *commentLength = 100;
@@ -79,7 +89,9 @@ SCCRTN SccOpenProject(LPVOID, HWND, LPSTR, LPCSTR projectName, LPCSTR, LPSTR, LP
 {
     printer = output;
     if (Defect::Is(L"input-texts"))
+    {
         std::strcpy(const_cast<LPSTR>(projectName), "mine");
+    }
     return SCC_OK;
 }
 
@@ -91,11 +103,17 @@ SCCRTN SccCloseProject(LPVOID)
 SCCRTN SccGet(LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS)
 {
     if (Defect::Is(L"text-without-kind"))
+    {
         Print("got", 99);
+    }
     else if (Defect::Is(L"text-null"))
+    {
         Print(nullptr, SCC_MSG_INFO);
+    }
     else
+    {
         Print(Defect::Is(L"text-output") ? "got\r\n" : "got", SCC_MSG_INFO);
+    }
     return Defect::Is(L"codes") ? 42 : SCC_OK;
 }
 
@@ -112,39 +130,53 @@ SCCRTN SccUncheckout(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
 SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG options, LPCMDOPTS)
 {
     if (Defect::Is(L"codes-given-back") && options == 0)
+    {
         return 42;
+    }
     if (Defect::Is(L"input-names") && count > 0)
+    {
         const_cast<LPSTR>(names[0])[0] = '#';
+    }
     return Become(count, names, Controlled);
 }
 
 SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG* options, LPCMDOPTS)
 {
     if (Defect::Is(L"codes-kept") && count > 0 && options[0] == SCC_KEEP_CHECKEDOUT)
+    {
         return 42;
+    }
     return Become(count, names, Controlled);
 }
 
 SCCRTN SccQueryInfo(LPVOID, LONG count, LPCSTR* names, LPLONG status)
 {
     if (Defect::Is(L"null-arguments") && count == 0)
+    {
         Defect::Crash();
+    }
     for (LONG i = 0; i < count; ++i)
     {
         if (Defect::Is(L"info-left-out") && i + 1 == count)
+        {
             break;
+        }
         status[i] = statuses.contains(names[i]) ? statuses[names[i]] : 0;
         status[i] |= Defect::Is(L"info-bits") && status[i] == CheckedOut ? 0x4000 : 0;
     }
     if (Defect::Is(L"info-overrun"))
+    {
         status[count] = 0;
+    }
     return SCC_OK;
 }
 
 SCCRTN SccGetCommandOptions(LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block)
 {
     if (Defect::Is(L"hang") && !block)
+    {
         Defect::Hang();
+    }
     return SCC_E_OPNOTSUPPORTED;
 }
 
@@ -154,10 +186,16 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
 {
     const HMODULE program = GetModuleHandleW(nullptr);
     if (reason == DLL_PROCESS_DETACH)
+    {
         refusal.reset();
+    }
     else if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"no-override"))
+    {
         refusal.emplace(program, "RegOverridePredefKey", reinterpret_cast<void*>(&RefuseOverride));
+    }
     else if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"no-value"))
+    {
         refusal.emplace(program, "RegSetValueExW", reinterpret_cast<void*>(&RefuseValue));
+    }
     return TRUE;
 }

@@ -22,7 +22,9 @@ public:
     {
         lines.emplace_back(text ? text : L"(null)", kind);
         if (onOutput)
+        {
             onOutput();
+        }
     }
     std::intptr_t RelayA(void*, void*, void*, void*) override { return 0; }
     std::uint32_t GetColor(std::int32_t) override { return 0; }

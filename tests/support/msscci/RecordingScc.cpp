@@ -51,7 +51,9 @@ std::string Show(std::span<Element> elements)
 {
     std::string text;
     for (const auto& element : elements)
+    {
         text += (text.empty() ? "" : ", ") + Show(element);
+    }
     return '[' + text + ']';
 }
 
@@ -78,11 +80,17 @@ std::string Join(const First& first, const Rest&... rest)
 {
     std::string text;
     if constexpr (std::is_same_v<First, std::string>)
+    {
         text = first;
+    }
     else
+    {
         text = Show(first);
+    }
     if constexpr (sizeof...(rest) > 0)
+    {
         text += ", " + Join(rest...);
+    }
     return text;
 }
 
@@ -91,7 +99,9 @@ SCCRTN Record(const std::string& function, const Arguments&... arguments)
 {
     Recorder().calls.push_back(function + '(' + Join(arguments...) + ')');
     if (Recorder().throwing.contains(function))
+    {
         throw std::runtime_error(function);
+    }
     const auto result = Recorder().results.find(function);
     return result == Recorder().results.end() ? SCC_OK : result->second;
 }
@@ -100,7 +110,9 @@ template <typename Handler, typename... Arguments>
 SCCRTN Answer(SCCRTN result, const Handler& handler, Arguments... arguments)
 {
     if (!handler)
+    {
         return result;
+    }
     const Handler copy = handler; // it may replace itself
     return copy(arguments...);
 }
@@ -260,6 +272,8 @@ BOOL WINAPI DllMain(HINSTANCE library, DWORD reason, void* processEnds)
         Recorder().dllDirectoryAtLoad = folder;
     }
     else if (reason == DLL_PROCESS_DETACH && !processEnds)
+    {
         Recorder().calls.push_back("unload " + LibraryName(library));
+    }
     return TRUE;
 }

@@ -40,7 +40,9 @@ public:
         PROCESS_INFORMATION started{};
         if (!CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &startup,
                             &started))
+        {
             return;
+        }
         std::ofstream(File()) << started.dwProcessId;
     }
 
@@ -48,7 +50,9 @@ public:
     static void Report(const char* operation, unsigned long options)
     {
         if (Is(L"report-options"))
+        {
             std::ofstream(File(), std::ios::app) << operation << ' ' << options << '\n';
+        }
     }
 
     /// Renames this program's file, so that it cannot be started once more.

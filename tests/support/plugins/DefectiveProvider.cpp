@@ -31,9 +31,13 @@ public:
     {
         ++m_starts;
         if (Defect::Is(L"handles"))
+        {
             CreateEventW(nullptr, FALSE, FALSE, nullptr);
+        }
         if (Defect::Is(L"starts") || (Defect::Is(L"sessions") && m_starts == 4))
+        {
             return Failure;
+        }
         m_initialized = true;
         return Success;
     }
@@ -70,9 +74,13 @@ public:
     {
         Report("CheckOut", options);
         if (Defect::Is(L"option-bit") && (options & 0x4) != 0)
+        {
             return Failure;
+        }
         if (Defect::Is(L"bad-input") && std::wstring(Last(list)).find(L'?') != std::wstring::npos)
+        {
             return 3;
+        }
         return Become(list, CheckedOut);
     }
 
@@ -80,7 +88,9 @@ public:
     {
         Report("CheckIn", options);
         if (Defect::Is(L"list-untouched") && list->NumActiveEntries() != 0)
+        {
             list->GetActiveFileEntry(0)->SetFlagsIn(0);
+        }
         return Become(list, Controlled);
     }
 
@@ -107,21 +117,31 @@ public:
         {
             const std::wstring file = list->GetActiveFileEntry(i)->GetFile();
             if (m_open && file.compare(0, m_project.size(), m_project) != 0)
+            {
                 return Failure;
+            }
             if (!Defect::Is(L"status-failure"))
+            {
                 continue;
+            }
             list->GetActiveFileEntry(i)->SetFlagsOut(NotControlled); // too early
         }
         for (unsigned int i = 0; i < count; ++i)
+        {
             if (!Defect::Is(L"status-left-out") || !m_open || i + 1 < count)
+            {
                 list->GetActiveFileEntry(i)->SetFlagsOut(FlagsOf(*list->GetActiveFileEntry(i)));
+            }
+        }
         return count == 0 ? Failure : Success;
     }
 
     int ReservedC() override
     {
         if (Defect::Is(L"exception"))
+        {
             throw std::runtime_error("defect");
+        }
         return Defect::Is(L"reserved") ? Success : NotOffered;
     }
 
@@ -133,28 +153,36 @@ public:
     int ReservedE() override
     {
         if (Defect::Is(L"crash"))
+        {
             Defect::Crash();
+        }
         return NotOffered;
     }
 
     int ReservedF() override
     {
         if (Defect::Is(L"hang"))
+        {
             Defect::Hang();
+        }
         return NotOffered;
     }
 
     int ReservedG() override
     {
         if (Defect::Is(L"exit"))
+        {
             ExitProcess(7);
+        }
         return NotOffered;
     }
 
     int ReservedH() override
     {
         if (Defect::Is(L"descendant"))
+        {
             Defect::StartDescendant();
+        }
         return NotOffered;
     }
 
@@ -172,7 +200,9 @@ private:
     void Report(const char* operation, unsigned long options) const
     {
         if (m_starts == 1)
+        {
             Defect::Report(operation, options);
+        }
     }
 
     static const wchar_t* Last(OrvixFileList* list)
@@ -184,18 +214,24 @@ private:
     int Become(OrvixFileList* list, unsigned long state)
     {
         for (unsigned int i = 0; OrvixFileEntry* entry = list->GetActiveFileEntry(i); ++i)
+        {
             m_states[entry->GetFile()] = state;
+        }
         return list->NumActiveEntries() == 0 ? Failure : Success;
     }
 
     unsigned long FlagsOf(OrvixFileEntry& entry)
     {
         if (!m_open)
+        {
             return Defect::Is(L"status-closed") ? NotControlled | 0x100000 : NotControlled;
+        }
         const auto found = m_states.find(entry.GetFile());
         const unsigned long state = found == m_states.end() ? NotControlled : found->second;
         if (Defect::Is(L"status-contradiction"))
+        {
             return state | NotControlled | Controlled;
+        }
         return Defect::Is(L"status-bits") && state == CheckedOut ? state | 0x40 : state;
     }
 
@@ -242,10 +278,16 @@ const wchar_t* GetOrvixProviderName()
 BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
 {
     if (reason != DLL_PROCESS_ATTACH)
+    {
         return TRUE;
+    }
     if (Defect::Is(L"crash-at-load"))
+    {
         Defect::Crash();
+    }
     if (Defect::Is(L"program-moves"))
+    {
         Defect::MoveProgram();
+    }
     return !Defect::Is(L"reload") || Defect::Count(L"ORVIX_DEFECT_LOADS") != 5;
 }

@@ -39,7 +39,9 @@ void Leave(const std::wstring& text)
     std::wstring file(1024, L'\0');
     file.resize(GetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST_FILE", file.data(), static_cast<DWORD>(file.size())));
     if (!file.empty())
+    {
         std::wofstream(std::filesystem::path(file)) << text;
+    }
 }
 
 /// Prints both as C code does and past its buffers.
