@@ -35,7 +35,7 @@ void FloorFlat(OrvixFileList& list, std::vector<OrvixFileEntry*>& active)
     for (unsigned int i = 0; i < list.NumEntries(); ++i)
     {
         OrvixFileEntry* entry = list.GetFileEntry(i);
-        if (entry && (entry->GetFlagsIn() & Mask))
+        if (entry != nullptr && (entry->GetFlagsIn() & Mask))
         {
             active.push_back(entry);
         }

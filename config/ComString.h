@@ -14,7 +14,7 @@ public:
     ComString() = default;
     explicit ComString(const wchar_t* text) : m_text(SysAllocString(text))
     {
-        if (text && !m_text)
+        if (text != nullptr && m_text == nullptr)
         {
             throw _com_error(E_OUTOFMEMORY);
         }

@@ -16,7 +16,7 @@ public:
     explicit ComVariant(const wchar_t* text) : ComVariant()
     {
         V_BSTR(&m_value) = SysAllocString(text);
-        if (text && !V_BSTR(&m_value))
+        if (text != nullptr && !V_BSTR(&m_value))
         {
             throw _com_error(E_OUTOFMEMORY);
         }
@@ -31,7 +31,7 @@ public:
     {
         V_VT(&m_value) = VT_DISPATCH;
         V_DISPATCH(&m_value) = object;
-        if (object)
+        if (object != nullptr)
         {
             object->AddRef();
         }

@@ -24,7 +24,7 @@ constexpr long ElementType = 1;   // NODE_ELEMENT of createNode
 ComPtr<IXMLDOMElement> AsElement(IXMLDOMNode* node)
 {
     ComPtr<IXMLDOMElement> element;
-    if (node)
+    if (node != nullptr)
     {
         node->QueryInterface(InterfaceElement, reinterpret_cast<void**>(element.GetAddressOf()));
     }
@@ -57,14 +57,14 @@ std::wstring XmlText(const wchar_t* text)
 bool UsesEntities(IXMLDOMDocument* document)
 {
     ComPtr<IXMLDOMDocumentType> type;
-    if (document->get_doctype(&type) != S_OK || !type)
+    if (document->get_doctype(&type) != S_OK || type == nullptr)
     {
         return false;
     }
     ComPtr<IXMLDOMElement> root;
     document->get_documentElement(&root);
     ComPtr<IXMLDOMNode> node = root;
-    while (node)
+    while (node != nullptr)
     {
         DOMNodeType kind = NODE_INVALID;
         if (SUCCEEDED(node->get_nodeType(&kind)) && kind == NODE_ENTITY_REFERENCE)
@@ -73,10 +73,10 @@ bool UsesEntities(IXMLDOMDocument* document)
         }
         ComPtr<IXMLDOMNode> next;
         node->get_firstChild(&next);
-        while (!next && node)
+        while (next == nullptr && node != nullptr)
         {
             node->get_nextSibling(&next);
-            if (!next)
+            if (next == nullptr)
             {
                 ComPtr<IXMLDOMNode> parent;
                 node->get_parentNode(&parent);
@@ -134,7 +134,7 @@ bool OrvixFileIO::OpenDocument(const wchar_t* path)
     m_document->put_validateOnParse(VARIANT_FALSE);
     m_document->put_resolveExternals(VARIANT_FALSE);
     m_content = Content::Missing;
-    if (path && _waccess(path, ReadPermission) == 0)
+    if (path != nullptr && _waccess(path, ReadPermission) == 0)
     {
         VARIANT_BOOL loaded = VARIANT_FALSE;
         m_document->load(ComVariant(path).Get(), &loaded);
@@ -156,7 +156,7 @@ bool OrvixFileIO::OpenDocument(const wchar_t* path)
 
 bool OrvixFileIO::SaveDocument(const wchar_t* path)
 {
-    return m_document && SUCCEEDED(m_document->save(ComVariant(path).Get()));
+    return m_document != nullptr && SUCCEEDED(m_document->save(ComVariant(path).Get()));
 }
 
 bool OrvixFileIO::CloseDocument()
@@ -171,13 +171,13 @@ bool OrvixFileIO::CloseDocument()
 
 OrvixFileIO::Node* OrvixFileIO::GetDocumentRoot()
 {
-    return m_rootNode ? std::addressof(m_rootNode) : nullptr;
+    return m_rootNode != nullptr ? std::addressof(m_rootNode) : nullptr;
 }
 
 bool OrvixFileIO::GetRootElement(Node& root, std::wstring& name)
 {
     ComPtr<IXMLDOMElement> element;
-    if (!m_document || FAILED(m_document->get_documentElement(&element)) || !element)
+    if (m_document == nullptr || FAILED(m_document->get_documentElement(&element)) || element == nullptr)
     {
         return false;
     }
@@ -189,7 +189,7 @@ long OrvixFileIO::NumChildNodes(IXMLDOMNode* node)
 {
     ComPtr<IXMLDOMNodeList> children;
     long length = 0;
-    if (SUCCEEDED(node->get_childNodes(&children)) && children)
+    if (SUCCEEDED(node->get_childNodes(&children)) && children != nullptr)
     {
         children->get_length(&length);
     }
@@ -201,19 +201,19 @@ bool OrvixFileIO::GetChildNode(IXMLDOMNode* parent, long index, Node& child)
     IXMLDOMNode* node = ParentOrDocument(parent);
     ComPtr<IXMLDOMNodeList> children;
     long length = 0;
-    if (!node || FAILED(node->get_childNodes(&children)) || !children)
+    if (node == nullptr || FAILED(node->get_childNodes(&children)) || children == nullptr)
     {
         return false;
     }
     children->get_length(&length);
     return index >= 0 && index < length && SUCCEEDED(children->get_item(index, child.ReleaseAndGetAddressOf())) &&
-           child;
+           child != nullptr;
 }
 
 bool OrvixFileIO::GetFirstChild(IXMLDOMNode* parent, Node& child)
 {
     IXMLDOMNode* node = ParentOrDocument(parent);
-    return node && SUCCEEDED(node->get_firstChild(child.ReleaseAndGetAddressOf())) && child;
+    return node != nullptr && SUCCEEDED(node->get_firstChild(child.ReleaseAndGetAddressOf())) && child != nullptr;
 }
 
 bool OrvixFileIO::GetNextSibling(Node& node)
@@ -228,7 +228,7 @@ bool OrvixFileIO::GetNodeName(IXMLDOMNode* node, std::wstring& name)
 {
     const ComPtr<IXMLDOMElement> element = AsElement(node);
     ComString text;
-    if (!element || FAILED(element->get_nodeName(text.Out())) || !text.Get())
+    if (element == nullptr || FAILED(element->get_nodeName(text.Out())) || text.Get() == nullptr)
     {
         return false;
     }
@@ -240,7 +240,7 @@ bool OrvixFileIO::GetNodeText(IXMLDOMNode* node, std::wstring& text)
 {
     // An element may declare a data type: its typed value is then no string.
     ComVariant value;
-    if (FAILED(node->get_nodeTypedValue(value.Out())) || !value.String())
+    if (FAILED(node->get_nodeTypedValue(value.Out())) || value.String() == nullptr)
     {
         return false;
     }
@@ -259,7 +259,7 @@ bool OrvixFileIO::FindChildTexts(IXMLDOMNode* node, std::span<const std::wstring
 {
     std::uint32_t missing = static_cast<std::uint32_t>((std::uint64_t{1} << names.size()) - 1);
     Node child;
-    for (bool more = GetFirstChild(node, child); more; more = missing && GetNextSibling(child))
+    for (bool more = GetFirstChild(node, child); more; more = (missing != 0) && GetNextSibling(child))
     {
         ComString name;
         if (FAILED(child->get_nodeName(name.Out())))
@@ -303,7 +303,7 @@ bool OrvixFileIO::AddTextElement(IXMLDOMNode* parent, const wchar_t* name, const
 
 bool OrvixFileIO::AppendText(IXMLDOMNode* element, const wchar_t* text)
 {
-    if (!AsElement(element))
+    if (AsElement(element) == nullptr)
     {
         return false;
     }
@@ -316,7 +316,7 @@ bool OrvixFileIO::AppendText(IXMLDOMNode* element, const wchar_t* text)
 bool OrvixFileIO::SetAttribute(IXMLDOMNode* node, const wchar_t* name, const wchar_t* value)
 {
     const ComPtr<IXMLDOMElement> element = AsElement(node);
-    if (!element)
+    if (element == nullptr)
     {
         return false;
     }

@@ -102,7 +102,10 @@ public:
 
 private:
     bool MakeDocument();
-    IXMLDOMNode* ParentOrDocument(IXMLDOMNode* parent) const { return parent ? parent : m_documentNode.Get(); }
+    IXMLDOMNode* ParentOrDocument(IXMLDOMNode* parent) const
+    {
+        return parent != nullptr ? parent : m_documentNode.Get();
+    }
 
     Microsoft::WRL::ComPtr<IXMLDOMDocument> m_document;
     Node m_documentNode;

@@ -7,7 +7,7 @@ OrvixPromptTable::~OrvixPromptTable() = default;
 
 int OrvixPromptTable::AddPrompt(int id, const wchar_t* text, unsigned long options, unsigned long prompt, bool locked)
 {
-    if (!text)
+    if (text == nullptr)
     {
         return -1;
     }

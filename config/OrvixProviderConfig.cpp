@@ -4,7 +4,7 @@
 
 FileExclusion OrvixProviderConfig::FindExclusion(const wchar_t* path) const
 {
-    if (!path)
+    if (path == nullptr)
     {
         return {};
     }
@@ -30,7 +30,7 @@ bool OrvixProviderConfig::IsFileExcluded(const wchar_t* path, std::wstring* filt
 {
     return WithBarrier(false, [&] {
         const FileExclusion exclusion = FindExclusion(path);
-        if (exclusion.filter && filterName)
+        if (exclusion.filter != nullptr && filterName != nullptr)
         {
             *filterName = exclusion.filter->m_name;
         }

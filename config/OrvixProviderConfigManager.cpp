@@ -201,7 +201,7 @@ OrvixProviderConfigManager::~OrvixProviderConfigManager() = default;
 
 bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log)
 {
-    if (!path)
+    if (path == nullptr)
     {
         return false;
     }
@@ -215,7 +215,7 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log
         OrvixFileIO::Node root;
         std::wstring rootName;
         const bool hasRoot = file.GetRootElement(root, rootName) && IsNamed(rootName, RootName);
-        if (log)
+        if (log != nullptr)
         {
             log->content = file.GetContent();
             log->hasRoot = hasRoot;
@@ -249,7 +249,7 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log
 
 OrvixProviderConfig* OrvixProviderConfigManager::FindConfig(const wchar_t* providerName) const
 {
-    if (!providerName)
+    if (providerName == nullptr)
     {
         return nullptr;
     }

@@ -90,7 +90,7 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
         return false;
     }
     const OpenedDocument opened(file);
-    if (log)
+    if (log != nullptr)
     {
         Describe(file, *log);
     }
@@ -105,7 +105,7 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
     OrvixFileIO::Node prompt;
     for (bool more = file.GetFirstChild(root.Get(), prompt); more; more = file.GetNextSibling(prompt))
     {
-        if (log)
+        if (log != nullptr)
         {
             Explain(file, prompt.Get(), place);
         }
@@ -164,7 +164,7 @@ bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
     const OpenedDocument opened(file);
     OrvixFileIO::Node root;
     file.AddElement(nullptr, PromptFileRoot, root, false);
-    if (!root)
+    if (root == nullptr)
     {
         return false;
     }
@@ -173,7 +173,7 @@ bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
     {
         OrvixFileIO::Node prompt;
         file.AddElement(root.Get(), L"Prompt", prompt, false);
-        if (!prompt)
+        if (prompt == nullptr)
         {
             return false;
         }

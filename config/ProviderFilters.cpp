@@ -66,5 +66,5 @@ Exclusion ProviderFilters::Judge(const FilteredPath& path) const
 
 bool ProviderFilters::Excludes(const wchar_t* path) const
 {
-    return path && WithBarrier(false, [&] { return Judge(FilteredPath(path)) != Exclusion::None; });
+    return path != nullptr && WithBarrier(false, [&] { return Judge(FilteredPath(path)) != Exclusion::None; });
 }

@@ -64,7 +64,7 @@ public:
     void Remark(ReadingLog::Why why, const wchar_t* element = L"", const wchar_t* text = L"",
                 const wchar_t* countsAs = L"") const
     {
-        if (m_log)
+        if (m_log != nullptr)
         {
             m_log->remarks.push_back({why, m_item, m_filter, element, text, countsAs});
         }
@@ -72,7 +72,7 @@ public:
 
     void Use(const OrvixProviderConfig* config, const std::wstring& name) const
     {
-        if (m_log)
+        if (m_log != nullptr)
         {
             m_log->providers.push_back({config, m_item, name});
         }

@@ -99,7 +99,7 @@ std::int32_t FileListOperation::Run(bool callProviderFirst, std::uint32_t flagsO
 {
     if (callProviderFirst)
     {
-        if (!m_provider)
+        if (m_provider == nullptr)
         {
             return Cancelled;
         }
@@ -109,7 +109,7 @@ std::int32_t FileListOperation::Run(bool callProviderFirst, std::uint32_t flagsO
     {
         return Done;
     }
-    if (!m_provider && (m_operations & AnyProviderCall))
+    if (m_provider == nullptr && (m_operations & AnyProviderCall))
     {
         return Cancelled;
     }
@@ -145,7 +145,7 @@ bool FileListOperation::KeepFittingEntries(std::uint32_t flagsOutMask)
     for (unsigned int i = 0; i < m_list.NumActiveEntries(); ++i)
     {
         OrvixFileEntry* entry = m_list.GetActiveFileEntry(i);
-        if (!entry)
+        if (entry == nullptr)
         {
             continue;
         }
@@ -172,7 +172,7 @@ void FileListOperation::RemoveUntickedEntries()
     for (unsigned int i = 0; i < m_list.NumActiveEntries(); ++i)
     {
         OrvixFileEntry* entry = m_list.GetActiveFileEntry(i);
-        if (entry && !(entry->GetFlagsOut() & Ticked))
+        if (entry != nullptr && !(entry->GetFlagsOut() & Ticked))
         {
             unticked.push_back(entry);
         }
@@ -284,7 +284,7 @@ void FileListOperation::CallProvider()
 bool FileListOperation::NotifyBefore(bool cancelled)
 {
     const NotificationIds* ids = IdsFor(m_operations);
-    return ids && Broadcast(ids->before, m_list, cancelled) == Vetoed;
+    return ids != nullptr && Broadcast(ids->before, m_list, cancelled) == Vetoed;
 }
 
 void FileListOperation::NotifyAfter()

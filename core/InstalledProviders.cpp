@@ -99,11 +99,11 @@ InstalledProviders::Candidate InstalledProviders::Judge(const std::wstring& keyP
         return reject(name, Verdict::NoName);
     }
     candidate.config = configs.FindConfig(candidate.name.c_str());
-    if (candidate.config && !candidate.config->m_enabled)
+    if (candidate.config != nullptr && !candidate.config->m_enabled)
     {
         return reject(name, Verdict::SwitchedOff);
     }
-    if (candidate.config)
+    if (candidate.config != nullptr)
     {
         candidate.searchPath = candidate.config->m_msSccDllSearchPath.substr(0, MaxSearchPath);
         candidate.serverPath = candidate.config->m_msSccDllFullPath.substr(0, MaxServerPath);

@@ -10,7 +10,7 @@ class ActivationScope
 {
 public:
     explicit ActivationScope(HANDLE context) noexcept
-        : m_active(context != INVALID_HANDLE_VALUE && ActivateActCtx(context, &m_cookie))
+        : m_active(context != INVALID_HANDLE_VALUE && (ActivateActCtx(context, &m_cookie) != 0))
     {
     }
     ActivationScope(const ActivationScope&) = delete;

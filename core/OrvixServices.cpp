@@ -45,7 +45,7 @@ void ReleaseIOrvixServices(IOrvixServices* services)
 
 bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
 {
-    if (!info)
+    if (info == nullptr)
     {
         return false;
     }
@@ -59,8 +59,9 @@ bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
         });
         m_clientAccess = info->GetIOrvixClientAccess();
         LoadPrompts();
-        const bool pluginsAdded = (sources & Plugins) && WithBarrier(false, [&] { return DiscoverPlugins(info); });
-        const bool registryRead = (sources & InstalledMSSCCI) && DiscoverMSSCCIProviders();
+        const bool pluginsAdded =
+            ((sources & Plugins) != 0) && WithBarrier(false, [&] { return DiscoverPlugins(info); });
+        const bool registryRead = ((sources & InstalledMSSCCI) != 0) && DiscoverMSSCCIProviders();
         m_initialized = true;
         return pluginsAdded || registryRead;
     });
@@ -85,7 +86,7 @@ OrvixServices::~OrvixServices()
         }
         ReleaseProviders();
     }
-    if (m_coreUI)
+    if (m_coreUI != nullptr)
     {
         ReleaseIOrvixCoreUI(m_coreUI);
     }
@@ -98,11 +99,11 @@ void OrvixServices::ReleaseProviders()
     m_initialized = false;
     for (auto& entry : providers)
     {
-        if (entry->provider && entry->isMSSCCI)
+        if (entry->provider != nullptr && entry->isMSSCCI)
         {
             delete entry->provider;
         }
-        else if (entry->provider && entry->releaseProvider)
+        else if (entry->provider != nullptr && entry->releaseProvider != nullptr)
         {
             entry->releaseProvider(entry->provider);
         }
@@ -144,7 +145,7 @@ std::int32_t OrvixServices::ShowPrompt(void* a, void* b, void* c, std::uint32_t 
             const bool locked = IsPromptLocked(promptID);
             const std::uint32_t action = GetPromptAction(promptID);
             const bool ask = (action & PromptAction::Ask) != 0;
-            if (!ask && dontAskAgain)
+            if (!ask && dontAskAgain != nullptr)
             {
                 *dontAskAgain = true;
             }
@@ -159,7 +160,7 @@ std::int32_t OrvixServices::ShowPrompt(void* a, void* b, void* c, std::uint32_t 
         }
         bool flag = false;
         const std::int32_t answer = CoreUI().ShowPrompt(a, b, c, options, &flag);
-        if (dontAskAgain)
+        if (dontAskAgain != nullptr)
         {
             *dontAskAgain = flag;
         }
@@ -181,8 +182,8 @@ std::int32_t OrvixServices::RunFileListOperation(void* a, OrvixFileListDialogPar
                                                  std::uint32_t flagsOutMask)
 {
     return WithBarrier(std::int32_t{0}, [&] {
-        OrvixFileList* list = params ? params->GetOrvixFileList() : nullptr;
-        if (!list)
+        OrvixFileList* list = params != nullptr ? params->GetOrvixFileList() : nullptr;
+        if (list == nullptr)
         {
             return std::int32_t{0};
         }
@@ -240,34 +241,34 @@ std::int32_t OrvixServices::EditPrompts(void* a, void* b)
 const wchar_t* OrvixServices::GetProviderFixedProjectRoot(std::uint32_t index)
 {
     const OrvixProviderConfig* config = ConfigOf(index);
-    return config ? config->m_fixedProjectRoot.c_str() : nullptr;
+    return config != nullptr ? config->m_fixedProjectRoot.c_str() : nullptr;
 }
 
 const wchar_t* OrvixServices::GetProviderAltExecutable(std::uint32_t index)
 {
     const OrvixProviderConfig* config = ConfigOf(index);
-    return config ? config->m_altProviderExecutable.c_str() : nullptr;
+    return config != nullptr ? config->m_altProviderExecutable.c_str() : nullptr;
 }
 
 bool OrvixServices::IsFileExcludedByProvider(std::uint32_t index, const wchar_t* fileName, std::wstring* filterName)
 {
     const OrvixProviderConfig* config = ConfigOf(index);
-    return config && config->IsFileExcluded(fileName, filterName);
+    return config != nullptr && config->IsFileExcluded(fileName, filterName);
 }
 
 std::intptr_t OrvixServices::ClientRelayA(void* a, void* b, void* c, void* d)
 {
-    return m_clientAccess ? m_clientAccess->RelayA(a, b, c, d) : 0;
+    return m_clientAccess != nullptr ? m_clientAccess->RelayA(a, b, c, d) : 0;
 }
 
 std::uint32_t OrvixServices::GetColor(std::int32_t index)
 {
-    return m_clientAccess ? m_clientAccess->GetColor(index) : GetSysColor(index);
+    return m_clientAccess != nullptr ? m_clientAccess->GetColor(index) : GetSysColor(index);
 }
 
 std::intptr_t OrvixServices::ClientRelayB(void* a, void* b, void* c, void* d)
 {
-    return m_clientAccess ? m_clientAccess->RelayB(a, b, c, d) : 0;
+    return m_clientAccess != nullptr ? m_clientAccess->RelayB(a, b, c, d) : 0;
 }
 
 bool OrvixServices::IsPromptLocked(std::uint32_t promptID)
@@ -278,7 +279,7 @@ bool OrvixServices::IsPromptLocked(std::uint32_t promptID)
 
 bool OrvixServices::IsUnattended()
 {
-    return m_clientAccess && m_clientAccess->IsUnattended();
+    return m_clientAccess != nullptr && m_clientAccess->IsUnattended();
 }
 
 /// Appends every accepted plug-in of the client's plug-in folder; true when there was one.
@@ -357,7 +358,7 @@ void OrvixServices::AddMSSCCIProvider(const std::wstring& keyPath)
     }
     auto bridge = std::make_unique<OrvixMSSCC>();
     bridge->SetProvider(candidate.serverPath.c_str(), candidate.searchPath.c_str(), candidate.name.c_str(), false);
-    if (candidate.config)
+    if (candidate.config != nullptr)
     {
         bridge->SetProjectSettingsFile(candidate.config->m_msSccProjectFile);
     }
@@ -415,7 +416,7 @@ OrvixProviderConfig* OrvixServices::ConfigOf(std::uint32_t index)
 
 IOrvixCoreUI& OrvixServices::CoreUI()
 {
-    if (!m_coreUI)
+    if (m_coreUI == nullptr)
     {
         m_coreUI = GetIOrvixCoreUI();
         m_coreUI->SetClientAccess(this);

@@ -35,7 +35,7 @@ std::vector<const char*> PluginCandidate::FindMissingExports() const
     std::vector<const char*> missing;
     for (const char* name : Exports)
     {
-        if (entry && !Export<void()>(name))
+        if (entry && (Export<void()>(name) == nullptr))
         {
             missing.push_back(name);
         }
@@ -46,7 +46,7 @@ std::vector<const char*> PluginCandidate::FindMissingExports() const
 PluginCandidate::Verdict PluginCandidate::Ask(const OrvixProviderConfigManager& configs)
 {
     auto* const getVersion = Export<std::int32_t()>(GetVersion);
-    if (!getVersion)
+    if (getVersion == nullptr)
     {
         return Verdict::Incomplete;
     }
@@ -58,18 +58,18 @@ PluginCandidate::Verdict PluginCandidate::Ask(const OrvixProviderConfigManager& 
     entry->getProvider = Export<IOrvixProvider*()>(GetProvider);
     entry->releaseProvider = Export<void(IOrvixProvider*)>(ReleaseProvider);
     auto* const getName = Export<const wchar_t*()>(GetName);
-    if (getName)
+    if (getName != nullptr)
     {
         // A null name stays the empty name, to which no configuration belongs.
         const wchar_t* name = getName();
-        entry->name = name ? name : L"";
+        entry->name = name != nullptr ? name : L"";
         entry->config = configs.FindConfig(name);
     }
-    if (!entry->getProvider || !entry->releaseProvider || !getName)
+    if (entry->getProvider == nullptr || entry->releaseProvider == nullptr || getName == nullptr)
     {
         return Verdict::Incomplete;
     }
-    return !entry->config || entry->config->m_enabled ? Verdict::Listed : Verdict::SwitchedOff;
+    return entry->config == nullptr || entry->config->m_enabled ? Verdict::Listed : Verdict::SwitchedOff;
 }
 
 /// A function of the plug-in; null when it is missing.

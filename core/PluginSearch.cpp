@@ -45,5 +45,5 @@ void PluginSearch::Next()
 std::wstring PluginSearch::PathOf(const wchar_t* name) const
 {
     const wchar_t* folder = m_client.GetProviderPluginPath();
-    return folder ? std::wstring(folder) + name : std::wstring();
+    return folder != nullptr ? std::wstring(folder) + name : std::wstring();
 }

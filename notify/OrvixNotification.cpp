@@ -40,7 +40,7 @@ Registry* GetRegistry()
 bool OrvixNotification::RegisterOrvixNotification(IOrvixNotifyCallback* callback, std::int64_t userData)
 {
     Registry* registry = GetRegistry();
-    if (!registry || !callback)
+    if (registry == nullptr || callback == nullptr)
     {
         return false;
     }
@@ -66,7 +66,7 @@ bool OrvixNotification::RegisterOrvixNotification(IOrvixNotifyCallback* callback
 bool OrvixNotification::UnRegisterOrvixNotification(IOrvixNotifyCallback* callback)
 {
     Registry* registry = GetRegistry();
-    if (!registry || !callback)
+    if (registry == nullptr || callback == nullptr)
     {
         return false;
     }
@@ -91,7 +91,7 @@ std::uint32_t OrvixNotification::BroadcastOrvixNotification(std::uint32_t id, st
 std::uint32_t OrvixNotification::BroadcastOrvixNotification(OrvixNotifyParams* params)
 {
     const Registry* registry = GetRegistry();
-    if (!registry || !params)
+    if (registry == nullptr || params == nullptr)
     {
         return 0;
     }

@@ -22,7 +22,7 @@ bool IsExact(std::wstring_view path, const char* narrow)
         return true;
     }
     const WStr back(narrow);
-    return back.Get() && back.Get() == path;
+    return back.Get() != nullptr && back.Get() == path;
 }
 
 } // namespace
@@ -33,7 +33,7 @@ NarrowPaths::NarrowPaths(OrvixFileList& list, unsigned int count)
     for (unsigned int i = 0; i < count; ++i)
     {
         OrvixFileEntry* entry = list.GetActiveFileEntry(i);
-        if (!entry)
+        if (entry == nullptr)
         {
             throw std::out_of_range("active entry");
         }
@@ -49,7 +49,7 @@ NarrowPaths::NarrowPaths(const wchar_t* path)
 void NarrowPaths::Add(const wchar_t* path)
 {
     const CStr text(path);
-    if (!text.Get())
+    if (text.Get() == nullptr)
     {
         throw std::bad_alloc();
     }

@@ -47,7 +47,7 @@ bool OrvixMSSCC::SetProvider(const wchar_t* dllPath, const wchar_t* searchFolder
     m_dllPath = dllPath;
     m_providerName = providerName;
     Store(m_sccName, m_providerName, FieldLimit);
-    if (searchFolder)
+    if (searchFolder != nullptr)
     {
         m_searchFolder = searchFolder;
     }
@@ -64,7 +64,7 @@ bool OrvixMSSCC::Load()
     const auto getVersion =
         m_module ? reinterpret_cast<AnyFunction>(GetProcAddress(m_module.get(), SccFunctions::GetVersion.name))
                  : nullptr;
-    if (!getVersion)
+    if (getVersion == nullptr)
     {
         return false;
     }
@@ -123,7 +123,7 @@ void OrvixMSSCC::StoreNarrow(Field& field, const char* text, std::size_t limit) 
 LONG OrvixMSSCC::GetVersion()
 {
     auto* const getVersion = Resolve(SccFunctions::GetVersion);
-    return getVersion ? WithBarrier(LONG{0}, getVersion) : 0;
+    return getVersion != nullptr ? WithBarrier(LONG{0}, getVersion) : 0;
 }
 
 SCCRTN OrvixMSSCC::Initialize(LPCSTR callerName)
@@ -132,7 +132,7 @@ SCCRTN OrvixMSSCC::Initialize(LPCSTR callerName)
     {
         return SCC_OK;
     }
-    if (!Resolve(SccFunctions::Initialize)) // before the fields are read: loading sets one
+    if (Resolve(SccFunctions::Initialize) == nullptr) // before the fields are read: loading sets one
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -155,7 +155,7 @@ SCCRTN OrvixMSSCC::Initialize(LPCSTR callerName)
 SCCRTN OrvixMSSCC::Uninitialize()
 {
     // The library is told even when it was never started: deliberate.
-    if (!Resolve(SccFunctions::Uninitialize))
+    if (Resolve(SccFunctions::Uninitialize) == nullptr)
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -183,14 +183,14 @@ SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC o
     {
         CloseProject();
     }
-    if (!Resolve(SccFunctions::OpenProject))
+    if (Resolve(SccFunctions::OpenProject) == nullptr)
     {
         return SCC_E_INITIALIZEFAILED;
     }
     std::string path; // with room for the longest text that a library may write
     if (!WithBarrier(false, [&] {
             path.reserve(MAX_PATH);
-            path = localPath ? localPath : "";
+            path = localPath != nullptr ? localPath : "";
             path.resize(std::max<std::size_t>(path.size(), MAX_PATH));
             return true;
         }))
@@ -204,7 +204,7 @@ SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC o
     NarrowBuffer auxPath(m_auxPath.data(), AuxPathLimit);
     const auto open = [&] {
         return Call(SccFunctions::OpenProject, m_context, m_parentWindow, user.Get(), projectName.Get(),
-                    localPath ? path.data() : nullptr, auxPath.Get(), comment, output, SCC_OP_CREATEIFNEW);
+                    localPath != nullptr ? path.data() : nullptr, auxPath.Get(), comment, output, SCC_OP_CREATEIFNEW);
     };
     SCCRTN result = open();
     if (result == SCC_E_PROJSYNTAXERR)
@@ -232,7 +232,7 @@ SCCRTN OrvixMSSCC::CloseProject()
     {
         return SCC_E_PROJNOTOPEN;
     }
-    if (!Resolve(SccFunctions::CloseProject))
+    if (Resolve(SccFunctions::CloseProject) == nullptr)
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -242,7 +242,7 @@ SCCRTN OrvixMSSCC::CloseProject()
 
 SCCRTN OrvixMSSCC::GetProjPath(LPSTR, LPSTR, LPSTR, LPSTR, BOOL allowChangePath)
 {
-    if (!Resolve(SccFunctions::GetProjPath))
+    if (Resolve(SccFunctions::GetProjPath) == nullptr)
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -327,7 +327,7 @@ SCCRTN OrvixMSSCC::RunScc(LONG count, LPCSTR* names)
 
 SCCRTN OrvixMSSCC::GetCommandOptions()
 {
-    if (!Resolve(SccFunctions::GetCommandOptions))
+    if (Resolve(SccFunctions::GetCommandOptions) == nullptr)
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -351,7 +351,7 @@ SCCRTN OrvixMSSCC::AddFromScc(LPLONG count, LPCSTR** names)
     {
         return SCC_E_OPNOTSUPPORTED;
     }
-    if (!Resolve(SccFunctions::AddFromScc))
+    if (Resolve(SccFunctions::AddFromScc) == nullptr)
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -371,7 +371,7 @@ SCCRTN OrvixMSSCC::SetOption(LONG option, LONG value)
 /// well, leaves them.
 void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
 {
-    if (m_settingsFileName.empty() || !folder)
+    if (m_settingsFileName.empty() || folder == nullptr)
     {
         return;
     }
@@ -412,7 +412,7 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
 /// Writes both texts; failures are silent, those of memory as well: the project is open all the same.
 void OrvixMSSCC::WriteProjectSettings(const wchar_t* folder)
 {
-    if (m_settingsFileName.empty() || !folder)
+    if (m_settingsFileName.empty() || folder == nullptr)
     {
         return;
     }
@@ -425,7 +425,7 @@ void OrvixMSSCC::WriteProjectSettings(const wchar_t* folder)
         const OpenedDocument opened(file);
         OrvixFileIO::Node root;
         file.AddElement(nullptr, RootName, root, false);
-        return root && file.AddTextElement(root.Get(), AuxPathName, m_auxPath.data()) &&
+        return root != nullptr && file.AddTextElement(root.Get(), AuxPathName, m_auxPath.data()) &&
                file.AddTextElement(root.Get(), ProjectNameName, m_projectName.data()) &&
                file.SaveDocument((folder + (L'\\' + m_settingsFileName)).c_str());
     });

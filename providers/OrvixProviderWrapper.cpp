@@ -41,9 +41,9 @@ LONG KeepOption(unsigned long options)
 class NarrowText
 {
 public:
-    explicit NarrowText(const wchar_t* text) : m_text(text ? text : L"")
+    explicit NarrowText(const wchar_t* text) : m_text(text != nullptr ? text : L"")
     {
-        if (!m_text.Get())
+        if (m_text.Get() == nullptr)
         {
             throw std::bad_alloc();
         }
@@ -59,7 +59,7 @@ LONG OutputText(LPCSTR text, LONG)
 {
     return WithBarrier(LONG{0}, [text] {
         const WStr wide(text);
-        if (clientAccess && wide.Get())
+        if (clientAccess != nullptr && wide.Get() != nullptr)
         {
             clientAccess->OutputText(wide.Get(), 0);
         }
@@ -173,7 +173,7 @@ bool OrvixProviderWrapper::IsProjectOpen()
 int OrvixProviderWrapper::Initialize(OrvixClientInfo* info)
 {
     return WithBarrier(Failure, [&] {
-        if (!info)
+        if (info == nullptr)
         {
             return Failure;
         }
@@ -285,7 +285,7 @@ int OrvixProviderWrapper::ShowHistory(OrvixFileList* list)
 int OrvixProviderWrapper::ShowProperties(OrvixFileList* list)
 {
     return WithBarrier(Failure, [&] {
-        if (!list || list->NumActiveEntries() == 0)
+        if (list == nullptr || list->NumActiveEntries() == 0)
         {
             return Failure;
         }

@@ -7,7 +7,7 @@
 /// Copies `text` into a record's field. Null, and exhausted memory, leave the old value and give false.
 inline bool AssignText(std::wstring& field, const wchar_t* text)
 {
-    return text && WithBarrier(false, [&] {
+    return text != nullptr && WithBarrier(false, [&] {
                field = text;
                return true;
            });
@@ -16,5 +16,5 @@ inline bool AssignText(std::wstring& field, const wchar_t* text)
 /// True when a setter that was given `wanted` has stored it: setters leave the old, empty text without memory.
 inline bool IsStored(const wchar_t* wanted, const wchar_t* stored)
 {
-    return !wanted || !*wanted || *stored;
+    return wanted == nullptr || *wanted == L'\0' || *stored != L'\0';
 }

@@ -50,7 +50,7 @@ void OrvixExploreProviderParams::SetDownloadFiles(bool download)
 
 std::uint32_t OrvixExploreProviderParams::AddFilter(const wchar_t* name, const wchar_t* extensions)
 {
-    if (!name || !extensions)
+    if (name == nullptr || extensions == nullptr)
     {
         return 0;
     }

@@ -85,7 +85,7 @@ void OrvixFileEntry::SetFlagsOut(unsigned long flags)
 
 unsigned int OrvixFileEntry::AddChild(OrvixFileEntry* child)
 {
-    if (!child)
+    if (child == nullptr)
     {
         return 0;
     }
@@ -124,7 +124,7 @@ bool OrvixFileEntry::RemoveAllChildren()
 
 unsigned int OrvixFileEntry::AddAttachment(OrvixFileEntry* source)
 {
-    if (!source)
+    if (source == nullptr)
     {
         return 0;
     }
@@ -134,7 +134,7 @@ unsigned int OrvixFileEntry::AddAttachment(OrvixFileEntry* source)
 unsigned int OrvixFileEntry::AddAttachment(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
                                            long long clientPtr)
 {
-    if (!file)
+    if (file == nullptr)
     {
         return 0;
     }

@@ -60,7 +60,7 @@ void DetachFromTree(OrvixFileEntry* root, OrvixFileEntry* target, std::vector<Tr
             step.entry->RemoveChild(position);
             way.pop_back();
         }
-        else if (child)
+        else if (child != nullptr)
         {
             way.push_back({child, 0});
         }
@@ -113,7 +113,7 @@ OrvixFileEntry* OrvixFileList::CreateEntry(OrvixFileEntry& source)
         for (unsigned int i = 0; i < source.NumChildren(); ++i)
         {
             OrvixFileEntry* child = source.GetChild(i);
-            if (child && copy->AddChild(child) == 0)
+            if (child != nullptr && copy->AddChild(child) == 0)
             {
                 return nullptr;
             }
@@ -121,7 +121,7 @@ OrvixFileEntry* OrvixFileList::CreateEntry(OrvixFileEntry& source)
         for (unsigned int i = 0; i < source.NumAttachments(); ++i)
         {
             OrvixFileEntry* attachment = source.GetAttachment(i);
-            if (attachment && copy->AddAttachment(attachment) == 0)
+            if (attachment != nullptr && copy->AddAttachment(attachment) == 0)
             {
                 return nullptr;
             }
@@ -133,7 +133,7 @@ OrvixFileEntry* OrvixFileList::CreateEntry(OrvixFileEntry& source)
 OrvixFileEntry* OrvixFileList::CreateEntry(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
                                            long long clientPtr)
 {
-    if (!file)
+    if (file == nullptr)
     {
         return nullptr;
     }
@@ -219,7 +219,7 @@ unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
         for (unsigned int i = 0; i < NumEntries(); ++i)
         {
             OrvixFileEntry* entry = GetFileEntry(i);
-            if (entry && (entry->GetFlagsIn() & mask))
+            if (entry != nullptr && (entry->GetFlagsIn() & mask))
             {
                 m_active.AppendDistinct(entry);
             }
@@ -235,7 +235,7 @@ unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
 
 unsigned int OrvixFileList::AddActiveEntry(OrvixFileEntry* entry)
 {
-    if (entry)
+    if (entry != nullptr)
     {
         WithBarrier(false, [&] {
             m_active.Append(entry);

@@ -56,7 +56,7 @@ OrvixUserEntry* OrvixUserList::CreateEntry(OrvixUserEntry& source)
 
 OrvixUserEntry* OrvixUserList::CreateEntry(const wchar_t* userName)
 {
-    if (!userName)
+    if (userName == nullptr)
     {
         return nullptr;
     }

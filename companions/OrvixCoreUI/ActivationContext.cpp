@@ -20,7 +20,8 @@ HANDLE CreateContext()
 } // namespace
 
 ActivationContext::ActivationContext()
-    : m_context(CreateContext()), m_active(m_context != INVALID_HANDLE_VALUE && ActivateActCtx(m_context, &m_cookie))
+    : m_context(CreateContext()),
+      m_active(m_context != INVALID_HANDLE_VALUE && (ActivateActCtx(m_context, &m_cookie) != 0))
 {
 }
 

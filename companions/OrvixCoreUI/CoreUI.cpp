@@ -15,7 +15,7 @@ std::int32_t CoreUI::ShowPrompt(void* a, void* b, void* c, std::uint32_t options
 
 std::int32_t CoreUI::ShowFileListDialog(void* a, OrvixFileListDialogParams* params)
 {
-    if (!params || !params->GetOrvixFileList())
+    if (params == nullptr || params->GetOrvixFileList() == nullptr)
     {
         return 0;
     }

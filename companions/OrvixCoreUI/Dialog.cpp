@@ -85,7 +85,7 @@ INT_PTR CALLBACK Dialog::Procedure(HWND window, UINT message, WPARAM wParam, LPA
         std::bit_cast<Dialog*>(lParam)->m_window = window;
     }
     auto* dialog = std::bit_cast<Dialog*>(GetWindowLongPtrW(window, DWLP_USER));
-    if (!dialog)
+    if (dialog == nullptr)
     {
         return FALSE;
     }
@@ -142,7 +142,7 @@ void Dialog::OnOpen()
     ColorCheckBoxes();
     OnInit();
     m_layout = Layout(m_window, Rules());
-    const SIZE size = (m_name ? Settings::WindowSize(m_name) : std::nullopt).value_or(SIZE{});
+    const SIZE size = (m_name != nullptr ? Settings::WindowSize(m_name) : std::nullopt).value_or(SIZE{});
     const LONG smallest = m_layout.SmallestWindow().y;
     const RECT work = WorkArea();
     const LONG height = std::max(std::min<LONG>(m_layout.ToPixels(size.cy), work.bottom - work.top), smallest);
@@ -157,7 +157,7 @@ void Dialog::ColorCheckBoxes() const
     {
         return;
     }
-    for (HWND control = GetWindow(m_window, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
+    for (HWND control = GetWindow(m_window, GW_CHILD); control != nullptr; control = GetWindow(control, GW_HWNDNEXT))
     {
         if (IsCheckBox(control))
         {
@@ -169,7 +169,7 @@ void Dialog::ColorCheckBoxes() const
 LONG Dialog::ShowWholeMessage()
 {
     const HWND message = Item(IDC_MESSAGE);
-    if (!message)
+    if (message == nullptr)
     {
         return 0;
     }
@@ -210,7 +210,7 @@ void Dialog::RememberSize() const
 {
     WINDOWPLACEMENT placement{};
     placement.length = sizeof placement;
-    if (!m_name || !GetWindowPlacement(m_window, &placement))
+    if (m_name == nullptr || !GetWindowPlacement(m_window, &placement))
     {
         return;
     }

@@ -10,7 +10,7 @@ public:
     DpiAwareness() : m_previous(SetThreadDpiAwarenessContext(DPI_AWARENESS_CONTEXT_PER_MONITOR_AWARE_V2))
     {
         // The first releases of Windows 10 do not know the second version.
-        if (!m_previous)
+        if (m_previous == nullptr)
         {
             m_previous = SetThreadDpiAwarenessContext(DPI_AWARENESS_CONTEXT_PER_MONITOR_AWARE);
         }
@@ -19,7 +19,7 @@ public:
     DpiAwareness& operator=(const DpiAwareness&) = delete;
     ~DpiAwareness()
     {
-        if (m_previous)
+        if (m_previous != nullptr)
         {
             SetThreadDpiAwarenessContext(m_previous);
         }

@@ -199,7 +199,7 @@ void FileListDialog::ShowRecentComments()
         SendDlgItemMessageW(Window(), IDC_RECENT, CB_ADDSTRING, 0, reinterpret_cast<LPARAM>(OneLine(comment).c_str()));
     }
     SendDlgItemMessageW(Window(), IDC_RECENT, CB_SETEXTENDEDUI, TRUE, 0); // the Down key opens the list
-    EnableWindow(Item(IDC_RECENT), !m_recentComments.empty());
+    EnableWindow(Item(IDC_RECENT), !m_recentComments.empty() ? TRUE : FALSE);
 }
 
 void FileListDialog::TakeRecentComment() const

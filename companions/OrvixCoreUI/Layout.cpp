@@ -36,7 +36,7 @@ Layout::Layout(HWND dialog, std::span<const Rule> rules)
     m_inside = {area.right, area.bottom};
     auto* const font = std::bit_cast<HFONT>(SendMessageW(dialog, WM_GETFONT, 0, 0));
     GetObjectW(font, sizeof m_letters, &m_letters);
-    for (HWND control = GetWindow(dialog, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
+    for (HWND control = GetWindow(dialog, GW_CHILD); control != nullptr; control = GetWindow(control, GW_HWNDNEXT))
     {
         m_controls.push_back({control, PlaceOf(control, dialog), FollowsOf(control, rules)});
     }

@@ -7,7 +7,7 @@ namespace
 
 COLORREF Color(IOrvixCoreUIClientAccess* access, int index)
 {
-    return access ? access->GetColor(index) : GetSysColor(index);
+    return access != nullptr ? access->GetColor(index) : GetSysColor(index);
 }
 
 } // namespace

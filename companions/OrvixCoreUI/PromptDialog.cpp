@@ -49,8 +49,8 @@ RECT PlaceOf(HWND control)
 
 PromptDialog::PromptDialog(IOrvixCoreUIClientAccess* access, const wchar_t* title, const wchar_t* message,
                            std::uint32_t options)
-    : Dialog(IDD_PROMPT, nullptr, access), m_title(title ? title : L""), m_message(message ? message : L""),
-      m_options(options)
+    : Dialog(IDD_PROMPT, nullptr, access), m_title(title != nullptr ? title : L""),
+      m_message(message != nullptr ? message : L""), m_options(options)
 {
 }
 

@@ -157,8 +157,8 @@ void PromptEditorDialog::ShowSelected()
     SendMessageW(answers, CB_RESETCONTENT, 0, 0);
     const auto selected = m_list.Selected();
     const bool editable = selected && !m_prompts.GetLocked(static_cast<unsigned int>(*selected));
-    EnableWindow(answers, editable);
-    EnableWindow(Item(IDC_RESET), editable && AnswerIndex(m_actions[*selected]) != Ask);
+    EnableWindow(answers, editable ? TRUE : FALSE);
+    EnableWindow(Item(IDC_RESET), editable && AnswerIndex(m_actions[*selected]) != Ask ? TRUE : FALSE);
     const wchar_t* text = selected ? m_prompts.GetPromptText(static_cast<unsigned int>(*selected)) : L"";
     SetText(IDC_WHOLE_TEXT, WithFieldLineEnds(text).c_str());
     if (!selected)
@@ -192,7 +192,7 @@ void PromptEditorDialog::TakeAnswer()
     }
     const LRESULT answer = SendDlgItemMessageW(Window(), IDC_ANSWER, CB_GETITEMDATA, static_cast<WPARAM>(item), 0);
     SetAnswer(static_cast<unsigned int>(*row), static_cast<std::size_t>(answer));
-    EnableWindow(Item(IDC_RESET), static_cast<std::size_t>(answer) != Ask);
+    EnableWindow(Item(IDC_RESET), static_cast<std::size_t>(answer) != Ask ? TRUE : FALSE);
 }
 
 void PromptEditorDialog::SetAnswer(unsigned int row, std::size_t answer)

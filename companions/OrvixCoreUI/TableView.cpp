@@ -328,7 +328,7 @@ void TableView::Tick(const std::vector<std::size_t>& places, bool ticked)
 
 LRESULT TableView::Find(const NMLVFINDITEMW& search) const
 {
-    if ((search.lvfi.flags & (LVFI_STRING | LVFI_PARTIAL)) == 0 || !search.lvfi.psz)
+    if ((search.lvfi.flags & (LVFI_STRING | LVFI_PARTIAL)) == 0 || search.lvfi.psz == nullptr)
     {
         return -1;
     }

@@ -35,8 +35,9 @@ void CheckName(std::wstring_view name)
     {
         Refuse(L"Paths with \"..\" are not taken");
     }
-    const bool hasBadCharacter = std::any_of(
-        name.begin(), name.end(), [](wchar_t character) { return character < L' ' || wcschr(L"<>:\"|?*", character); });
+    const bool hasBadCharacter = std::any_of(name.begin(), name.end(), [](wchar_t character) {
+        return character < L' ' || wcschr(L"<>:\"|?*", character) != nullptr;
+    });
     if (hasBadCharacter || name.back() == L'.' || name.back() == L' ')
     {
         Refuse(L"Not a file name that can be used");

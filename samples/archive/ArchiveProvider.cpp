@@ -34,7 +34,7 @@ int Guarded(Work work) noexcept
 
 std::wstring Text(const wchar_t* text)
 {
-    return text ? text : L"";
+    return text != nullptr ? text : L"";
 }
 
 /// The bits of `IOrvixProvider::QueryStatus` for a file of an open project.
@@ -98,7 +98,7 @@ int ArchiveProvider::Initialize(OrvixClientInfo* info)
 {
     return Guarded([&] {
         Uninitialize();
-        if (!info)
+        if (info == nullptr)
         {
             return Failed;
         }
@@ -126,7 +126,7 @@ int ArchiveProvider::OpenProject(const wchar_t* localPath, const wchar_t*)
 {
     return Guarded([&] {
         m_store.Close();
-        return m_initialized && localPath ? Report(m_store.Open(localPath, m_user)) : Failed;
+        return m_initialized && localPath != nullptr ? Report(m_store.Open(localPath, m_user)) : Failed;
     });
 }
 
@@ -309,7 +309,7 @@ int ArchiveProvider::Report(const ArchiveFailures& failures)
 
 void ArchiveProvider::Output(const ArchiveReport::Lines& lines)
 {
-    if (!m_clientAccess)
+    if (m_clientAccess == nullptr)
     {
         return;
     }

@@ -14,7 +14,7 @@ constexpr SCCRTN BadArgument = SCC_E_NONSPECIFICERROR;
 
 std::wstring Text(LPCSTR text)
 {
-    return text ? ArchiveText::FromAnsi(text) : L"";
+    return text != nullptr ? ArchiveText::FromAnsi(text) : L"";
 }
 
 /// The text in a buffer of the host, which may lack a terminator.
@@ -165,7 +165,7 @@ void Append(ArchiveFailures& failures, ArchiveFailures more)
 SCCRTN ArchiveScc::OpenProject(LPSTR user, LPCSTR projectName, LPCSTR localPath, LPSTR auxPath, LPTEXTOUTPROC output,
                                LONG flags)
 {
-    if (!user || !projectName || !localPath || !auxPath)
+    if (user == nullptr || projectName == nullptr || localPath == nullptr || auxPath == nullptr)
     {
         return BadArgument;
     }
@@ -209,12 +209,12 @@ SCCRTN ArchiveScc::CloseProject()
 SCCRTN ArchiveScc::GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath, BOOL allowChangePath,
                                LPBOOL isNew)
 {
-    if (!user || !projectName || !localPath || !auxPath || !isNew)
+    if (user == nullptr || projectName == nullptr || localPath == nullptr || auxPath == nullptr || isNew == nullptr)
     {
         return BadArgument;
     }
     // The host's local path may be that of an earlier project.
-    const bool wasRefused = allowChangePath && !m_refusedFolder.empty();
+    const bool wasRefused = (allowChangePath != 0) && !m_refusedFolder.empty();
     const std::wstring folder = wasRefused ? m_refusedFolder : TextIn(localPath, MAX_PATH);
     if (folder.empty())
     {
@@ -317,7 +317,7 @@ SCCRTN ArchiveScc::Checkin(LONG count, LPCSTR* names, LPCSTR comment, LONG optio
 
 SCCRTN ArchiveScc::Add(LONG count, LPCSTR* names, LPCSTR comment, const LONG* options)
 {
-    if (!options)
+    if (options == nullptr)
     {
         return BadArgument;
     }
@@ -373,7 +373,7 @@ SCCRTN ArchiveScc::Properties(LPCSTR name)
 
 SCCRTN ArchiveScc::QueryInfo(LONG count, LPCSTR* names, LPLONG status)
 {
-    if (!status)
+    if (status == nullptr)
     {
         return BadArgument;
     }
@@ -389,7 +389,7 @@ SCCRTN ArchiveScc::QueryInfo(LONG count, LPCSTR* names, LPLONG status)
 SCCRTN ArchiveScc::PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback, LPVOID callerData,
                                 LPLONG status, LONG options)
 {
-    if (!callback)
+    if (callback == nullptr)
     {
         return BadArgument;
     }
@@ -425,7 +425,7 @@ SCCRTN ArchiveScc::GetCommandOptions(SCCCOMMAND command, LPCMDOPTS* block)
     {
         return SCC_E_OPNOTSUPPORTED;
     }
-    if (!block)
+    if (block == nullptr)
     {
         return SCC_I_ADV_SUPPORT;
     }
@@ -440,15 +440,16 @@ SCCRTN ArchiveScc::GetCommandOptions(SCCCOMMAND command, LPCMDOPTS* block)
 SCCRTN ArchiveScc::AddFromScc(LPLONG count, LPCSTR** names)
 {
     // The host may name the folder in the array that it was given before.
-    const bool hasFolder = count && names && *count == 1 && *names && **names;
+    const bool hasFolder =
+        count != nullptr && names != nullptr && *count == 1 && *names != nullptr && **names != nullptr;
     const std::wstring folder = hasFolder ? Text(**names) : m_folder;
     m_broughtFiles.clear();
     m_broughtNames.clear();
-    if (!count)
+    if (count == nullptr)
     {
         return SCC_OK;
     }
-    if (!names)
+    if (names == nullptr)
     {
         return BadArgument;
     }
@@ -523,6 +524,6 @@ SCCRTN ArchiveScc::Report(const ArchiveFailures& failures) const
 bool ArchiveScc::Output(const ArchiveReport::Lines& lines, LONG kind) const
 {
     return std::all_of(lines.begin(), lines.end(), [&](const std::wstring& line) {
-        return !m_output || m_output(ArchiveText::ToAnsi(line).c_str(), kind) != SCC_MSG_RTN_CANCEL;
+        return m_output == nullptr || m_output(ArchiveText::ToAnsi(line).c_str(), kind) != SCC_MSG_RTN_CANCEL;
     });
 }

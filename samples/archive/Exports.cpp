@@ -42,7 +42,7 @@ extern "C" IOrvixProvider* GetIOrvixProvider()
 
 extern "C" void ReleaseIOrvixProvider(IOrvixProvider* provider)
 {
-    if (provider && provider == theProvider.get() && --requests == 0)
+    if (provider != nullptr && provider == theProvider.get() && --requests == 0)
     {
         theProvider.reset();
     }

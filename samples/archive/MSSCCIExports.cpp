@@ -56,7 +56,8 @@ SCCRTN SccInitialize(LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabi
                      LPLONG checkoutCommentLength, LPLONG commentLength)
 {
     return Guarded([&] {
-        if (!context || !sccName || !capabilities || !auxPathLabel || !checkoutCommentLength || !commentLength)
+        if (context == nullptr || sccName == nullptr || capabilities == nullptr || auxPathLabel == nullptr ||
+            checkoutCommentLength == nullptr || commentLength == nullptr)
         {
             return SCC_E_INITIALIZEFAILED;
         }

@@ -34,7 +34,7 @@ protected:
     {
         EXPECT_TRUE(LoadProviders("<P><Name>P</Name><Filters>" + filters + "</Filters></P>"));
         const OrvixProviderConfig* config = m_manager.FindConfig(L"P");
-        if (!config)
+        if (config == nullptr)
         {
             throw std::runtime_error("the provider was dropped");
         }

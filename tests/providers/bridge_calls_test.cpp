@@ -244,11 +244,11 @@ TEST_F(BridgeCommandOptions, AreAskedForUntilTheLibraryOnceHasSome)
 TEST_F(BridgeCommandOptions, AreTheLibrarysBlockUntilItIsEnded)
 {
     m_recorder.getCommandOptions = [](LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block) {
-        if (!block)
+        if (block == nullptr)
         {
             return SCC_I_ADV_SUPPORT;
         }
-        if (!*block)
+        if (*block == nullptr)
         {
             *block = Block;
         }
@@ -296,7 +296,7 @@ TEST_F(BridgeAddFromScc, LetsTheLibraryFillTheHostsPlaces)
     m_recorder.addFromScc = [this](LPVOID context, HWND window, LPLONG count, LPCSTR** names) {
         EXPECT_EQ(context, reinterpret_cast<LPVOID>(0x77));
         EXPECT_EQ(window, reinterpret_cast<HWND>(0x1234));
-        if (!count)
+        if (count == nullptr)
         {
             return SCC_I_OPERATIONCANCELED; // the names are freed
         }

@@ -36,7 +36,7 @@ public:
 private:
     static BOOL WINAPI Set(LPCWSTR folder)
     {
-        s_folders.emplace_back(folder ? folder : L"none");
+        s_folders.emplace_back(folder != nullptr ? folder : L"none");
         return s_hook->Original<BOOL WINAPI(LPCWSTR)>()(folder);
     }
 

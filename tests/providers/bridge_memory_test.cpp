@@ -93,7 +93,7 @@ TEST_F(BridgeMemory, ThatIsExhaustedForTheSettingsFileLetsTheProjectOpen)
                   // Only the local path is needed before the library is asked.
                   EXPECT_EQ(result, Calls().empty() ? SCC_E_INITIALIZEFAILED : SCC_OK);
                   EXPECT_EQ(m_bridge->IsProjectOpen(), result == SCC_OK);
-                  opened += failed && result == SCC_OK;
+                  opened += static_cast<long>(failed && result == SCC_OK);
                   if (!failed)
                   {
                       EXPECT_TRUE(std::filesystem::exists(Settings()));

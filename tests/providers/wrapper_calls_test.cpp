@@ -204,7 +204,7 @@ TEST_F(Wrapper, ShowOptionsShowsTheOptionsOfALibraryThatHasSome)
 {
     Open();
     m_scc.getCommandOptions = [](LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block) {
-        return block ? SCC_OK : SCC_I_ADV_SUPPORT;
+        return block != nullptr ? SCC_OK : SCC_I_ADV_SUPPORT;
     };
     EXPECT_EQ(m_wrapper->ShowOptions(), 0);
     EXPECT_THAT(m_scc.Take(), ElementsAre("SccGetCommandOptions(0x77, 0x1234, 0xa, null)",

@@ -24,7 +24,7 @@ TEST_F(WrapperSlots, StandInTheOrderOfTheContract)
     ActiveList files{L"C:\\a"};
     OrvixFileList* const list = files.Get();
     m_scc.getCommandOptions = [](LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block) {
-        return block ? SCC_OK : SCC_I_ADV_SUPPORT;
+        return block != nullptr ? SCC_OK : SCC_I_ADV_SUPPORT;
     };
     m_scc.results["SccHistory"] = SCC_I_RELOADFILE;
 

@@ -400,7 +400,7 @@ private:
         OrvixFileEntry* parent = m_entries.empty() || Below(3) == 0 ? nullptr : AnyEntry();
         OrvixFileEntry* entry = Create(m_list, parent, Below(8));
         m_entries.push_back(entry);
-        (parent ? m_children[parent] : m_roots).push_back(entry);
+        (parent != nullptr ? m_children[parent] : m_roots).push_back(entry);
     }
 
     /// A second path to an entry; only from older to newer ones, so that no ring comes about.

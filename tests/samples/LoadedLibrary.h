@@ -17,7 +17,7 @@ public:
 
     void Unload()
     {
-        if (m_module)
+        if (m_module != nullptr)
         {
             FreeLibrary(m_module);
         }

@@ -25,7 +25,7 @@ struct Plugin
 {
     explicit Plugin(const std::filesystem::path& file) : library(file) {}
 
-    bool IsLoaded() const { return version && get && release && name; }
+    bool IsLoaded() const { return version != nullptr && get != nullptr && release != nullptr && name != nullptr; }
 
     LoadedLibrary library;
     std::int32_t (*version)() = library.Export<std::int32_t()>("GetOrvixVersion");

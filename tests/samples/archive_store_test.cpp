@@ -428,7 +428,7 @@ TEST_F(ArchiveStoreCheckOut, WritesTheRecordsOfItsFilesAndNothingElse)
     int changed = 0;
     for (const auto& [path, bytes] : before)
     {
-        changed += after.at(path) != bytes;
+        changed += static_cast<int>(after.at(path) != bytes);
     }
     EXPECT_EQ(changed, 1);
 }

@@ -16,5 +16,5 @@ inline std::wstring ActiveManifest()
         return {};
     }
     const auto* context = reinterpret_cast<const ACTIVATION_CONTEXT_DETAILED_INFORMATION*>(buffer);
-    return context->lpRootManifestPath ? context->lpRootManifestPath : L"";
+    return context->lpRootManifestPath != nullptr ? context->lpRootManifestPath : L"";
 }

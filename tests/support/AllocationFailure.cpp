@@ -25,7 +25,7 @@ constexpr const char* HostNewArrayImport = "_ZN17BraeHeapOperatorsnaEy";
 HMODULE Library()
 {
     const HMODULE module = GetModuleHandleW(L"OrvixCore.dll");
-    if (!module)
+    if (module == nullptr)
     {
         throw std::runtime_error("OrvixCore.dll is not loaded");
     }
@@ -68,7 +68,7 @@ long g_hostFailures;
 
 void* Noticed(void* block)
 {
-    if (!block)
+    if (block == nullptr)
     {
         ++g_hostFailures;
     }
@@ -91,7 +91,7 @@ class ProcessHeap final : public std::pmr::memory_resource
     void* do_allocate(std::size_t size, std::size_t) override
     {
         void* block = HeapAlloc(GetProcessHeap(), 0, size);
-        if (!block)
+        if (block == nullptr)
         {
             throw std::bad_alloc();
         }
@@ -108,7 +108,7 @@ public:
     void* Add(void* block)
     {
         const std::lock_guard lock(m_mutex);
-        if (block)
+        if (block != nullptr)
         {
             m_blocks.insert(block);
         }
@@ -177,7 +177,7 @@ void* WatchedAllocator::Realloc(void* block, std::size_t size)
         return nullptr;
     }
     void* moved = g_watched.realloc.Original<void*(void*, std::size_t)>()(block, size);
-    if (moved || size == 0)
+    if (moved != nullptr || size == 0)
     {
         g_watched.blocks.Remove(block);
     }

@@ -7,7 +7,7 @@ inline bool HasDisplay()
 {
     const HWND window =
         CreateWindowExW(0, L"Static", nullptr, WS_POPUP, 0, 0, 1, 1, nullptr, nullptr, nullptr, nullptr);
-    if (window)
+    if (window != nullptr)
     {
         DestroyWindow(window);
     }

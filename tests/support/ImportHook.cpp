@@ -55,7 +55,7 @@ bool WriteImport(void** slot, void* address)
 
 ImportHook::ImportHook(HMODULE module, const char* name, void* replacement) : m_slot(FindImport(module, name))
 {
-    if (!m_slot)
+    if (m_slot == nullptr)
     {
         return;
     }
@@ -68,7 +68,7 @@ ImportHook::ImportHook(HMODULE module, const char* name, void* replacement) : m_
 
 ImportHook::~ImportHook()
 {
-    if (m_slot)
+    if (m_slot != nullptr)
     {
         WriteImport(m_slot, m_original);
     }

@@ -49,6 +49,7 @@ std::string Lines(const std::filesystem::path& path)
     text.erase(std::remove(text.begin(), text.end(), '\r'), text.end());
     return text;
 }
+
 } // namespace
 
 OrvixTool::Result OrvixTool::Run(const std::filesystem::path& program, const std::filesystem::path& scratch,

@@ -88,6 +88,7 @@ std::string WithoutSequences(const std::string& output)
     text = std::regex_replace(text, std::regex("\x1b\\[[?0-9;]*[A-Za-z]"), "");
     return std::regex_replace(text, std::regex("\r"), "");
 }
+
 } // namespace
 
 PseudoConsole::Result PseudoConsole::Run(std::wstring commandLine)

@@ -23,8 +23,9 @@ public:
     /// Every file may be added; the state of one that is called "riddle" is not told.
     int QueryStatus(OrvixFileList* list, unsigned long) override
     {
-        for (unsigned int i = 0; OrvixFileEntry* entry = list->GetActiveFileEntry(i); ++i)
+        for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
         {
+            OrvixFileEntry* entry = list->GetActiveFileEntry(i);
             if (std::wcsstr(entry->GetFile(), L"riddle") != nullptr)
             {
                 return -1;
@@ -34,6 +35,7 @@ public:
         return 0;
     }
 };
+
 } // namespace
 
 extern "C" {

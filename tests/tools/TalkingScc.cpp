@@ -15,6 +15,7 @@ SCCRTN Answer(const std::string& text)
     printer(text.c_str(), SCC_MSG_INFO);
     return GetEnvironmentVariableW(L"ORVIX_TEST_SCC_FAILS", nullptr, 0) == 0 ? SCC_OK : SCC_E_NONSPECIFICERROR;
 }
+
 } // namespace
 
 extern "C" {

@@ -28,8 +28,9 @@ public:
         const auto says = [&](const wchar_t* word) { return answer.find(word) != std::wstring::npos; };
 
         OrvixFileList* list = params->GetOrvixFileList();
-        for (unsigned int i = 0; OrvixFileEntry* entry = list->GetActiveFileEntry(i); ++i)
+        for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
         {
+            OrvixFileEntry* entry = list->GetActiveFileEntry(i);
             const bool ticked = i > 0 || !says(L"untick");
             entry->SetFlagsOut(ticked ? entry->GetFlagsOut() | 0x2UL : entry->GetFlagsOut() & ~0x2UL);
         }
@@ -39,6 +40,7 @@ public:
 };
 
 WrittenAnswerUI ui;
+
 } // namespace
 
 IOrvixCoreUI* GetIOrvixCoreUI()

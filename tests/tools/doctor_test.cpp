@@ -246,6 +246,7 @@ std::string PromptsXml(const std::string& prompts)
 {
     return "<?xml version=\"1.0\"?><OrvixPrompts>" + prompts + "</OrvixPrompts>";
 }
+
 } // namespace
 
 TEST_F(DoctorTest, FindsNothingWrongWhereNothingIs)

@@ -34,6 +34,7 @@ protected:
         ~Failing() { SetEnvironmentVariableW(L"ORVIX_TEST_SCC_FAILS", nullptr); }
     };
 };
+
 } // namespace
 
 TEST_F(InstalledLibrary, IsNotLookedForUnlessAskedFor)

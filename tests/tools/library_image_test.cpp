@@ -33,6 +33,7 @@ protected:
 private:
     TempFolder m_folder;
 };
+
 } // namespace
 
 TEST_F(LibraryImageTest, NamesWhatALibraryNeeds)

@@ -56,6 +56,7 @@ protected:
         return json::parse(result.output);
     }
 };
+
 } // namespace
 
 TEST_F(ListingTool, FiltersTellsFolderFromTypeAndNamesTheFilter)

@@ -30,6 +30,7 @@ std::string Shown(const Listing& listing, const OutputStyle& style = {})
     TextOutput(stream, style).Show(listing);
     return stream.str();
 }
+
 } // namespace
 
 TEST(OutputStyle, ColoursNeedATerminalThatObeysAndAUserWhoWantsThem)

@@ -63,6 +63,7 @@ protected:
         EXPECT_EQ(std::distance(std::filesystem::directory_iterator(Config()), {}), 1);
     }
 };
+
 } // namespace
 
 TEST_F(PromptsTool, ListShowsEveryRowInWords)

@@ -11,6 +11,7 @@ using testing::AllOf;
 using testing::HasSubstr;
 
 using ProviderCommand = ToolTest;
+
 } // namespace
 
 TEST_F(ProviderCommand, OpenSaysWhichProjectIsOpenWithWhichProvider)

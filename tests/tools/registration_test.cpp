@@ -16,6 +16,7 @@ std::string Library()
 {
     return std::filesystem::path(ORVIX_TALKING_MSSCCI).make_preferred().string();
 }
+
 } // namespace
 
 TEST_F(Registration, IsSeenAmongTheProvidersUntilItIsTakenOut)

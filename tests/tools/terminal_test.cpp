@@ -61,6 +61,7 @@ std::size_t ColumnsOf(const std::string& text)
     return static_cast<std::size_t>(
         std::count_if(text.begin(), text.end(), [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; }));
 }
+
 } // namespace
 
 TEST_F(OnATerminal, ATableFitsAndItsPathsAreShortenedInTheMiddle)

@@ -70,6 +70,7 @@ bool IsReadOnly(const std::filesystem::path& path)
 constexpr const char* CheckInPrompt = "1330796546";
 constexpr const char* KeepPrompt = "1330796547";
 constexpr const char* CheckOutPrompt = "1330796548";
+
 } // namespace
 
 TEST_F(Tool, ListsTheProvidersWithTheirIndexes)

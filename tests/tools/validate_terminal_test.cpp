@@ -32,6 +32,7 @@ protected:
         return PseudoConsole::Run(L"\"" ORVIX_IN_CONSOLE L"\" \"" + tool + L"\"");
     }
 };
+
 } // namespace
 
 TEST_F(ValidateOnATerminal, HasColours)

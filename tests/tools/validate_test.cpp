@@ -134,6 +134,7 @@ void ExpectExactly(const Defects& defects, const std::map<std::string, std::stri
         EXPECT_THAT(failed, testing::Contains(Pair(rule, HasSubstr(reason)))) << std::filesystem::path(name);
     }
 }
+
 } // namespace
 
 TEST_F(Validate, PassesTheSamplePluginInEveryRule)

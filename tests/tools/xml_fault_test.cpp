@@ -23,6 +23,7 @@ protected:
 private:
     TempFolder m_folder;
 };
+
 } // namespace
 
 TEST_F(XmlFaultTest, IsFoundBehindAsMuchTextAsMayBeRead)

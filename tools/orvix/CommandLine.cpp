@@ -175,6 +175,7 @@ std::string Version()
     return "orvix " + std::to_string(ORVIX_VERSION_MAJOR) + "." + std::to_string(ORVIX_VERSION_MINOR) + "." +
            std::to_string(ORVIX_VERSION_PATCH);
 }
+
 } // namespace
 
 std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)

@@ -11,6 +11,7 @@ namespace Source
 
 constexpr std::uint32_t Plugins = 0x1;
 constexpr std::uint32_t InstalledMSSCCI = 0x2;
+
 } // namespace Source
 
 /// What the user asked for; folders and files as typed. An option that was not given is empty.

@@ -218,6 +218,7 @@ void ExplainRemarks(DoctorReport::Place& place, const ReadingLog& log, const wch
         }
     }
 }
+
 } // namespace
 
 Doctor::Doctor(const CommandLine& commandLine, Output& output) : m_commandLine(commandLine), m_output(output)

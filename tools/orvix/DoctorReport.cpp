@@ -52,6 +52,7 @@ std::string Counted(std::size_t count, const char* what)
 {
     return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
 }
+
 } // namespace
 
 std::size_t DoctorReport::NumListed() const

@@ -28,6 +28,7 @@ struct CloseSearch
     using pointer = HANDLE;
     void operator()(HANDLE search) const { FindClose(search); }
 };
+
 } // namespace
 
 void FileCollector::Add(const std::wstring& named)
@@ -109,7 +110,7 @@ void FileCollector::AddFolder(const std::wstring& folder)
             {
                 folders.push_back(name);
             }
-        } while (FindNextFileW(search, &found));
+        } while (FindNextFileW(search, &found) != 0);
         if (GetLastError() != ERROR_NO_MORE_FILES)
         {
             m_unreadableFolders.push_back(folder);

@@ -40,6 +40,7 @@ constexpr std::uint32_t Shown = 0x1; // set by the library
 constexpr std::uint32_t OffersKeep = 0x4;
 constexpr std::uint32_t Keep = 0x10;
 constexpr std::uint32_t OffersRemember = 0x40;
+
 } // namespace DialogOption
 
 namespace PromptAction
@@ -49,6 +50,7 @@ constexpr std::uint32_t Ask = 0x1;
 constexpr std::uint32_t Yes = 0x2;
 constexpr std::uint32_t Keep = 0x8;
 constexpr std::uint32_t DoNotKeep = 0x10;
+
 } // namespace PromptAction
 
 Listing EmptyListing(const CommandLine& commandLine)
@@ -73,6 +75,7 @@ void RegisterPrompts(IOrvixServices& services, const OperationRule& rule)
                                 PromptAction::DoNotKeep, OffersToAll, false);
     }
 }
+
 } // namespace
 
 FileCommand::FileCommand(ProjectSession& project, OrvixClientInfo& client, const CommandLine& commandLine,
@@ -134,8 +137,9 @@ ExitCode FileCommand::Run()
 void FileCommand::ShowStatus()
 {
     QueryStatus();
-    for (unsigned int i = 0; OrvixFileEntry* entry = m_list.GetFileEntry(i); ++i)
+    for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
     {
+        OrvixFileEntry* entry = m_list.GetFileEntry(i);
         const bool known = (entry->GetFlagsOut() & FileState::Controlled) != 0 || PathExists(entry->GetFile());
         Report(known ? Done : Refused, *entry);
     }
@@ -144,8 +148,9 @@ void FileCommand::ShowStatus()
 void FileCommand::ShowHistory()
 {
     QueryStatus();
-    for (unsigned int i = 0; OrvixFileEntry* entry = m_list.GetFileEntry(i); ++i)
+    for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
     {
+        OrvixFileEntry* entry = m_list.GetFileEntry(i);
         if ((entry->GetFlagsOut() & FileState::AllowsHistory) != 0)
         {
             continue;
@@ -218,8 +223,9 @@ void FileCommand::Change(const OperationRule& rule)
                             : m_commandLine.keep ||
                                   (rule.CanKeep() && services.GetPromptAction(rule.keepPrompt) == PromptAction::Keep);
     QueryStatus();
-    for (unsigned int i = 0; OrvixFileEntry* entry = m_list.GetFileEntry(i); ++i)
+    for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
     {
+        OrvixFileEntry* entry = m_list.GetFileEntry(i);
         if (!outcomes[i])
         {
             ++m_otherState;
@@ -240,8 +246,9 @@ std::vector<std::optional<FileCommand::Outcome>> FileCommand::OutcomesOfRun(cons
 {
     std::vector<std::optional<Outcome>> outcomes;
     unsigned int nextActive = 0; // the active list is in the order of the entries
-    for (unsigned int i = 0; OrvixFileEntry* entry = m_list.GetFileEntry(i); ++i)
+    for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
     {
+        OrvixFileEntry* entry = m_list.GetFileEntry(i);
         const bool active = entry == m_list.GetActiveFileEntry(nextActive);
         nextActive += active ? 1 : 0;
         if ((entry->GetFlagsIn() & TakenByOperation) != 0)

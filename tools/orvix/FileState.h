@@ -23,4 +23,5 @@ constexpr unsigned long AllowsHistory = 0x400000;
 
 /// The state in words. `exists`: the file is on the disk.
 std::string InWords(unsigned long flags, bool exists);
+
 } // namespace FileState

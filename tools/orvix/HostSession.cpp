@@ -36,6 +36,7 @@ std::wstring WindowsUser()
     ::GetUserNameW(name, &size);
     return name;
 }
+
 } // namespace
 
 HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_access(commandLine.unattended, output)

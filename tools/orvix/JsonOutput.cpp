@@ -20,6 +20,7 @@ Json ValueOf(const Listing::Cell& cell)
     } const asJson;
     return std::visit(asJson, cell.value);
 }
+
 } // namespace
 
 void JsonOutput::Say(std::wstring_view text)

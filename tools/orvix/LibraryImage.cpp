@@ -120,6 +120,7 @@ void AddMissing(const std::wstring& path, const std::wstring& shownAs, const Man
         }
     }
 }
+
 } // namespace
 
 std::optional<LibraryImage> LibraryImage::Read(const std::wstring& path)

@@ -38,6 +38,7 @@ const char* NotificationName(std::uint32_t id)
         return "unknown";
     }
 }
+
 } // namespace
 
 std::uint32_t NotificationPrinter::Notify(OrvixNotifyParams* params, std::int64_t)

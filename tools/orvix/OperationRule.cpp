@@ -71,6 +71,7 @@ constexpr OperationRule Rules[] = {
         .dialogPrompt = FirstPrompt + 6,
     },
 };
+
 } // namespace
 
 bool OperationRule::IsReached(unsigned long flags, bool kept) const

@@ -19,6 +19,7 @@ const char* Sequence(Listing::Tone tone)
         return "";
     }
 }
+
 } // namespace
 
 std::string OutputStyle::Painted(const std::string& text, Listing::Tone tone) const

@@ -14,6 +14,7 @@ std::wstring ProjectFolder(const std::wstring& named, const wchar_t* fixedRoot)
     }
     return FullPath(fixedRoot != nullptr && *fixedRoot != L'\0' ? fixedRoot : L".");
 }
+
 } // namespace
 
 ProjectSession::ProjectSession(HostSession& host, const CommandLine& commandLine)

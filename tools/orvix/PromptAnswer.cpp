@@ -30,6 +30,7 @@ std::uint32_t Meaning(std::uint32_t action)
     return (action & PromptAction::Ask) != 0 ? PromptAction::Ask
                                              : PromptAction::FromAnswer(PromptAction::ToAnswer(action));
 }
+
 } // namespace
 
 std::wstring PromptAnswer::InWords(std::uint32_t action)

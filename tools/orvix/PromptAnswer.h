@@ -20,4 +20,5 @@ bool IsOffered(std::uint32_t options, std::uint32_t action);
 
 /// What the options offer.
 std::wstring OptionsInWords(std::uint32_t options);
+
 } // namespace PromptAnswer

@@ -30,6 +30,7 @@ int ParseId(const std::wstring& text)
     }
     return static_cast<int>(value);
 }
+
 } // namespace
 
 PromptCommand::PromptCommand(const CommandLine& commandLine, Output& output)

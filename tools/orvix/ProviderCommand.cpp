@@ -20,6 +20,7 @@ constexpr int Failure = -1;
 constexpr int NotOffered = -2;
 
 constexpr unsigned long Selected = 0x2; // bit of an entry's FlagsIn
+
 } // namespace
 
 bool ProviderCommand::IsOne(const std::wstring& command)

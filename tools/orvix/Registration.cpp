@@ -80,6 +80,7 @@ void CheckLibrary(const std::wstring& path)
         throw ToolError(ExitCode::NoProject, L"no MSSCCI library, it has no SccGetVersion: " + path);
     }
 }
+
 } // namespace
 
 Registration::Registration(const std::wstring& name) : m_name(name), m_keyPath(OwnPlace + name)

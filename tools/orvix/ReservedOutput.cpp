@@ -15,6 +15,7 @@ constexpr int StandardOutput = 1; // descriptors
 constexpr int StandardError = 2;
 
 constexpr std::size_t MaxPiece = 0x10000; // bytes written at once
+
 } // namespace
 
 ReservedOutput::ReservedOutput() : m_output(_dup(StandardOutput))

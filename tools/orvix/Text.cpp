@@ -18,6 +18,7 @@ std::string WithoutControls(std::wstring_view text, std::wstring_view kept)
     std::replace_if(safe.begin(), safe.end(), isControl, L'\xFFFD');
     return Utf8(safe);
 }
+
 } // namespace
 
 std::string Utf8(std::wstring_view text)

@@ -19,6 +19,7 @@ void PrintSummary(std::ostream& stream, const std::vector<Listing::Count>& count
     }
     stream << '\n';
 }
+
 } // namespace
 
 void TextOutput::Say(std::wstring_view text)

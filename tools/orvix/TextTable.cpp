@@ -48,6 +48,7 @@ std::size_t ColumnsOfUnit(wchar_t unit)
     const bool wide = (type & (C3_FULLWIDTH | C3_IDEOGRAPH | C3_HIRAGANA | C3_KATAKANA)) != 0;
     return wide && (type & C3_HALFWIDTH) == 0 ? 2 : 1;
 }
+
 } // namespace
 
 TextTable::TextTable(const Listing& listing)

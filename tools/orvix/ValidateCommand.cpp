@@ -91,6 +91,7 @@ public:
 private:
     nlohmann::ordered_json m_document;
 };
+
 } // namespace
 
 ExitCode ValidateCommand::Run()

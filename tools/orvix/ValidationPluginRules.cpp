@@ -10,6 +10,7 @@ namespace
 {
 
 constexpr int Requests = 3;
+
 } // namespace
 
 void PluginRules::Exports(ValidationSubject& subject)

@@ -200,6 +200,7 @@ void CheckInThisProcess(const ValidationRule& rule, ValidationSubject& subject)
         subject.Tell(ValidationSubject::Skip, std::string("it cannot be checked: ") + error.what());
     }
 }
+
 } // namespace
 
 ValidationResult ValidationProcess::Check(const ValidationRule& rule) const

@@ -72,6 +72,7 @@ private:
 
     PrivateKey m_root;
 };
+
 } // namespace
 
 ValidationProvider::ValidationProvider(ValidationSubject& subject) : m_subject(subject)

@@ -65,8 +65,9 @@ public:
     std::vector<unsigned long> Flags()
     {
         std::vector<unsigned long> flags;
-        for (unsigned int i = 0; OrvixFileEntry* entry = m_list.GetFileEntry(i); ++i)
+        for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
         {
+            OrvixFileEntry* entry = m_list.GetFileEntry(i);
             flags.push_back(entry->GetFlagsOut());
         }
         return flags;
@@ -76,13 +77,15 @@ public:
     auto Rest()
     {
         std::vector<std::tuple<OrvixFileEntry*, std::wstring, unsigned long, long long, unsigned int>> rest;
-        for (unsigned int i = 0; OrvixFileEntry* entry = m_list.GetFileEntry(i); ++i)
+        for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
         {
+            OrvixFileEntry* entry = m_list.GetFileEntry(i);
             rest.emplace_back(entry, entry->GetFile(), entry->GetFlagsIn(), entry->GetClientPtr(),
                               entry->NumChildren() + entry->NumAttachments());
         }
-        for (unsigned int i = 0; OrvixFileEntry* entry = m_list.GetActiveFileEntry(i); ++i)
+        for (unsigned int i = 0; i < m_list.NumActiveEntries(); ++i)
         {
+            OrvixFileEntry* entry = m_list.GetActiveFileEntry(i);
             rest.emplace_back(entry, L"", 0, 0, 0);
         }
         return rest;
@@ -276,6 +279,7 @@ void DemandNoLeak(const std::string& what, const std::function<void(int round)>&
     Demand(after < before + Rounds, std::to_string(Rounds) + ' ' + what + " leave " +
                                         std::to_string(static_cast<int>(after - before)) + " handles open");
 }
+
 } // namespace
 
 void ProviderRules::Loads(ValidationSubject& subject)

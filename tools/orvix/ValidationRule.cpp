@@ -55,6 +55,7 @@ constexpr ValidationRule Rules[] = {
     {"dialogs", "ShowHistory gives 0, 1, -1 or -2, and what else shows windows 0, -1 or -2", Plugin | MSSCCI, true,
      ProviderRules::Dialogs},
 };
+
 } // namespace
 
 std::span<const ValidationRule> ValidationRule::All()

@@ -24,6 +24,7 @@ void Sessions(ValidationSubject& subject);
 void Reload(ValidationSubject& subject);
 void Handles(ValidationSubject& subject);
 void Dialogs(ValidationSubject& subject);
+
 } // namespace ProviderRules
 
 /// Of a plug-in's four functions.
@@ -34,6 +35,7 @@ void Exports(ValidationSubject& subject);
 void Version(ValidationSubject& subject);
 void Name(ValidationSubject& subject);
 void Objects(ValidationSubject& subject);
+
 } // namespace PluginRules
 
 /// Of an MSSCCI library's functions.
@@ -49,4 +51,5 @@ void NullArguments(ValidationSubject& subject);
 void InputTexts(ValidationSubject& subject);
 void InfoBits(ValidationSubject& subject);
 void TextOutput(ValidationSubject& subject);
+
 } // namespace SccRules

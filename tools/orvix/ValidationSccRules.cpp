@@ -191,6 +191,7 @@ public:
         return SCC_MSG_RTN_OK;
     }
 };
+
 } // namespace
 
 void SccRules::Exports(ValidationSubject& subject)

@@ -35,7 +35,8 @@ void ValidationScratch::RemoveTree(const std::wstring& folder)
 {
     WIN32_FIND_DATAW found;
     std::unique_ptr<void, decltype(&FindClose)> search(FindFirstFileW((folder + L"\\*").c_str(), &found), FindClose);
-    for (BOOL more = search.get() != INVALID_HANDLE_VALUE; more; more = FindNextFileW(search.get(), &found))
+    for (BOOL more = search.get() != INVALID_HANDLE_VALUE ? TRUE : FALSE; more;
+         more = FindNextFileW(search.get(), &found))
     {
         const std::wstring name = found.cFileName;
         const std::wstring path = folder + L'\\' + name;

@@ -29,8 +29,9 @@ std::uint32_t VetoRule::Notify(OrvixNotifyParams* params, std::int64_t)
     {
         return 0;
     }
-    for (unsigned int i = 0; OrvixFileEntry* entry = list->GetActiveFileEntry(i); ++i)
+    for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
     {
+        OrvixFileEntry* entry = list->GetActiveFileEntry(i);
         if (Forbids(entry->GetFile()))
         {
             return 1;

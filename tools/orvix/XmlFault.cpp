@@ -57,7 +57,7 @@ public:
             m_fault.emplace();
             locator->getLineNumber(&m_fault->line);
             locator->getColumnNumber(&m_fault->column);
-            m_fault->reason = message ? message : L"";
+            m_fault->reason = message != nullptr ? message : L"";
             while (!m_fault->reason.empty() && std::iswspace(m_fault->reason.back()))
             {
                 m_fault->reason.pop_back();
@@ -128,6 +128,7 @@ public:
 private:
     HRESULT m_result;
 };
+
 } // namespace
 
 std::optional<XmlFault> XmlFault::Find(const std::wstring& path, std::uintmax_t maxText)

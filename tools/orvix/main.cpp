@@ -35,8 +35,9 @@ void ListProviders(HostSession& host, Output& output)
     host.FindProvider(L""); // fails when there is none
     Listing listing{
         .key = "providers", .columns = {{"index", "Index"}, {"name", "Provider"}}, .rows = {}, .summary = {}};
-    for (std::uint32_t index = 0; const wchar_t* name = host.Services().GetProviderName(index); ++index)
+    for (std::uint32_t index = 0; index < host.Services().GetProviderCount(); ++index)
     {
+        const wchar_t* name = host.Services().GetProviderName(index);
         listing.rows.push_back({{std::int64_t{index}}, {std::wstring(name)}});
     }
     output.Show(listing);
@@ -142,6 +143,7 @@ ExitCode Run(int count, wchar_t** arguments)
     CheckWritten(output.Print());
     return code;
 }
+
 } // namespace
 
 int wmain(int count, wchar_t** arguments)

@@ -62,7 +62,7 @@ void* Allocate(std::size_t size) noexcept
         return nullptr;
     }
     auto* header = static_cast<BlockHeader*>(HeapAlloc(heap.handle, 0, sizeof(BlockHeader) + size));
-    if (!header)
+    if (header == nullptr)
     {
         return nullptr;
     }
@@ -73,7 +73,7 @@ void* Allocate(std::size_t size) noexcept
 
 void Free(void* block) noexcept
 {
-    if (!block)
+    if (block == nullptr)
     {
         return;
     }

@@ -6,7 +6,7 @@
 
 CStr::CStr(const wchar_t* text) noexcept
 {
-    if (!text)
+    if (text == nullptr)
     {
         return;
     }
@@ -16,7 +16,7 @@ CStr::CStr(const wchar_t* text) noexcept
         return;
     }
     m_text = new (std::nothrow) char[static_cast<std::size_t>(size)];
-    if (m_text)
+    if (m_text != nullptr)
     {
         WideCharToMultiByte(CP_ACP, 0, text, -1, m_text, size, nullptr, nullptr);
     }

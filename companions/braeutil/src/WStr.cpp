@@ -6,7 +6,7 @@
 
 WStr::WStr(const char* text) noexcept
 {
-    if (!text)
+    if (text == nullptr)
     {
         return;
     }
@@ -16,7 +16,7 @@ WStr::WStr(const char* text) noexcept
         return;
     }
     m_text = new (std::nothrow) wchar_t[static_cast<std::size_t>(size)];
-    if (m_text)
+    if (m_text != nullptr)
     {
         MultiByteToWideChar(CP_ACP, 0, text, -1, m_text, size);
     }

@@ -42,7 +42,7 @@ std::wstring NameOf(HWND control)
     {
         name = TextOf(control);
     }
-    else if (label && IsOfClass(label, L"Static"))
+    else if (label != nullptr && IsOfClass(label, L"Static"))
     {
         name = TextOf(label);
     }
@@ -53,7 +53,7 @@ std::wstring NameOf(HWND control)
 std::vector<HWND> VisibleControls(HWND dialog)
 {
     std::vector<HWND> controls;
-    for (HWND control = GetWindow(dialog, GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
+    for (HWND control = GetWindow(dialog, GW_CHILD); control != nullptr; control = GetWindow(control, GW_HWNDNEXT))
     {
         if ((GetWindowLongW(control, GWL_STYLE) & WS_VISIBLE) != 0)
         {
@@ -150,7 +150,7 @@ void DialogWindow::Close() const
 HWND DialogWindow::Control(const std::wstring& name) const
 {
     const HWND control = Find(m_window, name);
-    if (!control)
+    if (control == nullptr)
     {
         throw std::runtime_error("the dialog has no control " + std::filesystem::path(name).string());
     }
@@ -350,7 +350,7 @@ HWND DialogWindow::FocusWindow() const
     GUITHREADINFO info{};
     info.cbSize = sizeof info;
     GetGUIThreadInfo(GetWindowThreadProcessId(m_window, nullptr), &info);
-    return info.hwndFocus ? info.hwndFocus : m_window;
+    return info.hwndFocus != nullptr ? info.hwndFocus : m_window;
 }
 
 void DialogWindow::SetRowState(const std::wstring& list, int row, UINT states, bool set) const

@@ -12,6 +12,7 @@ namespace Gdiplus
 
 using std::max; // NOLINT(misc-unused-using-decls)
 using std::min; // NOLINT(misc-unused-using-decls)
+
 } // namespace Gdiplus
 #include <gdiplus.h>
 

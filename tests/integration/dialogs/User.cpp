@@ -41,7 +41,7 @@ LRESULT CALLBACK MarkProcedure(HWND window, UINT message, WPARAM wParam, LPARAM 
 
 void MakeMarkWindow()
 {
-    if (Mark().window)
+    if (Mark().window != nullptr)
     {
         return;
     }
@@ -77,7 +77,7 @@ BOOL CALLBACK CompareTitle(HWND window, LPARAM parameter)
     {
         search.found = window;
     }
-    return search.found == nullptr;
+    return search.found == nullptr ? TRUE : FALSE;
 }
 
 std::optional<DialogWindow> Await(DWORD thread, const std::wstring& title)
@@ -86,7 +86,7 @@ std::optional<DialogWindow> Await(DWORD thread, const std::wstring& title)
     {
         Search search{title};
         EnumThreadWindows(thread, &CompareTitle, reinterpret_cast<LPARAM>(&search));
-        if (search.found)
+        if (search.found != nullptr)
         {
             Settle(search.found);
             return DialogWindow(search.found, &Settle);

@@ -104,7 +104,7 @@ TEST_F(PromptDialog, ShowsAnIconAndTheOneThatItsOptionsName)
     const auto iconOf = [this](std::uint32_t options) {
         LRESULT icon = 0;
         ShowPrompt(options, [&icon](const DialogWindow& dialog) {
-            for (HWND control = GetWindow(dialog.Handle(), GW_CHILD); control;
+            for (HWND control = GetWindow(dialog.Handle(), GW_CHILD); control != nullptr;
                  control = GetWindow(control, GW_HWNDNEXT))
             {
                 if ((GetWindowLongW(control, GWL_STYLE) & SS_TYPEMASK) == SS_ICON && IsWindowVisible(control))

@@ -84,12 +84,13 @@ TEST_F(DialogWindows, GiveEveryControlAnAccessKeyOfItsOwn)
 {
     const auto expectKeys = [](const DialogWindow& dialog) {
         std::wstring keys;
-        for (HWND control = GetWindow(dialog.Handle(), GW_CHILD); control; control = GetWindow(control, GW_HWNDNEXT))
+        for (HWND control = GetWindow(dialog.Handle(), GW_CHILD); control != nullptr;
+             control = GetWindow(control, GW_HWNDNEXT))
         {
             wchar_t text[256] = {};
             GetWindowTextW(control, text, 256);
             const wchar_t* mark = wcschr(text, L'&');
-            if (IsWindowVisible(control) && mark)
+            if (IsWindowVisible(control) && mark != nullptr)
             {
                 keys += static_cast<wchar_t>(towlower(mark[1]));
             }

@@ -39,7 +39,7 @@ private:
     }
     static BOOL WINAPI SetFolder(const wchar_t* folder)
     {
-        s_folders.emplace_back(folder ? folder : L"");
+        s_folders.emplace_back(folder != nullptr ? folder : L"");
         return TRUE;
     }
 

@@ -5,7 +5,7 @@
 
 std::string ActiveNames(OrvixFileList* list)
 {
-    if (!list)
+    if (list == nullptr)
     {
         return "no list";
     }
@@ -17,7 +17,7 @@ std::string ActiveNames(OrvixFileList* list)
             names += ' ';
         }
         OrvixFileEntry* entry = list->GetActiveFileEntry(i);
-        names += entry ? Narrow(entry->GetFile()) : "null";
+        names += entry != nullptr ? Narrow(entry->GetFile()) : "null";
     }
     return names + "]";
 }

@@ -15,7 +15,7 @@ OperationTest::OperationTest()
         for (unsigned int i = 0; i < list.NumActiveEntries(); ++i)
         {
             OrvixFileEntry* entry = list.GetActiveFileEntry(i);
-            if (!entry)
+            if (entry == nullptr)
             {
                 continue;
             }

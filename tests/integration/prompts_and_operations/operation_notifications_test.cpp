@@ -52,7 +52,7 @@ TEST_F(OperationNotifications, NameTheFirstOperationAndTheProviderRunsAllInItsOw
         const OperationRow* first = nullptr;
         for (const OperationRow& row : ByPrecedence)
         {
-            if (!first && (operations & row.bit) != 0)
+            if (first == nullptr && (operations & row.bit) != 0)
             {
                 first = &row;
             }

@@ -33,11 +33,11 @@ protected:
     }
     void TearDown() override
     {
-        if (m_coreUI)
+        if (m_coreUI != nullptr)
         {
             Function<decltype(&ReleaseIOrvixCoreUI)>("ReleaseIOrvixCoreUI")(m_coreUI);
         }
-        if (m_module)
+        if (m_module != nullptr)
         {
             FreeLibrary(m_module);
         }

@@ -70,7 +70,7 @@ protected:
         return [this, action] {
             const ServicesPointer services(GetIOrvixServices());
             services->Initialize(&m_info, 0);
-            if (action)
+            if (action != nullptr)
             {
                 *action = services->GetPromptAction(1);
             }

@@ -32,7 +32,7 @@ Names NamesInSearchOrder(const std::filesystem::path& folder)
         {
             names.push_back(L"D\u00E9p\u00F4t \u5009\u5EAB");
         }
-    } while (FindNextFileW(search, &found));
+    } while (FindNextFileW(search, &found) != 0);
     FindClose(search);
     return names;
 }

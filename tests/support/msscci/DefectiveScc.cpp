@@ -22,7 +22,7 @@ std::map<std::string, LONG> statuses;
 
 void Print(LPCSTR text, LONG kind)
 {
-    if (printer)
+    if (printer != nullptr)
     {
         printer(text, kind);
     }
@@ -173,7 +173,7 @@ SCCRTN SccQueryInfo(LPVOID, LONG count, LPCSTR* names, LPLONG status)
 
 SCCRTN SccGetCommandOptions(LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block)
 {
-    if (Defect::Is(L"hang") && !block)
+    if (Defect::Is(L"hang") && block == nullptr)
     {
         Defect::Hang();
     }

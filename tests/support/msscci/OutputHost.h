@@ -20,7 +20,7 @@ public:
 
     void OutputText(const wchar_t* text, int kind) override
     {
-        lines.emplace_back(text ? text : L"(null)", kind);
+        lines.emplace_back(text != nullptr ? text : L"(null)", kind);
         if (onOutput)
         {
             onOutput();

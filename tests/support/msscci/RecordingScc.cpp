@@ -21,7 +21,7 @@ SccRecorder& Recorder()
 
 std::string Show(LPCSTR text)
 {
-    return text ? '"' + std::string(text) + '"' : "null";
+    return text != nullptr ? '"' + std::string(text) + '"' : "null";
 }
 
 std::string Show(LPSTR text)
@@ -67,7 +67,7 @@ std::string Show(Pointer* pointer)
 
 std::string Names(LONG count, LPCSTR* names)
 {
-    return names ? Show(std::span(names, static_cast<std::size_t>(count))) : "null";
+    return names != nullptr ? Show(std::span(names, static_cast<std::size_t>(count))) : "null";
 }
 
 std::string Join()
@@ -243,8 +243,8 @@ SCCRTN SccRunScc(LPVOID context, HWND window, LONG count, LPCSTR* names)
 
 SCCRTN SccGetCommandOptions(LPVOID context, HWND window, SCCCOMMAND command, LPCMDOPTS* block)
 {
-    const SCCRTN result =
-        Record("SccGetCommandOptions", context, window, command, block ? "block " + Show(*block) : std::string("null"));
+    const SCCRTN result = Record("SccGetCommandOptions", context, window, command,
+                                 block != nullptr ? "block " + Show(*block) : std::string("null"));
     return Answer(result, Recorder().getCommandOptions, context, window, command, block);
 }
 
@@ -271,7 +271,7 @@ BOOL WINAPI DllMain(HINSTANCE library, DWORD reason, void* processEnds)
         folder.resize(GetDllDirectoryW(static_cast<DWORD>(folder.size()), folder.data()));
         Recorder().dllDirectoryAtLoad = folder;
     }
-    else if (reason == DLL_PROCESS_DETACH && !processEnds)
+    else if (reason == DLL_PROCESS_DETACH && processEnds == nullptr)
     {
         Recorder().calls.push_back("unload " + LibraryName(library));
     }

@@ -213,8 +213,9 @@ private:
 
     int Become(OrvixFileList* list, unsigned long state)
     {
-        for (unsigned int i = 0; OrvixFileEntry* entry = list->GetActiveFileEntry(i); ++i)
+        for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
         {
+            OrvixFileEntry* entry = list->GetActiveFileEntry(i);
             m_states[entry->GetFile()] = state;
         }
         return list->NumActiveEntries() == 0 ? Failure : Success;
@@ -289,5 +290,5 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
     {
         Defect::MoveProgram();
     }
-    return !Defect::Is(L"reload") || Defect::Count(L"ORVIX_DEFECT_LOADS") != 5;
+    return !Defect::Is(L"reload") || Defect::Count(L"ORVIX_DEFECT_LOADS") != 5 ? TRUE : FALSE;
 }
