@@ -9,9 +9,8 @@ install(TARGETS orvix RUNTIME DESTINATION bin)
 install(FILES $<TARGET_FILE:archive_msscci> DESTINATION bin)
 install(FILES $<TARGET_FILE:archive> DESTINATION bin/plugins)
 
-install(DIRECTORY include/ companions/braeutil/include/ DESTINATION include
+install(DIRECTORY include/ companions/braeutil/include/ DESTINATION include FILES_MATCHING PATTERN "*.h"
   PATTERN BraeDiagnostics.h EXCLUDE) # only the development build has it
-install(FILES providers/MSSCCI.h DESTINATION include)
 # Side by side as in the tree, so that the links between them lead somewhere.
 install(DIRECTORY samples docs DESTINATION share/OrvixCore)
 

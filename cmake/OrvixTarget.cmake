@@ -42,3 +42,23 @@ function(orvix_windows_path variable path)
     set(${variable} Z:${path} PARENT_SCOPE)
   endif()
 endfunction()
+
+# orvix_floor(<name> USES <floor>... SOURCES <file>...)
+# One folder of the library, as the static library orvix_<name>. Its include path is its own folder and the floors that
+# it uses, with the floors below those: an include of a higher floor does not compile.
+function(orvix_floor name)
+  cmake_parse_arguments(arg "" "" "USES;SOURCES" ${ARGN})
+  add_library(orvix_${name} STATIC ${arg_SOURCES})
+  target_include_directories(orvix_${name} PUBLIC ${CMAKE_CURRENT_SOURCE_DIR})
+  target_compile_definitions(orvix_${name} PRIVATE ORVIXCORE_BUILD)
+  list(TRANSFORM arg_USES PREPEND orvix_)
+  target_link_libraries(orvix_${name} PUBLIC ${arg_USES} PRIVATE orvix_build)
+endfunction()
+
+# orvix_link_floors(<target>): links every floor whole, as OrvixCore.dll needs it and test programs that use what the
+# DLL does not export.
+function(orvix_link_floors target)
+  target_link_libraries(${target} PRIVATE orvix_core)
+  set_property(TARGET ${target} PROPERTY LINK_LIBRARY_OVERRIDE
+    WHOLE_ARCHIVE,orvix_records,orvix_notify,orvix_config,orvix_providers,orvix_core)
+endfunction()
