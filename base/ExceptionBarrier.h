@@ -18,6 +18,21 @@ Result WithBarrier(Result onFailure, Body&& body)
     }
 }
 
+/// Runs `body`, which returns nothing; false when anything is thrown.
+template <typename Body>
+bool Completes(Body&& body)
+{
+    try
+    {
+        std::forward<Body>(body)();
+        return true;
+    }
+    catch (...)
+    {
+        return false;
+    }
+}
+
 /// The barrier around what reads or writes an XML file: a COM error (`_com_error`) travels on to the host.
 template <typename Result, typename Body>
 Result WithXmlBarrier(Result onFailure, Body&& body)

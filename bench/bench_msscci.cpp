@@ -44,7 +44,7 @@ public:
     {
         auto bridge = std::make_unique<OrvixMSSCC>();
         bridge->SetProvider((ProgramFolder() / IdleLibrary).c_str(), L"", L"Idle", false);
-        m_wrapper.SetMSSCC(bridge.release());
+        m_wrapper.SetMSSCC(std::move(bridge));
         OrvixClientInfo info;
         m_wrapper.Initialize(&info);
         m_wrapper.OpenProject(L"C:\\project", L"");
@@ -92,7 +92,7 @@ void ReportMemory(IdleMsscci& msscci, HMODULE library)
         bytes += std::wcslen(list->GetActiveFileEntry(i)->GetFile()) + 1;
     }
     const SIZE_T before = MemoryNow();
-    msscci.Provider().QueryStatus(list.get(), 0);
+    msscci.Provider().QueryStatus(list.Get(), 0);
     const SIZE_T during = Export<SIZE_T()>(library, "MemoryInQuery")();
     std::printf("QueryStatus, 100,000 files: %.1f MB more than before at its peak; the narrow paths have %.1f MB\n",
                 static_cast<double>(during - before) / 1e6, static_cast<double>(bytes) / 1e6);
@@ -105,7 +105,7 @@ double CheckOutCostPerFile(IdleMsscci& msscci, unsigned int count, unsigned int 
     const double time = BestTime([&] {
         for (unsigned int i = 0; i < repeat; ++i)
         {
-            msscci.Provider().CheckOut(list.get(), L"comment", 0);
+            msscci.Provider().CheckOut(list.Get(), L"comment", 0);
         }
     });
     return time / count / repeat;
@@ -144,7 +144,7 @@ public:
             for (const char* name :
                  {"GetOrvixVersion", "GetIOrvixProvider", "ReleaseIOrvixProvider", "GetOrvixProviderName"})
             {
-                GetProcAddress(modules.back().get(), name);
+                GetProcAddress(modules.back().Get(), name);
             }
         }
         HKEY list = nullptr;
@@ -185,8 +185,8 @@ Measure InitializeFifty()
     info.SetProviderPluginPath(installed.PluginFolder().c_str());
     const UniqueModule core(LoadLibraryW(L"OrvixCore.dll"));
     const std::unique_ptr<IOrvixServices, void (*)(IOrvixServices*)> services(
-        Export<IOrvixServices*()>(core.get(), "GetIOrvixServices")(),
-        Export<void(IOrvixServices*)>(core.get(), "ReleaseIOrvixServices"));
+        Export<IOrvixServices*()>(core.Get(), "GetIOrvixServices")(),
+        Export<void(IOrvixServices*)>(core.Get(), "ReleaseIOrvixServices"));
     std::vector<UniqueModule> modules;
     return Compare(
         "Initialize, 50 plug-ins and 50 MSSCCI registrations", 1.2, [&] { services->Initialize(&info, 0x1 | 0x2); },
@@ -203,14 +203,14 @@ void BenchMsscci(MeasureTable& table)
 {
     IdleMsscci msscci;
     const UniqueModule library(LoadLibraryW((ProgramFolder() / IdleLibrary).c_str()));
-    ReportMemory(msscci, library.get());
-    const auto query = Export<decltype(SccQueryInfo)>(library.get(), "SccQueryInfo");
+    ReportMemory(msscci, library.Get());
+    const auto query = Export<decltype(SccQueryInfo)>(library.Get(), "SccQueryInfo");
     for (const unsigned int count : {10000U, 100000U})
     {
         const auto list = MakeActiveList(count);
         table.Print(Compare(
             "QueryStatus through an MSSCCI library, " + std::to_string(count) + " files", 1.5,
-            [&] { msscci.Provider().QueryStatus(list.get(), 0); }, [&] { QueryByHand(*list, query); }));
+            [&] { msscci.Provider().QueryStatus(list.Get(), 0); }, [&] { QueryByHand(*list, query); }));
     }
     table.Print({"CheckOut through an MSSCCI library, time per file: 100,000 against 1,000",
                  CheckOutCostPerFile(msscci, 100000, 1), CheckOutCostPerFile(msscci, 1000, 100), 1.3});

@@ -1,9 +1,40 @@
 #include "OrvixPromptTable.h"
 
-#include "AssignText.h"
+#include "RecordState.h"
+
+#include <deque>
+#include <string>
+#include <utility>
+#include <vector>
+
+/// Arrays of equal length, entry i of each belonging to row i. The texts lie in a deque, which never moves one: a
+/// text's address holds until the text is set or removed.
+struct OrvixPromptTable::State
+{
+    std::vector<int> ids;
+    std::deque<std::wstring> texts;
+    std::vector<unsigned long> options;
+    std::vector<unsigned long> prompts;
+    std::vector<bool> locked;
+};
+
+namespace
+{
+
+template <typename State>
+bool HasRow(const State* state, unsigned int index)
+{
+    return state != nullptr && index < state->ids.size();
+}
+
+} // namespace
 
 OrvixPromptTable::OrvixPromptTable() = default;
-OrvixPromptTable::~OrvixPromptTable() = default;
+
+OrvixPromptTable::~OrvixPromptTable()
+{
+    delete m_state;
+}
 
 int OrvixPromptTable::AddPrompt(int id, const wchar_t* text, unsigned long options, unsigned long prompt, bool locked)
 {
@@ -11,22 +42,25 @@ int OrvixPromptTable::AddPrompt(int id, const wchar_t* text, unsigned long optio
     {
         return -1;
     }
-    const std::size_t count = m_ids.size();
-    const bool added = WithBarrier(false, [&] {
-        m_ids.push_back(id);
-        m_texts.emplace_back(text);
-        m_options.push_back(options);
-        m_prompts.push_back(prompt);
-        m_locked.push_back(locked);
-        return true;
+    const std::size_t count = m_state != nullptr ? m_state->ids.size() : 0;
+    const bool added = Completes([&] {
+        State& state = StateOf(m_state);
+        state.ids.push_back(id);
+        state.texts.emplace_back(text);
+        state.options.push_back(options);
+        state.prompts.push_back(prompt);
+        state.locked.push_back(locked);
     });
     if (!added)
     {
-        // Shrinking does not allocate; the arrays keep equal lengths.
-        m_ids.resize(count);
-        m_texts.resize(count);
-        m_options.resize(count);
-        m_prompts.resize(count);
+        if (m_state != nullptr)
+        {
+            // Shrinking does not allocate; the arrays keep equal lengths.
+            m_state->ids.resize(count);
+            m_state->texts.resize(count);
+            m_state->options.resize(count);
+            m_state->prompts.resize(count);
+        }
         return -1;
     }
     return NumPrompts();
@@ -34,84 +68,80 @@ int OrvixPromptTable::AddPrompt(int id, const wchar_t* text, unsigned long optio
 
 int OrvixPromptTable::NumPrompts()
 {
-    return static_cast<int>(m_ids.size());
+    return m_state != nullptr ? static_cast<int>(m_state->ids.size()) : 0;
 }
 
 void OrvixPromptTable::RemoveAll()
 {
-    m_ids.clear();
-    m_texts.clear();
-    m_options.clear();
-    m_prompts.clear();
-    m_locked.clear();
+    delete std::exchange(m_state, nullptr);
 }
 
 int OrvixPromptTable::GetPromptID(unsigned int index)
 {
-    return index < m_ids.size() ? m_ids[index] : -1;
+    return HasRow(m_state, index) ? m_state->ids[index] : -1;
 }
 
 bool OrvixPromptTable::SetPromptID(unsigned int index, int id)
 {
-    if (index >= m_ids.size())
+    if (!HasRow(m_state, index))
     {
         return false;
     }
-    m_ids[index] = id;
+    m_state->ids[index] = id;
     return true;
 }
 
 const wchar_t* OrvixPromptTable::GetPromptText(unsigned int index)
 {
-    return index < m_texts.size() ? m_texts[index].c_str() : nullptr;
+    return HasRow(m_state, index) ? m_state->texts[index].c_str() : nullptr;
 }
 
 bool OrvixPromptTable::SetPromptText(unsigned int index, const wchar_t* text)
 {
-    return index < m_texts.size() && AssignText(m_texts[index], text);
+    return HasRow(m_state, index) && text != nullptr && Completes([&] { m_state->texts[index] = text; });
 }
 
 unsigned long OrvixPromptTable::GetPromptOptions(unsigned int index)
 {
-    return index < m_options.size() ? m_options[index] : 0;
+    return HasRow(m_state, index) ? m_state->options[index] : 0;
 }
 
 bool OrvixPromptTable::SetPromptOptions(unsigned int index, unsigned long options)
 {
-    if (index >= m_options.size())
+    if (!HasRow(m_state, index))
     {
         return false;
     }
-    m_options[index] = options;
+    m_state->options[index] = options;
     return true;
 }
 
 unsigned long OrvixPromptTable::GetPrompt(unsigned int index)
 {
-    return index < m_prompts.size() ? m_prompts[index] : 0;
+    return HasRow(m_state, index) ? m_state->prompts[index] : 0;
 }
 
 bool OrvixPromptTable::SetPrompt(unsigned int index, unsigned long prompt)
 {
-    if (index >= m_prompts.size())
+    if (!HasRow(m_state, index))
     {
         return false;
     }
-    m_prompts[index] = prompt;
+    m_state->prompts[index] = prompt;
     return true;
 }
 
 bool OrvixPromptTable::GetLocked(unsigned int index)
 {
-    return index < m_locked.size() && m_locked[index];
+    return HasRow(m_state, index) && m_state->locked[index];
 }
 
 bool OrvixPromptTable::SetLocked(unsigned int index, bool locked)
 {
-    if (index >= m_locked.size())
+    if (!HasRow(m_state, index))
     {
         return false;
     }
-    m_locked[index] = locked;
+    m_state->locked[index] = locked;
     return true;
 }

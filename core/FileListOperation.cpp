@@ -2,47 +2,29 @@
 
 #include "IOrvixCoreUI.h"
 #include "IOrvixProvider.h"
+#include "OrvixDialogOption.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
 #include "OrvixNotification.h"
+#include "OrvixNotificationID.h"
 #include "OrvixNotifyParams.h"
-#include "OrvixServices.h"
-#include "PromptAction.h"
+#include "OrvixOperation.h"
+#include "OrvixPrompt.h"
+#include "OrvixProviderOption.h"
+#include "StoredAnswers.h"
+#include "UserInterface.h"
 
-#include <array>
 #include <vector>
 
 namespace
 {
 
-constexpr std::int32_t Cancelled = 0;
-constexpr std::int32_t Done = 1;
-constexpr std::uint32_t Vetoed = 1;
+constexpr std::uint32_t AnyProviderCall = OrvixOperation::CheckIn | OrvixOperation::Add | OrvixOperation::GetLatest |
+                                          OrvixOperation::CheckOut | OrvixOperation::UndoCheckOut;
 
-// Bits of `operations`.
-constexpr std::uint32_t Notify = 0x1;
-constexpr std::uint32_t CheckIn = 0x2;
-constexpr std::uint32_t Add = 0x4;
-constexpr std::uint32_t GetLatest = 0x8;
-constexpr std::uint32_t CheckOut = 0x10;
-constexpr std::uint32_t UndoCheckOut = 0x20;
-constexpr std::uint32_t AnyProviderCall = CheckIn | Add | GetLatest | CheckOut | UndoCheckOut;
-
-// Bits of the record's options.
-constexpr std::uint32_t DialogShown = 0x1;
-constexpr std::uint32_t OptionKeepsCheckedOut = 0x4;
-constexpr std::uint32_t OptionGetsLatest = 0x8;
-constexpr std::uint32_t OptionTicked = 0x10;
-constexpr std::uint32_t RememberOffered = 0x40;
-constexpr std::uint32_t RememberTicked = 0x80;
-
-constexpr unsigned long Selected = 0x1; // bit of FlagsIn
-constexpr unsigned long Ticked = 0x2;   // bit of FlagsOut behind the dialog
-
-constexpr std::uint32_t FilesConfirmed = 27; // notification behind the dialog
-
-struct NotificationIds
+struct NotificationIDs
 {
     std::uint32_t operation;
     std::uint32_t before;
@@ -50,16 +32,21 @@ struct NotificationIds
 };
 
 /// The first row whose operation is asked for gives the identifiers.
-constexpr std::array<NotificationIds, 5> Notifications = {
-    {{CheckIn, 13, 14}, {Add, 19, 20}, {GetLatest, 21, 22}, {CheckOut, 15, 16}, {UndoCheckOut, 17, 18}}};
+constexpr NotificationIDs Notifications[] = {
+    {OrvixOperation::CheckIn, OrvixNotificationID::BeforeCheckIn, OrvixNotificationID::AfterCheckIn},
+    {OrvixOperation::Add, OrvixNotificationID::BeforeAdd, OrvixNotificationID::AfterAdd},
+    {OrvixOperation::GetLatest, OrvixNotificationID::BeforeGetLatest, OrvixNotificationID::AfterGetLatest},
+    {OrvixOperation::CheckOut, OrvixNotificationID::BeforeCheckOut, OrvixNotificationID::AfterCheckOut},
+    {OrvixOperation::UndoCheckOut, OrvixNotificationID::BeforeUndoCheckOut, OrvixNotificationID::AfterUndoCheckOut},
+};
 
-const NotificationIds* IdsFor(std::uint32_t operations)
+const NotificationIDs* IDsFor(std::uint32_t operations)
 {
-    if (operations & Notify)
+    if ((operations & OrvixOperation::Notify) != 0)
     {
-        for (const NotificationIds& ids : Notifications)
+        for (const NotificationIDs& ids : Notifications)
         {
-            if (operations & ids.operation)
+            if ((operations & ids.operation) != 0)
             {
                 return &ids;
             }
@@ -87,10 +74,12 @@ void RemoveActiveEntries(OrvixFileList& list, const std::vector<OrvixFileEntry*>
 
 } // namespace
 
-FileListOperation::FileListOperation(OrvixServices& services, void* dialogArgument, OrvixFileListDialogParams& params,
-                                     OrvixFileList& list, IOrvixProvider* provider, std::uint32_t operations)
-    : m_services(services), m_dialogArgument(dialogArgument), m_params(params), m_list(list), m_provider(provider),
-      m_operations(operations), m_dialogPrompt(static_cast<std::uint32_t>(params.GetDialogPromptID())),
+FileListOperation::FileListOperation(StoredAnswers& answers, UserInterface& userInterface, void* dialogArgument,
+                                     OrvixFileListDialogParams& params, OrvixFileList& list, IOrvixProvider* provider,
+                                     std::uint32_t operations)
+    : m_answers(answers), m_userInterface(userInterface), m_dialogArgument(dialogArgument), m_params(params),
+      m_list(list), m_provider(provider), m_operations(operations),
+      m_dialogPrompt(static_cast<std::uint32_t>(params.GetDialogPromptID())),
       m_optionPrompt(static_cast<std::uint32_t>(params.GetOptionPromptID()))
 {
 }
@@ -101,32 +90,32 @@ std::int32_t FileListOperation::Run(bool callProviderFirst, std::uint32_t flagsO
     {
         if (m_provider == nullptr)
         {
-            return Cancelled;
+            return OrvixOperationResult::Cancelled;
         }
         m_provider->QueryStatus(&m_list, 0);
     }
     if (m_list.NumActiveEntries() == 0)
     {
-        return Done;
+        return OrvixOperationResult::Done;
     }
-    if (m_provider == nullptr && (m_operations & AnyProviderCall))
+    if (m_provider == nullptr && (m_operations & AnyProviderCall) != 0)
     {
-        return Cancelled;
+        return OrvixOperationResult::Cancelled;
     }
     if (!KeepFittingEntries(flagsOutMask))
     {
-        return Done;
+        return OrvixOperationResult::Done;
     }
     if (NotifyBefore(false))
     {
-        return Cancelled;
+        return OrvixOperationResult::Cancelled;
     }
 
     const Confirmation confirmation = Confirm();
-    if (confirmation.result == Cancelled)
+    if (confirmation.result == OrvixOperationResult::Cancelled)
     {
         NotifyBefore(true);
-        return Cancelled;
+        return OrvixOperationResult::Cancelled;
     }
     if (confirmation.run)
     {
@@ -149,9 +138,9 @@ bool FileListOperation::KeepFittingEntries(std::uint32_t flagsOutMask)
         {
             continue;
         }
-        if (entry->GetFlagsOut() & flagsOutMask)
+        if ((entry->GetFlagsOut() & flagsOutMask) != 0)
         {
-            entry->SetFlagsIn(entry->GetFlagsIn() | Selected);
+            entry->SetFlagsIn(entry->GetFlagsIn() | OrvixFileSelection::Selected);
             anyFits = true;
         }
         else
@@ -166,76 +155,75 @@ bool FileListOperation::KeepFittingEntries(std::uint32_t flagsOutMask)
     return anyFits;
 }
 
-void FileListOperation::RemoveUntickedEntries()
+/// Removes the entries that the user cleared in the dialog.
+void FileListOperation::RemoveClearedEntries()
 {
-    std::vector<OrvixFileEntry*> unticked;
+    std::vector<OrvixFileEntry*> cleared;
     for (unsigned int i = 0; i < m_list.NumActiveEntries(); ++i)
     {
         OrvixFileEntry* entry = m_list.GetActiveFileEntry(i);
-        if (entry != nullptr && !(entry->GetFlagsOut() & Ticked))
+        if (entry != nullptr && (entry->GetFlagsOut() & OrvixFileSelection::Confirmed) == 0)
         {
-            unticked.push_back(entry);
+            cleared.push_back(entry);
         }
     }
-    RemoveActiveEntries(m_list, unticked);
+    RemoveActiveEntries(m_list, cleared);
 }
 
 /// Confirms by the stored answer, or by the dialog where the user is to be asked.
 FileListOperation::Confirmation FileListOperation::Confirm()
 {
-    if (m_dialogPrompt == PromptAction::NoPrompt)
+    if (m_dialogPrompt == OrvixPromptID::None)
     {
         return ShowDialog(false);
     }
 
-    const bool locked = m_services.IsPromptLocked(m_dialogPrompt);
-    const std::uint32_t action = m_services.GetPromptAction(m_dialogPrompt);
-    const bool ask = (action & PromptAction::Ask) != 0;
+    const bool locked = m_answers.IsLocked(m_dialogPrompt);
+    const std::uint32_t action = m_answers.GetAction(m_dialogPrompt);
+    const bool ask = (action & OrvixPromptAction::Ask) != 0;
     std::uint32_t optionAction = 0;
-    if (!ask && m_optionPrompt != PromptAction::NoPrompt)
+    if (!ask && m_optionPrompt != OrvixPromptID::None)
     {
-        optionAction = m_services.GetPromptAction(m_optionPrompt);
+        optionAction = m_answers.GetAction(m_optionPrompt);
     }
-    if (ask && !m_services.IsUnattended())
+    if (ask && !m_userInterface.IsUnattended())
     {
         return ShowDialog(locked);
     }
 
-    if (!(action & PromptAction::Answer1))
+    if ((action & OrvixPromptAction::Yes) == 0)
     {
-        return {Cancelled, false};
+        return {OrvixOperationResult::Cancelled, false};
     }
-    m_mode = 4;
-    if (optionAction == PromptAction::Answer2)
+    m_mode = OrvixProviderOption::NoDialog;
+    if (optionAction == OrvixPromptAction::OptionChecked)
     {
-        m_mode = m_params.GetOptions() & OptionKeepsCheckedOut ? 5 : m_params.GetOptions() & OptionGetsLatest ? 6 : 4;
+        m_mode |= OfferedOption();
     }
-    return {Done, true};
+    return {OrvixOperationResult::Done, true};
 }
 
 FileListOperation::Confirmation FileListOperation::ShowDialog(bool locked)
 {
-    const std::uint32_t options = m_params.GetOptions() | DialogShown;
-    m_params.SetOptions(locked ? options & ~RememberOffered : options);
-    const std::int32_t result = m_services.CoreUI().ShowFileListDialog(m_dialogArgument, &m_params);
+    const std::uint32_t options = m_params.GetOptions() | OrvixDialogOption::EntriesCanBeCleared;
+    m_params.SetOptions(locked ? options & ~OrvixDialogOption::OfferRemember : options);
+    const std::int32_t result = m_userInterface.CoreUI().ShowFileListDialog(m_dialogArgument, &m_params);
 
     bool run = false;
-    if (result == Done)
+    if (result == OrvixDialogResult::Confirmed)
     {
-        RemoveUntickedEntries();
-        if (m_operations & Notify)
+        RemoveClearedEntries();
+        if ((m_operations & OrvixOperation::Notify) != 0)
         {
-            Broadcast(FilesConfirmed, m_list, false);
+            Broadcast(OrvixNotificationID::FilesConfirmed, m_list, false);
         }
         run = m_list.NumActiveEntries() > 0;
-        if (run && (m_params.GetOptions() & OptionTicked))
+        if (run && HasOption(OrvixDialogOption::OptionChecked))
         {
-            m_mode = m_params.GetOptions() & OptionKeepsCheckedOut ? 1
-                     : m_params.GetOptions() & OptionGetsLatest    ? 2
-                                                                   : m_mode;
+            m_mode = OfferedOption();
         }
     }
-    if (m_params.GetOptions() & RememberTicked)
+    if (HasOption(OrvixDialogOption::RememberChecked))
     {
         StoreAnswers(result);
     }
@@ -244,37 +232,55 @@ FileListOperation::Confirmation FileListOperation::ShowDialog(bool locked)
 
 void FileListOperation::StoreAnswers(std::int32_t result)
 {
-    if (m_dialogPrompt != PromptAction::NoPrompt)
+    if (m_dialogPrompt != OrvixPromptID::None)
     {
-        m_services.SetPromptAction(m_dialogPrompt, result == Done ? PromptAction::Answer1 : PromptAction::Answer0);
+        const bool confirmed = result == OrvixDialogResult::Confirmed;
+        m_answers.SetAction(m_dialogPrompt, confirmed ? OrvixPromptAction::Yes : OrvixPromptAction::No);
     }
-    if (m_optionPrompt != PromptAction::NoPrompt)
+    if (m_optionPrompt != OrvixPromptID::None)
     {
-        m_services.SetPromptAction(m_optionPrompt, m_params.GetOptions() & OptionTicked ? PromptAction::Answer2
-                                                                                        : PromptAction::Answer3);
+        const bool checked = HasOption(OrvixDialogOption::OptionChecked);
+        m_answers.SetAction(m_optionPrompt,
+                            checked ? OrvixPromptAction::OptionChecked : OrvixPromptAction::OptionCleared);
     }
+}
+
+/// Whether the record's options, which anybody may change meanwhile, have a bit now.
+bool FileListOperation::HasOption(std::uint32_t bit)
+{
+    return (m_params.GetOptions() & bit) != 0;
+}
+
+/// The provider's option for what the dialog offers; keeping the files checked out goes first.
+unsigned long FileListOperation::OfferedOption()
+{
+    if (HasOption(OrvixDialogOption::OfferKeepCheckedOut))
+    {
+        return OrvixProviderOption::KeepCheckedOut;
+    }
+    return HasOption(OrvixDialogOption::OfferGetLatest) ? OrvixProviderOption::GetLatest : 0;
 }
 
 void FileListOperation::CallProvider()
 {
     const wchar_t* comment = m_params.GetComment();
-    if (m_operations & Add)
+    if ((m_operations & OrvixOperation::Add) != 0)
     {
         m_provider->Add(&m_list, comment, m_mode);
     }
-    if (m_operations & CheckIn)
+    if ((m_operations & OrvixOperation::CheckIn) != 0)
     {
         m_provider->CheckIn(&m_list, comment, m_mode);
     }
-    if (m_operations & GetLatest)
+    if ((m_operations & OrvixOperation::GetLatest) != 0)
     {
         m_provider->GetLatest(&m_list, m_mode);
     }
-    if (m_operations & CheckOut)
+    if ((m_operations & OrvixOperation::CheckOut) != 0)
     {
         m_provider->CheckOut(&m_list, comment, m_mode);
     }
-    if (m_operations & UndoCheckOut)
+    if ((m_operations & OrvixOperation::UndoCheckOut) != 0)
     {
         m_provider->UndoCheckOut(&m_list, m_mode);
     }
@@ -283,13 +289,13 @@ void FileListOperation::CallProvider()
 /// True when a listener vetoed.
 bool FileListOperation::NotifyBefore(bool cancelled)
 {
-    const NotificationIds* ids = IdsFor(m_operations);
-    return ids != nullptr && Broadcast(ids->before, m_list, cancelled) == Vetoed;
+    const NotificationIDs* ids = IDsFor(m_operations);
+    return ids != nullptr && Broadcast(ids->before, m_list, cancelled) == OrvixListenerAnswer::Veto;
 }
 
 void FileListOperation::NotifyAfter()
 {
-    if (const NotificationIds* ids = IdsFor(m_operations))
+    if (const NotificationIDs* ids = IDsFor(m_operations))
     {
         Broadcast(ids->after, m_list, false);
     }

@@ -5,15 +5,17 @@
 class IOrvixProvider;
 class OrvixFileList;
 class OrvixFileListDialogParams;
-class OrvixServices;
+class StoredAnswers;
+class UserInterface;
 
 /// One run of `IOrvixServices::RunFileListOperation`: source-control operations on the active entries of a
 /// file list. Lives for that call; owns nothing.
 class FileListOperation
 {
 public:
-    FileListOperation(OrvixServices& services, void* dialogArgument, OrvixFileListDialogParams& params,
-                      OrvixFileList& list, IOrvixProvider* provider, std::uint32_t operations);
+    FileListOperation(StoredAnswers& answers, UserInterface& userInterface, void* dialogArgument,
+                      OrvixFileListDialogParams& params, OrvixFileList& list, IOrvixProvider* provider,
+                      std::uint32_t operations);
 
     /// Runs all steps; the result is that of `RunFileListOperation`.
     std::int32_t Run(bool callProviderFirst, std::uint32_t flagsOutMask);
@@ -27,15 +29,18 @@ private:
     };
 
     bool KeepFittingEntries(std::uint32_t flagsOutMask);
-    void RemoveUntickedEntries();
+    void RemoveClearedEntries();
     Confirmation Confirm();
     Confirmation ShowDialog(bool locked);
     void StoreAnswers(std::int32_t result);
+    bool HasOption(std::uint32_t bit);
+    unsigned long OfferedOption();
     void CallProvider();
     bool NotifyBefore(bool cancelled);
     void NotifyAfter();
 
-    OrvixServices& m_services;
+    StoredAnswers& m_answers;
+    UserInterface& m_userInterface;
     void* m_dialogArgument;
     OrvixFileListDialogParams& m_params;
     OrvixFileList& m_list;
@@ -43,5 +48,5 @@ private:
     std::uint32_t m_operations;
     std::uint32_t m_dialogPrompt;
     std::uint32_t m_optionPrompt;
-    std::uint32_t m_mode = 0; ///< options of the provider calls; bit 0x1 keeps the files checked out
+    unsigned long m_mode = 0; ///< bits of `OrvixProviderOption` for the provider's operations
 };

@@ -93,7 +93,7 @@ InstalledProviders::Candidate InstalledProviders::Judge(const std::wstring& keyP
     {
         return candidate;
     }
-    const Step name = ReadText(key.get(), ServerName, candidate.name);
+    const Step name = ReadText(key.Get(), ServerName, candidate.name);
     if (name != Step::Found)
     {
         return reject(name, Verdict::NoName);
@@ -110,7 +110,7 @@ InstalledProviders::Candidate InstalledProviders::Judge(const std::wstring& keyP
     }
     if (candidate.serverPath.empty())
     {
-        const Step path = ReadText(key.get(), ServerPath, candidate.serverPath);
+        const Step path = ReadText(key.Get(), ServerPath, candidate.serverPath);
         if (path != Step::Found)
         {
             return reject(path, Verdict::NoPath);

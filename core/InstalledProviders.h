@@ -1,21 +1,11 @@
 #pragma once
 
-#include <windows.h>
+#include "UniqueHandle.h"
 
-#include <memory>
 #include <string>
 
 class OrvixProviderConfig;
 class OrvixProviderConfigManager;
-
-struct RegistryKeyDeleter
-{
-    using pointer = HKEY;
-    void operator()(HKEY key) const noexcept { RegCloseKey(key); }
-};
-
-/// An open registry key that closes itself.
-using UniqueRegistryKey = std::unique_ptr<HKEY, RegistryKeyDeleter>;
 
 /// The registry's list of installed MSSCCI libraries, and of one of them what its own key says.
 ///

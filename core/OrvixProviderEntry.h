@@ -1,14 +1,14 @@
 #pragma once
 
-#include "IsolatedLoad.h"
+#include "IOrvixProvider.h"
+#include "UniqueHandle.h"
 
+#include <memory>
 #include <string>
 
-class IOrvixProvider;
 class OrvixProviderConfig;
 
-/// One discovered provider. Destroying an entry frees its library; the services object releases `provider`
-/// before that.
+/// One discovered provider. Destroying an entry destroys its provider and then frees its library.
 class OrvixProviderEntry
 {
 public:
@@ -19,9 +19,9 @@ public:
 
     std::wstring name;
     bool isMSSCCI = false;
-    IOrvixProvider* provider = nullptr; ///< the wrapper of an MSSCCI library; always null for a plug-in
-    UniqueModule module;                ///< the plug-in's library; null for an MSSCCI library
+    UniqueModule module;                      ///< the plug-in's library; empty for an MSSCCI library
+    std::unique_ptr<IOrvixProvider> provider; ///< the wrapper of an MSSCCI library; always null for a plug-in
     OrvixProviderConfig* config = nullptr;
     IOrvixProvider* (*getProvider)() = nullptr;
-    void (*releaseProvider)(IOrvixProvider*) = nullptr;
+    void (*releaseProvider)(IOrvixProvider*) = nullptr; ///< required of a plug-in and never called: it owns its objects
 };

@@ -1,36 +1,31 @@
 #include "OrvixServices.h"
 
+#include "ActivationContext.h"
 #include "ExceptionBarrier.h"
 #include "FileListOperation.h"
+#include "HostHeap.h"
 #include "IOrvixClientAccess.h"
 #include "IOrvixCoreUI.h"
 #include "IOrvixProvider.h"
 #include "InstalledProviders.h"
+#include "LibraryModule.h"
 #include "OrvixClientInfo.h"
+#include "OrvixDialogOption.h"
 #include "OrvixFileListDialogParams.h"
 #include "OrvixMSSCC.h"
+#include "OrvixOperation.h"
+#include "OrvixPrompt.h"
 #include "OrvixProviderConfig.h"
+#include "OrvixProviderSource.h"
 #include "OrvixProviderWrapper.h"
 #include "PluginCandidate.h"
 #include "PluginSearch.h"
-#include "PromptAction.h"
 #include "PromptFile.h"
 
 #include <windows.h>
 
 #include <new>
 #include <utility>
-
-namespace
-{
-
-// Bits of `sources`.
-constexpr std::uint32_t Plugins = 0x1;
-constexpr std::uint32_t InstalledMSSCCI = 0x2;
-
-constexpr std::uint32_t StopAskingOffered = 0x100; // bit of a prompt's options
-
-} // namespace
 
 IOrvixServices* GetIOrvixServices()
 {
@@ -57,11 +52,11 @@ bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
         WithXmlBarrier(false, [&] {
             return m_config.LoadConfig((m_configFolder + OrvixProviderConfigManager::FileName).c_str());
         });
-        m_clientAccess = info->GetIOrvixClientAccess();
+        m_userInterface.SetClientAccess(info->GetIOrvixClientAccess());
         LoadPrompts();
         const bool pluginsAdded =
-            ((sources & Plugins) != 0) && WithBarrier(false, [&] { return DiscoverPlugins(info); });
-        const bool registryRead = ((sources & InstalledMSSCCI) != 0) && DiscoverMSSCCIProviders();
+            (sources & OrvixProviderSource::Plugins) != 0 && WithBarrier(false, [&] { return DiscoverPlugins(info); });
+        const bool registryRead = (sources & OrvixProviderSource::InstalledMSSCCI) != 0 && DiscoverMSSCCIProviders();
         m_initialized = true;
         return pluginsAdded || registryRead;
     });
@@ -86,10 +81,6 @@ OrvixServices::~OrvixServices()
         }
         ReleaseProviders();
     }
-    if (m_coreUI != nullptr)
-    {
-        ReleaseIOrvixCoreUI(m_coreUI);
-    }
 }
 
 void OrvixServices::ReleaseProviders()
@@ -99,15 +90,7 @@ void OrvixServices::ReleaseProviders()
     m_initialized = false;
     for (auto& entry : providers)
     {
-        if (entry->provider != nullptr && entry->isMSSCCI)
-        {
-            delete entry->provider;
-        }
-        else if (entry->provider != nullptr && entry->releaseProvider != nullptr)
-        {
-            entry->releaseProvider(entry->provider);
-        }
-        entry.reset();
+        entry.reset(); // in order of discovery
     }
 }
 
@@ -130,7 +113,7 @@ IOrvixProvider* OrvixServices::GetProvider(std::uint32_t index)
     const OrvixProviderEntry& entry = *m_providers[index];
     if (entry.isMSSCCI)
     {
-        return entry.provider;
+        return entry.provider.get();
     }
     return WithBarrier(static_cast<IOrvixProvider*>(nullptr), [&] { return entry.getProvider(); });
 }
@@ -138,35 +121,35 @@ IOrvixProvider* OrvixServices::GetProvider(std::uint32_t index)
 std::int32_t OrvixServices::ShowPrompt(void* a, void* b, void* c, std::uint32_t options, std::uint32_t promptID,
                                        bool* dontAskAgain)
 {
-    return WithBarrier(std::int32_t{0}, [&] {
-        const bool stored = promptID != PromptAction::NoPrompt;
+    return WithBarrier(OrvixPromptAnswer::No, [&] {
+        const bool stored = promptID != OrvixPromptID::None;
         if (stored)
         {
-            const bool locked = IsPromptLocked(promptID);
-            const std::uint32_t action = GetPromptAction(promptID);
-            const bool ask = (action & PromptAction::Ask) != 0;
+            const bool locked = m_answers.IsLocked(promptID);
+            const std::uint32_t action = m_answers.GetAction(promptID);
+            const bool ask = (action & OrvixPromptAction::Ask) != 0;
             if (!ask && dontAskAgain != nullptr)
             {
                 *dontAskAgain = true;
             }
-            if (IsUnattended() || !ask)
+            if (m_userInterface.IsUnattended() || !ask)
             {
-                return PromptAction::ToAnswer(action);
+                return OrvixPromptAction::ToAnswer(action);
             }
             if (locked)
             {
-                options &= ~StopAskingOffered;
+                options &= ~OrvixPromptOption::OfferStopAsking;
             }
         }
-        bool flag = false;
-        const std::int32_t answer = CoreUI().ShowPrompt(a, b, c, options, &flag);
+        bool stopAsking = false;
+        const std::int32_t answer = m_userInterface.CoreUI().ShowPrompt(a, b, c, options, &stopAsking);
         if (dontAskAgain != nullptr)
         {
-            *dontAskAgain = flag;
+            *dontAskAgain = stopAsking;
         }
-        if (stored && (options & StopAskingOffered) && flag)
+        if (stored && (options & OrvixPromptOption::OfferStopAsking) != 0 && stopAsking)
         {
-            SetPromptAction(promptID, PromptAction::FromAnswer(answer));
+            m_answers.SetAction(promptID, OrvixPromptAction::FromAnswer(answer));
         }
         return answer;
     });
@@ -174,63 +157,47 @@ std::int32_t OrvixServices::ShowPrompt(void* a, void* b, void* c, std::uint32_t 
 
 std::int32_t OrvixServices::ShowFileListDialog(void* a, OrvixFileListDialogParams* params)
 {
-    return WithBarrier(std::int32_t{0}, [&] { return CoreUI().ShowFileListDialog(a, params); });
+    return WithBarrier(OrvixDialogResult::Cancelled,
+                       [&] { return m_userInterface.CoreUI().ShowFileListDialog(a, params); });
 }
 
 std::int32_t OrvixServices::RunFileListOperation(void* a, OrvixFileListDialogParams* params, bool callProviderFirst,
                                                  IOrvixProvider* provider, std::uint32_t operations,
                                                  std::uint32_t flagsOutMask)
 {
-    return WithBarrier(std::int32_t{0}, [&] {
+    return WithBarrier(OrvixOperationResult::Cancelled, [&] {
         OrvixFileList* list = params != nullptr ? params->GetOrvixFileList() : nullptr;
         if (list == nullptr)
         {
-            return std::int32_t{0};
+            return OrvixOperationResult::Cancelled;
         }
-        return FileListOperation(*this, a, *params, *list, provider, operations).Run(callProviderFirst, flagsOutMask);
+        return FileListOperation(m_answers, m_userInterface, a, *params, *list, provider, operations)
+            .Run(callProviderFirst, flagsOutMask);
     });
 }
 
 std::uint32_t OrvixServices::GetPromptAction(std::uint32_t promptID)
 {
-    const int row = FirstPrompt(promptID);
-    return row < 0 ? 0 : m_prompts.GetPrompt(static_cast<unsigned int>(row));
+    return m_answers.GetAction(promptID);
 }
 
 bool OrvixServices::SetPromptAction(std::uint32_t promptID, std::uint32_t action)
 {
-    const int row = LastPrompt(promptID);
-    if (row < 0 || m_prompts.GetLocked(static_cast<unsigned int>(row)))
-    {
-        return false;
-    }
-    return m_prompts.SetPrompt(static_cast<unsigned int>(row), action);
+    return m_answers.SetAction(promptID, action);
 }
 
 bool OrvixServices::RegisterPrompt(std::uint32_t promptID, const wchar_t* text, std::uint32_t action,
                                    std::uint32_t actionOpts, bool overwriteSettings)
 {
-    const int row = LastPrompt(promptID);
-    if (row < 0)
-    {
-        m_prompts.AddPrompt(static_cast<int>(promptID), text, actionOpts, action, false);
-        return true;
-    }
-    const auto index = static_cast<unsigned int>(row);
-    m_prompts.SetPromptText(index, text);
-    if (overwriteSettings)
-    {
-        m_prompts.SetPromptOptions(index, actionOpts);
-        m_prompts.SetPrompt(index, action);
-    }
+    m_answers.Register(promptID, text, action, actionOpts, overwriteSettings);
     return true;
 }
 
 std::int32_t OrvixServices::EditPrompts(void* a, void* b)
 {
-    return WithXmlBarrier(std::int32_t{0}, [&] {
-        const std::int32_t result = CoreUI().EditPrompts(a, b, &m_prompts);
-        if (result == 1)
+    return WithXmlBarrier(OrvixPromptEditorResult::Unchanged, [&] {
+        const std::int32_t result = m_userInterface.CoreUI().EditPrompts(a, b, &m_answers.Table());
+        if (result == OrvixPromptEditorResult::Changed)
         {
             SavePrompts();
         }
@@ -258,28 +225,20 @@ bool OrvixServices::IsFileExcludedByProvider(std::uint32_t index, const wchar_t*
 
 std::intptr_t OrvixServices::ClientRelayA(void* a, void* b, void* c, void* d)
 {
-    return m_clientAccess != nullptr ? m_clientAccess->RelayA(a, b, c, d) : 0;
+    IOrvixClientAccess* access = m_userInterface.ClientAccess();
+    return access != nullptr ? access->RelayA(a, b, c, d) : 0;
 }
 
 std::uint32_t OrvixServices::GetColor(std::int32_t index)
 {
-    return m_clientAccess != nullptr ? m_clientAccess->GetColor(index) : GetSysColor(index);
+    IOrvixClientAccess* access = m_userInterface.ClientAccess();
+    return access != nullptr ? access->GetColor(index) : GetSysColor(index);
 }
 
 std::intptr_t OrvixServices::ClientRelayB(void* a, void* b, void* c, void* d)
 {
-    return m_clientAccess != nullptr ? m_clientAccess->RelayB(a, b, c, d) : 0;
-}
-
-bool OrvixServices::IsPromptLocked(std::uint32_t promptID)
-{
-    const int row = FirstPrompt(promptID);
-    return row >= 0 && m_prompts.GetLocked(static_cast<unsigned int>(row));
-}
-
-bool OrvixServices::IsUnattended()
-{
-    return m_clientAccess != nullptr && m_clientAccess->IsUnattended();
+    IOrvixClientAccess* access = m_userInterface.ClientAccess();
+    return access != nullptr ? access->RelayB(a, b, c, d) : 0;
 }
 
 /// Appends every accepted plug-in of the client's plug-in folder; true when there was one.
@@ -290,7 +249,7 @@ bool OrvixServices::DiscoverPlugins(OrvixClientInfo* info)
     {
         return false;
     }
-    const ManifestContext context;
+    const UniqueActivationContext context = MakeManifestContext(LibraryModule());
     bool added = false;
     for (; search.GetState() == PluginSearch::State::Found; search.Next())
     {
@@ -320,7 +279,7 @@ bool OrvixServices::DiscoverMSSCCIProviders()
     {
         const bool more = WithBarrier(true, [&] {
             std::wstring keyPath;
-            const InstalledProviders::Step step = InstalledProviders::KeyPathAt(list.get(), index, keyPath);
+            const InstalledProviders::Step step = InstalledProviders::KeyPathAt(list.Get(), index, keyPath);
             if (step == InstalledProviders::Step::EndsProcess)
             {
                 InstalledProviders::EndProcess();
@@ -338,7 +297,7 @@ bool OrvixServices::DiscoverMSSCCIProviders()
     }
 }
 
-/// Appends the provider of a registry key unless something of it is missing or it is switched off.
+/// Appends the provider of a registry key unless it is incomplete or switched off.
 void OrvixServices::AddMSSCCIProvider(const std::wstring& keyPath)
 {
     const InstalledProviders::Candidate candidate = InstalledProviders::Judge(keyPath, m_config);
@@ -351,75 +310,36 @@ void OrvixServices::AddMSSCCIProvider(const std::wstring& keyPath)
         return;
     }
 
-    std::unique_ptr<OrvixProviderWrapper> wrapper(new OrvixProviderWrapper); // null without memory
-    if (!wrapper)
-    {
-        return;
-    }
     auto bridge = std::make_unique<OrvixMSSCC>();
     bridge->SetProvider(candidate.serverPath.c_str(), candidate.searchPath.c_str(), candidate.name.c_str(), false);
     if (candidate.config != nullptr)
     {
         bridge->SetProjectSettingsFile(candidate.config->m_msSccProjectFile);
     }
-    wrapper->SetMSSCC(bridge.release());
+    auto wrapper = MakeOnHostHeap<OrvixProviderWrapper>();
+    wrapper->SetMSSCC(std::move(bridge));
     auto entry = std::make_unique<OrvixProviderEntry>();
     entry->name = candidate.name;
     entry->config = candidate.config;
     entry->isMSSCCI = true;
+    entry->provider = std::move(wrapper);
     m_providers.push_back(std::move(entry));
-    m_providers.back()->provider = wrapper.release();
 }
 
 bool OrvixServices::LoadPrompts()
 {
-    m_prompts.RemoveAll();
-    return WithXmlBarrier(false, [&] { return ReadPromptFile(m_prompts, (m_configFolder + PromptFileName).c_str()); });
+    m_answers.Table().RemoveAll();
+    return WithXmlBarrier(false,
+                          [&] { return ReadPromptFile(m_answers.Table(), (m_configFolder + PromptFileName).c_str()); });
 }
 
 bool OrvixServices::SavePrompts()
 {
-    return WithXmlBarrier(false, [&] { return WritePromptFile(m_prompts, (m_configFolder + PromptFileName).c_str()); });
-}
-
-/// Index of the first row with this ID; -1 when there is none.
-int OrvixServices::FirstPrompt(std::uint32_t promptID)
-{
-    for (int i = 0; i < m_prompts.NumPrompts(); ++i)
-    {
-        if (static_cast<std::uint32_t>(m_prompts.GetPromptID(static_cast<unsigned int>(i))) == promptID)
-        {
-            return i;
-        }
-    }
-    return -1;
-}
-
-/// Index of the last row with this ID; -1 when there is none. Reading takes the first row, writing the last:
-/// with duplicate IDs the two differ, as wanted.
-int OrvixServices::LastPrompt(std::uint32_t promptID)
-{
-    for (int i = m_prompts.NumPrompts() - 1; i >= 0; --i)
-    {
-        if (static_cast<std::uint32_t>(m_prompts.GetPromptID(static_cast<unsigned int>(i))) == promptID)
-        {
-            return i;
-        }
-    }
-    return -1;
+    return WithXmlBarrier(
+        false, [&] { return WritePromptFile(m_answers.Table(), (m_configFolder + PromptFileName).c_str()); });
 }
 
 OrvixProviderConfig* OrvixServices::ConfigOf(std::uint32_t index)
 {
     return index < GetProviderCount() ? m_providers[index]->config : nullptr;
-}
-
-IOrvixCoreUI& OrvixServices::CoreUI()
-{
-    if (m_coreUI == nullptr)
-    {
-        m_coreUI = GetIOrvixCoreUI();
-        m_coreUI->SetClientAccess(this);
-    }
-    return *m_coreUI;
 }

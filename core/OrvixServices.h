@@ -2,17 +2,15 @@
 
 #include "IOrvixCoreUIClientAccess.h"
 #include "IOrvixServices.h"
-#include "OrvixPromptTable.h"
 #include "OrvixProviderConfigManager.h"
 #include "OrvixProviderEntry.h"
+#include "StoredAnswers.h"
+#include "UserInterface.h"
 
 #include <memory>
 #include <vector>
 
-class IOrvixClientAccess;
-class IOrvixCoreUI;
-
-/// The services object. The operations' contracts stand in `IOrvixServices` and `IOrvixCoreUIClientAccess`.
+/// The services object. `IOrvixServices` and `IOrvixCoreUIClientAccess` say what the operations do.
 class OrvixServices final : public IOrvixServices, public IOrvixCoreUIClientAccess
 {
 public:
@@ -47,15 +45,6 @@ public:
     std::uint32_t GetColor(std::int32_t index) override;
     std::intptr_t ClientRelayB(void* a, void* b, void* c, void* d) override;
 
-    /// Whether the first row with this ID is locked; false when there is none.
-    bool IsPromptLocked(std::uint32_t promptID);
-
-    /// Whether the host says that nobody can answer.
-    bool IsUnattended();
-
-    /// The user-interface library's interface, obtained on first use and kept until the object is destroyed.
-    IOrvixCoreUI& CoreUI();
-
 private:
     bool DiscoverPlugins(OrvixClientInfo* info);
     bool DiscoverMSSCCIProviders();
@@ -63,15 +52,12 @@ private:
     void ReleaseProviders();
     bool LoadPrompts();
     bool SavePrompts();
-    int FirstPrompt(std::uint32_t promptID);
-    int LastPrompt(std::uint32_t promptID);
     OrvixProviderConfig* ConfigOf(std::uint32_t index);
 
     bool m_initialized = false;
     std::vector<std::unique_ptr<OrvixProviderEntry>> m_providers;
     std::wstring m_configFolder;
-    IOrvixCoreUI* m_coreUI = nullptr;
-    OrvixPromptTable m_prompts;
+    StoredAnswers m_answers;
     OrvixProviderConfigManager m_config;
-    IOrvixClientAccess* m_clientAccess = nullptr;
+    UserInterface m_userInterface{*this}; // last: the dialogs go first
 };

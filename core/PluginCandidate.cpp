@@ -1,6 +1,7 @@
 #include "PluginCandidate.h"
 
 #include "ExceptionBarrier.h"
+#include "IsolatedLoad.h"
 #include "OrvixProviderConfig.h"
 #include "OrvixProviderConfigManager.h"
 #include "OrvixVersion.h"
@@ -8,7 +9,7 @@
 
 #include <utility>
 
-PluginCandidate PluginCandidate::Judge(const std::wstring& path, const ManifestContext& context,
+PluginCandidate PluginCandidate::Judge(const std::wstring& path, const UniqueActivationContext& context,
                                        const OrvixProviderConfigManager& configs)
 {
     PluginCandidate candidate;
@@ -76,5 +77,5 @@ PluginCandidate::Verdict PluginCandidate::Ask(const OrvixProviderConfigManager& 
 template <typename Function>
 Function* PluginCandidate::Export(const char* name) const
 {
-    return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(entry->module.get(), name)));
+    return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(entry->module.Get(), name)));
 }

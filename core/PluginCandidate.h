@@ -34,7 +34,7 @@ struct PluginCandidate
 
     /// Loads the plug-in and asks for its version and its name. Throws std::bad_alloc; what the plug-in itself throws
     /// makes the verdict.
-    static PluginCandidate Judge(const std::wstring& path, const ManifestContext& context,
+    static PluginCandidate Judge(const std::wstring& path, const UniqueActivationContext& context,
                                  const OrvixProviderConfigManager& configs);
 
     /// The functions that a plug-in lacks, whatever the verdict is; none of what does not load. Throws std::bad_alloc.

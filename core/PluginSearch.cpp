@@ -17,12 +17,11 @@ PluginSearch::PluginSearch(OrvixClientInfo& client) : m_client(client)
         return;
     }
     m_state = State::End;
-    const HANDLE find = FindFirstFileW(pattern.c_str(), &m_found);
-    if (find == INVALID_HANDLE_VALUE)
+    m_find.Reset(FindFirstFileW(pattern.c_str(), &m_found));
+    if (!m_find)
     {
         return;
     }
-    m_find.reset(find);
     m_state = State::Found;
     const std::wstring_view name = m_found.cFileName;
     if (name == L"." || name == L"..")
@@ -36,7 +35,7 @@ void PluginSearch::Next()
     std::wstring_view name;
     do
     {
-        m_state = FindNextFileW(m_find.get(), &m_found) ? State::Found : State::End;
+        m_state = FindNextFileW(m_find.Get(), &m_found) ? State::Found : State::End;
         name = m_found.cFileName;
     } while (m_state == State::Found && (name == L"." || name == L".."));
 }

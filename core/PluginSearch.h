@@ -1,17 +1,10 @@
 #pragma once
 
-#include <windows.h>
+#include "UniqueHandle.h"
 
-#include <memory>
 #include <string>
 
 class OrvixClientInfo;
-
-struct FindDeleter
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE find) const noexcept { FindClose(find); }
-};
 
 /// The files that may be plug-ins, in the client's plug-in folder and in the order in which the system finds them.
 class PluginSearch
@@ -43,6 +36,6 @@ private:
 
     OrvixClientInfo& m_client;
     WIN32_FIND_DATAW m_found = {};
-    std::unique_ptr<HANDLE, FindDeleter> m_find;
+    UniqueFind m_find;
     State m_state = State::NoFolder;
 };

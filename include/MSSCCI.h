@@ -82,8 +82,9 @@ constexpr LONG SCC_OP_CREATEIFNEW = 0x1;
 constexpr LONG SCC_OP_SILENTOPEN = 0x2;
 constexpr LONG SCC_OPT_SHARESUBPROJ = 6;
 
-// Bits of a file's status; 0 is a file that is not controlled.
+// Bits of a file's status.
 constexpr LONG SCC_STATUS_INVALID = -1;
+constexpr LONG SCC_STATUS_NOTCONTROLLED = 0;
 constexpr LONG SCC_STATUS_CONTROLLED = 0x1;
 constexpr LONG SCC_STATUS_CHECKEDOUT = 0x2;
 constexpr LONG SCC_STATUS_OUTOTHER = 0x4;

@@ -3,8 +3,6 @@
 #include "BraeHeapOperators.h"
 #include "OrvixExport.h"
 
-#include <string>
-
 class IOrvixClientAccess;
 struct HWND__;
 
@@ -48,10 +46,11 @@ public:
     virtual void SetIOrvixClientAccess(IOrvixClientAccess* access);
 
 private:
-    std::wstring m_clientName;
-    std::wstring m_userName;
-    std::wstring m_providerPluginPath;
-    std::wstring m_configFilePath;
+    // The texts; null until one is stored. Numbers and pointers are members, so that setting them cannot fail.
+    struct State;
+    State* m_state = nullptr;
     HWND__* m_parentWindow = nullptr;
     IOrvixClientAccess* m_clientAccess = nullptr;
 };
+
+static_assert(sizeof(OrvixClientInfo) == 32, "host and library must agree about the size of a record");

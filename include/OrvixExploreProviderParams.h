@@ -4,14 +4,12 @@
 #include "OrvixExport.h"
 
 #include <cstdint>
-#include <string>
-#include <vector>
 
 /// How a provider's browse dialog behaves, with its file-type filters.
 ///
 /// Created and owned by the host. Texts are copied in: a setter given null (or without memory left) leaves
-/// the old text. A getter's text is valid until the field is set again, a filter is added or the record is
-/// destroyed. Nothing is checked. All operations: [library, main-thread].
+/// the old text. A getter's text is valid until the field is set again or the record is destroyed. Nothing is checked.
+/// All operations: [library, main-thread].
 class ORVIX_API OrvixExploreProviderParams : public BraeHeapOperators
 {
 public:
@@ -44,8 +42,10 @@ public:
     virtual const wchar_t* GetFilterExtensions(std::uint32_t index);
 
 private:
-    std::wstring m_title;
-    std::uint32_t m_flags = 2;
-    std::vector<std::wstring> m_filterNames;
-    std::vector<std::wstring> m_filterExtensions;
+    // The texts and filters; null until one is stored. The flags are a member, so that setting them cannot fail.
+    struct State;
+    State* m_state = nullptr;
+    std::uint32_t m_flags = 2; // files are downloaded
 };
+
+static_assert(sizeof(OrvixExploreProviderParams) == 24, "host and library must agree about the size of a record");

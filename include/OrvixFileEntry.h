@@ -3,9 +3,6 @@
 #include "BraeHeapOperators.h"
 #include "OrvixExport.h"
 
-#include <string>
-#include <vector>
-
 /// One file: its path, its flags, its place in a tree of files, and its attachments (secondary files that
 /// belong to it).
 ///
@@ -80,11 +77,18 @@ public:
     virtual OrvixFileEntry* GetParent();
 
 private:
-    std::wstring m_file;
+    // Plain members of fixed size, so that host and library agree about every object. Null: empty.
+    wchar_t* m_file = nullptr;
     unsigned long m_flagsIn = 0;
     unsigned long m_flagsOut = 0;
     long long m_clientPtr = 0;
-    std::vector<OrvixFileEntry*> m_children;
+    OrvixFileEntry** m_children = nullptr;
+    unsigned int m_numChildren = 0;
+    unsigned int m_childCapacity = 0;
     OrvixFileEntry* m_parent = nullptr;
-    std::vector<OrvixFileEntry*> m_attachments;
+    OrvixFileEntry** m_attachments = nullptr;
+    unsigned int m_numAttachments = 0;
+    unsigned int m_attachmentCapacity = 0;
 };
+
+static_assert(sizeof(OrvixFileEntry) == 72, "host and library must agree about the size of a record");

@@ -1,10 +1,7 @@
 #pragma once
 
 #include "BraeHeapOperators.h"
-#include "OrvixActiveSequence.h"
 #include "OrvixExport.h"
-
-#include <vector>
 
 class OrvixFileEntry;
 
@@ -71,7 +68,9 @@ public:
     virtual OrvixFileEntry* GetRootEntry(unsigned int index);
 
 private:
-    std::vector<OrvixFileEntry*> m_entries;
-    std::vector<OrvixFileEntry*> m_roots;
-    OrvixActiveSequence m_active;
+    // What the library alone knows; null until something is stored.
+    struct State;
+    State* m_state = nullptr;
 };
+
+static_assert(sizeof(OrvixFileList) == 16, "host and library must agree about the size of a record");

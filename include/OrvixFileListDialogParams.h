@@ -2,9 +2,9 @@
 
 #include "BraeHeapOperators.h"
 #include "OrvixExport.h"
+#include "OrvixPrompt.h"
 
 #include <cstdint>
-#include <string>
 
 class OrvixFileList;
 
@@ -51,11 +51,13 @@ public:
     virtual void SetOptionPromptID(std::int32_t id);
 
 private:
-    std::wstring m_title;
-    std::wstring m_message;
+    // The texts; null until one is stored. Numbers and pointers are members, so that setting them cannot fail.
+    struct State;
+    State* m_state = nullptr;
     OrvixFileList* m_fileList = nullptr;
     std::uint32_t m_options = 0;
-    std::wstring m_comment;
-    std::int32_t m_dialogPromptID = -1;
-    std::int32_t m_optionPromptID = -1;
+    std::int32_t m_dialogPromptID = OrvixPromptID::Unset;
+    std::int32_t m_optionPromptID = OrvixPromptID::Unset;
 };
+
+static_assert(sizeof(OrvixFileListDialogParams) == 40, "host and library must agree about the size of a record");

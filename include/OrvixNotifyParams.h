@@ -41,3 +41,5 @@ private:
     bool m_cancelled = false;
     OrvixFileList* m_fileList = nullptr;
 };
+
+static_assert(sizeof(OrvixNotifyParams) == 32, "host and library must agree about the size of a record");

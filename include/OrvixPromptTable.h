@@ -2,9 +2,6 @@
 
 #include "OrvixExport.h"
 
-#include <string>
-#include <vector>
-
 /// The stored answers to prompts: per prompt its ID, its text, the options that go with the answer, the
 /// answer (an action bit set) and whether the answer is locked.
 ///
@@ -52,9 +49,9 @@ public:
     virtual bool SetLocked(unsigned int index, bool locked);
 
 private:
-    std::vector<int> m_ids;
-    std::vector<std::wstring> m_texts;
-    std::vector<unsigned long> m_options;
-    std::vector<unsigned long> m_prompts;
-    std::vector<bool> m_locked;
+    // What the library alone knows; null until something is stored.
+    struct State;
+    State* m_state = nullptr;
 };
+
+static_assert(sizeof(OrvixPromptTable) == 16, "host and library must agree about the size of a record");

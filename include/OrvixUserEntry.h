@@ -3,8 +3,6 @@
 #include "BraeHeapOperators.h"
 #include "OrvixExport.h"
 
-#include <string>
-
 /// A user: login name and person.
 ///
 /// Created by an `OrvixUserList` (which then owns it) or by the host. Texts are copied in whole: a setter
@@ -34,8 +32,9 @@ public:
     virtual void SetEmail(const wchar_t* email);
 
 private:
-    std::wstring m_userName;
-    std::wstring m_firstName;
-    std::wstring m_lastName;
-    std::wstring m_email;
+    // What the library alone knows; null until something is stored.
+    struct State;
+    State* m_state = nullptr;
 };
+
+static_assert(sizeof(OrvixUserEntry) == 16, "host and library must agree about the size of a record");

@@ -3,8 +3,6 @@
 #include "BraeHeapOperators.h"
 #include "OrvixExport.h"
 
-#include <vector>
-
 class OrvixUserEntry;
 
 /// A list of users that owns its entries.
@@ -40,5 +38,9 @@ public:
     virtual OrvixUserEntry* GetUserEntry(unsigned int index);
 
 private:
-    std::vector<OrvixUserEntry*> m_entries;
+    // What the library alone knows; null until something is stored.
+    struct State;
+    State* m_state = nullptr;
 };
+
+static_assert(sizeof(OrvixUserList) == 16, "host and library must agree about the size of a record");

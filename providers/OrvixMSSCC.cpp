@@ -1,7 +1,10 @@
 #include "OrvixMSSCC.h"
 
+#include "ActivationContext.h"
 #include "DllDirectoryScope.h"
 #include "ExceptionBarrier.h"
+#include "IsolatedLoad.h"
+#include "LibraryModule.h"
 #include "NarrowBuffer.h"
 #include "OrvixFileIO.h"
 #include "SccFunctions.h"
@@ -59,10 +62,10 @@ bool OrvixMSSCC::Load()
 {
     {
         const DllDirectoryScope directory(m_searchFolder);
-        m_module = LoadLibraryIsolated(m_dllPath.c_str(), ManifestContext());
+        m_module = LoadLibraryIsolated(m_dllPath.c_str(), MakeManifestContext(LibraryModule()));
     }
     const auto getVersion =
-        m_module ? reinterpret_cast<AnyFunction>(GetProcAddress(m_module.get(), SccFunctions::GetVersion.name))
+        m_module ? reinterpret_cast<AnyFunction>(GetProcAddress(m_module.Get(), SccFunctions::GetVersion.name))
                  : nullptr;
     if (getVersion == nullptr)
     {
@@ -88,7 +91,7 @@ Function* OrvixMSSCC::Resolve(const SccFunction<Function>& entry) noexcept
     }
     if (!function)
     {
-        function = reinterpret_cast<AnyFunction>(GetProcAddress(m_module.get(), entry.name));
+        function = reinterpret_cast<AnyFunction>(GetProcAddress(m_module.Get(), entry.name));
     }
     return reinterpret_cast<Function*>(function);
 }

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "IOrvixMSSCC.h"
-#include "IsolatedLoad.h"
+#include "UniqueHandle.h"
 
 #include <array>
 #include <string>

@@ -6,23 +6,22 @@
 #include "NarrowPaths.h"
 #include "OrvixClientInfo.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixMSSCC.h"
+#include "OrvixProviderOption.h"
+#include "OrvixProviderResult.h"
 #include "WStr.h"
 
 #include <new>
+#include <utility>
 
 namespace
 {
 
-constexpr int Success = 0;
-constexpr int Failure = -1;
-constexpr int NotOffered = -2;
-constexpr int ReloadFile = 1; // of ShowHistory
-
-// Bits of an operation's options.
-constexpr unsigned long KeepCheckedOut = 0x1;
-constexpr unsigned long WithGetLatest = 0x2;
+using OrvixProviderResult::Failure;
+using OrvixProviderResult::NotOffered;
+using OrvixProviderResult::Success;
 
 /// Shared by all wrappers: set by every `Initialize`, read by the text output, to which no wrapper is given.
 IOrvixClientAccess* clientAccess = nullptr;
@@ -34,7 +33,7 @@ int ToResult(SCCRTN result)
 
 LONG KeepOption(unsigned long options)
 {
-    return options & KeepCheckedOut ? SCC_KEEP_CHECKEDOUT : 0;
+    return (options & OrvixProviderOption::KeepCheckedOut) != 0 ? SCC_KEEP_CHECKEDOUT : 0;
 }
 
 /// A comment or a name in the ANSI code page, never null. Throws std::bad_alloc.
@@ -72,7 +71,7 @@ template <typename Work>
 int FileOperation(OrvixFileList* list, Work work)
 {
     return WithBarrier(Failure, [&] {
-        const unsigned int count = list ? list->NumActiveEntries() : 0;
+        const unsigned int count = list != nullptr ? list->NumActiveEntries() : 0;
         if (count == 0)
         {
             return Failure;
@@ -87,67 +86,34 @@ unsigned long FlagsOf(LONG status, bool projectOpen)
 {
     const auto has = [status](LONG bits) { return (status & bits) != 0; };
     const bool controlled = has(SCC_STATUS_CONTROLLED);
-    const bool onlyMine = has(SCC_STATUS_CHECKEDOUT) && !has(SCC_STATUS_OUTOTHER);
+    const bool outToMe = has(SCC_STATUS_CHECKEDOUT);
+    const bool outToOther = has(SCC_STATUS_OUTOTHER);
 
     unsigned long flags = 0;
-    if (status == 0)
-    {
-        flags |= 0x1;
-    }
-    if (controlled)
-    {
-        flags |= 0x2 | 0x200000 | 0x400000;
-    }
-    if (has(SCC_STATUS_CHECKEDOUT))
-    {
-        flags |= 0x4;
-    }
-    if (has(SCC_STATUS_OUTOTHER))
-    {
-        flags |= 0x8;
-    }
-    if (has(SCC_STATUS_OUTOFDATE))
-    {
-        flags |= 0x10;
-    }
-    if (has(SCC_STATUS_DELETED))
-    {
-        flags |= 0x20;
-    }
-    if (has(SCC_STATUS_MODIFIED))
-    {
-        flags |= 0x80;
-    }
-    if (controlled && onlyMine)
-    {
-        flags |= 0x10000 | 0x40000;
-    }
-    if (controlled && !has(SCC_STATUS_CHECKEDOUT | SCC_STATUS_OUTOTHER | SCC_STATUS_OUTOFDATE))
-    {
-        flags |= 0x20000;
-    }
-    if (controlled && has(SCC_STATUS_CHECKEDOUT | SCC_STATUS_MODIFIED))
-    {
-        flags |= 0x80000;
-    }
-    if (!controlled && projectOpen)
-    {
-        flags |= 0x100000;
-    }
+    const auto setWhen = [&flags](bool condition, unsigned long bits) { flags |= condition ? bits : 0; };
+    setWhen(status == SCC_STATUS_NOTCONTROLLED, OrvixFileState::NotControlled);
+    setWhen(controlled, OrvixFileState::Controlled);
+    setWhen(outToMe, OrvixFileState::CheckedOut);
+    setWhen(outToOther, OrvixFileState::CheckedOutByOther);
+    setWhen(has(SCC_STATUS_OUTOFDATE), OrvixFileState::OutOfDate);
+    setWhen(has(SCC_STATUS_DELETED), OrvixFileState::Deleted);
+    setWhen(has(SCC_STATUS_MODIFIED), OrvixFileState::Modified);
+    setWhen(controlled, OrvixFilePermission::GetLatest | OrvixFilePermission::ShowHistory);
+    setWhen(controlled && outToMe && !outToOther, OrvixFilePermission::CheckIn | OrvixFilePermission::UndoCheckOut);
+    setWhen(controlled && !outToMe && !outToOther && !has(SCC_STATUS_OUTOFDATE), OrvixFilePermission::CheckOut);
+    setWhen(controlled && (outToMe || has(SCC_STATUS_MODIFIED)), OrvixFilePermission::Compare);
+    setWhen(!controlled && projectOpen, OrvixFilePermission::Add);
     return flags;
 }
 
 } // namespace
 
-OrvixProviderWrapper::~OrvixProviderWrapper()
-{
-    delete m_bridge;
-}
+OrvixProviderWrapper::OrvixProviderWrapper() = default;
+OrvixProviderWrapper::~OrvixProviderWrapper() = default;
 
-void OrvixProviderWrapper::SetMSSCC(IOrvixMSSCC* bridge)
+void OrvixProviderWrapper::SetMSSCC(std::unique_ptr<OrvixMSSCC> bridge)
 {
-    delete m_bridge;
-    m_bridge = bridge;
+    m_bridge = std::move(bridge);
 }
 
 const wchar_t* OrvixProviderWrapper::GetName()
@@ -177,7 +143,7 @@ int OrvixProviderWrapper::Initialize(OrvixClientInfo* info)
         {
             return Failure;
         }
-        static_cast<OrvixMSSCC*>(m_bridge)->SetParentWindow(info->GetParentWindow());
+        m_bridge->SetParentWindow(info->GetParentWindow());
         clientAccess = info->GetIOrvixClientAccess();
         return ToResult(m_bridge->Initialize(NarrowText(info->GetClientName()).Get()));
     });
@@ -223,7 +189,7 @@ int OrvixProviderWrapper::CheckOut(OrvixFileList* list, const wchar_t* comment, 
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
         const NarrowText text(comment);
-        if (options & WithGetLatest)
+        if ((options & OrvixProviderOption::GetLatest) != 0)
         {
             m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr); // a failed get does not stop the check-out
         }
@@ -235,7 +201,7 @@ int OrvixProviderWrapper::UndoCheckOut(OrvixFileList* list, unsigned long option
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
         SCCRTN result = m_bridge->Uncheckout(paths.Count(), paths.Get(), 0, nullptr);
-        if (options & WithGetLatest)
+        if ((options & OrvixProviderOption::GetLatest) != 0)
         {
             result = m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr);
         }
@@ -278,7 +244,7 @@ int OrvixProviderWrapper::ShowHistory(OrvixFileList* list)
         {
             return Failure;
         }
-        return result == SCC_I_RELOADFILE ? ReloadFile : Success;
+        return result == SCC_I_RELOADFILE ? OrvixProviderResult::ReloadFiles : Success;
     });
 }
 

@@ -2,7 +2,9 @@
 
 #include "IOrvixProvider.h"
 
-class IOrvixMSSCC;
+#include <memory>
+
+class OrvixMSSCC;
 
 /// An installed MSSCCI library as a provider: turns the active entries of a list into narrow paths, calls the bridge,
 /// and turns its result into 0 (the library answered 0) or -1.
@@ -15,13 +17,13 @@ class IOrvixMSSCC;
 class OrvixProviderWrapper : public IOrvixProvider
 {
 public:
-    OrvixProviderWrapper() = default;
+    OrvixProviderWrapper();
     OrvixProviderWrapper(const OrvixProviderWrapper&) = delete;
     OrvixProviderWrapper& operator=(const OrvixProviderWrapper&) = delete;
     ~OrvixProviderWrapper() override;
 
-    /// Takes ownership of a bridge, which must be an `OrvixMSSCC`, and deletes the old one.
-    void SetMSSCC(IOrvixMSSCC* bridge);
+    /// Takes the bridge that every operation needs; called right after construction.
+    void SetMSSCC(std::unique_ptr<OrvixMSSCC> bridge);
 
     const wchar_t* GetName() override;
     int ReservedA() override;
@@ -51,5 +53,5 @@ public:
     bool ReservedI() override;
 
 private:
-    IOrvixMSSCC* m_bridge = nullptr;
+    std::unique_ptr<OrvixMSSCC> m_bridge;
 };

@@ -1,20 +1,27 @@
 #include "EntryFactory.h"
 
-#include "AssignText.h"
+#include "HostHeap.h"
+#include "RecordState.h"
+
+namespace
+{
+
+void StoreFile(OrvixFileEntry& entry, const wchar_t* file)
+{
+    entry.SetFile(file);
+    if (!IsStored(file, entry.GetFile()))
+    {
+        throw std::bad_alloc();
+    }
+}
+
+} // namespace
 
 std::unique_ptr<OrvixFileEntry> MakeEntry(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
                                           long long clientPtr)
 {
-    std::unique_ptr<OrvixFileEntry> entry(new OrvixFileEntry);
-    if (!entry)
-    {
-        return nullptr;
-    }
-    entry->SetFile(file);
-    if (!IsStored(file, entry->GetFile()))
-    {
-        return nullptr;
-    }
+    auto entry = MakeOnHostHeap<OrvixFileEntry>();
+    StoreFile(*entry, file);
     entry->SetFlagsIn(flagsIn);
     entry->SetClientPtr(clientPtr);
     entry->SetParent(parent);
@@ -23,17 +30,8 @@ std::unique_ptr<OrvixFileEntry> MakeEntry(const wchar_t* file, OrvixFileEntry* p
 
 std::unique_ptr<OrvixFileEntry> CopyEntry(OrvixFileEntry& source)
 {
-    std::unique_ptr<OrvixFileEntry> copy(new OrvixFileEntry);
-    if (!copy)
-    {
-        return nullptr;
-    }
-    const wchar_t* file = source.GetFile();
-    copy->SetFile(file);
-    if (!IsStored(file, copy->GetFile()))
-    {
-        return nullptr;
-    }
+    auto copy = MakeOnHostHeap<OrvixFileEntry>();
+    StoreFile(*copy, source.GetFile());
     copy->SetFlagsIn(source.GetFlagsIn());
     copy->SetFlagsOut(source.GetFlagsOut());
     copy->SetClientPtr(source.GetClientPtr());

@@ -4,7 +4,7 @@
 
 #include <memory>
 
-/// New entries on the host's heap, for lists and attachments. Null when memory is exhausted.
+/// New entries on the host's heap, for lists and attachments. Throw std::bad_alloc when memory is exhausted.
 
 /// An entry made from a path and values. `file` is not null.
 std::unique_ptr<OrvixFileEntry> MakeEntry(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,

@@ -1,28 +1,40 @@
 #include "OrvixClientInfo.h"
 
-#include "AssignText.h"
+#include "RecordState.h"
+
+struct OrvixClientInfo::State
+{
+    std::wstring clientName;
+    std::wstring userName;
+    std::wstring providerPluginPath;
+    std::wstring configFilePath;
+};
 
 OrvixClientInfo::OrvixClientInfo() = default;
-OrvixClientInfo::~OrvixClientInfo() = default;
+
+OrvixClientInfo::~OrvixClientInfo()
+{
+    delete m_state;
+}
 
 const wchar_t* OrvixClientInfo::GetClientName()
 {
-    return m_clientName.c_str();
+    return TextOf(m_state, &State::clientName);
 }
 
 void OrvixClientInfo::SetClientName(const wchar_t* name)
 {
-    AssignText(m_clientName, name);
+    SetText(m_state, &State::clientName, name);
 }
 
 const wchar_t* OrvixClientInfo::GetUserNameW()
 {
-    return m_userName.c_str();
+    return TextOf(m_state, &State::userName);
 }
 
 void OrvixClientInfo::SetUserName(const wchar_t* name)
 {
-    AssignText(m_userName, name);
+    SetText(m_state, &State::userName, name);
 }
 
 HWND__* OrvixClientInfo::GetParentWindow()
@@ -37,22 +49,22 @@ void OrvixClientInfo::SetParentWindow(HWND__* window)
 
 const wchar_t* OrvixClientInfo::GetProviderPluginPath()
 {
-    return m_providerPluginPath.c_str();
+    return TextOf(m_state, &State::providerPluginPath);
 }
 
 void OrvixClientInfo::SetProviderPluginPath(const wchar_t* path)
 {
-    AssignText(m_providerPluginPath, path);
+    SetText(m_state, &State::providerPluginPath, path);
 }
 
 const wchar_t* OrvixClientInfo::GetConfigFilePath()
 {
-    return m_configFilePath.c_str();
+    return TextOf(m_state, &State::configFilePath);
 }
 
 void OrvixClientInfo::SetConfigFilePath(const wchar_t* path)
 {
-    AssignText(m_configFilePath, path);
+    SetText(m_state, &State::configFilePath, path);
 }
 
 IOrvixClientAccess* OrvixClientInfo::GetIOrvixClientAccess()

@@ -1,6 +1,8 @@
 #include "OrvixExploreProviderParams.h"
 
-#include "AssignText.h"
+#include "RecordState.h"
+
+#include <deque>
 
 namespace
 {
@@ -15,17 +17,33 @@ std::uint32_t WithBit(std::uint32_t flags, std::uint32_t bit, bool set)
 
 } // namespace
 
+struct OrvixExploreProviderParams::State
+{
+    struct Filter
+    {
+        std::wstring name;
+        std::wstring extensions;
+    };
+
+    std::wstring title;
+    std::deque<Filter> filters; // which never moves a text
+};
+
 OrvixExploreProviderParams::OrvixExploreProviderParams() = default;
-OrvixExploreProviderParams::~OrvixExploreProviderParams() = default;
+
+OrvixExploreProviderParams::~OrvixExploreProviderParams()
+{
+    delete m_state;
+}
 
 const wchar_t* OrvixExploreProviderParams::GetTitle()
 {
-    return m_title.c_str();
+    return TextOf(m_state, &State::title);
 }
 
 void OrvixExploreProviderParams::SetTitle(const wchar_t* title)
 {
-    AssignText(m_title, title);
+    SetText(m_state, &State::title, title);
 }
 
 bool OrvixExploreProviderParams::GetMultipleSelections()
@@ -54,32 +72,21 @@ std::uint32_t OrvixExploreProviderParams::AddFilter(const wchar_t* name, const w
     {
         return 0;
     }
-    const std::size_t count = m_filterNames.size();
-    const bool added = WithBarrier(false, [&] {
-        std::wstring copy(extensions); // may be a name of this record, which moves
-        m_filterNames.emplace_back(name);
-        m_filterExtensions.push_back(std::move(copy));
-        return true;
-    });
-    if (!added)
-    {
-        m_filterNames.resize(count); // shrinking does not allocate
-        return 0;
-    }
-    return NumFilters();
+    const bool added = Completes([&] { StateOf(m_state).filters.push_back({name, extensions}); });
+    return added ? NumFilters() : 0;
 }
 
 std::uint32_t OrvixExploreProviderParams::NumFilters()
 {
-    return static_cast<std::uint32_t>(m_filterNames.size());
+    return m_state != nullptr ? static_cast<std::uint32_t>(m_state->filters.size()) : 0;
 }
 
 const wchar_t* OrvixExploreProviderParams::GetFilterName(std::uint32_t index)
 {
-    return index < m_filterNames.size() ? m_filterNames[index].c_str() : nullptr;
+    return m_state != nullptr && index < m_state->filters.size() ? m_state->filters[index].name.c_str() : nullptr;
 }
 
 const wchar_t* OrvixExploreProviderParams::GetFilterExtensions(std::uint32_t index)
 {
-    return index < m_filterExtensions.size() ? m_filterExtensions[index].c_str() : nullptr;
+    return m_state != nullptr && index < m_state->filters.size() ? m_state->filters[index].extensions.c_str() : nullptr;
 }

@@ -1,35 +1,32 @@
 #include "OrvixFileEntry.h"
 
-#include "AssignText.h"
 #include "EntryFactory.h"
+#include "EntryLinks.h"
+#include "ExceptionBarrier.h"
 
-#include <memory>
+#include <cwchar>
+#include <utility>
 
 namespace
 {
 
-/// //server/share becomes \\server/share. A path of just the two slashes stays: the bound is intended.
-void ReplaceLeadingDoubleSlash(std::wstring& file)
+/// //server/share becomes \\server/share. A path of just the two slashes stays as it is, as the interface promises.
+void ReplaceLeadingDoubleSlash(wchar_t* file)
 {
-    if (file.size() > 2 && file[0] == L'/' && file[1] == L'/')
+    if (file[0] == L'/' && file[1] == L'/' && file[2] != L'\0')
     {
         file[0] = file[1] = L'\\';
     }
 }
 
-/// Appends what `make` gives; false with nothing changed when that is null or memory is exhausted.
+/// Appends the new entry that `make` gives; false with nothing changed when memory is exhausted.
 template <typename Make>
-bool AppendNew(std::vector<OrvixFileEntry*>& entries, Make&& make)
+bool AppendNew(EntryLinks links, const Make& make)
 {
-    return WithBarrier(false, [&] {
-        std::unique_ptr<OrvixFileEntry> entry = make();
-        if (!entry)
-        {
-            return false;
-        }
-        entries.push_back(entry.get());
+    return Completes([&] {
+        auto entry = make();
+        links.Append(entry.get());
         entry.release();
-        return true;
     });
 }
 
@@ -40,17 +37,29 @@ OrvixFileEntry::OrvixFileEntry() = default;
 OrvixFileEntry::~OrvixFileEntry()
 {
     OrvixFileEntry::RemoveAllAttachments();
+    delete[] m_attachments;
+    delete[] m_children;
+    delete[] m_file;
 }
 
 const wchar_t* OrvixFileEntry::GetFile()
 {
-    return m_file.c_str();
+    return m_file != nullptr ? m_file : L"";
 }
 
 void OrvixFileEntry::SetFile(const wchar_t* file)
 {
-    AssignText(m_file, file);
-    ReplaceLeadingDoubleSlash(m_file);
+    if (file == nullptr)
+    {
+        return;
+    }
+    const std::size_t size = std::wcslen(file) + 1;
+    Completes([&] {
+        auto* copy = new wchar_t[size];
+        std::wmemcpy(copy, file, size);
+        ReplaceLeadingDoubleSlash(copy);
+        delete[] std::exchange(m_file, copy);
+    });
 }
 
 unsigned long OrvixFileEntry::GetFlagsIn()
@@ -89,36 +98,33 @@ unsigned int OrvixFileEntry::AddChild(OrvixFileEntry* child)
     {
         return 0;
     }
-    const bool added = WithBarrier(false, [&] {
-        m_children.push_back(child);
-        return true;
-    });
+    const bool added = Completes([&] { EntryLinks(m_children, m_numChildren, m_childCapacity).Append(child); });
     return added ? NumChildren() : 0;
 }
 
 unsigned int OrvixFileEntry::NumChildren()
 {
-    return static_cast<unsigned int>(m_children.size());
+    return m_numChildren;
 }
 
 OrvixFileEntry* OrvixFileEntry::GetChild(unsigned int index)
 {
-    return index < m_children.size() ? m_children[index] : nullptr;
+    return index < m_numChildren ? m_children[index] : nullptr;
 }
 
 bool OrvixFileEntry::RemoveChild(unsigned int index)
 {
-    if (index >= m_children.size())
+    if (index >= m_numChildren)
     {
         return false;
     }
-    m_children.erase(m_children.begin() + index);
+    EntryLinks(m_children, m_numChildren, m_childCapacity).Remove(index);
     return true;
 }
 
 bool OrvixFileEntry::RemoveAllChildren()
 {
-    m_children.clear();
+    m_numChildren = 0;
     return true;
 }
 
@@ -128,7 +134,8 @@ unsigned int OrvixFileEntry::AddAttachment(OrvixFileEntry* source)
     {
         return 0;
     }
-    return AppendNew(m_attachments, [&] { return CopyEntry(*source); }) ? NumAttachments() : 0;
+    const EntryLinks links(m_attachments, m_numAttachments, m_attachmentCapacity);
+    return AppendNew(links, [&] { return CopyEntry(*source); }) ? NumAttachments() : 0;
 }
 
 unsigned int OrvixFileEntry::AddAttachment(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
@@ -138,37 +145,38 @@ unsigned int OrvixFileEntry::AddAttachment(const wchar_t* file, OrvixFileEntry* 
     {
         return 0;
     }
-    return AppendNew(m_attachments, [&] { return MakeEntry(file, parent, flagsIn, clientPtr); }) ? NumAttachments() : 0;
+    const EntryLinks links(m_attachments, m_numAttachments, m_attachmentCapacity);
+    return AppendNew(links, [&] { return MakeEntry(file, parent, flagsIn, clientPtr); }) ? NumAttachments() : 0;
 }
 
 unsigned int OrvixFileEntry::NumAttachments()
 {
-    return static_cast<unsigned int>(m_attachments.size());
+    return m_numAttachments;
 }
 
 OrvixFileEntry* OrvixFileEntry::GetAttachment(unsigned int index)
 {
-    return index < m_attachments.size() ? m_attachments[index] : nullptr;
+    return index < m_numAttachments ? m_attachments[index] : nullptr;
 }
 
 bool OrvixFileEntry::RemoveAttachment(unsigned int index)
 {
-    if (index >= m_attachments.size())
+    if (index >= m_numAttachments)
     {
         return false;
     }
     delete m_attachments[index];
-    m_attachments.erase(m_attachments.begin() + index);
+    EntryLinks(m_attachments, m_numAttachments, m_attachmentCapacity).Remove(index);
     return true;
 }
 
 bool OrvixFileEntry::RemoveAllAttachments()
 {
-    for (OrvixFileEntry* attachment : m_attachments)
+    for (unsigned int i = 0; i < m_numAttachments; ++i)
     {
-        delete attachment;
+        delete m_attachments[i];
     }
-    m_attachments.clear();
+    m_numAttachments = 0;
     return true;
 }
 

@@ -1,9 +1,13 @@
 #include "OrvixFileList.h"
 
+#include "ActiveSequence.h"
 #include "EntryFactory.h"
 #include "ExceptionBarrier.h"
+#include "RecordState.h"
 
 #include <algorithm>
+#include <utility>
+#include <vector>
 
 namespace
 {
@@ -17,7 +21,7 @@ struct TreeStep
 
 /// Appends to the active list, children before their parents, what the mask selects in the tree below `root`.
 /// The way down is kept on the heap: a tree may be deeper than the stack.
-void AppendTree(OrvixFileEntry* root, unsigned long mask, std::vector<TreeStep>& way, OrvixActiveSequence& active)
+void AppendTree(OrvixFileEntry* root, unsigned long mask, std::vector<TreeStep>& way, ActiveSequence& active)
 {
     way.push_back({root, 0});
     while (!way.empty())
@@ -67,15 +71,11 @@ void DetachFromTree(OrvixFileEntry* root, OrvixFileEntry* target, std::vector<Tr
     }
 }
 
-/// Puts the entry into the list's sequences and under its parent; null with nothing changed when `entry` is
-/// null or memory is exhausted.
+/// Puts the entry into the list's sequences and under its parent; null with nothing changed when the parent cannot take
+/// it. Throws std::bad_alloc with nothing changed.
 OrvixFileEntry* Append(std::vector<OrvixFileEntry*>& entries, std::vector<OrvixFileEntry*>& roots,
                        std::unique_ptr<OrvixFileEntry> entry)
 {
-    if (!entry)
-    {
-        return nullptr;
-    }
     entries.push_back(entry.get());
     const bool linked = WithBarrier(false, [&] {
         if (OrvixFileEntry* parent = entry->GetParent())
@@ -95,21 +95,25 @@ OrvixFileEntry* Append(std::vector<OrvixFileEntry*>& entries, std::vector<OrvixF
 
 } // namespace
 
+struct OrvixFileList::State
+{
+    std::vector<OrvixFileEntry*> entries;
+    std::vector<OrvixFileEntry*> roots;
+    ActiveSequence active;
+};
+
 OrvixFileList::OrvixFileList() = default;
 
 OrvixFileList::~OrvixFileList()
 {
     OrvixFileList::RemoveAll();
+    delete m_state;
 }
 
 OrvixFileEntry* OrvixFileList::CreateEntry(OrvixFileEntry& source)
 {
     return WithBarrier(static_cast<OrvixFileEntry*>(nullptr), [&]() -> OrvixFileEntry* {
         auto copy = CopyEntry(source);
-        if (!copy)
-        {
-            return nullptr;
-        }
         for (unsigned int i = 0; i < source.NumChildren(); ++i)
         {
             OrvixFileEntry* child = source.GetChild(i);
@@ -126,7 +130,7 @@ OrvixFileEntry* OrvixFileList::CreateEntry(OrvixFileEntry& source)
                 return nullptr;
             }
         }
-        return Append(m_entries, m_roots, std::move(copy));
+        return Append(StateOf(m_state).entries, StateOf(m_state).roots, std::move(copy));
     });
 }
 
@@ -137,29 +141,30 @@ OrvixFileEntry* OrvixFileList::CreateEntry(const wchar_t* file, OrvixFileEntry* 
     {
         return nullptr;
     }
-    return WithBarrier(static_cast<OrvixFileEntry*>(nullptr),
-                       [&] { return Append(m_entries, m_roots, MakeEntry(file, parent, flagsIn, clientPtr)); });
+    return WithBarrier(static_cast<OrvixFileEntry*>(nullptr), [&] {
+        return Append(StateOf(m_state).entries, StateOf(m_state).roots, MakeEntry(file, parent, flagsIn, clientPtr));
+    });
 }
 
 bool OrvixFileList::RemoveEntry(unsigned int index)
 {
-    if (index >= m_entries.size())
+    if (m_state == nullptr || index >= m_state->entries.size())
     {
         return false;
     }
-    OrvixFileEntry* entry = m_entries[index];
-    const bool detached = WithBarrier(false, [&] {
-        const auto root = std::find(m_roots.begin(), m_roots.end(), entry);
-        if (root != m_roots.end())
+    OrvixFileEntry* entry = m_state->entries[index];
+    const bool detached = Completes([&] {
+        auto& roots = m_state->roots;
+        const auto root = std::find(roots.begin(), roots.end(), entry);
+        if (root != roots.end())
         {
-            m_roots.erase(root);
+            roots.erase(root);
         }
         std::vector<TreeStep> way;
-        for (OrvixFileEntry* remaining : m_roots)
+        for (OrvixFileEntry* remaining : roots)
         {
             DetachFromTree(remaining, entry, way);
         }
-        return true;
     });
     if (!detached)
     {
@@ -167,43 +172,55 @@ bool OrvixFileList::RemoveEntry(unsigned int index)
     }
     RemoveActiveEntry(entry);
     delete entry;
-    m_entries.erase(m_entries.begin() + index);
+    m_state->entries.erase(m_state->entries.begin() + index);
     return true;
 }
 
 bool OrvixFileList::RemoveEntry(OrvixFileEntry* entry)
 {
-    const auto found = std::find(m_entries.begin(), m_entries.end(), entry);
-    return RemoveEntry(found == m_entries.end() ? NumEntries() : static_cast<unsigned int>(found - m_entries.begin()));
+    if (m_state != nullptr)
+    {
+        const auto& entries = m_state->entries;
+        const auto found = std::find(entries.begin(), entries.end(), entry);
+        if (found != entries.end())
+        {
+            return RemoveEntry(static_cast<unsigned int>(found - entries.begin()));
+        }
+    }
+    return RemoveEntry(NumEntries());
 }
 
 unsigned int OrvixFileList::NumEntries()
 {
-    return static_cast<unsigned int>(m_entries.size());
+    return m_state != nullptr ? static_cast<unsigned int>(m_state->entries.size()) : 0;
 }
 
 bool OrvixFileList::RemoveAll()
 {
-    for (OrvixFileEntry* entry : m_entries)
+    if (m_state != nullptr)
     {
-        delete entry;
+        for (OrvixFileEntry* entry : m_state->entries)
+        {
+            delete entry;
+        }
+        m_state->entries.clear();
+        m_state->roots.clear();
+        m_state->active.Clear();
     }
-    m_entries.clear();
-    m_roots.clear();
-    m_active.Clear();
     return true;
 }
 
 OrvixFileEntry* OrvixFileList::GetFileEntry(unsigned int index)
 {
-    return index < m_entries.size() ? m_entries[index] : nullptr;
+    return m_state != nullptr && index < m_state->entries.size() ? m_state->entries[index] : nullptr;
 }
 
 unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
 {
-    m_active.Clear();
-    const bool built = WithBarrier(false, [&] {
-        m_active.Reserve(std::max(NumEntries(), 1U));
+    const bool built = Completes([&] {
+        ActiveSequence& active = StateOf(m_state).active;
+        active.Clear();
+        active.Reserve(std::max(NumEntries(), 1U));
         if (fromRoots)
         {
             std::vector<TreeStep> way;
@@ -211,24 +228,23 @@ unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
             {
                 if (OrvixFileEntry* root = GetRootEntry(i))
                 {
-                    AppendTree(root, mask, way, m_active);
+                    AppendTree(root, mask, way, active);
                 }
             }
-            return true;
+            return;
         }
         for (unsigned int i = 0; i < NumEntries(); ++i)
         {
             OrvixFileEntry* entry = GetFileEntry(i);
-            if (entry != nullptr && (entry->GetFlagsIn() & mask))
+            if (entry != nullptr && (entry->GetFlagsIn() & mask) != 0)
             {
-                m_active.AppendDistinct(entry);
+                active.AppendDistinct(entry);
             }
         }
-        return true;
     });
-    if (!built)
+    if (!built && m_state != nullptr)
     {
-        m_active.Clear();
+        m_state->active.Clear();
     }
     return NumActiveEntries();
 }
@@ -237,35 +253,32 @@ unsigned int OrvixFileList::AddActiveEntry(OrvixFileEntry* entry)
 {
     if (entry != nullptr)
     {
-        WithBarrier(false, [&] {
-            m_active.Append(entry);
-            return true;
-        });
+        Completes([&] { StateOf(m_state).active.Append(entry); });
     }
     return NumActiveEntries();
 }
 
 bool OrvixFileList::RemoveActiveEntry(OrvixFileEntry* entry)
 {
-    return m_active.Remove(entry);
+    return m_state != nullptr && m_state->active.Remove(entry);
 }
 
 unsigned int OrvixFileList::NumActiveEntries()
 {
-    return static_cast<unsigned int>(m_active.Size());
+    return m_state != nullptr ? static_cast<unsigned int>(m_state->active.Size()) : 0;
 }
 
 OrvixFileEntry* OrvixFileList::GetActiveFileEntry(unsigned int index)
 {
-    return index < m_active.Size() ? m_active.At(index) : nullptr;
+    return m_state != nullptr && index < m_state->active.Size() ? m_state->active.At(index) : nullptr;
 }
 
 unsigned int OrvixFileList::NumRootEntries()
 {
-    return static_cast<unsigned int>(m_roots.size());
+    return m_state != nullptr ? static_cast<unsigned int>(m_state->roots.size()) : 0;
 }
 
 OrvixFileEntry* OrvixFileList::GetRootEntry(unsigned int index)
 {
-    return index < m_roots.size() ? m_roots[index] : nullptr;
+    return m_state != nullptr && index < m_state->roots.size() ? m_state->roots[index] : nullptr;
 }

@@ -1,9 +1,20 @@
 #include "OrvixFileListDialogParams.h"
 
-#include "AssignText.h"
+#include "RecordState.h"
+
+struct OrvixFileListDialogParams::State
+{
+    std::wstring title;
+    std::wstring message;
+    std::wstring comment;
+};
 
 OrvixFileListDialogParams::OrvixFileListDialogParams() = default;
-OrvixFileListDialogParams::~OrvixFileListDialogParams() = default;
+
+OrvixFileListDialogParams::~OrvixFileListDialogParams()
+{
+    delete m_state;
+}
 
 void OrvixFileListDialogParams::SetOptions(std::uint32_t options)
 {
@@ -17,22 +28,22 @@ std::uint32_t OrvixFileListDialogParams::GetOptions()
 
 const wchar_t* OrvixFileListDialogParams::GetTitle()
 {
-    return m_title.c_str();
+    return TextOf(m_state, &State::title);
 }
 
 void OrvixFileListDialogParams::SetTitle(const wchar_t* title)
 {
-    AssignText(m_title, title);
+    SetText(m_state, &State::title, title);
 }
 
 const wchar_t* OrvixFileListDialogParams::GetMessageW()
 {
-    return m_message.c_str();
+    return TextOf(m_state, &State::message);
 }
 
 void OrvixFileListDialogParams::SetMessage(const wchar_t* message)
 {
-    AssignText(m_message, message);
+    SetText(m_state, &State::message, message);
 }
 
 OrvixFileList* OrvixFileListDialogParams::GetOrvixFileList()
@@ -47,12 +58,12 @@ void OrvixFileListDialogParams::SetOrvixFileList(OrvixFileList* list)
 
 const wchar_t* OrvixFileListDialogParams::GetComment()
 {
-    return m_comment.c_str();
+    return TextOf(m_state, &State::comment);
 }
 
 void OrvixFileListDialogParams::SetComment(const wchar_t* comment)
 {
-    AssignText(m_comment, comment);
+    SetText(m_state, &State::comment, comment);
 }
 
 std::int32_t OrvixFileListDialogParams::GetDialogPromptID()

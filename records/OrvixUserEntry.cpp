@@ -1,46 +1,58 @@
 #include "OrvixUserEntry.h"
 
-#include "AssignText.h"
+#include "RecordState.h"
+
+struct OrvixUserEntry::State
+{
+    std::wstring userName;
+    std::wstring firstName;
+    std::wstring lastName;
+    std::wstring email;
+};
 
 OrvixUserEntry::OrvixUserEntry() = default;
-OrvixUserEntry::~OrvixUserEntry() = default;
+
+OrvixUserEntry::~OrvixUserEntry()
+{
+    delete m_state;
+}
 
 const wchar_t* OrvixUserEntry::GetUserNameW()
 {
-    return m_userName.c_str();
+    return TextOf(m_state, &State::userName);
 }
 
 void OrvixUserEntry::SetUserName(const wchar_t* name)
 {
-    AssignText(m_userName, name);
+    SetText(m_state, &State::userName, name);
 }
 
 const wchar_t* OrvixUserEntry::GetFirstName()
 {
-    return m_firstName.c_str();
+    return TextOf(m_state, &State::firstName);
 }
 
 void OrvixUserEntry::SetFirstName(const wchar_t* name)
 {
-    AssignText(m_firstName, name);
+    SetText(m_state, &State::firstName, name);
 }
 
 const wchar_t* OrvixUserEntry::GetLastName()
 {
-    return m_lastName.c_str();
+    return TextOf(m_state, &State::lastName);
 }
 
 void OrvixUserEntry::SetLastName(const wchar_t* name)
 {
-    AssignText(m_lastName, name);
+    SetText(m_state, &State::lastName, name);
 }
 
 const wchar_t* OrvixUserEntry::GetEmail()
 {
-    return m_email.c_str();
+    return TextOf(m_state, &State::email);
 }
 
 void OrvixUserEntry::SetEmail(const wchar_t* email)
 {
-    AssignText(m_email, email);
+    SetText(m_state, &State::email, email);
 }

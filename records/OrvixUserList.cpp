@@ -1,57 +1,59 @@
 #include "OrvixUserList.h"
 
-#include "AssignText.h"
 #include "ExceptionBarrier.h"
+#include "HostHeap.h"
 #include "OrvixUserEntry.h"
+#include "RecordState.h"
 
 #include <algorithm>
-#include <memory>
+#include <vector>
 
 namespace
 {
 
-/// Appends the entry; null with the list unchanged when `entry` is null or memory is exhausted.
+/// Stores a text. Throws std::bad_alloc when memory is exhausted.
+void Store(OrvixUserEntry& entry, void (OrvixUserEntry::*set)(const wchar_t*), const wchar_t* (OrvixUserEntry::*get)(),
+           const wchar_t* text)
+{
+    (entry.*set)(text);
+    if (!IsStored(text, (entry.*get)()))
+    {
+        throw std::bad_alloc();
+    }
+}
+
+/// Appends the entry. Throws std::bad_alloc with the list unchanged.
 OrvixUserEntry* Append(std::vector<OrvixUserEntry*>& entries, std::unique_ptr<OrvixUserEntry> entry)
 {
-    return WithBarrier(static_cast<OrvixUserEntry*>(nullptr), [&] {
-        if (entry)
-        {
-            entries.push_back(entry.get());
-        }
-        return entry.release();
-    });
+    entries.push_back(entry.get());
+    return entry.release();
 }
 
 } // namespace
+
+struct OrvixUserList::State
+{
+    std::vector<OrvixUserEntry*> entries;
+};
 
 OrvixUserList::OrvixUserList() = default;
 
 OrvixUserList::~OrvixUserList()
 {
     OrvixUserList::RemoveAll();
+    delete m_state;
 }
 
 OrvixUserEntry* OrvixUserList::CreateEntry(OrvixUserEntry& source)
 {
-    std::unique_ptr<OrvixUserEntry> entry(new OrvixUserEntry);
-    if (!entry)
-    {
-        return nullptr;
-    }
-    const wchar_t* userName = source.GetUserNameW();
-    entry->SetUserName(userName);
-    const wchar_t* firstName = source.GetFirstName();
-    entry->SetFirstName(firstName);
-    const wchar_t* lastName = source.GetLastName();
-    entry->SetLastName(lastName);
-    const wchar_t* email = source.GetEmail();
-    entry->SetEmail(email);
-    if (!IsStored(userName, entry->GetUserNameW()) || !IsStored(firstName, entry->GetFirstName()) ||
-        !IsStored(lastName, entry->GetLastName()) || !IsStored(email, entry->GetEmail()))
-    {
-        return nullptr;
-    }
-    return Append(m_entries, std::move(entry));
+    return WithBarrier(static_cast<OrvixUserEntry*>(nullptr), [&] {
+        auto entry = MakeOnHostHeap<OrvixUserEntry>();
+        Store(*entry, &OrvixUserEntry::SetUserName, &OrvixUserEntry::GetUserNameW, source.GetUserNameW());
+        Store(*entry, &OrvixUserEntry::SetFirstName, &OrvixUserEntry::GetFirstName, source.GetFirstName());
+        Store(*entry, &OrvixUserEntry::SetLastName, &OrvixUserEntry::GetLastName, source.GetLastName());
+        Store(*entry, &OrvixUserEntry::SetEmail, &OrvixUserEntry::GetEmail, source.GetEmail());
+        return Append(StateOf(m_state).entries, std::move(entry));
+    });
 }
 
 OrvixUserEntry* OrvixUserList::CreateEntry(const wchar_t* userName)
@@ -60,56 +62,55 @@ OrvixUserEntry* OrvixUserList::CreateEntry(const wchar_t* userName)
     {
         return nullptr;
     }
-    std::unique_ptr<OrvixUserEntry> entry(new OrvixUserEntry);
-    if (!entry)
-    {
-        return nullptr;
-    }
-    entry->SetUserName(userName);
-    if (!IsStored(userName, entry->GetUserNameW()))
-    {
-        return nullptr;
-    }
-    return Append(m_entries, std::move(entry));
+    return WithBarrier(static_cast<OrvixUserEntry*>(nullptr), [&] {
+        auto entry = MakeOnHostHeap<OrvixUserEntry>();
+        Store(*entry, &OrvixUserEntry::SetUserName, &OrvixUserEntry::GetUserNameW, userName);
+        return Append(StateOf(m_state).entries, std::move(entry));
+    });
 }
 
 bool OrvixUserList::RemoveEntry(unsigned int index)
 {
-    if (index >= m_entries.size())
+    if (m_state == nullptr || index >= m_state->entries.size())
     {
         return false;
     }
-    delete m_entries[index];
-    m_entries.erase(m_entries.begin() + index);
+    auto& entries = m_state->entries;
+    delete entries[index];
+    entries.erase(entries.begin() + index);
     return true;
 }
 
 bool OrvixUserList::RemoveEntry(OrvixUserEntry* entry)
 {
-    const auto found = std::find(m_entries.begin(), m_entries.end(), entry);
-    if (found == m_entries.end())
+    if (m_state == nullptr)
     {
         return false;
     }
-    return RemoveEntry(static_cast<unsigned int>(found - m_entries.begin()));
+    const auto& entries = m_state->entries;
+    const auto found = std::find(entries.begin(), entries.end(), entry);
+    return found != entries.end() && RemoveEntry(static_cast<unsigned int>(found - entries.begin()));
 }
 
 unsigned int OrvixUserList::NumEntries()
 {
-    return static_cast<unsigned int>(m_entries.size());
+    return m_state != nullptr ? static_cast<unsigned int>(m_state->entries.size()) : 0;
 }
 
 bool OrvixUserList::RemoveAll()
 {
-    for (OrvixUserEntry* entry : m_entries)
+    if (m_state != nullptr)
     {
-        delete entry;
+        for (OrvixUserEntry* entry : m_state->entries)
+        {
+            delete entry;
+        }
+        m_state->entries.clear();
     }
-    m_entries.clear();
     return true;
 }
 
 OrvixUserEntry* OrvixUserList::GetUserEntry(unsigned int index)
 {
-    return index < m_entries.size() ? m_entries[index] : nullptr;
+    return m_state != nullptr && index < m_state->entries.size() ? m_state->entries[index] : nullptr;
 }

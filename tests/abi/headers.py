@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
 """Compiles the public headers with every warning an error: each alone, and all in several orders, without and
-behind <windows.h>, without and with UNICODE. Accessors keep their names in every case."""
+behind <windows.h>, without and with UNICODE. Accessors keep their names and classes their sizes in every case."""
 
 import random
 import sys
@@ -15,6 +15,19 @@ using ClientName = decltype(IsGetter<OrvixClientInfo, const wchar_t*>(&OrvixClie
 using UserName = decltype(IsGetter<OrvixUserEntry, const wchar_t*>(&OrvixUserEntry::GetUserNameW));
 using Message = decltype(IsGetter<OrvixFileListDialogParams, const wchar_t*>(&OrvixFileListDialogParams::GetMessageW));
 """
+# The size of every exported class on 64-bit Windows, whatever the compiler and its configuration.
+SIZES = {
+    "OrvixClientInfo": 32,
+    "OrvixExploreProviderParams": 24,
+    "OrvixFileEntry": 72,
+    "OrvixFileList": 16,
+    "OrvixFileListDialogParams": 40,
+    "OrvixNotifyParams": 32,
+    "OrvixPromptTable": 16,
+    "OrvixUserEntry": 16,
+    "OrvixUserList": 16,
+}
+PINS = "".join(f'static_assert(sizeof({name}) == {size}, "{name}");\n' for name, size in SIZES.items())
 PRELUDES = {
     "alone": "",
     "with UNICODE": "#define UNICODE\n#define _UNICODE\n",
@@ -44,7 +57,7 @@ def main():
         for order, headers in orders():
             for prelude, text in PRELUDES.items():
                 jobs.append((f"{compiler}: all headers {order}, {prelude}", command,
-                             text + compilers.include_all(headers) + NAMES))
+                             text + compilers.include_all(headers) + NAMES + PINS))
 
     results = compilers.compile_all([(command, source) for _, command, source in jobs])
     errors = [f"{name}\n{result.stderr}" for (name, _, _), result in zip(jobs, results) if result.returncode != 0]

@@ -63,11 +63,11 @@ protected:
     }
     void TearDown() override { m_scc = {}; }
 
-    static OrvixMSSCC* NewBridge(const std::wstring& library)
+    static std::unique_ptr<OrvixMSSCC> NewBridge(const std::wstring& library)
     {
         auto bridge = std::make_unique<OrvixMSSCC>();
         bridge->SetProvider((ORVIX_RECORDING_MSSCCI L"\\" + library + L".dll").c_str(), L"", L"Recorded", false);
-        return bridge.release();
+        return bridge;
     }
 
     /// The host of most tests; it lives as long as the program, since wrappers keep it between tests.

@@ -1,5 +1,6 @@
 #include "CommandLine.h"
 
+#include "OrvixProviderSource.h"
 #include "OrvixVersion.h"
 #include "ToolError.h"
 
@@ -144,10 +145,10 @@ constexpr struct
     const char* text;
     std::uint32_t bits;
 } SourceLists[] = {
-    {"plugins", Source::Plugins},
-    {"msscci", Source::InstalledMSSCCI},
-    {"plugins,msscci", Source::Plugins | Source::InstalledMSSCCI},
-    {"msscci,plugins", Source::Plugins | Source::InstalledMSSCCI},
+    {"plugins", OrvixProviderSource::Plugins},
+    {"msscci", OrvixProviderSource::InstalledMSSCCI},
+    {"plugins,msscci", OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI},
+    {"msscci,plugins", OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI},
 };
 
 std::uint32_t Sources(const std::string& text)
@@ -286,7 +287,8 @@ std::optional<CommandLine> CommandLine::Parse(int count, wchar_t** arguments)
     result.paths = Unmarked(paths);
     result.name = Unmarked(name);
     const bool looksEverywhere = result.command == L"doctor" && app.count("--sources") == 0;
-    result.sources = looksEverywhere ? Source::Plugins | Source::InstalledMSSCCI : Sources(sources);
+    result.sources =
+        looksEverywhere ? OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI : Sources(sources);
     result.plugins = Unmarked(plugins);
     result.config = Unmarked(config);
     result.provider = Unmarked(provider);

@@ -5,15 +5,6 @@
 #include <string>
 #include <vector>
 
-/// Where providers come from: the bits of `IOrvixServices::Initialize`.
-namespace Source
-{
-
-constexpr std::uint32_t Plugins = 0x1;
-constexpr std::uint32_t InstalledMSSCCI = 0x2;
-
-} // namespace Source
-
 /// What the user asked for; folders and files as typed. An option that was not given is empty.
 struct CommandLine
 {
@@ -23,7 +14,7 @@ struct CommandLine
     std::wstring answer; ///< to the prompt
     std::vector<std::wstring> paths;
     std::wstring name;         ///< of a registration
-    std::uint32_t sources = 0; ///< bits of `Source`
+    std::uint32_t sources = 0; ///< bits of `OrvixProviderSource`
     std::wstring plugins;
     std::wstring config;
     std::wstring provider;

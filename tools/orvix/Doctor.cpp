@@ -1,5 +1,6 @@
 #include "Doctor.h"
 
+#include "ActivationContext.h"
 #include "DllDirectoryScope.h"
 #include "FilePath.h"
 #include "HostSession.h"
@@ -8,6 +9,7 @@
 #include "OrvixClientInfo.h"
 #include "OrvixPromptTable.h"
 #include "OrvixProviderConfig.h"
+#include "OrvixProviderSource.h"
 #include "OrvixVersion.h"
 #include "PluginCandidate.h"
 #include "PluginSearch.h"
@@ -73,7 +75,8 @@ void CheckHeaders(DoctorReport::Place& place, const std::wstring& path)
     }
 }
 
-void ExplainLoadError(DoctorReport::Place& place, const std::wstring& path, const ManifestContext& context, DWORD error)
+void ExplainLoadError(DoctorReport::Place& place, const std::wstring& path, const UniqueActivationContext& context,
+                      DWORD error)
 {
     place.AddProblem("does-not-load", L"it does not load: " + SystemMessage(error, path));
     for (const LibraryImage::Missing& missing : LibraryImage::FindMissing(path, context))
@@ -232,16 +235,16 @@ DoctorReport Doctor::Examine()
     const std::wstring folder = HostSession::ConfigFolder(m_commandLine) + L'\\';
     ReadSettings(folder);
     ReadPrompts(folder);
-    if ((m_commandLine.sources & Source::Plugins) != 0)
+    if ((m_commandLine.sources & OrvixProviderSource::Plugins) != 0)
     {
         ExaminePlugins();
     }
-    if ((m_commandLine.sources & Source::InstalledMSSCCI) != 0)
+    if ((m_commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
     {
         ExamineInstalled();
         Examine32BitView();
     }
-    if (m_commandLine.sources == (Source::Plugins | Source::InstalledMSSCCI))
+    if (m_commandLine.sources == (OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI))
     {
         FindUnusedSettings();
     }
@@ -290,14 +293,14 @@ void Doctor::ExaminePlugins()
     {
         place.AddProblem("no-folder", L"there is no such folder");
     }
-    const ManifestContext context;
+    const UniqueActivationContext context = MakeManifestContext(LibraryModule());
     for (; search.GetState() == PluginSearch::State::Found; search.Next())
     {
         ExaminePlugin(search.Path(), context);
     }
 }
 
-void Doctor::ExaminePlugin(const std::wstring& path, const ManifestContext& context)
+void Doctor::ExaminePlugin(const std::wstring& path, const UniqueActivationContext& context)
 {
     using Verdict = PluginCandidate::Verdict;
 
@@ -368,12 +371,12 @@ void Doctor::ExamineInstalled()
     for (DWORD index = 0; list; ++index)
     {
         std::wstring keyPath;
-        const Step step = InstalledProviders::KeyPathAt(list.get(), index, keyPath);
+        const Step step = InstalledProviders::KeyPathAt(list.Get(), index, keyPath);
         if (step == Step::End)
         {
             return;
         }
-        ExamineRegistration(list.get(), index, step, keyPath);
+        ExamineRegistration(list.Get(), index, step, keyPath);
     }
 }
 
@@ -433,10 +436,10 @@ void Doctor::ExamineKey(DoctorReport::Candidate& candidate, const std::wstring& 
                                            SystemMessage(error, keyPath));
         break;
     case Verdict::NoName:
-        ExplainText(candidate, key.get(), InstalledProviders::ServerName, "no-server-name");
+        ExplainText(candidate, key.Get(), InstalledProviders::ServerName, "no-server-name");
         break;
     case Verdict::NoPath:
-        ExplainText(candidate, key.get(), InstalledProviders::ServerPath, "no-server-path");
+        ExplainText(candidate, key.Get(), InstalledProviders::ServerPath, "no-server-path");
         break;
     case Verdict::EndsProcess:
         // The name is read first.
@@ -479,7 +482,7 @@ void Doctor::ExamineLibrary(DoctorReport::Candidate& candidate, const InstalledP
         CheckHeaders(candidate, found);
     }
     Announce(judged.serverPath);
-    const ManifestContext context;
+    const UniqueActivationContext context = MakeManifestContext(LibraryModule());
     const UniqueModule module = LoadLibraryIsolated(judged.serverPath.c_str(), context);
     if (const DWORD error = GetLastError(); !module && !found.empty())
     {
@@ -494,7 +497,7 @@ void Doctor::ExamineLibrary(DoctorReport::Candidate& candidate, const InstalledP
     }
     for (const char* function : SccFunctions::Names)
     {
-        if (GetProcAddress(module.get(), function) != nullptr)
+        if (GetProcAddress(module.Get(), function) != nullptr)
         {
             continue;
         }
@@ -517,7 +520,7 @@ void Doctor::Examine32BitView()
     for (DWORD index = 0; list; ++index)
     {
         std::wstring keyPath;
-        const Step step = InstalledProviders::KeyPathAt(list.get(), index, keyPath);
+        const Step step = InstalledProviders::KeyPathAt(list.Get(), index, keyPath);
         if (step == Step::End)
         {
             return;
@@ -531,7 +534,7 @@ void Doctor::Examine32BitView()
         candidate.location = keyPath;
         const UniqueRegistryKey key = InstalledProviders::OpenProvider(keyPath, KEY_WOW64_32KEY);
         std::wstring name;
-        if (key && InstalledProviders::ReadText(key.get(), InstalledProviders::ServerName, name) == Step::Found)
+        if (key && InstalledProviders::ReadText(key.Get(), InstalledProviders::ServerName, name) == Step::Found)
         {
             candidate.name = name;
         }

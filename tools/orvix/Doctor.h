@@ -29,7 +29,7 @@ private:
     void ReadSettings(const std::wstring& folder);
     void ReadPrompts(const std::wstring& folder);
     void ExaminePlugins();
-    void ExaminePlugin(const std::wstring& path, const ManifestContext& context);
+    void ExaminePlugin(const std::wstring& path, const UniqueActivationContext& context);
     void ExamineInstalled();
     void ExamineRegistration(HKEY list, DWORD index, InstalledProviders::Step step, const std::wstring& keyPath);
     void ExamineKey(DoctorReport::Candidate& candidate, const std::wstring& keyPath);

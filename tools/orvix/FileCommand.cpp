@@ -1,9 +1,13 @@
 #include "FileCommand.h"
 
 #include "FilePath.h"
-#include "FileState.h"
+#include "FileStateText.h"
 #include "NotificationPrinter.h"
+#include "OrvixDialogOption.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixOperation.h"
+#include "OrvixPrompt.h"
 #include "TemporaryAnswer.h"
 #include "VetoRule.h"
 
@@ -25,33 +29,10 @@ constexpr struct
     {"failed", "failed", Listing::Tone::Bad},
 };
 
-// Bits of an entry's FlagsIn.
-constexpr unsigned long TakenByOperation = 0x1; // set by the library
+/// Bit of an entry's FlagsIn by which the tool selects.
 constexpr unsigned long Selected = 0x2;
 
-constexpr std::uint32_t NotifyListeners = 0x1;
-
-constexpr std::uint32_t OffersToAll = 0x2 | 0x4; // bits of a prompt's options: its answers are those two
-
-namespace DialogOption
-{
-
-constexpr std::uint32_t Shown = 0x1; // set by the library
-constexpr std::uint32_t OffersKeep = 0x4;
-constexpr std::uint32_t Keep = 0x10;
-constexpr std::uint32_t OffersRemember = 0x40;
-
-} // namespace DialogOption
-
-namespace PromptAction
-{
-
-constexpr std::uint32_t Ask = 0x1;
-constexpr std::uint32_t Yes = 0x2;
-constexpr std::uint32_t Keep = 0x8;
-constexpr std::uint32_t DoNotKeep = 0x10;
-
-} // namespace PromptAction
+constexpr std::uint32_t OffersToAll = OrvixPromptOption::OfferYesToAll | OrvixPromptOption::OfferNoToAll;
 
 Listing EmptyListing(const CommandLine& commandLine)
 {
@@ -68,11 +49,11 @@ void RegisterPrompts(IOrvixServices& services, const OperationRule& rule)
 {
     const std::wstring title = rule.title;
     services.RegisterPrompt(rule.dialogPrompt, (title + L": confirm the files").c_str(),
-                            PromptAction::Ask | PromptAction::Yes, 0, false);
+                            OrvixPromptAction::Ask | OrvixPromptAction::Yes, 0, false);
     if (rule.CanKeep())
     {
         services.RegisterPrompt(rule.keepPrompt, (title + L": keep the files checked out").c_str(),
-                                PromptAction::DoNotKeep, OffersToAll, false);
+                                OrvixPromptAction::OptionCleared, OffersToAll, false);
     }
 }
 
@@ -140,7 +121,7 @@ void FileCommand::ShowStatus()
     for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
     {
         OrvixFileEntry* entry = m_list.GetFileEntry(i);
-        const bool known = (entry->GetFlagsOut() & FileState::Controlled) != 0 || PathExists(entry->GetFile());
+        const bool known = (entry->GetFlagsOut() & OrvixFileState::Controlled) != 0 || PathExists(entry->GetFile());
         Report(known ? Done : Refused, *entry);
     }
 }
@@ -151,7 +132,7 @@ void FileCommand::ShowHistory()
     for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
     {
         OrvixFileEntry* entry = m_list.GetFileEntry(i);
-        if ((entry->GetFlagsOut() & FileState::AllowsHistory) != 0)
+        if ((entry->GetFlagsOut() & OrvixFilePermission::ShowHistory) != 0)
         {
             continue;
         }
@@ -187,30 +168,30 @@ void FileCommand::Change(const OperationRule& rule)
     params.SetMessage(rule.question);
     params.SetOrvixFileList(&m_list);
     params.SetComment(m_commandLine.comment.c_str());
-    params.SetOptions(DialogOption::OffersRemember | (rule.CanKeep() ? DialogOption::OffersKeep : 0) |
-                      (m_commandLine.keep ? DialogOption::Keep : 0));
+    params.SetOptions(OrvixDialogOption::OfferRemember | (rule.CanKeep() ? OrvixDialogOption::OfferKeepCheckedOut : 0) |
+                      (m_commandLine.keep ? OrvixDialogOption::OptionChecked : 0));
     params.SetDialogPromptID(static_cast<std::int32_t>(rule.dialogPrompt));
     params.SetOptionPromptID(static_cast<std::int32_t>(rule.keepPrompt));
 
     RegisterPrompts(services, rule);
     const bool asks =
-        !m_commandLine.unattended && (services.GetPromptAction(rule.dialogPrompt) & PromptAction::Ask) != 0;
+        !m_commandLine.unattended && (services.GetPromptAction(rule.dialogPrompt) & OrvixPromptAction::Ask) != 0;
     std::optional<TemporaryAnswer> dialogAnswer;
     if (m_commandLine.unattended)
     {
-        dialogAnswer.emplace(services, rule.dialogPrompt, PromptAction::Yes);
+        dialogAnswer.emplace(services, rule.dialogPrompt, OrvixPromptAction::Yes);
     }
     std::optional<TemporaryAnswer> keepAnswer;
     if (rule.CanKeep() && !asks && (m_commandLine.unattended || m_commandLine.keep))
     {
         keepAnswer.emplace(services, rule.keepPrompt,
-                           m_commandLine.keep ? PromptAction::Keep : PromptAction::DoNotKeep);
+                           m_commandLine.keep ? OrvixPromptAction::OptionChecked : OrvixPromptAction::OptionCleared);
     }
 
     m_list.BuildActiveList(Selected, false);
     m_output.Progress(std::wstring(rule.title) + L", files: " + std::to_wstring(m_list.NumActiveEntries()));
     const bool ran = services.RunFileListOperation(m_client.GetParentWindow(), &params, true, &m_project.Provider(),
-                                                   NotifyListeners | rule.operation, rule.allowedBy) == 1;
+                                                   OrvixOperation::Notify | rule.operation, rule.allowedBy) == 1;
     if (!veto.Reason().empty())
     {
         m_output.Progress({});
@@ -218,10 +199,10 @@ void FileCommand::Change(const OperationRule& rule)
     }
 
     const std::vector<std::optional<Outcome>> outcomes = OutcomesOfRun(rule, ran);
-    const bool shown = (params.GetOptions() & DialogOption::Shown) != 0;
-    const bool kept = shown ? (params.GetOptions() & DialogOption::Keep) != 0
-                            : m_commandLine.keep ||
-                                  (rule.CanKeep() && services.GetPromptAction(rule.keepPrompt) == PromptAction::Keep);
+    const bool shown = (params.GetOptions() & OrvixDialogOption::EntriesCanBeCleared) != 0;
+    const bool kept = shown ? (params.GetOptions() & OrvixDialogOption::OptionChecked) != 0
+                            : m_commandLine.keep || (rule.CanKeep() && services.GetPromptAction(rule.keepPrompt) ==
+                                                                           OrvixPromptAction::OptionChecked);
     QueryStatus();
     for (unsigned int i = 0; i < m_list.NumEntries(); ++i)
     {
@@ -251,7 +232,7 @@ std::vector<std::optional<FileCommand::Outcome>> FileCommand::OutcomesOfRun(cons
         OrvixFileEntry* entry = m_list.GetFileEntry(i);
         const bool active = entry == m_list.GetActiveFileEntry(nextActive);
         nextActive += active ? 1 : 0;
-        if ((entry->GetFlagsIn() & TakenByOperation) != 0)
+        if ((entry->GetFlagsIn() & OrvixFileSelection::Selected) != 0)
         {
             outcomes.emplace_back(!ran ? Cancelled : active ? Done : Unticked);
         }
@@ -284,7 +265,7 @@ bool FileCommand::IsNamed(OrvixFileEntry& entry) const
 
 void FileCommand::Report(Outcome outcome, OrvixFileEntry& entry)
 {
-    Report(outcome, Wide(FileState::InWords(entry.GetFlagsOut(), PathExists(entry.GetFile()))), entry.GetFile());
+    Report(outcome, FileStateText::InWords(entry.GetFlagsOut(), PathExists(entry.GetFile())), entry.GetFile());
 }
 
 void FileCommand::Report(Outcome outcome, const std::wstring& state, const std::wstring& path)

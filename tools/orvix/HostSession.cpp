@@ -1,6 +1,7 @@
 #include "HostSession.h"
 
 #include "FilePath.h"
+#include "OrvixProviderSource.h"
 #include "ToolError.h"
 
 #include <windows.h>
@@ -41,7 +42,7 @@ std::wstring WindowsUser()
 
 HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_access(commandLine.unattended, output)
 {
-    if ((commandLine.sources & Source::Plugins) != 0)
+    if ((commandLine.sources & OrvixProviderSource::Plugins) != 0)
     {
         const std::wstring plugins = PluginFolder(commandLine);
         if (!IsFolder(plugins))
@@ -51,7 +52,7 @@ HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_acc
         m_client.SetProviderPluginPath((plugins + L'\\').c_str());
         m_searched = plugins;
     }
-    if ((commandLine.sources & Source::InstalledMSSCCI) != 0)
+    if ((commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
     {
         m_searched += m_searched.empty() ? L"" : L" or ";
         m_searched += L"the registry's list of MSSCCI libraries";

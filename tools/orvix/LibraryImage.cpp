@@ -94,7 +94,7 @@ bool IsOfWindows(const std::wstring& path)
     return PathBelow(folder, path) != path;
 }
 
-void AddMissing(const std::wstring& path, const std::wstring& shownAs, const ManifestContext& context,
+void AddMissing(const std::wstring& path, const std::wstring& shownAs, const UniqueActivationContext& context,
                 std::set<std::wstring>& seen, std::vector<LibraryImage::Missing>& missing)
 {
     const std::optional<LibraryImage> image = LibraryImage::Read(path);
@@ -114,7 +114,7 @@ void AddMissing(const std::wstring& path, const std::wstring& shownAs, const Man
         {
             missing.push_back({name, shownAs, GetLastError()});
         }
-        else if (const std::wstring found = ModulePath(module.get()); !IsOfWindows(found))
+        else if (const std::wstring found = ModulePath(module.Get()); !IsOfWindows(found))
         {
             AddMissing(found, name, context, seen, missing);
         }
@@ -162,7 +162,8 @@ bool LibraryImage::IsFor64Bit() const
     return machine == IMAGE_FILE_MACHINE_AMD64;
 }
 
-std::vector<LibraryImage::Missing> LibraryImage::FindMissing(const std::wstring& path, const ManifestContext& context)
+std::vector<LibraryImage::Missing> LibraryImage::FindMissing(const std::wstring& path,
+                                                             const UniqueActivationContext& context)
 {
     std::vector<Missing> missing;
     std::set<std::wstring> seen;

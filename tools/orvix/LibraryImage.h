@@ -1,11 +1,11 @@
 #pragma once
 
+#include "UniqueHandle.h"
+
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <vector>
-
-class ManifestContext;
 
 /// What the headers of a library file say. The file is read, never loaded, and nothing in it is trusted.
 struct LibraryImage
@@ -29,5 +29,5 @@ struct LibraryImage
     /// The libraries that are missing for the library of this path, among those that it needs and those that these
     /// need; Windows' own are not looked into. The system searches for them as it does for a library that is being
     /// loaded in this context; none of their code runs.
-    static std::vector<Missing> FindMissing(const std::wstring& path, const ManifestContext& context);
+    static std::vector<Missing> FindMissing(const std::wstring& path, const UniqueActivationContext& context);
 };

@@ -1,6 +1,7 @@
 #include "OperationRule.h"
 
-#include "FileState.h"
+#include "OrvixFileFlags.h"
+#include "OrvixOperation.h"
 
 #include <algorithm>
 #include <iterator>
@@ -16,11 +17,11 @@ constexpr OperationRule Rules[] = {
         .command = L"add",
         .title = L"Add",
         .question = L"Add these files?",
-        .operation = 0x4,
-        .allowedBy = FileState::AllowsAdd,
-        .concerns = FileState::NotControlled,
-        .leadsTo = FileState::Controlled,
-        .ends = FileState::CheckedOut | FileState::Modified,
+        .operation = OrvixOperation::Add,
+        .allowedBy = OrvixFilePermission::Add,
+        .concerns = OrvixFileState::NotControlled,
+        .leadsTo = OrvixFileState::Controlled,
+        .ends = OrvixFileState::CheckedOut | OrvixFileState::Modified,
         .dialogPrompt = FirstPrompt,
         .keepPrompt = FirstPrompt + 1,
     },
@@ -28,11 +29,11 @@ constexpr OperationRule Rules[] = {
         .command = L"checkin",
         .title = L"Check in",
         .question = L"Check these files in?",
-        .operation = 0x2,
-        .allowedBy = FileState::AllowsCheckIn,
-        .concerns = FileState::CheckedOut,
-        .leadsTo = FileState::Controlled,
-        .ends = FileState::CheckedOut | FileState::Modified,
+        .operation = OrvixOperation::CheckIn,
+        .allowedBy = OrvixFilePermission::CheckIn,
+        .concerns = OrvixFileState::CheckedOut,
+        .leadsTo = OrvixFileState::Controlled,
+        .ends = OrvixFileState::CheckedOut | OrvixFileState::Modified,
         .dialogPrompt = FirstPrompt + 2,
         .keepPrompt = FirstPrompt + 3,
     },
@@ -40,34 +41,34 @@ constexpr OperationRule Rules[] = {
         .command = L"checkout",
         .title = L"Check out",
         .question = L"Check these files out?",
-        .operation = 0x10,
-        .allowedBy = FileState::AllowsCheckOut,
-        .concerns = FileState::Controlled,
-        .concernsNone = FileState::CheckedOut,
-        .leadsTo = FileState::CheckedOut,
+        .operation = OrvixOperation::CheckOut,
+        .allowedBy = OrvixFilePermission::CheckOut,
+        .concerns = OrvixFileState::Controlled,
+        .concernsNone = OrvixFileState::CheckedOut,
+        .leadsTo = OrvixFileState::CheckedOut,
         .dialogPrompt = FirstPrompt + 4,
     },
     {
         .command = L"undo",
         .title = L"Undo check-out",
         .question = L"Give these files back unchanged?",
-        .operation = 0x20,
-        .allowedBy = FileState::AllowsUndo,
-        .concerns = FileState::CheckedOut,
-        .leadsTo = FileState::Controlled,
-        .ends = FileState::CheckedOut | FileState::Modified,
+        .operation = OrvixOperation::UndoCheckOut,
+        .allowedBy = OrvixFilePermission::UndoCheckOut,
+        .concerns = OrvixFileState::CheckedOut,
+        .leadsTo = OrvixFileState::Controlled,
+        .ends = OrvixFileState::CheckedOut | OrvixFileState::Modified,
         .dialogPrompt = FirstPrompt + 5,
     },
     {
         .command = L"get",
         .title = L"Get latest version",
         .question = L"Get the latest versions of these files?",
-        .operation = 0x8,
-        .allowedBy = FileState::AllowsGet,
-        .concerns = FileState::Controlled,
-        .leadsTo = FileState::Controlled,
-        .ends = FileState::OutOfDate,
-        .endsUnheld = FileState::Modified,
+        .operation = OrvixOperation::GetLatest,
+        .allowedBy = OrvixFilePermission::GetLatest,
+        .concerns = OrvixFileState::Controlled,
+        .leadsTo = OrvixFileState::Controlled,
+        .ends = OrvixFileState::OutOfDate,
+        .endsUnheld = OrvixFileState::Modified,
         .dialogPrompt = FirstPrompt + 6,
     },
 };
@@ -76,8 +77,8 @@ constexpr OperationRule Rules[] = {
 
 bool OperationRule::IsReached(unsigned long flags, bool kept) const
 {
-    const unsigned long held = flags & FileState::CheckedOut;
-    const unsigned long ended = (kept ? ends & ~FileState::CheckedOut : ends) | (held != 0 ? 0 : endsUnheld);
+    const unsigned long held = flags & OrvixFileState::CheckedOut;
+    const unsigned long ended = (kept ? ends & ~OrvixFileState::CheckedOut : ends) | (held != 0 ? 0 : endsUnheld);
     return (flags & leadsTo) != 0 && (flags & ended) == 0 && (!kept || held != 0);
 }
 

@@ -1,14 +1,14 @@
 #pragma once
 
+#include "OrvixPrompt.h"
+
 #include <cstdint>
 #include <string>
 
 /// One command that runs through `IOrvixServices::RunFileListOperation`: what it asks for, and how to see
-/// from the files' states (bits of `FileState`) that it came about.
+/// from the files' states (bits of `OrvixFileState`) that it came about.
 struct OperationRule
 {
-    static constexpr std::uint32_t NoPrompt = 0xFFFFFFFF;
-
     const wchar_t* command = nullptr;
     const wchar_t* title = nullptr;
     const wchar_t* question = nullptr;
@@ -22,10 +22,11 @@ struct OperationRule
     unsigned long ends = 0;       ///< states that it must have lost, ...
     unsigned long endsUnheld = 0; ///< ... and those that only a file checked out by this user may keep
 
-    std::uint32_t dialogPrompt = 0;      ///< ID of the stored answer to the file-list dialog
-    std::uint32_t keepPrompt = NoPrompt; ///< ID of the stored answer to "keep checked out", where that is offered
+    std::uint32_t dialogPrompt = 0; ///< ID of the stored answer to the file-list dialog
+    std::uint32_t keepPrompt =
+        OrvixPromptID::None; ///< ID of the stored answer to "keep checked out", where that is offered
 
-    bool CanKeep() const { return keepPrompt != NoPrompt; }
+    bool CanKeep() const { return keepPrompt != OrvixPromptID::None; }
 
     /// Whether a file that was found in a folder is meant by the command.
     bool Concerns(unsigned long flags) const { return (flags & concerns) != 0 && (flags & concernsNone) == 0; }

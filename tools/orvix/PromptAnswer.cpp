@@ -1,6 +1,6 @@
 #include "PromptAnswer.h"
 
-#include "PromptAction.h"
+#include "OrvixPrompt.h"
 
 #include <algorithm>
 #include <iterator>
@@ -8,27 +8,23 @@
 namespace
 {
 
-// Bits of a prompt's options.
-constexpr std::uint32_t OnlyConfirms = 0x1;
-constexpr std::uint32_t OffersYesToAll = 0x2;
-constexpr std::uint32_t OffersNoToAll = 0x4;
-constexpr std::uint32_t OffersToStopAsking = 0x100;
-
 constexpr struct
 {
     std::uint32_t action;
     const wchar_t* words;
 } Answers[] = {
-    {PromptAction::Ask, L"ask"},           {PromptAction::Answer1, L"yes"},
-    {PromptAction::Answer0, L"no"},        {PromptAction::Answer2, L"yes-to-all"},
-    {PromptAction::Answer3, L"no-to-all"},
+    {OrvixPromptAction::Ask, L"ask"},
+    {OrvixPromptAction::Yes, L"yes"},
+    {OrvixPromptAction::No, L"no"},
+    {OrvixPromptAction::YesToAll, L"yes-to-all"},
+    {OrvixPromptAction::NoToAll, L"no-to-all"},
 };
 
 /// The one bit that counts in a stored action.
 std::uint32_t Meaning(std::uint32_t action)
 {
-    return (action & PromptAction::Ask) != 0 ? PromptAction::Ask
-                                             : PromptAction::FromAnswer(PromptAction::ToAnswer(action));
+    return (action & OrvixPromptAction::Ask) != 0 ? OrvixPromptAction::Ask
+                                                  : OrvixPromptAction::FromAnswer(OrvixPromptAction::ToAnswer(action));
 }
 
 } // namespace
@@ -51,12 +47,14 @@ bool PromptAnswer::IsOffered(std::uint32_t options, std::uint32_t action)
 {
     switch (Meaning(action))
     {
-    case PromptAction::Answer0:
-        return (options & OnlyConfirms) == 0;
-    case PromptAction::Answer2:
-        return (options & (OnlyConfirms | OffersYesToAll)) == OffersYesToAll;
-    case PromptAction::Answer3:
-        return (options & (OnlyConfirms | OffersNoToAll)) == OffersNoToAll;
+    case OrvixPromptAction::No:
+        return (options & OrvixPromptOption::OnlyOK) == 0;
+    case OrvixPromptAction::YesToAll:
+        return (options & (OrvixPromptOption::OnlyOK | OrvixPromptOption::OfferYesToAll)) ==
+               OrvixPromptOption::OfferYesToAll;
+    case OrvixPromptAction::NoToAll:
+        return (options & (OrvixPromptOption::OnlyOK | OrvixPromptOption::OfferNoToAll)) ==
+               OrvixPromptOption::OfferNoToAll;
     default:
         return true;
     }
@@ -67,10 +65,10 @@ std::wstring PromptAnswer::OptionsInWords(std::uint32_t options)
     std::wstring words;
     for (const auto& answer : Answers)
     {
-        if (answer.action != PromptAction::Ask && IsOffered(options, answer.action))
+        if (answer.action != OrvixPromptAction::Ask && IsOffered(options, answer.action))
         {
             words += (words.empty() ? L"" : L", ") + std::wstring(answer.words);
         }
     }
-    return words + ((options & OffersToStopAsking) != 0 ? L", can stop asking" : L"");
+    return words + ((options & OrvixPromptOption::OfferStopAsking) != 0 ? L", can stop asking" : L"");
 }

@@ -2,7 +2,7 @@
 
 #include "FilePath.h"
 #include "HostSession.h"
-#include "PromptAction.h"
+#include "OrvixPrompt.h"
 #include "PromptAnswer.h"
 #include "PromptFile.h"
 #include "ToolError.h"
@@ -68,7 +68,7 @@ void PromptCommand::Run()
     }
     else if (action == L"reset")
     {
-        Set(rows, PromptAction::Ask);
+        Set(rows, OrvixPromptAction::Ask);
     }
     else if (action != L"list")
     {
@@ -125,7 +125,7 @@ PromptCommand::Rows PromptCommand::ResetAll()
     Rows rows = All();
     m_leftLocked =
         static_cast<unsigned int>(std::erase_if(rows, [this](unsigned int row) { return m_table.GetLocked(row); }));
-    Set(rows, PromptAction::Ask);
+    Set(rows, OrvixPromptAction::Ask);
     return rows;
 }
 

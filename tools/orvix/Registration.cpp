@@ -46,7 +46,7 @@ std::optional<std::wstring> ReadText(const std::wstring& keyPath, const wchar_t*
 {
     const UniqueRegistryKey key = InstalledProviders::OpenProvider(keyPath);
     std::wstring text;
-    const bool found = key && InstalledProviders::ReadText(key.get(), valueName, text) == Step::Found;
+    const bool found = key && InstalledProviders::ReadText(key.Get(), valueName, text) == Step::Found;
     return found ? std::optional(text) : std::nullopt;
 }
 
@@ -75,7 +75,7 @@ void CheckLibrary(const std::wstring& path)
     {
         throw ToolError(ExitCode::NoProject, L"not a 64-bit library: " + path);
     }
-    if (GetProcAddress(module.get(), SccFunctions::GetVersion.name) == nullptr)
+    if (GetProcAddress(module.Get(), SccFunctions::GetVersion.name) == nullptr)
     {
         throw ToolError(ExitCode::NoProject, L"no MSSCCI library, it has no SccGetVersion: " + path);
     }
@@ -132,7 +132,7 @@ std::optional<std::wstring> Registration::Set(const std::wstring& library)
 void Registration::Remove()
 {
     const std::vector<Entry> list = ReadList();
-    bool known = InstalledProviders::OpenProvider(m_keyPath) != nullptr; // also when an interrupted run has left it
+    bool known = static_cast<bool>(InstalledProviders::OpenProvider(m_keyPath)); // also when an interrupted run has left it
     for (const Entry& entry : list)
     {
         if (IsOwn(entry))
@@ -163,13 +163,13 @@ std::vector<Registration::Entry> Registration::ReadList()
     for (DWORD index = 0;; ++index)
     {
         std::wstring keyPath;
-        if (InstalledProviders::KeyPathAt(key.get(), index, keyPath) == Step::End)
+        if (InstalledProviders::KeyPathAt(key.Get(), index, keyPath) == Step::End)
         {
             return list;
         }
         DWORD size = static_cast<DWORD>(name.size());
         // A name that is too long for this is too long for the library, too.
-        if (RegEnumValueW(key.get(), index, name.data(), &size, nullptr, nullptr, nullptr, nullptr) == ERROR_SUCCESS)
+        if (RegEnumValueW(key.Get(), index, name.data(), &size, nullptr, nullptr, nullptr, nullptr) == ERROR_SUCCESS)
         {
             list.push_back({name.data(), keyPath});
         }

@@ -17,7 +17,7 @@ public:
     template <typename Function>
     Function* Find(const char* name) const
     {
-        return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(m_module.get(), name)));
+        return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(m_module.Get(), name)));
     }
 
     /// An exported function that a rule needs. Throws `RuleSkipped` when the library lacks it.

@@ -2,6 +2,7 @@
 
 #include "CommandLine.h"
 #include "InstalledProviders.h"
+#include "OrvixProviderSource.h"
 #include "PluginCandidate.h"
 #include "SccFunctions.h"
 #include "Text.h"
@@ -37,7 +38,7 @@ public:
     PrivateKey& operator=(const PrivateKey&) = delete;
     ~PrivateKey() { RegDeleteTreeW(HKEY_CURRENT_USER, m_path.c_str()); }
 
-    HKEY Get() const { return m_key.get(); }
+    HKEY Get() const { return m_key.Get(); }
 
 private:
     std::wstring m_path = L"Software\\OrvixCore\\Validation-" + std::to_wstring(GetCurrentProcessId());
@@ -54,9 +55,9 @@ public:
     {
         const UniqueRegistryKey list = NewKey(m_root.Get(), InstalledProviders::ListPath);
         const UniqueRegistryKey provider = NewKey(m_root.Get(), Name);
-        Write(list.get(), Name, Name);
-        Write(provider.get(), InstalledProviders::ServerName, Name);
-        Write(provider.get(), InstalledProviders::ServerPath, library);
+        Write(list.Get(), Name, Name);
+        Write(provider.Get(), InstalledProviders::ServerName, Name);
+        Write(provider.Get(), InstalledProviders::ServerPath, library);
         Demand(RegOverridePredefKey(HKEY_LOCAL_MACHINE, m_root.Get()));
     }
     PrivateRegistration(const PrivateRegistration&) = delete;
@@ -130,7 +131,7 @@ void ValidationProvider::FindInstalled()
     if (m_services)
     {
         const PrivateRegistration registration(m_subject.Library());
-        m_services->Initialize(&m_client, Source::InstalledMSSCCI);
+        m_services->Initialize(&m_client, OrvixProviderSource::InstalledMSSCCI);
         m_provider = m_services->GetProvider(0);
     }
 }

@@ -1,6 +1,6 @@
-#include "FileState.h"
 #include "InstalledProviders.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "PluginSearch.h"
 #include "Text.h"
@@ -438,12 +438,13 @@ void ProviderRules::EmptyList(ValidationSubject& subject)
 
 void ProviderRules::StatusBits(ValidationSubject& subject)
 {
-    constexpr unsigned long Documented = FileState::NotControlled | FileState::Controlled | FileState::CheckedOut |
-                                         FileState::CheckedOutByOther | FileState::OutOfDate | FileState::Deleted |
-                                         FileState::Modified | FileState::AllowsCheckIn | FileState::AllowsCheckOut |
-                                         FileState::AllowsUndo | FileState::AllowsCompare | FileState::AllowsAdd |
-                                         FileState::AllowsGet | FileState::AllowsHistory;
-    constexpr unsigned long Either = FileState::NotControlled | FileState::Controlled;
+    constexpr unsigned long Documented =
+        OrvixFileState::NotControlled | OrvixFileState::Controlled | OrvixFileState::CheckedOut |
+        OrvixFileState::CheckedOutByOther | OrvixFileState::OutOfDate | OrvixFileState::Deleted |
+        OrvixFileState::Modified | OrvixFilePermission::CheckIn | OrvixFilePermission::CheckOut |
+        OrvixFilePermission::UndoCheckOut | OrvixFilePermission::Compare | OrvixFilePermission::Add |
+        OrvixFilePermission::GetLatest | OrvixFilePermission::ShowHistory;
+    constexpr unsigned long Either = OrvixFileState::NotControlled | OrvixFileState::Controlled;
 
     ValidationProvider provider(subject);
     provider.Begin();
@@ -525,7 +526,7 @@ void ProviderRules::StatusClosed(ValidationSubject& subject)
         Demand(result == 0, "QueryStatus gives " + std::to_string(result) + when);
         for (const unsigned long flags : files.Flags())
         {
-            Demand(flags == FileState::NotControlled, "QueryStatus writes " + Hexadecimal(flags) + when);
+            Demand(flags == OrvixFileState::NotControlled, "QueryStatus writes " + Hexadecimal(flags) + when);
         }
     };
     if (provider.Initialize() != 0)

@@ -11,7 +11,7 @@ class OrvixFileEntry;
 ///
 /// Part of `OrvixFileList`; not exported. `Append`, `AppendDistinct` and `Reserve` may throw std::bad_alloc,
 /// with nothing changed.
-class OrvixActiveSequence
+class ActiveSequence
 {
 public:
     std::size_t Size() const { return m_slots.size() - (m_gapEnd - m_gapBegin); }

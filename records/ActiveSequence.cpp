@@ -1,17 +1,17 @@
-#include "OrvixActiveSequence.h"
+#include "ActiveSequence.h"
 
 #include "ExceptionBarrier.h"
 
 #include <algorithm>
 
-void OrvixActiveSequence::Clear()
+void ActiveSequence::Clear()
 {
     m_slots.clear();
     m_gapBegin = m_gapEnd = 0;
     m_distinct = true;
 }
 
-bool OrvixActiveSequence::Remove(OrvixFileEntry* entry)
+bool ActiveSequence::Remove(OrvixFileEntry* entry)
 {
     const std::size_t position = PositionOf(entry);
     if (position == m_slots.size())
@@ -42,7 +42,7 @@ bool OrvixActiveSequence::Remove(OrvixFileEntry* entry)
 }
 
 /// Slot of the first occurrence; the number of slots when there is none.
-std::size_t OrvixActiveSequence::PositionOf(OrvixFileEntry* entry)
+std::size_t ActiveSequence::PositionOf(OrvixFileEntry* entry)
 {
     const auto find = [&](std::size_t from, std::size_t to) {
         const auto begin = m_slots.begin();
@@ -74,7 +74,7 @@ std::size_t OrvixActiveSequence::PositionOf(OrvixFileEntry* entry)
     return position;
 }
 
-bool OrvixActiveSequence::HasNoRepetition() const
+bool ActiveSequence::HasNoRepetition() const
 {
     return WithBarrier(false, [this] {
         std::vector<OrvixFileEntry*> sorted;
@@ -88,7 +88,7 @@ bool OrvixActiveSequence::HasNoRepetition() const
     });
 }
 
-void OrvixActiveSequence::CloseGap()
+void ActiveSequence::CloseGap()
 {
     const auto begin = m_slots.begin();
     m_slots.erase(begin + static_cast<std::ptrdiff_t>(m_gapBegin), begin + static_cast<std::ptrdiff_t>(m_gapEnd));

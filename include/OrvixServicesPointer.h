@@ -1,0 +1,21 @@
+#pragma once
+
+#include "IOrvixServices.h"
+
+#include <memory>
+
+/// Gives a services object back to the library.
+struct OrvixServicesRelease
+{
+    void operator()(IOrvixServices* services) const { ReleaseIOrvixServices(services); }
+};
+
+/// Owns a services object. At the end it is shut down, which saves the stored answers, and released. Call `Shutdown`
+/// yourself where you want to know of a COM error in saving.
+using OrvixServicesPointer = std::unique_ptr<IOrvixServices, OrvixServicesRelease>;
+
+/// Makes a services object; null when memory is exhausted.
+inline OrvixServicesPointer MakeOrvixServices()
+{
+    return OrvixServicesPointer(GetIOrvixServices());
+}
