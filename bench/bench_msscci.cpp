@@ -92,7 +92,7 @@ void ReportMemory(IdleMsscci& msscci, HMODULE library)
         bytes += std::wcslen(list->GetActiveFileEntry(i)->GetFile()) + 1;
     }
     const SIZE_T before = MemoryNow();
-    msscci.Provider().QueryStatus(list.Get(), 0);
+    msscci.Provider().QueryStatus(list.get(), 0);
     const SIZE_T during = Export<SIZE_T()>(library, "MemoryInQuery")();
     std::printf("QueryStatus, 100,000 files: %.1f MB more than before at its peak; the narrow paths have %.1f MB\n",
                 static_cast<double>(during - before) / 1e6, static_cast<double>(bytes) / 1e6);
@@ -105,7 +105,7 @@ double CheckOutCostPerFile(IdleMsscci& msscci, unsigned int count, unsigned int 
     const double time = BestTime([&] {
         for (unsigned int i = 0; i < repeat; ++i)
         {
-            msscci.Provider().CheckOut(list.Get(), L"comment", 0);
+            msscci.Provider().CheckOut(list.get(), L"comment", 0);
         }
     });
     return time / count / repeat;
@@ -210,7 +210,7 @@ void BenchMsscci(MeasureTable& table)
         const auto list = MakeActiveList(count);
         table.Print(Compare(
             "QueryStatus through an MSSCCI library, " + std::to_string(count) + " files", 1.5,
-            [&] { msscci.Provider().QueryStatus(list.Get(), 0); }, [&] { QueryByHand(*list, query); }));
+            [&] { msscci.Provider().QueryStatus(list.get(), 0); }, [&] { QueryByHand(*list, query); }));
     }
     table.Print({"CheckOut through an MSSCCI library, time per file: 100,000 against 1,000",
                  CheckOutCostPerFile(msscci, 100000, 1), CheckOutCostPerFile(msscci, 1000, 100), 1.3});

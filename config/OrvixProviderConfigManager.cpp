@@ -1,10 +1,10 @@
 #include "OrvixProviderConfigManager.h"
 
 #include "ExceptionBarrier.h"
+#include "FileDiagnostics.h"
 #include "OrvixFileIO.h"
 #include "OrvixProviderConfig.h"
 #include "ProviderFilters.h"
-#include "ReadingLog.h"
 #include "UpperCase.h"
 
 #include <algorithm>
@@ -16,14 +16,14 @@
 namespace
 {
 
-using Why = ReadingLog::Why;
+using Kind = FileDiagnostics::Kind;
 
 /// What one reading of the file has made so far. It frees itself unless the reading succeeds.
 struct Reading
 {
     std::vector<std::unique_ptr<OrvixProviderConfig>> configs;
     std::vector<std::unique_ptr<ProviderFilters>> filters;
-    ReadingPlace place;
+    DiagnosticReporter reporter;
 };
 
 bool IsNamed(const std::wstring& name, const wchar_t* wanted)
@@ -49,7 +49,7 @@ void ForEachElement(OrvixFileIO& file, IXMLDOMNode* parent, Visit&& visit)
 /// Calls `visit(name, text, child)` for every child element whose name and text can be read, until it
 /// returns false.
 template <typename Visit>
-void ForEachReadableElement(OrvixFileIO& file, IXMLDOMNode* parent, const ReadingPlace& place, Visit&& visit)
+void ForEachReadableElement(OrvixFileIO& file, IXMLDOMNode* parent, const DiagnosticReporter& reporter, Visit&& visit)
 {
     std::wstring text;
     ForEachElement(file, parent, [&](const std::wstring& name, IXMLDOMNode* child) {
@@ -57,14 +57,14 @@ void ForEachReadableElement(OrvixFileIO& file, IXMLDOMNode* parent, const Readin
         {
             return visit(name, text, child);
         }
-        place.Remark(Why::NoText, name.c_str());
+        reporter.Report(Kind::NoText, name.c_str());
         return true;
     });
 }
 
 /// Whether a text is the first of two choices; any text but the first is the second.
 bool IsFirstChoice(const std::wstring& element, const std::wstring& text, const wchar_t* first, const wchar_t* second,
-                   const ReadingPlace& place)
+                   const DiagnosticReporter& reporter)
 {
     if (IsNamed(text, first))
     {
@@ -72,7 +72,7 @@ bool IsFirstChoice(const std::wstring& element, const std::wstring& text, const 
     }
     if (!IsNamed(text, second))
     {
-        place.Remark(Why::UnknownValue, element.c_str(), text.c_str(), second);
+        reporter.Report(Kind::UnknownValue, element.c_str(), text.c_str(), second);
     }
     return false;
 }
@@ -83,44 +83,44 @@ void ReadFilter(OrvixFileIO& file, IXMLDOMNode* node, OrvixProviderConfig& confi
 {
     auto owned = std::make_unique<ProviderFilters>();
     ProviderFilters* filter = owned.get();
-    Why dropped = Why::NoName;
-    ForEachReadableElement(file, node, reading.place,
-                           [&](const std::wstring& name, const std::wstring& text, IXMLDOMNode*) {
-                               if (IsNamed(name, L"Name"))
-                               {
-                                   filter->m_name = text;
-                                   if (owned)
-                                   {
-                                       reading.filters.push_back(std::move(owned));
-                                   }
-                               }
-                               else if (owned)
-                               {
-                                   dropped = Why::NameNotFirst;
-                                   return false;
-                               }
-                               else if (IsNamed(name, L"Type"))
-                               {
-                                   filter->m_exclude = IsFirstChoice(name, text, L"exclude", L"include", reading.place);
-                               }
-                               else if (IsNamed(name, L"Folder"))
-                               {
-                                   filter->m_folders.push_back(UpperCase(text));
-                               }
-                               else if (IsNamed(name, L"FileType"))
-                               {
-                                   filter->m_fileTypes.push_back(UpperCase(text));
-                               }
-                               else
-                               {
-                                   reading.place.Remark(Why::UnknownElement, name.c_str());
-                               }
-                               config.m_filters.push_back(filter);
-                               return true;
-                           });
+    Kind dropped = Kind::NoName;
+    ForEachReadableElement(
+        file, node, reading.reporter, [&](const std::wstring& name, const std::wstring& text, IXMLDOMNode*) {
+            if (IsNamed(name, L"Name"))
+            {
+                filter->m_name = text;
+                if (owned)
+                {
+                    reading.filters.push_back(std::move(owned));
+                }
+            }
+            else if (owned)
+            {
+                dropped = Kind::NameNotFirst;
+                return false;
+            }
+            else if (IsNamed(name, L"Type"))
+            {
+                filter->m_exclude = IsFirstChoice(name, text, L"exclude", L"include", reading.reporter);
+            }
+            else if (IsNamed(name, L"Folder"))
+            {
+                filter->m_folders.push_back(UpperCase(text));
+            }
+            else if (IsNamed(name, L"FileType"))
+            {
+                filter->m_fileTypes.push_back(UpperCase(text));
+            }
+            else
+            {
+                reading.reporter.Report(Kind::UnknownElement, name.c_str());
+            }
+            config.m_filters.push_back(filter);
+            return true;
+        });
     if (owned)
     {
-        reading.place.Remark(dropped);
+        reading.reporter.Report(dropped);
     }
 }
 
@@ -130,7 +130,7 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
     auto config = std::make_unique<OrvixProviderConfig>();
     const std::size_t filtersBefore = reading.filters.size();
     std::optional<std::wstring> writtenName;
-    ForEachReadableElement(file, node, reading.place,
+    ForEachReadableElement(file, node, reading.reporter,
                            [&](const std::wstring& name, const std::wstring& text, IXMLDOMNode* child) {
                                if (IsNamed(name, L"Name"))
                                {
@@ -139,7 +139,7 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
                                }
                                else if (IsNamed(name, L"Enabled"))
                                {
-                                   config->m_enabled = !IsFirstChoice(name, text, L"false", L"true", reading.place);
+                                   config->m_enabled = !IsFirstChoice(name, text, L"false", L"true", reading.reporter);
                                }
                                else if (IsNamed(name, L"FixedProjectRoot"))
                                {
@@ -164,26 +164,26 @@ void ReadProvider(OrvixFileIO& file, IXMLDOMNode* node, Reading& reading)
                                else if (IsNamed(name, L"Filters"))
                                {
                                    ForEachElement(file, child, [&](const std::wstring&, IXMLDOMNode* filter) {
-                                       reading.place.EnterFilter();
+                                       reading.reporter.EnterFilter();
                                        ReadFilter(file, filter, *config, reading);
                                        return true;
                                    });
-                                   reading.place.LeaveFilter();
+                                   reading.reporter.LeaveFilter();
                                }
                                else
                                {
-                                   reading.place.Remark(Why::UnknownElement, name.c_str());
+                                   reading.reporter.Report(Kind::UnknownElement, name.c_str());
                                }
                                return true;
                            });
     if (writtenName)
     {
-        reading.place.Use(config.get(), *writtenName);
+        reading.reporter.AddProvider(config.get(), *writtenName);
         reading.configs.push_back(std::move(config));
     }
     else
     {
-        reading.place.Remark(Why::NoName);
+        reading.reporter.Report(Kind::NoName);
         reading.filters.resize(filtersBefore);
     }
 }
@@ -199,7 +199,7 @@ bool Applies(const OrvixProviderConfig& config, const std::wstring& providerName
 OrvixProviderConfigManager::OrvixProviderConfigManager() = default;
 OrvixProviderConfigManager::~OrvixProviderConfigManager() = default;
 
-bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log)
+bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, FileDiagnostics* diagnostics)
 {
     if (path == nullptr)
     {
@@ -215,20 +215,20 @@ bool OrvixProviderConfigManager::LoadConfig(const wchar_t* path, ReadingLog* log
         OrvixFileIO::Node root;
         std::wstring rootName;
         const bool hasRoot = file.GetRootElement(root, rootName) && IsNamed(rootName, RootName);
-        if (log != nullptr)
+        if (diagnostics != nullptr)
         {
-            log->content = file.GetContent();
-            log->hasRoot = hasRoot;
-            log->root = rootName;
+            diagnostics->content = file.GetContent();
+            diagnostics->hasRoot = hasRoot;
+            diagnostics->root = rootName;
         }
         if (!hasRoot)
         {
             return false;
         }
 
-        Reading reading{{}, {}, ReadingPlace(log)};
+        Reading reading{{}, {}, DiagnosticReporter(diagnostics)};
         ForEachElement(file, root.Get(), [&](const std::wstring&, IXMLDOMNode* provider) {
-            reading.place.EnterItem();
+            reading.reporter.EnterItem();
             ReadProvider(file, provider, reading);
             return true;
         });

@@ -3,7 +3,7 @@
 #include <vector>
 
 class OrvixProviderConfig;
-struct ReadingLog;
+struct FileDiagnostics;
 
 /// The administrator's settings from "OrvixProviders.xml". The file is only read.
 class OrvixProviderConfigManager
@@ -20,8 +20,8 @@ public:
     virtual ~OrvixProviderConfigManager();
 
     /// Appends the configurations of a file; false with nothing added when the path is null, the file has no
-    /// "OrvixProviders" element (a missing or broken file has none) or memory is exhausted. `log` may be null.
-    bool LoadConfig(const wchar_t* path, ReadingLog* log = nullptr);
+    /// "OrvixProviders" element (a missing or broken file has none) or memory is exhausted. `diagnostics` may be null.
+    bool LoadConfig(const wchar_t* path, FileDiagnostics* diagnostics = nullptr);
 
     /// The first configuration whose name occurs anywhere in `providerName`, letter case aside; null when
     /// there is none or the name is null. Throws std::bad_alloc, since null would mean "not switched off".

@@ -1,8 +1,8 @@
 #include "PromptFile.h"
 
+#include "FileDiagnostics.h"
 #include "OrvixFileIO.h"
 #include "OrvixPromptTable.h"
-#include "ReadingLog.h"
 
 #include <algorithm>
 #include <array>
@@ -33,42 +33,42 @@ bool IsUnlocked(const std::wstring& text)
     return _wcsicmp(text.c_str(), L"false") == 0;
 }
 
-using Why = ReadingLog::Why;
+using Kind = FileDiagnostics::Kind;
 
-/// Tells the log about the document, for which the library has no use.
-void Describe(OrvixFileIO& file, ReadingLog& log)
+/// Describes the document as a whole.
+void Describe(OrvixFileIO& file, FileDiagnostics& diagnostics)
 {
     OrvixFileIO::Node node;
-    log.content = file.GetContent();
-    log.hasRoot = file.GetChildNode(nullptr, RootIndex, node) && file.GetNodeName(node.Get(), log.root);
-    if (!log.hasRoot)
+    diagnostics.content = file.GetContent();
+    diagnostics.hasRoot = file.GetChildNode(nullptr, RootIndex, node) && file.GetNodeName(node.Get(), diagnostics.root);
+    if (!diagnostics.hasRoot)
     {
-        file.GetRootElement(node, log.root);
+        file.GetRootElement(node, diagnostics.root);
     }
 }
 
 /// The remarks on one node below the root.
-void Explain(OrvixFileIO& file, IXMLDOMNode* prompt, ReadingPlace& place)
+void Explain(OrvixFileIO& file, IXMLDOMNode* prompt, DiagnosticReporter& reporter)
 {
     std::wstring text;
     if (!file.GetNodeName(prompt, text))
     {
         return;
     }
-    place.EnterItem();
+    reporter.EnterItem();
     for (const std::wstring_view name : FieldNames)
     {
         if (!file.FindChildText(prompt, name.data(), text))
         {
-            place.Remark(Why::LacksElement, name.data());
+            reporter.Report(Kind::MissingElement, name.data());
         }
         else if (name == FieldNames[Text] && text.size() > MaxTextLength)
         {
-            place.Remark(Why::TextCut, name.data());
+            reporter.Report(Kind::TextCut, name.data());
         }
         else if (name == FieldNames[Locked] && !IsUnlocked(text) && _wcsicmp(text.c_str(), L"true") != 0)
         {
-            place.Remark(Why::UnknownValue, name.data(), text.c_str(), L"true");
+            reporter.Report(Kind::UnknownValue, name.data(), text.c_str(), L"true");
         }
     }
     OrvixFileIO::Node child;
@@ -77,12 +77,12 @@ void Explain(OrvixFileIO& file, IXMLDOMNode* prompt, ReadingPlace& place)
         if (file.GetNodeName(child.Get(), text) &&
             std::find(FieldNames.begin(), FieldNames.end(), text) == FieldNames.end())
         {
-            place.Remark(Why::UnknownElement, text.c_str());
+            reporter.Report(Kind::UnknownElement, text.c_str());
         }
     }
 }
 
-bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
+bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, FileDiagnostics* diagnostics)
 {
     OrvixFileIO file;
     if (!file.OpenDocument(path))
@@ -90,9 +90,9 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
         return false;
     }
     const OpenedDocument opened(file);
-    if (log != nullptr)
+    if (diagnostics != nullptr)
     {
-        Describe(file, *log);
+        Describe(file, *diagnostics);
     }
     OrvixFileIO::Node root;
     if (!file.GetChildNode(nullptr, RootIndex, root))
@@ -100,14 +100,14 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
         return false;
     }
 
-    ReadingPlace place(log);
+    DiagnosticReporter reporter(diagnostics);
     std::array<std::wstring, NumFields> fields;
     OrvixFileIO::Node prompt;
     for (bool more = file.GetFirstChild(root.Get(), prompt); more; more = file.GetNextSibling(prompt))
     {
-        if (log != nullptr)
+        if (diagnostics != nullptr)
         {
-            Explain(file, prompt.Get(), place);
+            Explain(file, prompt.Get(), reporter);
         }
         if (!file.FindChildTexts(prompt.Get(), FieldNames, fields))
         {
@@ -136,11 +136,11 @@ std::wstring Decimal(unsigned long value)
 
 } // namespace
 
-bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path, ReadingLog* log)
+bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path, FileDiagnostics* diagnostics)
 {
     try
     {
-        return ReadPrompts(table, path, log);
+        return ReadPrompts(table, path, diagnostics);
     }
     catch (...)
     {

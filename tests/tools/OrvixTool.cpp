@@ -13,14 +13,13 @@ namespace
 
 constexpr DWORD Milliseconds = 60'000;
 
-UniqueHandle NewFile(const std::filesystem::path& path)
+UniqueFile NewFile(const std::filesystem::path& path)
 {
     SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
-    UniqueHandle file(CreateFileW(path.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE, &inheritable,
-                                  CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
-    if (file.get() == INVALID_HANDLE_VALUE)
+    UniqueFile file(CreateFileW(path.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE, &inheritable,
+                                CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
+    if (!file)
     {
-        file.release();
         throw std::runtime_error("no file for the output");
     }
     return file;
@@ -65,27 +64,27 @@ OrvixTool::Result OrvixTool::Run(const std::filesystem::path& program, const std
 
     Result result{TimedOut, {}, {}};
     {
-        const UniqueHandle output = NewFile(outputFile);
-        const UniqueHandle errors = NewFile(errorFile);
+        const UniqueFile output = NewFile(outputFile);
+        const UniqueFile errors = NewFile(errorFile);
         STARTUPINFOW startup{};
         startup.cb = sizeof startup;
         startup.dwFlags = STARTF_USESTDHANDLES;
-        startup.hStdOutput = output.get();
-        startup.hStdError = errors.get();
+        startup.hStdOutput = output.Get();
+        startup.hStdError = errors.Get();
         PROCESS_INFORMATION information{};
         if (!CreateProcessW(nullptr, commandLine.data(), nullptr, nullptr, TRUE, CREATE_NO_WINDOW, nullptr,
                             folder.c_str(), &startup, &information))
         {
             throw std::runtime_error("the program does not start");
         }
-        const UniqueHandle process(information.hProcess);
-        const UniqueHandle thread(information.hThread);
-        if (WaitForSingleObject(process.get(), Milliseconds) != WAIT_OBJECT_0)
+        const UniqueKernelHandle process(information.hProcess);
+        const UniqueKernelHandle thread(information.hThread);
+        if (WaitForSingleObject(process.Get(), Milliseconds) != WAIT_OBJECT_0)
         {
-            TerminateProcess(process.get(), TimedOut);
-            WaitForSingleObject(process.get(), INFINITE);
+            TerminateProcess(process.Get(), TimedOut);
+            WaitForSingleObject(process.Get(), INFINITE);
         }
-        GetExitCodeProcess(process.get(), &result.code);
+        GetExitCodeProcess(process.Get(), &result.code);
     }
     result.output = Lines(outputFile);
     result.errors = Lines(errorFile);

@@ -30,12 +30,12 @@ struct Pipe
         {
             throw std::runtime_error("no pipe");
         }
-        reader.reset(readEnd);
-        writer.reset(writeEnd);
+        reader.Reset(readEnd);
+        writer.Reset(writeEnd);
     }
 
-    UniqueHandle reader;
-    UniqueHandle writer;
+    UniqueKernelHandle reader;
+    UniqueKernelHandle writer;
 };
 
 /// A process that is started with a console for its own.
@@ -57,15 +57,15 @@ DWORD RunIn(HPCON console, std::wstring& commandLine)
         throw std::runtime_error("the program does not start in a console");
     }
     DeleteProcThreadAttributeList(startup.lpAttributeList);
-    const UniqueHandle process(information.hProcess);
-    const UniqueHandle thread(information.hThread);
+    const UniqueKernelHandle process(information.hProcess);
+    const UniqueKernelHandle thread(information.hThread);
     DWORD code = 0;
-    if (WaitForSingleObject(process.get(), Milliseconds) != WAIT_OBJECT_0)
+    if (WaitForSingleObject(process.Get(), Milliseconds) != WAIT_OBJECT_0)
     {
-        TerminateProcess(process.get(), 1);
+        TerminateProcess(process.Get(), 1);
         throw std::runtime_error("the program does not end in a console");
     }
-    GetExitCodeProcess(process.get(), &code);
+    GetExitCodeProcess(process.Get(), &code);
     return code;
 }
 
@@ -98,15 +98,15 @@ PseudoConsole::Result PseudoConsole::Run(std::wstring commandLine)
     Pipe output;
     {
         HPCON opened = nullptr;
-        if (FAILED(CreatePseudoConsole({Columns, 100}, input.reader.get(), output.writer.get(), 0, &opened)))
+        if (FAILED(CreatePseudoConsole({Columns, 100}, input.reader.Get(), output.writer.Get(), 0, &opened)))
         {
             throw std::runtime_error("no pseudo console");
         }
         const UniqueConsole console(opened);
-        output.writer.reset(); // the console has its own
+        output.writer.Reset(); // the console has its own
         result.code = RunIn(console.get(), commandLine);
     }
-    result.output = ReadAll(output.reader.get());
+    result.output = ReadAll(output.reader.Get());
     result.text = WithoutSequences(result.output);
     return result;
 }

@@ -284,8 +284,8 @@ TEST_F(Validate, LeavesNoProcessBehindThatTheLibraryStarted)
     ValidatePlugin(Plugins / L"defective.dll", Success);
     const std::string number = ReadBytes(file);
     ASSERT_NE(number, "");
-    const UniqueHandle process(OpenProcess(SYNCHRONIZE, FALSE, std::stoul(number)));
-    EXPECT_TRUE(!process || WaitForSingleObject(process.get(), 10000) == WAIT_OBJECT_0);
+    const UniqueKernelHandle process(OpenProcess(SYNCHRONIZE, FALSE, std::stoul(number)));
+    EXPECT_TRUE(!process || WaitForSingleObject(process.Get(), 10000) == WAIT_OBJECT_0);
 }
 
 TEST_F(Validate, FailsOneRuleForWhatIsNoLibraryAndSkipsTheOthers)

@@ -29,7 +29,7 @@ namespace
 {
 
 using InstalledProviders::Step;
-using Why = ReadingLog::Why;
+using Kind = FileDiagnostics::Kind;
 using Content = OrvixFileIO::Content;
 
 constexpr const char* InstalledKind = "MSSCCI library";
@@ -137,7 +137,7 @@ DWORD OpenError(const std::wstring& path)
     return file ? ERROR_SUCCESS : GetLastError();
 }
 
-void ExplainContent(DoctorReport::Place& place, const ReadingLog& log, const wchar_t* root)
+void ExplainContent(DoctorReport::Place& place, const FileDiagnostics& log, const wchar_t* root)
 {
     if (log.content == Content::Missing && !PathExists(place.location))
     {
@@ -182,41 +182,41 @@ void ExplainContent(DoctorReport::Place& place, const ReadingLog& log, const wch
 }
 
 /// What the reader of a file passed over. `item` is what the elements below the root are called.
-void ExplainRemarks(DoctorReport::Place& place, const ReadingLog& log, const wchar_t* item)
+void ExplainRemarks(DoctorReport::Place& place, const FileDiagnostics& log, const wchar_t* item)
 {
     std::map<unsigned int, std::wstring> names;
-    for (const ReadingLog::Provider& provider : log.providers)
+    for (const FileDiagnostics::Provider& provider : log.providers)
     {
         names[provider.item] = L" (" + Quoted(provider.name) + L")";
     }
-    for (const ReadingLog::Remark& remark : log.remarks)
+    for (const FileDiagnostics::Diagnostic& diagnostic : log.diagnostics)
     {
-        std::wstring where = item + std::wstring(L" ") + std::to_wstring(remark.item) + names[remark.item];
-        where += remark.filter != 0 ? L", filter " + std::to_wstring(remark.filter) : L"";
-        switch (remark.why)
+        std::wstring where = item + std::wstring(L" ") + std::to_wstring(diagnostic.item) + names[diagnostic.item];
+        where += diagnostic.filter != 0 ? L", filter " + std::to_wstring(diagnostic.filter) : L"";
+        switch (diagnostic.kind)
         {
-        case Why::NoName:
+        case Kind::NoName:
             place.AddProblem("no-name", where + L" is ignored: it has no Name");
             break;
-        case Why::NameNotFirst:
+        case Kind::NameNotFirst:
             place.AddProblem("name-not-first", where + L" is ignored: Name is not its first element");
             break;
-        case Why::UnknownElement:
+        case Kind::UnknownElement:
             place.AddProblem("unknown-element",
-                             where + L": " + remark.element + L" is ignored: no such element is known");
+                             where + L": " + diagnostic.element + L" is ignored: no such element is known");
             break;
-        case Why::NoText:
-            place.AddProblem("no-text", where + L": " + remark.element + L" is ignored: it holds no text");
+        case Kind::NoText:
+            place.AddProblem("no-text", where + L": " + diagnostic.element + L" is ignored: it holds no text");
             break;
-        case Why::UnknownValue:
-            place.AddProblem("unknown-value", where + L": " + remark.element + L" is " + Quoted(remark.text) +
-                                                  L", which counts as " + Quoted(remark.countsAs));
+        case Kind::UnknownValue:
+            place.AddProblem("unknown-value", where + L": " + diagnostic.element + L" is " + Quoted(diagnostic.text) +
+                                                  L", which counts as " + Quoted(diagnostic.countsAs));
             break;
-        case Why::LacksElement:
-            place.AddProblem("incomplete-prompt", where + L" is ignored: it has no " + remark.element);
+        case Kind::MissingElement:
+            place.AddProblem("incomplete-prompt", where + L" is ignored: it has no " + diagnostic.element);
             break;
-        case Why::TextCut:
-            place.AddProblem("text-cut", where + L": " + remark.element + L" is too long and is cut");
+        case Kind::TextCut:
+            place.AddProblem("text-cut", where + L": " + diagnostic.element + L" is too long and is cut");
             break;
         }
     }
@@ -265,7 +265,7 @@ void Doctor::ReadPrompts(const std::wstring& folder)
 {
     DoctorReport::Place& place = m_report.places.emplace_back("prompt file", folder + PromptFileName);
     OrvixPromptTable table;
-    ReadingLog log;
+    FileDiagnostics log;
     ReadPromptFile(table, place.location.c_str(), &log);
     ExplainContent(place, log, PromptFileRoot);
     if (log.hasRoot && log.root != PromptFileRoot)
@@ -590,7 +590,7 @@ void Doctor::ExplainConfiguration(DoctorReport::Candidate& candidate, const Orvi
 
 void Doctor::FindUnusedSettings()
 {
-    for (const ReadingLog::Provider& provider : m_settings.providers)
+    for (const FileDiagnostics::Provider& provider : m_settings.providers)
     {
         if (m_used.count(provider.config) != 0)
         {
@@ -626,7 +626,7 @@ void Doctor::Announce(const std::wstring& library)
 
 std::wstring Doctor::SettingsElement(const OrvixProviderConfig* config) const
 {
-    for (const ReadingLog::Provider& provider : m_settings.providers)
+    for (const FileDiagnostics::Provider& provider : m_settings.providers)
     {
         if (provider.config == config)
         {

@@ -6,7 +6,7 @@
 #include "IsolatedLoad.h"
 #include "OrvixProviderConfigManager.h"
 #include "Output.h"
-#include "ReadingLog.h"
+#include "FileDiagnostics.h"
 
 #include <map>
 #include <set>
@@ -49,7 +49,7 @@ private:
     Output& m_output;
     DoctorReport m_report;
     OrvixProviderConfigManager m_configs;
-    ReadingLog m_settings;
+    FileDiagnostics m_settings;
     std::set<const OrvixProviderConfig*> m_used;
     std::map<const OrvixProviderConfig*, const OrvixProviderConfig*> m_hiddenBy;
     std::set<std::wstring> m_keyPaths; // of the 64-bit list, as `PathKey` gives them

@@ -140,8 +140,8 @@ void PromptCommand::Lock(const Rows& rows, bool locked)
 
 void PromptCommand::Save()
 {
-    const auto losses = std::count_if(m_log.remarks.begin(), m_log.remarks.end(), [](const ReadingLog::Remark& remark) {
-        return remark.why != ReadingLog::Why::UnknownValue;
+    const auto losses = std::count_if(m_log.diagnostics.begin(), m_log.diagnostics.end(), [](const FileDiagnostics::Diagnostic& diagnostic) {
+        return diagnostic.kind != FileDiagnostics::Kind::UnknownValue;
     });
     if (losses > 0)
     {

@@ -3,7 +3,7 @@
 #include "CommandLine.h"
 #include "OrvixPromptTable.h"
 #include "Output.h"
-#include "ReadingLog.h"
+#include "FileDiagnostics.h"
 
 #include <functional>
 #include <string>
@@ -41,6 +41,6 @@ private:
     Output& m_output;
     std::wstring m_path;
     OrvixPromptTable m_table;
-    ReadingLog m_log;              // what the file would lose by being saved
+    FileDiagnostics m_log;              // what the file would lose by being saved
     unsigned int m_leftLocked = 0; // prompts that were left as they are
 };

@@ -21,7 +21,7 @@ constexpr UINT MarkMessage = WM_APP;
 struct MarkWindow
 {
     HWND window = nullptr;
-    UniqueHandle reached{CreateEventW(nullptr, FALSE, FALSE, nullptr)};
+    UniqueKernelHandle reached{CreateEventW(nullptr, FALSE, FALSE, nullptr)};
 };
 
 MarkWindow& Mark()
@@ -34,7 +34,7 @@ LRESULT CALLBACK MarkProcedure(HWND window, UINT message, WPARAM wParam, LPARAM 
 {
     if (message == MarkMessage)
     {
-        SetEvent(Mark().reached.get());
+        SetEvent(Mark().reached.Get());
     }
     return DefWindowProcW(window, message, wParam, lParam);
 }
@@ -54,9 +54,9 @@ void Settle(HWND dialog)
     // The second time for the messages that the first ones posted in their turn, a key's character say.
     for (int i = 0; i < 2 && IsWindow(dialog); ++i)
     {
-        ResetEvent(Mark().reached.get());
+        ResetEvent(Mark().reached.Get());
         PostMessageW(Mark().window, MarkMessage, 0, 0);
-        while (IsWindow(dialog) && WaitForSingleObject(Mark().reached.get(), 10) == WAIT_TIMEOUT)
+        while (IsWindow(dialog) && WaitForSingleObject(Mark().reached.Get(), 10) == WAIT_TIMEOUT)
         {
         }
     }

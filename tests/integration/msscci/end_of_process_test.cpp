@@ -26,11 +26,11 @@ public:
     std::string ReadUntilTheEnd(const PROCESS_INFORMATION& process)
     {
         std::string output;
-        const HANDLE events[] = {m_written.get(), process.hProcess};
+        const HANDLE events[] = {m_written.Get(), process.hProcess};
         DWORD event = WAIT_OBJECT_0;
         while (event == WAIT_OBJECT_0)
         {
-            SetEvent(m_free.get());
+            SetEvent(m_free.Get());
             event = WaitForMultipleObjects(2, events, FALSE, 60000);
             if (event == WAIT_OBJECT_0 && m_buffer->process == process.dwProcessId)
             {
@@ -49,12 +49,12 @@ private:
     };
 
     // The names by which the system finds its monitor.
-    UniqueHandle m_free{CreateEventW(nullptr, FALSE, FALSE, L"DBWIN_BUFFER_READY")};
-    UniqueHandle m_written{CreateEventW(nullptr, FALSE, FALSE, L"DBWIN_DATA_READY")};
-    UniqueHandle m_section{
+    UniqueKernelHandle m_free{CreateEventW(nullptr, FALSE, FALSE, L"DBWIN_BUFFER_READY")};
+    UniqueKernelHandle m_written{CreateEventW(nullptr, FALSE, FALSE, L"DBWIN_DATA_READY")};
+    UniqueKernelHandle m_section{
         CreateFileMappingW(INVALID_HANDLE_VALUE, nullptr, PAGE_READWRITE, 0, sizeof(Buffer), L"DBWIN_BUFFER")};
     std::unique_ptr<const Buffer, decltype(&UnmapViewOfFile)> m_buffer{
-        static_cast<const Buffer*>(MapViewOfFile(m_section.get(), FILE_MAP_READ, 0, 0, 0)), UnmapViewOfFile};
+        static_cast<const Buffer*>(MapViewOfFile(m_section.Get(), FILE_MAP_READ, 0, 0, 0)), UnmapViewOfFile};
 };
 
 /// Runs a process that looks for installed libraries.
@@ -78,8 +78,8 @@ protected:
             ADD_FAILURE() << "no process: error " << GetLastError();
             return outcome;
         }
-        const UniqueHandle thread(process.hThread);
-        const UniqueHandle handle(process.hProcess);
+        const UniqueKernelHandle thread(process.hThread);
+        const UniqueKernelHandle handle(process.hProcess);
         outcome.debugOutput = debugOutput.ReadUntilTheEnd(process);
         GetExitCodeProcess(process.hProcess, &outcome.exitCode);
         outcome.marks = ReadBytes(marker);
