@@ -1,6 +1,6 @@
 #pragma once
 
-/// Makes GCC's run-time allocate now what it needs to throw when memory is exhausted: the lock of its emergency
+/// Makes GCC's run-time allocate now what it needs to throw when memory runs out: the lock of its emergency
 /// pool, made on the pool's first use, and the state of the calling thread. Without them the first exception in
 /// a process without memory ends it. Called once, when the process loads the library. Other run-times need
 /// nothing.

@@ -4,8 +4,8 @@
 
 #include <utility>
 
-/// Owns a handle of the system and gives it back. A policy says what the handle's type is, which value means "none",
-/// and how the handle is given back. The thread's last error stays as it was.
+/// Owns a handle of the system and closes it. A policy names the handle's type, the value that means "none" and the
+/// function that closes it. Closing keeps the thread's last error.
 template <typename Policy>
 class UniqueHandle
 {
@@ -27,10 +27,10 @@ public:
     explicit operator bool() const noexcept { return m_handle != Policy::None(); }
     Handle Get() const noexcept { return m_handle; }
 
-    /// Gives the ownership to the caller.
+    /// Hands the ownership to the caller.
     Handle Release() noexcept { return std::exchange(m_handle, Policy::None()); }
 
-    /// Gives the handle back and takes another one.
+    /// Closes the handle and takes another one.
     void Reset(Handle handle = Policy::None()) noexcept
     {
         const Handle previous = std::exchange(m_handle, handle);
@@ -42,7 +42,7 @@ public:
         }
     }
 
-    /// Gives the handle back and returns where a function stores the next one.
+    /// Closes the handle and returns the address where a function stores the next one.
     Handle* Out() noexcept
     {
         Reset();

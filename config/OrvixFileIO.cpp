@@ -52,8 +52,8 @@ std::wstring XmlText(const wchar_t* text)
     return result;
 }
 
-/// Whether the document refers to an entity that it declares: the few characters of a reference can stand for
-/// gigabytes of text. Looks at every node, but only where there is a document type to declare entities.
+/// Whether the document refers to an entity that it declares: a reference of a few characters can expand to gigabytes
+/// of text. Looks at every node, but only in a document with a document type, which is where entities are declared.
 bool UsesEntities(IXMLDOMDocument* document)
 {
     ComPtr<IXMLDOMDocumentType> type;

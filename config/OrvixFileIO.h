@@ -12,12 +12,12 @@
 /// Reads or writes one XML file through the MSXML document object model.
 ///
 /// Used on one thread, for one file: `OpenDocument` or `CreateDocument`, then the node operations, then
-/// `CloseDocument` (an `OpenedDocument` sees to that). Both starting operations initialise COM on the thread;
+/// `CloseDocument` (see `OpenedDocument`). Both starting operations initialise COM on the thread;
 /// `CloseDocument` is the only place that uninitialises it, so it is called after a success only, and no node
 /// may be held across it. A failed start leaves COM as it is.
 ///
-/// A node argument may not be null, save a parent: null means the document node. Operations report failure by
-/// false. When memory for a string is exhausted `_com_error` is thrown.
+/// A node argument may not be null, except a parent: null means the document node. Operations report failure by
+/// false. When memory for a string runs out, `_com_error` is thrown.
 class OrvixFileIO
 {
 public:
@@ -58,7 +58,7 @@ public:
     /// The document node of an opened document; null otherwise. Owned by this object.
     Node* GetDocumentRoot();
 
-    /// The root element, whatever stands around it, and its name; false when there is none.
+    /// The root element, whatever is around it, and its name; false when there is none.
     bool GetRootElement(Node& root, std::wstring& name);
 
     /// Number of child nodes; 0 when they cannot be read.
@@ -71,7 +71,7 @@ public:
     /// The first child; false when there is none.
     bool GetFirstChild(IXMLDOMNode* parent, Node& child);
 
-    /// Steps from `node` to its next sibling; false, with a null node, behind the last.
+    /// Steps from `node` to its next sibling; false, with a null node, after the last one.
     bool GetNextSibling(Node& node);
 
     /// Name of an element; false for every other kind of node.
@@ -87,7 +87,7 @@ public:
     /// all were found. At most 32 names.
     bool FindChildTexts(IXMLDOMNode* node, std::span<const std::wstring_view> names, std::span<std::wstring> texts);
 
-    /// Adds an element under a parent, in front of its first child or behind its last; always true.
+    /// Adds an element under a parent, before its first child or after its last one; always true.
     bool AddElement(IXMLDOMNode* parent, const wchar_t* name, Node& element, bool insertFirst);
 
     /// Adds an element whose only child is a text node.

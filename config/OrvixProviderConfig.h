@@ -14,8 +14,8 @@ struct FileExclusion
 
 /// The administrator's settings for one provider. The consumers read the fields.
 ///
-/// Made once per initialisation of a services object and alive until the process ends, deliberately: callers
-/// hold plain pointers to it. The filters are not owned and live as long.
+/// Made once per initialisation of a services object and never destroyed, since callers hold plain pointers to it. The
+/// filters are not owned and live as long.
 class OrvixProviderConfig
 {
 public:
@@ -36,6 +36,6 @@ public:
     std::wstring m_msSccDllSearchPath;
     std::wstring m_msSccDllFullPath;
 
-    /// In list order. A filter stands here once for its name and once more for every element behind the name.
+    /// In the order of the file. A filter is here once for its name and once more for every element after the name.
     std::vector<ProviderFilters*> m_filters;
 };

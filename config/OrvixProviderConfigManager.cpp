@@ -77,8 +77,8 @@ bool IsFirstChoice(const std::wstring& element, const std::wstring& text, const 
     return false;
 }
 
-/// Reads one filter. It is appended to the configuration once for its name and once more for every element
-/// behind the name: deliberate, and harmless. A filter whose first element is not its name is dropped.
+/// Reads one filter. It is appended to the configuration once for its name and once more for every element after the
+/// name; the repetitions give the same verdict. A filter whose first element is not its name is dropped.
 void ReadFilter(OrvixFileIO& file, IXMLDOMNode* node, OrvixProviderConfig& config, Reading& reading)
 {
     auto owned = std::make_unique<ProviderFilters>();

@@ -23,12 +23,12 @@ public:
     /// "OrvixProviders" element (a missing or broken file has none) or memory is exhausted. `diagnostics` may be null.
     bool LoadConfig(const wchar_t* path, FileDiagnostics* diagnostics = nullptr);
 
-    /// The first configuration whose name occurs anywhere in `providerName`, letter case aside; null when
+    /// The first configuration whose name occurs anywhere in `providerName`, in any letter case; null when
     /// there is none or the name is null. Throws std::bad_alloc, since null would mean "not switched off".
     OrvixProviderConfig* FindConfig(const wchar_t* providerName) const;
 
-    /// Every configuration whose name occurs in `providerName`: the one that `FindConfig` gives, and behind it those
-    /// that it hides. Throws std::bad_alloc.
+    /// Every configuration whose name occurs in `providerName`: first the one that `FindConfig` gives, then those that
+    /// it hides. Throws std::bad_alloc.
     std::vector<OrvixProviderConfig*> FindAllConfigs(const wchar_t* providerName) const;
 
 private:

@@ -13,7 +13,7 @@ namespace
 {
 
 constexpr std::size_t MaxTextLength = 1024;
-constexpr long RootIndex = 1; // the declaration is child 0; the root's name is not looked at, on purpose
+constexpr long RootIndex = 1; // the declaration is child 0; a root of any name is read
 
 enum Field
 {

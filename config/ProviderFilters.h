@@ -4,7 +4,7 @@
 #include <string_view>
 #include <vector>
 
-/// A path in upper case with what stands behind its last dot, made once for all filters.
+/// A path in upper case and the text after its last dot, made once for all filters.
 struct FilteredPath
 {
     explicit FilteredPath(const wchar_t* path);

@@ -31,7 +31,7 @@ struct NotificationIDs
     std::uint32_t after;
 };
 
-/// The first row whose operation is asked for gives the identifiers.
+/// The first row with a requested operation gives the identifiers.
 constexpr NotificationIDs Notifications[] = {
     {OrvixOperation::CheckIn, OrvixNotificationID::BeforeCheckIn, OrvixNotificationID::AfterCheckIn},
     {OrvixOperation::Add, OrvixNotificationID::BeforeAdd, OrvixNotificationID::AfterAdd},
@@ -245,7 +245,7 @@ void FileListOperation::StoreAnswers(std::int32_t result)
     }
 }
 
-/// Whether the record's options, which anybody may change meanwhile, have a bit now.
+/// Whether the record's options have a bit. Read afresh each time, since the dialog and listeners change them.
 bool FileListOperation::HasOption(std::uint32_t bit)
 {
     return (m_params.GetOptions() & bit) != 0;

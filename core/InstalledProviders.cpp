@@ -51,7 +51,7 @@ InstalledProviders::Step InstalledProviders::KeyPathAt(HKEY list, DWORD index, s
     DWORD type = REG_NONE;
     const LSTATUS status = RegEnumValueW(list, index, name.data(), &nameSize, nullptr, &type,
                                          reinterpret_cast<BYTE*>(data.data()), &dataSize);
-    // A key that is deleted meanwhile answers every index with this error.
+    // A key that is deleted during the walk answers every index with this error.
     if (status == ERROR_NO_MORE_ITEMS || status == ERROR_KEY_DELETED)
     {
         return Step::End;

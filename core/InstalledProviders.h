@@ -7,7 +7,7 @@
 class OrvixProviderConfig;
 class OrvixProviderConfigManager;
 
-/// The registry's list of installed MSSCCI libraries, and of one of them what its own key says.
+/// The registry's list of installed MSSCCI libraries, and what the key of one library says.
 ///
 /// Texts have at most 2047 bytes; a longer one is a failed read. One of exactly 2048 bytes, which the fixed buffers
 /// of this contract cannot terminate, makes the services object end the process (`EndProcess`).
@@ -30,7 +30,7 @@ inline constexpr std::size_t MaxServerPath = 1024;
 /// view of the registry (KEY_WOW64_32KEY), which no 64-bit host sees.
 UniqueRegistryKey OpenList(REGSAM view = 0);
 
-/// What the reading of one text came to.
+/// The result of reading one text.
 enum class Step
 {
     Found,
@@ -49,7 +49,7 @@ UniqueRegistryKey OpenProvider(const std::wstring& path, REGSAM view = 0);
 /// A value of the provider's key, whatever its type. Throws std::bad_alloc.
 Step ReadText(HKEY provider, const wchar_t* valueName, std::wstring& text);
 
-/// Why a library of the list is a provider, or is none.
+/// Whether a library of the list is a provider, and if not, the reason.
 enum class Verdict
 {
     Listed,

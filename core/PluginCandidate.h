@@ -32,12 +32,13 @@ struct PluginCandidate
     static constexpr const char* GetName = "GetOrvixProviderName";
     static constexpr std::array Exports = {GetVersion, GetProvider, ReleaseProvider, GetName};
 
-    /// Loads the plug-in and asks for its version and its name. Throws std::bad_alloc; what the plug-in itself throws
-    /// makes the verdict.
+    /// Loads the plug-in and asks for its version and its name. Throws std::bad_alloc; an exception of the plug-in
+    /// itself gives the verdict `Throws`.
     static PluginCandidate Judge(const std::wstring& path, const UniqueActivationContext& context,
                                  const OrvixProviderConfigManager& configs);
 
-    /// The functions that a plug-in lacks, whatever the verdict is; none of what does not load. Throws std::bad_alloc.
+    /// The functions that the plug-in does not export, whatever the verdict; empty when it does not load. Throws
+    /// std::bad_alloc.
     std::vector<const char*> FindMissingExports() const;
 
     Verdict verdict = Verdict::PathTooLong;

@@ -2,6 +2,7 @@
 
 #include "ExceptionBarrier.h"
 #include "IOrvixNotifyCallback.h"
+#include "OrvixNotificationID.h"
 #include "OrvixNotifyParams.h"
 
 #include <algorithm>
@@ -13,19 +14,19 @@
 namespace
 {
 
-constexpr std::uint32_t Cancel = 1;
-
-/// The listeners in order of registration; entry i of one array belongs to entry i of the other.
-struct Registry
+struct Listener
 {
-    std::vector<IOrvixNotifyCallback*> callbacks;
-    std::vector<std::int64_t> userData;
+    IOrvixNotifyCallback* callback;
+    std::int64_t userData;
 };
+
+/// In order of registration.
+using Registry = std::vector<Listener>;
 
 /// The process-wide registry; freed when the library is unloaded.
 std::unique_ptr<Registry> theRegistry;
 
-/// The registry, made on first use; null when memory is exhausted.
+/// The registry, made on first use; null when memory runs out.
 Registry* GetRegistry()
 {
     if (!theRegistry)
@@ -33,6 +34,12 @@ Registry* GetRegistry()
         theRegistry.reset(new (std::nothrow) Registry);
     }
     return theRegistry.get();
+}
+
+Registry::iterator Find(Registry& registry, const IOrvixNotifyCallback* callback)
+{
+    return std::find_if(registry.begin(), registry.end(),
+                        [callback](const Listener& listener) { return listener.callback == callback; });
 }
 
 } // namespace
@@ -44,23 +51,9 @@ bool OrvixNotification::RegisterOrvixNotification(IOrvixNotifyCallback* callback
     {
         return false;
     }
-    auto& callbacks = registry->callbacks;
-    if (std::find(callbacks.begin(), callbacks.end(), callback) != callbacks.end())
-    {
-        return true;
-    }
-    return WithBarrier(false, [&] {
-        callbacks.push_back(callback);
-        const bool complete = WithBarrier(false, [&] {
-            registry->userData.push_back(userData);
-            return true;
-        });
-        if (!complete)
-        {
-            callbacks.pop_back();
-        }
-        return complete;
-    });
+    return Find(*registry, callback) != registry->end() || Completes([&] {
+               registry->push_back({callback, userData});
+           });
 }
 
 bool OrvixNotification::UnRegisterOrvixNotification(IOrvixNotifyCallback* callback)
@@ -70,13 +63,12 @@ bool OrvixNotification::UnRegisterOrvixNotification(IOrvixNotifyCallback* callba
     {
         return false;
     }
-    const auto found = std::find(registry->callbacks.begin(), registry->callbacks.end(), callback);
-    if (found == registry->callbacks.end())
+    const auto found = Find(*registry, callback);
+    if (found == registry->end())
     {
         return false;
     }
-    registry->userData.erase(registry->userData.begin() + (found - registry->callbacks.begin()));
-    registry->callbacks.erase(found);
+    registry->erase(found);
     return true;
 }
 
@@ -93,25 +85,27 @@ std::uint32_t OrvixNotification::BroadcastOrvixNotification(OrvixNotifyParams* p
     const Registry* registry = GetRegistry();
     if (registry == nullptr || params == nullptr)
     {
-        return 0;
+        return OrvixListenerAnswer::Accept;
     }
-    // A listener may register and unregister listeners: the arrays are read afresh at every step.
-    for (std::size_t i = 0; i < registry->callbacks.size(); ++i)
+    // A listener may register and unregister listeners: the registry is read afresh at every step.
+    for (std::size_t i = 0; i < registry->size(); ++i)
     {
-        const std::uint32_t answer = registry->callbacks[i]->Notify(params, registry->userData[i]);
-        if (answer == 0)
+        const Listener listener = (*registry)[i];
+        const std::uint32_t answer = listener.callback->Notify(params, listener.userData);
+        if (answer == OrvixListenerAnswer::Accept)
         {
             continue;
         }
-        if (answer == Cancel)
+        if (answer == OrvixListenerAnswer::Veto)
         {
             params->SetCancelled(true);
-            for (std::size_t j = 0; j < i && j < registry->callbacks.size(); ++j)
+            for (std::size_t j = 0; j < i && j < registry->size(); ++j)
             {
-                registry->callbacks[j]->Notify(params, registry->userData[j]);
+                const Listener earlier = (*registry)[j];
+                earlier.callback->Notify(params, earlier.userData);
             }
         }
         return answer;
     }
-    return 0;
+    return OrvixListenerAnswer::Accept;
 }

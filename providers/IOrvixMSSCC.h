@@ -27,20 +27,20 @@ public:
     /// The interface's version, major in the high word; 0 when it cannot be asked.
     virtual LONG GetVersion() = 0;
 
-    /// Starts the library for a host of this name; 0 at once when it is started already.
+    /// Starts the library for a host of this name; 0 at once when it has been started.
     virtual SCCRTN Initialize(LPCSTR callerName) = 0;
 
     /// Closes an open project and ends the library, also one that was never started.
     virtual SCCRTN Uninitialize() = 0;
 
-    /// Opens the project of a local folder, after closing the open one. What the project settings file there says is
-    /// used, and the file is written afterwards. When the library refuses its project strings (-23) it is asked for
-    /// new ones, and to open once more.
+    /// Opens the project of a local folder, after closing the open one. Reads the project settings file there first and
+    /// writes it afterwards. When the library refuses its project strings (-23), it is asked for new ones and then to
+    /// open the project once more.
     virtual SCCRTN OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC output) = 0;
 
     virtual SCCRTN CloseProject() = 0;
 
-    /// Has the library choose a project, which may be a new one. The bridge keeps the choice; the first four
+    /// Lets the library choose a project, which may be a new one. The bridge keeps the choice; the first four
     /// arguments are not used.
     virtual SCCRTN GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath, BOOL allowChangePath) = 0;
 

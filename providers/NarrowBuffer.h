@@ -3,8 +3,8 @@
 #include <array>
 #include <cstddef>
 
-/// A text in the ANSI code page that a provider may read and overwrite. Whatever the text's own limit, the memory
-/// holds the longest text that the interface lets a provider write anywhere, and ends in a zero behind it.
+/// A text in the ANSI code page that a provider may read and overwrite. Whatever the text's own limit, the memory holds
+/// the longest text that the interface lets a provider write, and a zero after it.
 class NarrowBuffer
 {
 public:

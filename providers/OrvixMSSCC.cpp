@@ -57,7 +57,7 @@ bool OrvixMSSCC::SetProvider(const wchar_t* dllPath, const wchar_t* searchFolder
     return !loadNow || Load();
 }
 
-/// Loads the library and asks it for its version. A library without SccGetVersion stays loaded all the same.
+/// Loads the library and asks it for its version. A library without SccGetVersion stays loaded.
 bool OrvixMSSCC::Load()
 {
     {
@@ -107,7 +107,7 @@ Result OrvixMSSCC::Call(const SccFunction<Result(Parameters...)>& entry,
 }
 
 /// Copies at most `limit` characters and fills up to the limit with zeros. A text that reaches the limit gets no
-/// terminator there, so that a cut text which comes back unchanged leaves the rest of the field standing.
+/// terminator there: when a text that was cut comes back unchanged, the rest of the field stays.
 void OrvixMSSCC::Store(Field& field, std::wstring_view text, std::size_t limit) noexcept
 {
     limit = std::min(limit, FieldLimit);
@@ -135,7 +135,7 @@ SCCRTN OrvixMSSCC::Initialize(LPCSTR callerName)
     {
         return SCC_OK;
     }
-    if (Resolve(SccFunctions::Initialize) == nullptr) // before the fields are read: loading sets one
+    if (Resolve(SccFunctions::Initialize) == nullptr) // before the fields are read, since loading sets one
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -157,7 +157,7 @@ SCCRTN OrvixMSSCC::Initialize(LPCSTR callerName)
 
 SCCRTN OrvixMSSCC::Uninitialize()
 {
-    // The library is told even when it was never started: deliberate.
+    // The library is called even when it was never started, as the interface promises.
     if (Resolve(SccFunctions::Uninitialize) == nullptr)
     {
         return SCC_E_INITIALIZEFAILED;
@@ -171,7 +171,7 @@ SCCRTN OrvixMSSCC::Uninitialize()
         field->front() = L'\0';
     }
     m_capabilities = 0;
-    m_commentLength = 0; // the check-out comment's length stays: deliberate
+    m_commentLength = 0; // the length of check-out comments keeps its value, as the interface promises
     m_initialized = false;
     m_projectOpen = false;
     m_commandOptionsPending = true;
@@ -191,12 +191,12 @@ SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC o
         return SCC_E_INITIALIZEFAILED;
     }
     std::string path; // with room for the longest text that a library may write
-    if (!WithBarrier(false, [&] {
-            path.reserve(MAX_PATH);
-            path = localPath != nullptr ? localPath : "";
-            path.resize(std::max<std::size_t>(path.size(), MAX_PATH));
-            return true;
-        }))
+    const bool hasPath = Completes([&] {
+        path.reserve(MAX_PATH);
+        path = localPath != nullptr ? localPath : "";
+        path.resize(std::max<std::size_t>(path.size(), MAX_PATH));
+    });
+    if (!hasPath)
     {
         return SCC_E_INITIALIZEFAILED;
     }
@@ -215,7 +215,7 @@ SCCRTN OrvixMSSCC::OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC o
         result = GetProjPath(nullptr, nullptr, nullptr, nullptr, TRUE);
         if (result == SCC_OK)
         {
-            result = open(); // with the same texts: deliberate
+            result = open(); // with the same texts: the library may have written into them
         }
     }
     if (result != SCC_OK)
@@ -370,26 +370,26 @@ SCCRTN OrvixMSSCC::SetOption(LONG option, LONG value)
     return Call(SccFunctions::SetOption, m_context, option, value);
 }
 
-/// Takes the auxiliary path and the project name from the settings file. What cannot be read, for want of memory as
-/// well, leaves them.
+/// Takes the auxiliary path and the project name from the settings file. What cannot be read changes nothing, also
+/// when memory runs out.
 void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
 {
     if (m_settingsFileName.empty() || folder == nullptr)
     {
         return;
     }
-    WithBarrier(false, [&] {
+    Completes([&] {
         OrvixFileIO file;
         if (!file.OpenDocument((folder + (L'\\' + m_settingsFileName)).c_str()))
         {
-            return false;
+            return;
         }
         const OpenedDocument opened(file);
         OrvixFileIO::Node root;
         std::wstring name;
         if (!file.GetRootElement(root, name) || !EqualNames(name, RootName))
         {
-            return false;
+            return;
         }
         OrvixFileIO::Node child;
         std::wstring text;
@@ -408,28 +408,29 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
                 Store(m_projectName, text, FieldLimit);
             }
         }
-        return true;
     });
 }
 
-/// Writes both texts; failures are silent, those of memory as well: the project is open all the same.
+/// Writes both texts. A failure is silent, also when memory runs out: the project is open in any case.
 void OrvixMSSCC::WriteProjectSettings(const wchar_t* folder)
 {
     if (m_settingsFileName.empty() || folder == nullptr)
     {
         return;
     }
-    WithBarrier(false, [&] {
+    Completes([&] {
         OrvixFileIO file;
         if (!file.CreateDocument())
         {
-            return false;
+            return;
         }
         const OpenedDocument opened(file);
         OrvixFileIO::Node root;
         file.AddElement(nullptr, RootName, root, false);
-        return root != nullptr && file.AddTextElement(root.Get(), AuxPathName, m_auxPath.data()) &&
-               file.AddTextElement(root.Get(), ProjectNameName, m_projectName.data()) &&
-               file.SaveDocument((folder + (L'\\' + m_settingsFileName)).c_str());
+        if (root != nullptr && file.AddTextElement(root.Get(), AuxPathName, m_auxPath.data()) &&
+            file.AddTextElement(root.Get(), ProjectNameName, m_projectName.data()))
+        {
+            file.SaveDocument((folder + (L'\\' + m_settingsFileName)).c_str());
+        }
     });
 }

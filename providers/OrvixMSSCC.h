@@ -11,18 +11,18 @@
 template <typename Function>
 struct SccFunction;
 
-/// The bridge to one MSSCCI library, which it loads on first use and frees when it is destroyed.
+/// The bridge to one MSSCCI library. It loads the library on first use and frees it when it is destroyed.
 ///
-/// Each operation finds its function when it is called for the first time; one that is missing fails that operation
-/// alone, but without SccGetVersion the operation that loads the library fails. A load that failed is tried again by
-/// the next operation. The folder that the process searches for libraries is the search folder during the load and as
-/// before afterwards. An empty one is restored as none: the system reports both alike.
+/// Each operation looks its function up when it is called for the first time. A missing function fails that operation
+/// alone; without SccGetVersion the operation that loads the library fails. After a failed load the next operation
+/// tries again. During the load the process searches the search folder for libraries, and the previous DLL directory
+/// afterwards. An empty DLL directory is restored as none: the system reports both alike.
 ///
-/// What a library may write by its interface, up to 300 bytes of text, never reaches other memory than its buffer's.
-/// Texts are cut to the field's limit, between characters on their way to the library.
+/// A library may write up to 300 bytes of text, as the interface allows: every buffer has room for that. Texts are cut
+/// to the field's limit; on their way to the library never within a character.
 ///
-/// Where the interface leaves the choice: a library that asks for a project (`GetProjPath`) may make a new one, and
-/// the context and the capabilities of a failed start are dropped.
+/// A library that asks for a project (`GetProjPath`) may make a new one. After a failed start the context and the
+/// capabilities are dropped.
 class OrvixMSSCC final : public IOrvixMSSCC
 {
 public:
@@ -31,8 +31,8 @@ public:
     OrvixMSSCC& operator=(const OrvixMSSCC&) = delete;
     ~OrvixMSSCC() override;
 
-    /// Names the library; called once. `searchFolder` is where the libraries that it needs are looked for; null keeps
-    /// the old one. False only with `loadNow`, when the library does not load or lacks SccGetVersion. Throws
+    /// Names the library; called once. `searchFolder` is the folder of the libraries that it needs; null keeps the old
+    /// one. False only with `loadNow`, when the library does not load or does not export SccGetVersion. Throws
     /// std::bad_alloc.
     bool SetProvider(const wchar_t* dllPath, const wchar_t* searchFolder, const wchar_t* providerName, bool loadNow);
 
@@ -110,7 +110,7 @@ private:
     Field m_sccName = {};
     Field m_auxPath = {};
     Field m_user = {};
-    Field m_spare = {}; // has no use; kept on purpose
+    Field m_spare = {}; // cleared with the others and read by nobody: part of the object's fixed fields
     Field m_projectName = {};
     Field m_localPath = {};
     LPVOID m_context = nullptr;

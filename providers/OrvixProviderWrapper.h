@@ -9,9 +9,9 @@ class OrvixMSSCC;
 /// An installed MSSCCI library as a provider: turns the active entries of a list into narrow paths, calls the bridge,
 /// and turns its result into 0 (the library answered 0) or -1.
 ///
-/// Before anything is sent, an operation fails with -1 for a null or empty list, a null path, without memory, and for a
-/// path that the ANSI code page does not carry exactly: it would name another file. Comments and names may lose
-/// characters. A null comment is an empty one. What the library or the host throws during an operation makes it fail.
+/// An operation fails with -1 before anything is sent: for a null or empty list, for a null path, when memory runs out,
+/// and for a path that the ANSI code page does not carry exactly, since it would name another file. Comments and names
+/// may lose characters. A null comment counts as empty. An exception of the library or the host fails the operation.
 ///
 /// The library's text output goes to the client access of the last `Initialize` of any wrapper.
 class OrvixProviderWrapper : public IOrvixProvider

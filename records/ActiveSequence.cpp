@@ -59,7 +59,7 @@ std::size_t ActiveSequence::PositionOf(OrvixFileEntry* entry)
         m_searched = 0;
     }
 
-    // Where no entry stands twice, any occurrence is the first, and the search may start behind the gap.
+    // Without repetition any occurrence is the first, and the search may start after the gap.
     if (m_distinct)
     {
         const std::size_t position = find(m_gapEnd, m_slots.size());

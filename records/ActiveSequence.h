@@ -51,6 +51,6 @@ private:
     std::vector<OrvixFileEntry*> m_slots;
     std::size_t m_gapBegin = 0;
     std::size_t m_gapEnd = 0;
-    bool m_distinct = true;     ///< known that no entry stands twice
+    bool m_distinct = true;     ///< no entry is known to be in the sequence twice
     std::size_t m_searched = 0; ///< slots searched since that was last unknown
 };

@@ -12,7 +12,7 @@
 namespace
 {
 
-/// One step on the way down a tree: an entry and the child to look at next.
+/// One step on the path down a tree: an entry and the child to look at next.
 struct TreeStep
 {
     OrvixFileEntry* entry;
@@ -20,19 +20,19 @@ struct TreeStep
 };
 
 /// Appends to the active list, children before their parents, what the mask selects in the tree below `root`.
-/// The way down is kept on the heap: a tree may be deeper than the stack.
-void AppendTree(OrvixFileEntry* root, unsigned long mask, std::vector<TreeStep>& way, ActiveSequence& active)
+/// The path down is kept on the heap: a tree may be deeper than the stack.
+void AppendTree(OrvixFileEntry* root, unsigned long mask, std::vector<TreeStep>& path, ActiveSequence& active)
 {
-    way.push_back({root, 0});
-    while (!way.empty())
+    path.push_back({root, 0});
+    while (!path.empty())
     {
-        TreeStep& step = way.back();
+        TreeStep& step = path.back();
         OrvixFileEntry* entry = step.entry;
         if (step.nextChild < entry->NumChildren())
         {
             if (OrvixFileEntry* child = entry->GetChild(step.nextChild++))
             {
-                way.push_back({child, 0});
+                path.push_back({child, 0});
             }
             continue;
         }
@@ -40,21 +40,21 @@ void AppendTree(OrvixFileEntry* root, unsigned long mask, std::vector<TreeStep>&
         {
             active.Append(entry);
         }
-        way.pop_back();
+        path.pop_back();
     }
 }
 
-/// Removes the first occurrence of `target` from every sequence of children below `root`; the siblings behind
-/// it are not visited.
-void DetachFromTree(OrvixFileEntry* root, OrvixFileEntry* target, std::vector<TreeStep>& way)
+/// Removes the first occurrence of `target` from every sequence of children below `root`; the siblings after it are
+/// not visited.
+void DetachFromTree(OrvixFileEntry* root, OrvixFileEntry* target, std::vector<TreeStep>& path)
 {
-    way.push_back({root, 0});
-    while (!way.empty())
+    path.push_back({root, 0});
+    while (!path.empty())
     {
-        TreeStep& step = way.back();
+        TreeStep& step = path.back();
         if (step.nextChild >= step.entry->NumChildren())
         {
-            way.pop_back();
+            path.pop_back();
             continue;
         }
         const unsigned int position = step.nextChild++;
@@ -62,11 +62,11 @@ void DetachFromTree(OrvixFileEntry* root, OrvixFileEntry* target, std::vector<Tr
         if (child == target)
         {
             step.entry->RemoveChild(position);
-            way.pop_back();
+            path.pop_back();
         }
         else if (child != nullptr)
         {
-            way.push_back({child, 0});
+            path.push_back({child, 0});
         }
     }
 }
@@ -160,10 +160,10 @@ bool OrvixFileList::RemoveEntry(unsigned int index)
         {
             roots.erase(root);
         }
-        std::vector<TreeStep> way;
+        std::vector<TreeStep> path;
         for (OrvixFileEntry* remaining : roots)
         {
-            DetachFromTree(remaining, entry, way);
+            DetachFromTree(remaining, entry, path);
         }
     });
     if (!detached)
@@ -223,12 +223,12 @@ unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
         active.Reserve(std::max(NumEntries(), 1U));
         if (fromRoots)
         {
-            std::vector<TreeStep> way;
+            std::vector<TreeStep> path;
             for (unsigned int i = 0; i < NumRootEntries(); ++i)
             {
                 if (OrvixFileEntry* root = GetRootEntry(i))
                 {
-                    AppendTree(root, mask, way, active);
+                    AppendTree(root, mask, path, active);
                 }
             }
             return;
