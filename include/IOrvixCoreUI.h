@@ -36,6 +36,7 @@ protected:
     ~IOrvixCoreUI() = default;
 };
 
+/// Marks what OrvixCoreUI.dll exports. The user-interface library defines ORVIXCOREUI_BUILD; everybody else imports.
 #if defined(ORVIXCOREUI_BUILD)
 #define ORVIXCOREUI_API __declspec(dllexport)
 #else

@@ -35,7 +35,7 @@ public:
     /// Display name, valid as long as the provider. [plug-in, main-thread]
     virtual const wchar_t* GetName() = 0;
 
-    /// Returns 0.
+    /// Reserved. Returns 0. [plug-in, main-thread]
     virtual int ReservedA() = 0;
 
     /// True after a successful `Initialize`, until `Uninitialize`. [plug-in, main-thread]
@@ -55,13 +55,13 @@ public:
     /// [plug-in, main-thread, initialized]
     virtual int OpenProject(const wchar_t* localPath, const wchar_t* comment) = 0;
 
-    /// [plug-in, main-thread, project-open]
+    /// Closes the open project. [plug-in, main-thread, project-open]
     virtual int CloseProject() = 0;
 
-    /// Returns 0.
+    /// Reserved. Returns 0. [plug-in, main-thread]
     virtual int ReservedB() = 0;
 
-    /// Returns -2.
+    /// Reserved. Returns -2. [plug-in, main-thread]
     virtual int ReservedC() = 0;
 
     /// Stores new versions. Bit 0x1 of `options`: keep the files checked out. An empty active list fails, as
@@ -79,10 +79,10 @@ public:
     /// Brings the latest version. [plug-in, main-thread, project-open]
     virtual int GetLatest(OrvixFileList* list, unsigned long options) = 0;
 
-    /// Stores 0 through both pointers and returns -2.
+    /// Reserved. Stores 0 through both pointers and returns -2. [plug-in, main-thread]
     virtual int ReservedD(void* argument, unsigned long* first, unsigned long* second) = 0;
 
-    /// Returns -2.
+    /// Reserved. Returns -2. [plug-in, main-thread]
     virtual int ReservedE() = 0;
 
     /// Puts files under control. Bit 0x1 of `options`: keep them checked out.
@@ -112,10 +112,10 @@ public:
     /// `options` is 0 from the library. [plug-in, main-thread]
     virtual int QueryStatus(OrvixFileList* list, unsigned long options) = 0;
 
-    /// Returns -2.
+    /// Reserved. Returns -2. [plug-in, main-thread]
     virtual int ReservedF() = 0;
 
-    /// Returns -2.
+    /// Reserved. Returns -2. [plug-in, main-thread]
     virtual int ReservedG() = 0;
 
     /// Shows the provider's own options dialog. [plug-in, main-thread, initialized]
@@ -124,9 +124,9 @@ public:
     /// Starts the provider's own program. [plug-in, main-thread, initialized]
     virtual int RunProviderClient() = 0;
 
-    /// Returns -2.
+    /// Reserved. Returns -2. [plug-in, main-thread]
     virtual int ReservedH() = 0;
 
-    /// Returns true.
+    /// Reserved. Returns true. [plug-in, main-thread]
     virtual bool ReservedI() = 0;
 };

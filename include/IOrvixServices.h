@@ -34,7 +34,7 @@ public:
     /// user-interface library stays until the object is destroyed. [library, main-thread]
     virtual void Shutdown() = 0;
 
-    /// [library, main-thread]
+    /// Number of providers found; 0 before `Initialize` and after `Shutdown`. [library, main-thread]
     virtual std::uint32_t GetProviderCount() = 0;
 
     /// The provider's name, owned by the services object, valid until `Shutdown`. [library, main-thread]
@@ -85,9 +85,13 @@ public:
     /// result. [library, main-thread]
     virtual std::int32_t EditPrompts(void* a, void* b) = 0;
 
-    /// Settings of the provider from "OrvixProviders.xml"; null without configuration, empty when the setting
-    /// is absent. Valid until the process ends. [library, main-thread]
+    /// The administrator's setting "FixedProjectRoot" for the provider, from "OrvixProviders.xml": the folder of
+    /// its projects. The library hands it to the host and does not use it. Null for a provider without
+    /// configuration, empty when the setting is absent. Valid until the process ends. [library, main-thread]
     virtual const wchar_t* GetProviderFixedProjectRoot(std::uint32_t index) = 0;
+
+    /// The administrator's setting "AltProviderExecutable" for the provider: a program that the host may start for
+    /// it. Everything else as for `GetProviderFixedProjectRoot`. [library, main-thread]
     virtual const wchar_t* GetProviderAltExecutable(std::uint32_t index) = 0;
 
     /// True when one of the provider's filters excludes the file. `filterName` may be null; it receives the

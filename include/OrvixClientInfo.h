@@ -21,28 +21,34 @@ public:
 
     /// Name of the client program, as providers show it; empty by default.
     virtual const wchar_t* GetClientName();
+    /// Sets the name of the client program; a copy is kept.
     virtual void SetClientName(const wchar_t* name);
 
     /// Login name of the user; empty by default. The name ends in W so that no header's macro changes it.
     virtual const wchar_t* GetUserNameW();
+    /// Sets the login name; a copy is kept.
     virtual void SetUserName(const wchar_t* name);
 
     /// Window that providers' dialogs belong to; null by default. Not owned.
     virtual HWND__* GetParentWindow();
+    /// Sets the parent window; null for none.
     virtual void SetParentWindow(HWND__* window);
 
     /// Folder that is searched for provider plug-ins. "*.dll" is put directly behind it, so it ends in a
     /// backslash; the whole path of a plug-in must fit 260 characters, terminator included.
     virtual const wchar_t* GetProviderPluginPath();
+    /// Sets the plug-in folder; a copy is kept as it is, with no backslash added.
     virtual void SetProviderPluginPath(const wchar_t* path);
 
     /// Folder of "OrvixProviders.xml" and "OrvixPrompts.xml", without a backslash at its end: one is always
     /// added.
     virtual const wchar_t* GetConfigFilePath();
+    /// Sets the configuration folder; a copy is kept as it is.
     virtual void SetConfigFilePath(const wchar_t* path);
 
     /// The host's call-back interface; null by default. Not owned; it must outlive the services object.
     virtual IOrvixClientAccess* GetIOrvixClientAccess();
+    /// Sets the call-back interface; null for none.
     virtual void SetIOrvixClientAccess(IOrvixClientAccess* access);
 
 private:

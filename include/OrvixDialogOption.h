@@ -19,7 +19,7 @@ inline constexpr std::uint32_t RememberChecked = 0x80;    ///< the answers are t
 namespace OrvixDialogResult
 {
 
-inline constexpr std::int32_t Cancelled = 0;
-inline constexpr std::int32_t Confirmed = 1;
+inline constexpr std::int32_t Cancelled = 0; ///< the user cancelled: nothing is done
+inline constexpr std::int32_t Confirmed = 1; ///< the user confirmed the files
 
 } // namespace OrvixDialogResult

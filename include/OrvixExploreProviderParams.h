@@ -20,14 +20,17 @@ public:
 
     /// Title of the dialog; empty by default.
     virtual const wchar_t* GetTitle();
+    /// Sets the title; a copy is kept.
     virtual void SetTitle(const wchar_t* title);
 
     /// Whether several files may be chosen; false by default.
     virtual bool GetMultipleSelections();
+    /// Sets whether several files may be chosen.
     virtual void SetMultipleSelections(bool allowed);
 
     /// Whether the chosen files are downloaded; true by default.
     virtual bool GetDownloadFiles();
+    /// Sets whether the chosen files are downloaded.
     virtual void SetDownloadFiles(bool download);
 
     /// Appends a file-type filter; both texts are copied unchanged. Returns the new number of filters, or 0
@@ -37,8 +40,9 @@ public:
     /// Number of filters.
     virtual std::uint32_t NumFilters();
 
-    /// Name or extensions of the filter at `index`; null when `index` is not below `NumFilters()`.
+    /// Name of the filter at `index`; null when `index` is not below `NumFilters()`. Valid as long as the record.
     virtual const wchar_t* GetFilterName(std::uint32_t index);
+    /// Extensions of the filter at `index`, as `GetFilterName`.
     virtual const wchar_t* GetFilterExtensions(std::uint32_t index);
 
 private:

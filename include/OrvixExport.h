@@ -14,7 +14,8 @@
 #endif
 
 /// Declares two overloads of one virtual operation, `first` in the lower slot of the table.
-/// Microsoft's ABI lays overloads out in reverse order of declaration, GCC's in order of declaration.
+/// A comment in front of each is allowed. Microsoft's ABI lays overloads out in reverse order of declaration, GCC's in
+/// order of declaration.
 #if defined(_MSC_VER)
 #define ORVIX_OVERLOADS_IN_SLOT_ORDER(first, second)                                                                   \
     second;                                                                                                            \

@@ -29,22 +29,29 @@ public:
     /// Flags set by the host, on which `OrvixFileList::BuildActiveList` selects; 0 by default. Bit 0x1 is set by
     /// `IOrvixServices::RunFileListOperation` on the entries that fit.
     virtual unsigned long GetFlagsIn();
+    /// Sets the host's flags; every value is stored as it is.
     virtual void SetFlagsIn(unsigned long flags);
 
     /// A value that the host keeps with the entry; never interpreted, 0 by default.
     virtual long long GetClientPtr();
+    /// Sets the host's value.
     virtual void SetClientPtr(long long value);
 
     /// State flags written by a provider (see `IOrvixProvider::QueryStatus`); 0 by default. The file-list dialog
     /// overwrites bit 0x2 with the user's tick.
     virtual unsigned long GetFlagsOut();
+    /// Sets the state flags; every value is stored as it is.
     virtual void SetFlagsOut(unsigned long flags);
 
     /// Appends a child, which is not owned; its parent link is not touched and duplicates are not looked
     /// for. Links must not lead in a circle: whoever walks the tree would not come to an end. Returns `NumChildren()`,
     /// or 0 with nothing changed for null and when memory is exhausted.
     virtual unsigned int AddChild(OrvixFileEntry* child);
+
+    /// Number of children.
     virtual unsigned int NumChildren();
+
+    /// The child at `index`, not owned; null for an index out of range.
     virtual OrvixFileEntry* GetChild(unsigned int index);
 
     /// Unlinks a child without deleting it or touching its parent link; false for an index out of range.
@@ -53,17 +60,21 @@ public:
     /// Unlinks every child; always true.
     virtual bool RemoveAllChildren();
 
-    /// Two ways to append an attachment, a new entry that this entry owns: a copy of `source`'s path, flags,
-    /// client value and parent link (not of its children and attachments), or an entry made from a path and
-    /// values. `parent` is stored as given; this entry does not become the attachment's parent.
-    /// Returns `NumAttachments()`, or 0 with nothing changed when the first argument is null or memory is
-    /// exhausted.
-    ORVIX_OVERLOADS_IN_SLOT_ORDER(virtual unsigned int AddAttachment(OrvixFileEntry* source),
-                                  virtual unsigned int AddAttachment(const wchar_t* file, OrvixFileEntry* parent,
-                                                                     unsigned long flagsIn, long long clientPtr));
+    ORVIX_OVERLOADS_IN_SLOT_ORDER(
+        /// Appends an attachment, a new entry that this entry owns: a copy of `source`'s path, flags, client
+        /// value and parent link, not of its children and attachments. Returns `NumAttachments()`, or 0 with
+        /// nothing changed when `source` is null or memory is exhausted.
+        virtual unsigned int AddAttachment(OrvixFileEntry* source),
+        /// Appends an attachment made from a path and values. `parent` is stored as given; this entry does not
+        /// become the attachment's parent. Returns `NumAttachments()`, or 0 with nothing changed when `file` is
+        /// null or memory is exhausted.
+        virtual unsigned int AddAttachment(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
+                                           long long clientPtr));
+
+    /// Number of attachments.
     virtual unsigned int NumAttachments();
 
-    /// The attachment at `index`, owned by this entry.
+    /// The attachment at `index`, owned by this entry and valid until it is removed; null for an index out of range.
     virtual OrvixFileEntry* GetAttachment(unsigned int index);
 
     /// Deletes one attachment; false for an index out of range.
@@ -72,8 +83,10 @@ public:
     /// Deletes every attachment; always true.
     virtual bool RemoveAllAttachments();
 
-    /// The parent link; not owned, null by default. Setting it does not change the parent's children.
+    /// Sets the parent link, which is not owned; null for none. The parent's children do not change.
     virtual void SetParent(OrvixFileEntry* parent);
+
+    /// The parent link; null by default.
     virtual OrvixFileEntry* GetParent();
 
 private:

@@ -20,33 +20,37 @@ public:
     /// Deletes every entry that the list created.
     virtual ~OrvixFileList();
 
-    /// Two ways to append an entry that the list then owns.
-    ///
-    /// From `source`: copies path, flags, client value and parent link; shares the very same child objects
-    /// (their parent links still name the source); copies the attachments one level deep. The copy is added
-    /// to the children of the source's parent, or to the roots when there is none.
-    ///
-    /// From a path and values: the entry is added to the children of `parent`, which need not belong to this
-    /// list, or to the roots when `parent` is null.
-    ///
-    /// Returns the entry; null with the list unchanged when the path is null or memory is exhausted (a
-    /// parent whose `AddChild` gives 0 counts as exhausted).
-    ORVIX_OVERLOADS_IN_SLOT_ORDER(virtual OrvixFileEntry* CreateEntry(OrvixFileEntry& source),
-                                  virtual OrvixFileEntry* CreateEntry(const wchar_t* file, OrvixFileEntry* parent,
-                                                                      unsigned long flagsIn, long long clientPtr));
+    ORVIX_OVERLOADS_IN_SLOT_ORDER(
+        /// Appends a copy of an entry; the list owns it. Copies path, flags, client value and parent link, and the
+        /// attachments one level deep. The children are shared: the same objects, whose parent links still name
+        /// the source. The copy is added to the children of the source's parent, or to the roots when there is
+        /// none. Returns the copy; null with the list unchanged when memory is exhausted (a parent whose
+        /// `AddChild` gives 0 counts as exhausted).
+        virtual OrvixFileEntry* CreateEntry(OrvixFileEntry& source),
+        /// Appends an entry made from a path and values; the list owns it. It is added to the children of
+        /// `parent`, which need not belong to this list, or to the roots when `parent` is null. Returns the entry;
+        /// null with the list unchanged when `file` is null or memory is exhausted, as in the other form.
+        virtual OrvixFileEntry* CreateEntry(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
+                                            long long clientPtr));
 
-    /// Removes the entry at an index, or the entry itself, from the list, the roots, the active list and the
-    /// children of the entries that can be reached from the roots, and deletes it with its attachments. Its
-    /// own children stay in the list as they are: no roots, and with a parent link to what was deleted; the
-    /// host removes or links them itself. False when the list does not hold the entry. When memory is
-    /// exhausted while a tree is searched: false, and the entry stays in the list to be removed later, though
-    /// some links to it may be gone already.
-    ORVIX_OVERLOADS_IN_SLOT_ORDER(virtual bool RemoveEntry(unsigned int index),
-                                  virtual bool RemoveEntry(OrvixFileEntry* entry));
+    ORVIX_OVERLOADS_IN_SLOT_ORDER(
+        /// Removes the entry at `index` of the list, as the other form does; false for an index out of range.
+        virtual bool RemoveEntry(unsigned int index),
+        /// Removes an entry from the list, the roots, the active list and the children of the entries that can be
+        /// reached from the roots, and deletes it with its attachments. Its own children stay in the list as they
+        /// are: they are no roots, and their parent links name the deleted entry; the host removes or links them
+        /// itself. False when the list does not hold the entry. When memory is exhausted while a tree is searched:
+        /// false, and the entry stays in the list to be removed later, though some links to it may be gone
+        /// already.
+        virtual bool RemoveEntry(OrvixFileEntry* entry));
+
+    /// Number of entries.
     virtual unsigned int NumEntries();
 
     /// Deletes every entry and empties roots and active list; always true.
     virtual bool RemoveAll();
+
+    /// The entry at `index` in order of creation, owned by the list; null for an index out of range.
     virtual OrvixFileEntry* GetFileEntry(unsigned int index);
 
     /// Rebuilds the active list from the entries whose FlagsIn shares a bit with `mask`: in order of creation,
@@ -60,11 +64,17 @@ public:
 
     /// Removes the first occurrence of the entry from the active list; false when it is not there.
     virtual bool RemoveActiveEntry(OrvixFileEntry* entry);
+
+    /// Number of active entries.
     virtual unsigned int NumActiveEntries();
+
+    /// The active entry at `index`, in the order of the active list; null for an index out of range.
     virtual OrvixFileEntry* GetActiveFileEntry(unsigned int index);
 
-    /// The entries created without a parent, in order of creation.
+    /// Number of roots: the entries created without a parent.
     virtual unsigned int NumRootEntries();
+
+    /// The root at `index` in order of creation; null for an index out of range.
     virtual OrvixFileEntry* GetRootEntry(unsigned int index);
 
 private:

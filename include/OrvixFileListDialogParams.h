@@ -21,33 +21,42 @@ public:
     OrvixFileListDialogParams& operator=(const OrvixFileListDialogParams&) = delete;
     virtual ~OrvixFileListDialogParams();
 
-    /// Bit set read and written by the dialog and by `IOrvixServices::RunFileListOperation`; 0 by default. The bits:
-    /// docs/host.md. The setter stands first: that order is part of the published table.
+    /// Sets the options, bits of `OrvixDialogOption`. The setter comes first: that order is part of the published
+    /// table.
     virtual void SetOptions(std::uint32_t options);
+
+    /// The options, bits of `OrvixDialogOption`, which the dialog and `IOrvixServices::RunFileListOperation` read and
+    /// write; 0 by default.
     virtual std::uint32_t GetOptions();
 
     /// Title of the dialog; empty by default.
     virtual const wchar_t* GetTitle();
+    /// Sets the title; a copy is kept.
     virtual void SetTitle(const wchar_t* title);
 
     /// Message above the files; empty by default. The name ends in W so that no header's macro changes it.
     virtual const wchar_t* GetMessageW();
+    /// Sets the message; a copy is kept.
     virtual void SetMessage(const wchar_t* message);
 
     /// The files; the dialog shows the active entries. Null by default. Not owned.
     virtual OrvixFileList* GetOrvixFileList();
+    /// Sets the files, which must stay alive as long as the record names them; null for none.
     virtual void SetOrvixFileList(OrvixFileList* list);
 
     /// Comment for the operation; empty by default.
     virtual const wchar_t* GetComment();
+    /// Sets the comment; a copy is kept.
     virtual void SetComment(const wchar_t* comment);
 
     /// Prompt whose stored answer may replace the dialog; -1 (no prompt) by default.
     virtual std::int32_t GetDialogPromptID();
+    /// Sets the prompt of the dialog; `OrvixPromptID::Unset` for none.
     virtual void SetDialogPromptID(std::int32_t id);
 
-    /// Prompt whose stored answer stands for the dialog's option; -1 (no prompt) by default.
+    /// Prompt whose stored answer sets the dialog's option; -1 (no prompt) by default.
     virtual std::int32_t GetOptionPromptID();
+    /// Sets the prompt of the option; `OrvixPromptID::Unset` for none.
     virtual void SetOptionPromptID(std::int32_t id);
 
 private:

@@ -17,15 +17,20 @@ public:
         : m_listener(OrvixNotification::RegisterOrvixNotification(&listener, userData) ? &listener : nullptr)
     {
     }
+
+    /// Takes the registration of `other`, which is empty afterwards.
     OrvixListenerRegistration(OrvixListenerRegistration&& other) noexcept
         : m_listener(std::exchange(other.m_listener, nullptr))
     {
     }
+
+    /// Exchanges the two registrations.
     OrvixListenerRegistration& operator=(OrvixListenerRegistration&& other) noexcept
     {
         std::swap(m_listener, other.m_listener);
         return *this;
     }
+
     OrvixListenerRegistration(const OrvixListenerRegistration&) = delete;
     OrvixListenerRegistration& operator=(const OrvixListenerRegistration&) = delete;
     ~OrvixListenerRegistration() { OrvixNotification::UnRegisterOrvixNotification(m_listener); }

@@ -6,17 +6,17 @@
 namespace OrvixNotificationID
 {
 
-inline constexpr std::uint32_t BeforeCheckIn = 13; ///< a listener may veto each "before"
-inline constexpr std::uint32_t AfterCheckIn = 14;  ///< each "after" is sent whatever the provider returned
-inline constexpr std::uint32_t BeforeCheckOut = 15;
-inline constexpr std::uint32_t AfterCheckOut = 16;
-inline constexpr std::uint32_t BeforeUndoCheckOut = 17;
-inline constexpr std::uint32_t AfterUndoCheckOut = 18;
-inline constexpr std::uint32_t BeforeAdd = 19;
-inline constexpr std::uint32_t AfterAdd = 20;
-inline constexpr std::uint32_t BeforeGetLatest = 21;
-inline constexpr std::uint32_t AfterGetLatest = 22;
-inline constexpr std::uint32_t FilesConfirmed = 27; ///< the user confirmed the files in the dialog
+inline constexpr std::uint32_t BeforeCheckIn = 13;      ///< a listener may veto each "before"
+inline constexpr std::uint32_t AfterCheckIn = 14;       ///< each "after" is sent whatever the provider returned
+inline constexpr std::uint32_t BeforeCheckOut = 15;     ///< may be vetoed
+inline constexpr std::uint32_t AfterCheckOut = 16;      ///< has been tried
+inline constexpr std::uint32_t BeforeUndoCheckOut = 17; ///< may be vetoed
+inline constexpr std::uint32_t AfterUndoCheckOut = 18;  ///< has been tried
+inline constexpr std::uint32_t BeforeAdd = 19;          ///< may be vetoed
+inline constexpr std::uint32_t AfterAdd = 20;           ///< has been tried
+inline constexpr std::uint32_t BeforeGetLatest = 21;    ///< may be vetoed
+inline constexpr std::uint32_t AfterGetLatest = 22;     ///< has been tried
+inline constexpr std::uint32_t FilesConfirmed = 27;     ///< the user confirmed the files in the dialog
 
 } // namespace OrvixNotificationID
 

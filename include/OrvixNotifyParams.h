@@ -21,18 +21,22 @@ public:
 
     /// The notification's identifier; 0 by default. The sender gives it its meaning.
     virtual std::uint32_t GetID();
+    /// Sets the identifier.
     virtual void SetID(std::uint32_t id);
 
     /// Index of the provider that the notification concerns; 0 by default.
     virtual std::uint32_t GetProviderIndex();
+    /// Sets the provider index.
     virtual void SetProviderIndex(std::uint32_t index);
 
     /// True once a listener has cancelled; false by default.
     virtual bool IsCancelled();
+    /// Marks the notification as cancelled, or takes the mark away.
     virtual void SetCancelled(bool cancelled);
 
     /// The files that the notification concerns; null by default. Not owned.
     virtual OrvixFileList* GetOrvixFileList();
+    /// Sets the files; null for none.
     virtual void SetOrvixFileList(OrvixFileList* list);
 
 private:

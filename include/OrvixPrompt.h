@@ -22,10 +22,10 @@ inline constexpr std::uint32_t OfferStopAsking = 0x100; ///< a box Do not ask ag
 namespace OrvixPromptAnswer
 {
 
-inline constexpr std::int32_t No = 0;
-inline constexpr std::int32_t Yes = 1; ///< also OK
-inline constexpr std::int32_t YesToAll = 2;
-inline constexpr std::int32_t NoToAll = 3;
+inline constexpr std::int32_t No = 0;       ///< declined
+inline constexpr std::int32_t Yes = 1;      ///< also OK
+inline constexpr std::int32_t YesToAll = 2; ///< yes, also for what follows
+inline constexpr std::int32_t NoToAll = 3;  ///< no, also for what follows
 
 } // namespace OrvixPromptAnswer
 
@@ -34,15 +34,14 @@ inline constexpr std::int32_t NoToAll = 3;
 namespace OrvixPromptAction
 {
 
-inline constexpr std::uint32_t Ask = 0x1; ///< ask; the answer counts only where nobody can be asked
-inline constexpr std::uint32_t Yes = 0x2;
-inline constexpr std::uint32_t No = 0x4;
-inline constexpr std::uint32_t YesToAll = 0x8;
-inline constexpr std::uint32_t NoToAll = 0x10;
+inline constexpr std::uint32_t Ask = 0x1;      ///< ask; the answer counts only where nobody can be asked
+inline constexpr std::uint32_t Yes = 0x2;      ///< answers `OrvixPromptAnswer::Yes`
+inline constexpr std::uint32_t No = 0x4;       ///< answers `OrvixPromptAnswer::No`
+inline constexpr std::uint32_t YesToAll = 0x8; ///< answers `OrvixPromptAnswer::YesToAll`
+inline constexpr std::uint32_t NoToAll = 0x10; ///< answers `OrvixPromptAnswer::NoToAll`
 
-// The same two bits where the prompt stores the option of a file-list dialog.
-inline constexpr std::uint32_t OptionChecked = YesToAll;
-inline constexpr std::uint32_t OptionCleared = NoToAll;
+inline constexpr std::uint32_t OptionChecked = YesToAll; ///< in the prompt of a dialog's option: checked
+inline constexpr std::uint32_t OptionCleared = NoToAll;  ///< in the prompt of a dialog's option: cleared
 
 /// The answer (`OrvixPromptAnswer`) that an action stores.
 constexpr std::int32_t ToAnswer(std::uint32_t action)
@@ -89,7 +88,7 @@ inline constexpr std::int32_t Unset = -1;         ///< the same in `OrvixFileLis
 namespace OrvixPromptEditorResult
 {
 
-inline constexpr std::int32_t Unchanged = 0;
-inline constexpr std::int32_t Changed = 1; ///< the table has new answers, which are to be saved
+inline constexpr std::int32_t Unchanged = 0; ///< the table is as it was
+inline constexpr std::int32_t Changed = 1;   ///< the table has new answers, which are to be saved
 
 } // namespace OrvixPromptEditorResult

@@ -28,7 +28,7 @@ public:
 
     /// ID of a row; -1 for an index not below `NumPrompts()`.
     virtual int GetPromptID(unsigned int index);
-    /// Setters give false and change nothing for an index not below `NumPrompts()`.
+    /// Sets the ID of a row; false, with nothing changed, for an index not below `NumPrompts()`, as in every setter.
     virtual bool SetPromptID(unsigned int index, int id);
 
     /// Text of a row, valid until it is set or removed; null for an index out of range.
@@ -38,14 +38,17 @@ public:
 
     /// Options stored with the answer; 0 for an index out of range.
     virtual unsigned long GetPromptOptions(unsigned int index);
+    /// Sets the options of a row, bits of `OrvixPromptOption`; false for an index out of range.
     virtual bool SetPromptOptions(unsigned int index, unsigned long options);
 
     /// Stored answer, an action bit set; 0 for an index out of range.
     virtual unsigned long GetPrompt(unsigned int index);
+    /// Sets the stored answer of a row, bits of `OrvixPromptAction`; false for an index out of range.
     virtual bool SetPrompt(unsigned int index, unsigned long prompt);
 
     /// Whether the answer is locked against `IOrvixServices::SetPromptAction`; false out of range.
     virtual bool GetLocked(unsigned int index);
+    /// Locks or unlocks the answer of a row; false for an index out of range.
     virtual bool SetLocked(unsigned int index, bool locked);
 
 private:

@@ -7,6 +7,7 @@
 /// Gives a services object back to the library.
 struct OrvixServicesRelease
 {
+    /// Shuts the object down and destroys it; null does nothing. [library, main-thread]
     void operator()(IOrvixServices* services) const { ReleaseIOrvixServices(services); }
 };
 

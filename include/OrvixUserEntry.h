@@ -19,16 +19,22 @@ public:
 
     /// Login name. The getter's name ends in W so that no header's macro changes it.
     virtual const wchar_t* GetUserNameW();
+    /// Sets the login name.
     virtual void SetUserName(const wchar_t* name);
 
+    /// First name.
     virtual const wchar_t* GetFirstName();
+    /// Sets the first name.
     virtual void SetFirstName(const wchar_t* name);
 
+    /// Last name.
     virtual const wchar_t* GetLastName();
+    /// Sets the last name.
     virtual void SetLastName(const wchar_t* name);
 
     /// E-mail address; stored as given.
     virtual const wchar_t* GetEmail();
+    /// Sets the e-mail address.
     virtual void SetEmail(const wchar_t* email);
 
 private:

@@ -18,15 +18,19 @@ public:
     /// Deletes every entry.
     virtual ~OrvixUserList();
 
-    /// Two ways to append an entry that the list then owns: a copy of `source`'s four texts, or a user name
-    /// alone with the other texts empty. Returns the entry, valid until it is removed; null with the list
-    /// unchanged when the name is null or memory is exhausted.
-    ORVIX_OVERLOADS_IN_SLOT_ORDER(virtual OrvixUserEntry* CreateEntry(OrvixUserEntry& source),
-                                  virtual OrvixUserEntry* CreateEntry(const wchar_t* userName));
+    ORVIX_OVERLOADS_IN_SLOT_ORDER(
+        /// Appends a copy of a user's four texts; the list owns it. Returns the copy, valid until it is removed;
+        /// null with the list unchanged when memory is exhausted.
+        virtual OrvixUserEntry* CreateEntry(OrvixUserEntry& source),
+        /// Appends a user with this login name and no other text; the list owns it. Returns the entry, valid until
+        /// it is removed; null with the list unchanged when `userName` is null or memory is exhausted.
+        virtual OrvixUserEntry* CreateEntry(const wchar_t* userName));
 
-    /// Deletes the entry at an index, or the entry itself; false when the list does not hold it.
-    ORVIX_OVERLOADS_IN_SLOT_ORDER(virtual bool RemoveEntry(unsigned int index),
-                                  virtual bool RemoveEntry(OrvixUserEntry* entry));
+    ORVIX_OVERLOADS_IN_SLOT_ORDER(
+        /// Deletes the entry at `index`; false when `index` is not below `NumEntries()`.
+        virtual bool RemoveEntry(unsigned int index),
+        /// Deletes the entry; false when the list does not hold it.
+        virtual bool RemoveEntry(OrvixUserEntry* entry));
 
     /// Number of entries.
     virtual unsigned int NumEntries();
