@@ -5,18 +5,20 @@
 /// The host's side of the library: what the library may ask of the host while it works.
 ///
 /// Implemented by: host. Handed over in `OrvixClientInfo`; it must outlive the services object that was
-/// initialised with it. The library never deletes it. All operations are called on the host's
-/// user-interface thread.
+/// initialised with it. The library never deletes it. All operations except `OutputText` are called on
+/// the host's user-interface thread.
 class IOrvixClientAccess
 {
 public:
-    /// Shows one line of a provider's output (history, progress, messages). `text` carries no line end and
-    /// lives only for the call; `kind` is 0 for everything the library sends itself. [host, main-thread]
+    /// Shows one line of a provider's output (history, progress, messages). `text` has no line end and lives only for
+    /// the call; `kind` is 0 for everything that the library sends.
+    ///
+    /// The one operation that may come from another thread: an MSSCCI library may send text from a thread of its own,
+    /// also after an operation has returned. [host, any-thread]
     virtual void OutputText(const wchar_t* text, int kind) = 0;
 
-    /// Relay of the user-interface library; the library hands the four values through and returns the
-    /// result unchanged. Their meaning lies between the user-interface library and the host.
-    /// [host, main-thread]
+    /// A call of the user-interface library for the host. The library passes the four values and the result through
+    /// unchanged; host and user-interface library agree about them. [host, main-thread]
     virtual std::intptr_t RelayA(void* a, void* b, void* c, void* d) = 0;
 
     /// The host's colour for a system colour index (COLOR_*), as 0x00BBGGRR. [host, main-thread]
@@ -26,7 +28,7 @@ public:
     /// [host, main-thread]
     virtual bool IsUnattended() = 0;
 
-    /// Second relay of the user-interface library, as `RelayA`. [host, main-thread]
+    /// A second call of the user-interface library, as `RelayA`. [host, main-thread]
     virtual std::intptr_t RelayB(void* a, void* b, void* c, void* d) = 0;
 
 protected:

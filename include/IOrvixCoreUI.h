@@ -6,11 +6,11 @@ class IOrvixCoreUIClientAccess;
 class OrvixFileListDialogParams;
 class OrvixPromptTable;
 
-/// The dialogs of the feature. The services object obtains this interface on first need and keeps it until
-/// it is destroyed.
+/// The dialogs. The services object obtains this interface when it shows the first dialog and keeps it until it is
+/// destroyed.
 ///
-/// Implemented by: user-interface library (OrvixCoreUI.dll). The arguments `a`, `b` and `c` come from the
-/// host unchanged; their meaning lies between the host and the user-interface library.
+/// Implemented by: user-interface library (OrvixCoreUI.dll). The arguments `a`, `b` and `c` come from the host
+/// unchanged; host and user-interface library agree about them.
 class IOrvixCoreUI
 {
 public:
@@ -18,18 +18,18 @@ public:
     /// not owned. [ui-library, main-thread]
     virtual void SetClientAccess(IOrvixCoreUIClientAccess* access) = 0;
 
-    /// Asks a question. With bit 0x100 of `options` the dialog offers a choice to stop asking, whose state
-    /// goes to `*dontAskAgain` (never null; false on entry). Returns the answer: 1, 0, 2 or 3.
-    /// [ui-library, main-thread]
+    /// Asks a question. `options` are bits of `OrvixPromptOption`. With `OfferStopAsking` the dialog offers to stop
+    /// asking, and the user's choice goes to `*dontAskAgain` (never null; false on entry). Returns an
+    /// `OrvixPromptAnswer`. [ui-library, main-thread]
     virtual std::int32_t ShowPrompt(void* a, void* b, void* c, std::uint32_t options, bool* dontAskAgain) = 0;
 
-    /// Shows the active entries of the record's file list. 1 means confirmed, 0 cancelled. The user's
-    /// choices come back in the record's options and in bit 0x2 of each active entry's FlagsOut (set:
-    /// ticked). The record is the host's. [ui-library, main-thread]
+    /// Shows the active entries of the record's file list and returns an `OrvixDialogResult`. The user's choices come
+    /// back in the record's options and in the bit `OrvixFileSelection::Confirmed` of each active entry's FlagsOut. The
+    /// record belongs to the host. [ui-library, main-thread]
     virtual std::int32_t ShowFileListDialog(void* a, OrvixFileListDialogParams* params) = 0;
 
-    /// Edits the stored answers in place. 1 means the table was changed and is to be saved. The table is
-    /// the services object's. [ui-library, main-thread]
+    /// Edits the stored answers in place and returns an `OrvixPromptEditorResult`. The table belongs to the services
+    /// object. [ui-library, main-thread]
     virtual std::int32_t EditPrompts(void* a, void* b, OrvixPromptTable* prompts) = 0;
 
 protected:
@@ -48,6 +48,6 @@ extern "C" {
 /// Each call is matched by one `ReleaseIOrvixCoreUI`. [ui-library, main-thread]
 ORVIXCOREUI_API IOrvixCoreUI* GetIOrvixCoreUI();
 
-/// Hands the interface back to the library that made it. [ui-library, main-thread]
+/// Releases the interface in the library that made it. [ui-library, main-thread]
 ORVIXCOREUI_API void ReleaseIOrvixCoreUI(IOrvixCoreUI* coreUI);
 }

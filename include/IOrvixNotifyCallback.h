@@ -11,13 +11,13 @@ class OrvixNotifyParams;
 class IOrvixNotifyCallback
 {
 public:
-    /// Receives one notification. `params` is the sender's and lives only for the call; `userData` is the
-    /// value given at registration.
+    /// Receives one notification. `params` belongs to the sender and lives only for the call; `userData` is the value
+    /// given at registration.
     ///
-    /// Returns 0 to accept and let delivery continue, 1 to cancel, any other value to stop delivery without
-    /// cancelling. When a later listener cancels, this one is called a second time for the same record, with
-    /// `params->IsCancelled()` true; that result is ignored. The listener may register and unregister
-    /// listeners, itself included. An exception leaves the broadcast. [host, main-thread]
+    /// Returns an `OrvixListenerAnswer`; any other value counts as `Stop`. When a later listener vetoes, this one is
+    /// called a second time for the same record, with `params->IsCancelled()` true; that result is ignored. The
+    /// listener may register and unregister listeners, itself included. An exception leaves the broadcast. [host,
+    /// main-thread]
     virtual std::uint32_t Notify(OrvixNotifyParams* params, std::int64_t userData) = 0;
 
 protected:

@@ -9,7 +9,7 @@ struct HWND__;
 /// Who the client is and where its files lie; the argument of `IOrvixServices::Initialize`.
 ///
 /// Created and owned by the host; the library does not keep it. Texts are copied in: a setter given null
-/// (or without memory left) leaves the old text. A getter's text is never null and is valid until the
+/// (and any setter when memory runs out) leaves the old text. A getter's text is never null and is valid until the
 /// field is set again or the record is destroyed. Nothing is checked. All operations: [library, main-thread].
 class ORVIX_API OrvixClientInfo : public BraeHeapOperators
 {
@@ -34,7 +34,7 @@ public:
     /// Sets the parent window; null for none.
     virtual void SetParentWindow(HWND__* window);
 
-    /// Folder that is searched for provider plug-ins. "*.dll" is put directly behind it, so it ends in a
+    /// Folder that is searched for provider plug-ins. "*.dll" is appended to it directly, so it ends in a
     /// backslash; the whole path of a plug-in must fit 260 characters, terminator included.
     virtual const wchar_t* GetProviderPluginPath();
     /// Sets the plug-in folder; a copy is kept as it is, with no backslash added.

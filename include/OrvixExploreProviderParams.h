@@ -7,7 +7,7 @@
 
 /// How a provider's browse dialog behaves, with its file-type filters.
 ///
-/// Created and owned by the host. Texts are copied in: a setter given null (or without memory left) leaves
+/// Created and owned by the host. Texts are copied in: a setter given null, or without memory left, leaves
 /// the old text. A getter's text is valid until the field is set again or the record is destroyed. Nothing is checked.
 /// All operations: [library, main-thread].
 class ORVIX_API OrvixExploreProviderParams : public BraeHeapOperators
@@ -34,7 +34,7 @@ public:
     virtual void SetDownloadFiles(bool download);
 
     /// Appends a file-type filter; both texts are copied unchanged. Returns the new number of filters, or 0
-    /// with nothing added when a text is null or memory is exhausted.
+    /// with nothing added when a text is null or memory runs out.
     virtual std::uint32_t AddFilter(const wchar_t* name, const wchar_t* extensions);
 
     /// Number of filters.

@@ -22,12 +22,12 @@ public:
     /// The path; never null, empty by default, of any length. Valid until it is set again.
     virtual const wchar_t* GetFile();
 
-    /// Copies the path; null (or exhausted memory) leaves the old one. A path longer than two characters
+    /// Copies the path; null (or a lack of memory) leaves the old one. A path longer than two characters
     /// that starts with two forward slashes gets two backslashes in their place; nothing else is changed.
     virtual void SetFile(const wchar_t* file);
 
-    /// Flags set by the host, on which `OrvixFileList::BuildActiveList` selects; 0 by default. Bit 0x1 is set by
-    /// `IOrvixServices::RunFileListOperation` on the entries that fit.
+    /// Flags set by the host, on which `OrvixFileList::BuildActiveList` selects; 0 by default.
+    /// `OrvixFileSelection::Selected` is set by `IOrvixServices::RunFileListOperation` on the entries that fit.
     virtual unsigned long GetFlagsIn();
     /// Sets the host's flags; every value is stored as it is.
     virtual void SetFlagsIn(unsigned long flags);
@@ -38,14 +38,14 @@ public:
     virtual void SetClientPtr(long long value);
 
     /// State flags written by a provider (see `IOrvixProvider::QueryStatus`); 0 by default. The file-list dialog
-    /// overwrites bit 0x2 with the user's tick.
+    /// overwrites `OrvixFileSelection::Confirmed` with the user's choice.
     virtual unsigned long GetFlagsOut();
     /// Sets the state flags; every value is stored as it is.
     virtual void SetFlagsOut(unsigned long flags);
 
     /// Appends a child, which is not owned; its parent link is not touched and duplicates are not looked
     /// for. Links must not lead in a circle: whoever walks the tree would not come to an end. Returns `NumChildren()`,
-    /// or 0 with nothing changed for null and when memory is exhausted.
+    /// or 0 with nothing changed for null and when memory runs out.
     virtual unsigned int AddChild(OrvixFileEntry* child);
 
     /// Number of children.
@@ -63,11 +63,11 @@ public:
     ORVIX_OVERLOADS_IN_SLOT_ORDER(
         /// Appends an attachment, a new entry that this entry owns: a copy of `source`'s path, flags, client
         /// value and parent link, not of its children and attachments. Returns `NumAttachments()`, or 0 with
-        /// nothing changed when `source` is null or memory is exhausted.
+        /// nothing changed when `source` is null or memory runs out.
         virtual unsigned int AddAttachment(OrvixFileEntry* source),
         /// Appends an attachment made from a path and values. `parent` is stored as given; this entry does not
         /// become the attachment's parent. Returns `NumAttachments()`, or 0 with nothing changed when `file` is
-        /// null or memory is exhausted.
+        /// null or memory runs out.
         virtual unsigned int AddAttachment(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
                                            long long clientPtr));
 

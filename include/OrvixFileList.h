@@ -24,12 +24,12 @@ public:
         /// Appends a copy of an entry; the list owns it. Copies path, flags, client value and parent link, and the
         /// attachments one level deep. The children are shared: the same objects, whose parent links still name
         /// the source. The copy is added to the children of the source's parent, or to the roots when there is
-        /// none. Returns the copy; null with the list unchanged when memory is exhausted (a parent whose
+        /// none. Returns the copy; null with the list unchanged when memory runs out (a parent whose
         /// `AddChild` gives 0 counts as exhausted).
         virtual OrvixFileEntry* CreateEntry(OrvixFileEntry& source),
         /// Appends an entry made from a path and values; the list owns it. It is added to the children of
         /// `parent`, which need not belong to this list, or to the roots when `parent` is null. Returns the entry;
-        /// null with the list unchanged when `file` is null or memory is exhausted, as in the other form.
+        /// null with the list unchanged when `file` is null or memory runs out, as in the other form.
         virtual OrvixFileEntry* CreateEntry(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
                                             long long clientPtr));
 
@@ -39,7 +39,7 @@ public:
         /// Removes an entry from the list, the roots, the active list and the children of the entries that can be
         /// reached from the roots, and deletes it with its attachments. Its own children stay in the list as they
         /// are: they are no roots, and their parent links name the deleted entry; the host removes or links them
-        /// itself. False when the list does not hold the entry. When memory is exhausted while a tree is searched:
+        /// itself. False when the list does not hold the entry. When memory runs out while a tree is searched:
         /// false, and the entry stays in the list to be removed later, though some links to it may be gone
         /// already.
         virtual bool RemoveEntry(OrvixFileEntry* entry));
@@ -55,7 +55,7 @@ public:
 
     /// Rebuilds the active list from the entries whose FlagsIn shares a bit with `mask`: in order of creation,
     /// or with `fromRoots` the trees below the roots, children before their parents. Returns
-    /// `NumActiveEntries()`. When memory is exhausted the active list is empty.
+    /// `NumActiveEntries()`. When memory runs out the active list is empty.
     virtual unsigned int BuildActiveList(unsigned long mask, bool fromRoots);
 
     /// Appends an entry, which need not belong to this list, to the active list; null is ignored. Returns

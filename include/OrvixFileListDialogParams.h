@@ -10,7 +10,7 @@ class OrvixFileList;
 
 /// What a file-list dialog shows and what it brings back.
 ///
-/// Created and owned by the host. Texts are copied in: a setter given null (or without memory left) leaves
+/// Created and owned by the host. Texts are copied in: a setter given null, or without memory left, leaves
 /// the old text. A getter's text is never null and is valid until the field is set again or the record is
 /// destroyed. Nothing is checked. All operations: [library, main-thread].
 class ORVIX_API OrvixFileListDialogParams : public BraeHeapOperators
@@ -49,12 +49,12 @@ public:
     /// Sets the comment; a copy is kept.
     virtual void SetComment(const wchar_t* comment);
 
-    /// Prompt whose stored answer may replace the dialog; -1 (no prompt) by default.
+    /// Prompt whose stored answer may replace the dialog; `OrvixPromptID::Unset` (no prompt) by default.
     virtual std::int32_t GetDialogPromptID();
     /// Sets the prompt of the dialog; `OrvixPromptID::Unset` for none.
     virtual void SetDialogPromptID(std::int32_t id);
 
-    /// Prompt whose stored answer sets the dialog's option; -1 (no prompt) by default.
+    /// Prompt whose stored answer sets the dialog's option; `OrvixPromptID::Unset` (no prompt) by default.
     virtual std::int32_t GetOptionPromptID();
     /// Sets the prompt of the option; `OrvixPromptID::Unset` for none.
     virtual void SetOptionPromptID(std::int32_t id);

@@ -17,7 +17,7 @@ public:
 
     /// Adds a listener at the end. `callback` is not owned and must stay alive until it is unregistered;
     /// `userData` is passed back unchanged on every delivery to it. Registering a listener again gives true
-    /// and changes nothing: the first user data stays. False for null and when memory is exhausted.
+    /// and changes nothing: the first user data stays. False for null and when memory runs out.
     /// [library, main-thread]
     static bool RegisterOrvixNotification(IOrvixNotifyCallback* callback, std::int64_t userData);
 
@@ -29,8 +29,8 @@ public:
     /// without a file list. Result as for the other form. [library, main-thread]
     static std::uint32_t BroadcastOrvixNotification(std::uint32_t id, std::uint32_t providerIndex);
 
-    /// Delivers the caller's record, which listeners may read and change. `params` is not owned; null is
-    /// delivered to nobody and gives 0.
+    /// Delivers the caller's record, which listeners may read and change. `params` is not owned; null gives 0 and
+    /// reaches no listener.
     ///
     /// Returns 0 when every listener accepted (or there is none), 1 when one cancelled: the record is then
     /// marked cancelled and the listeners before that one were called once more. Any other value is that of

@@ -17,7 +17,7 @@ public:
     virtual ~OrvixPromptTable();
 
     /// Appends a row with a copy of `text`; returns the new number of rows, or -1 with nothing changed when
-    /// `text` is null or memory is exhausted.
+    /// `text` is null or memory runs out.
     virtual int AddPrompt(int id, const wchar_t* text, unsigned long options, unsigned long prompt, bool locked);
 
     /// Number of rows.

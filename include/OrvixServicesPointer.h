@@ -15,7 +15,7 @@ struct OrvixServicesRelease
 /// yourself where you want to know of a COM error in saving.
 using OrvixServicesPointer = std::unique_ptr<IOrvixServices, OrvixServicesRelease>;
 
-/// Makes a services object; null when memory is exhausted.
+/// Makes a services object; null when memory runs out.
 inline OrvixServicesPointer MakeOrvixServices()
 {
     return OrvixServicesPointer(GetIOrvixServices());

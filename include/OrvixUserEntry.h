@@ -6,7 +6,7 @@
 /// A user: login name and person.
 ///
 /// Created by an `OrvixUserList` (which then owns it) or by the host. Texts are copied in whole: a setter
-/// given null (or without memory left) leaves the old text. A getter's text is never null, empty by
+/// given null (and any setter when memory runs out) leaves the old text. A getter's text is never null, empty by
 /// default, and valid until the field is set again or the entry is destroyed.
 /// All operations: [library, main-thread].
 class ORVIX_API OrvixUserEntry : public BraeHeapOperators

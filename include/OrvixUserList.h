@@ -20,10 +20,10 @@ public:
 
     ORVIX_OVERLOADS_IN_SLOT_ORDER(
         /// Appends a copy of a user's four texts; the list owns it. Returns the copy, valid until it is removed;
-        /// null with the list unchanged when memory is exhausted.
+        /// null with the list unchanged when memory runs out.
         virtual OrvixUserEntry* CreateEntry(OrvixUserEntry& source),
         /// Appends a user with this login name and no other text; the list owns it. Returns the entry, valid until
-        /// it is removed; null with the list unchanged when `userName` is null or memory is exhausted.
+        /// it is removed; null with the list unchanged when `userName` is null or memory runs out.
         virtual OrvixUserEntry* CreateEntry(const wchar_t* userName));
 
     ORVIX_OVERLOADS_IN_SLOT_ORDER(
