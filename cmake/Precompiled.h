@@ -1,0 +1,18 @@
+// Parsed once a build for all sources of the product (GCC only). Each source still includes what it uses; lint reads
+// them without this file.
+#include <windows.h>
+
+#include <comdef.h>
+
+#include <algorithm>
+#include <array>
+#include <cstdint>
+#include <filesystem>
+#include <iostream>
+#include <memory>
+#include <optional>
+#include <span>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
