@@ -1,24 +1,28 @@
 #pragma once
 
 #include "IOrvixProvider.h"
+#include "OrvixFileList.h"
 #include "OrvixProviderResult.h"
 
 /// A provider that offers nothing yet: derive from it and write what your version-control system can do. A derived
 /// class has to say its name, its session (initialise, open a project) and the state of files; every other operation
-/// answers "not offered" until it is overridden. The reserved operations answer what the contract asks.
+/// answers "not offered" until it is overridden, and fails for a list without an active entry, as the contract asks of
+/// every file operation. The reserved operations answer what the contract asks.
 ///
 /// Header only: nothing is imported for it. Implemented by: plug-in.
 class OrvixProviderBase : public IOrvixProvider
 {
 public:
-    /// Each operation on files, the dialogs and the provider's own program: not offered.
-    int CheckIn(OrvixFileList*, const wchar_t*, unsigned long) override { return OrvixProviderResult::NotOffered; }
-    int CheckOut(OrvixFileList*, const wchar_t*, unsigned long) override { return OrvixProviderResult::NotOffered; }
-    int UndoCheckOut(OrvixFileList*, unsigned long) override { return OrvixProviderResult::NotOffered; }
-    int GetLatest(OrvixFileList*, unsigned long) override { return OrvixProviderResult::NotOffered; }
-    int Add(OrvixFileList*, const wchar_t*, unsigned long) override { return OrvixProviderResult::NotOffered; }
-    int ShowHistory(OrvixFileList*) override { return OrvixProviderResult::NotOffered; }
-    int ShowProperties(OrvixFileList*) override { return OrvixProviderResult::NotOffered; }
+    // The operations on files.
+    int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long) override { return NotOfferedFor(list); }
+    int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long) override { return NotOfferedFor(list); }
+    int UndoCheckOut(OrvixFileList* list, unsigned long) override { return NotOfferedFor(list); }
+    int GetLatest(OrvixFileList* list, unsigned long) override { return NotOfferedFor(list); }
+    int Add(OrvixFileList* list, const wchar_t*, unsigned long) override { return NotOfferedFor(list); }
+    int ShowHistory(OrvixFileList* list) override { return NotOfferedFor(list); }
+    int ShowProperties(OrvixFileList* list) override { return NotOfferedFor(list); }
+
+    // The dialogs and the provider's own program.
     int ShowOptions() override { return OrvixProviderResult::NotOffered; }
     int RunProviderClient() override { return OrvixProviderResult::NotOffered; }
 
@@ -37,4 +41,11 @@ public:
     int ReservedG() override { return OrvixProviderResult::NotOffered; }
     int ReservedH() override { return OrvixProviderResult::NotOffered; }
     bool ReservedI() override { return true; }
+
+private:
+    static int NotOfferedFor(OrvixFileList* list)
+    {
+        const bool empty = list != nullptr && list->NumActiveEntries() == 0;
+        return empty ? OrvixProviderResult::Failure : OrvixProviderResult::NotOffered;
+    }
 };
