@@ -1,5 +1,28 @@
-# What `cmake --install` gives; docs/sdk.md describes it.
+# What `cmake --install` gives; docs/sdk.md describes it. The files for debuggers are the component "debug", everything else
+# is "sdk".
 include(CMakePackageConfigHelpers)
+set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME sdk)
+
+# orvix_install_debug_file(<target> <folder>): installs a module's debug information beside the module in <folder>. Of GCC it
+# is a file that is split off at installation: the installed module is stripped and names it.
+function(orvix_install_debug_file target folder)
+  if(MSVC)
+    install(FILES $<TARGET_PDB_FILE:${target}> DESTINATION ${folder} COMPONENT debug OPTIONAL)
+    return()
+  endif()
+  set(name $<TARGET_FILE_NAME:${target}>)
+  set(debug_file ${PROJECT_BINARY_DIR}/debug/${name}.debug)
+  install(CODE "
+    file(MAKE_DIRECTORY \"${PROJECT_BINARY_DIR}/debug\")
+    execute_process(COMMAND_ERROR_IS_FATAL ANY
+      COMMAND \"${CMAKE_OBJCOPY}\" --only-keep-debug \"$<TARGET_FILE:${target}>\" \"${debug_file}\")"
+    ALL_COMPONENTS)
+  install(CODE "
+    execute_process(COMMAND_ERROR_IS_FATAL ANY
+      COMMAND \"${CMAKE_OBJCOPY}\" --strip-all \"--add-gnu-debuglink=${debug_file}\" \"$<TARGET_FILE:${target}>\"
+        \"\$ENV{DESTDIR}\${CMAKE_INSTALL_PREFIX}/${folder}/${name}\")")
+  install(FILES ${debug_file} DESTINATION ${folder} COMPONENT debug)
+endfunction()
 
 install(TARGETS OrvixCore OrvixCoreUI braeutil MSSCCI BuildOptions EXPORT OrvixCore
   RUNTIME DESTINATION bin
@@ -8,11 +31,17 @@ install(TARGETS OrvixCore OrvixCoreUI braeutil MSSCCI BuildOptions EXPORT OrvixC
 install(TARGETS orvix RUNTIME DESTINATION bin)
 install(FILES $<TARGET_FILE:archive_msscci> DESTINATION bin)
 install(FILES $<TARGET_FILE:archive> DESTINATION bin/plugins)
+foreach(target OrvixCore OrvixCoreUI braeutil orvix archive_msscci)
+  orvix_install_debug_file(${target} bin)
+endforeach()
+orvix_install_debug_file(archive bin/plugins)
 
 install(DIRECTORY include/ companions/braeutil/include/ DESTINATION include FILES_MATCHING PATTERN "*.h"
   PATTERN BraeDiagnostics.h EXCLUDE) # only the development build has it
+
 # Side by side as in the tree, so that the links between them lead somewhere.
-install(DIRECTORY samples docs DESTINATION share/OrvixCore)
+install(DIRECTORY samples docs DESTINATION share/OrvixCore
+  PATTERN build EXCLUDE PATTERN Doxyfile EXCLUDE PATTERN "*.dox" EXCLUDE) # the reference is built from the tree
 
 set(package lib/cmake/OrvixCore)
 configure_package_config_file(cmake/OrvixCoreConfig.cmake.in ${PROJECT_BINARY_DIR}/OrvixCoreConfig.cmake
