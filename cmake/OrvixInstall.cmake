@@ -39,8 +39,10 @@ orvix_install_debug_file(archive bin/plugins)
 install(DIRECTORY include/ companions/braeutil/include/ DESTINATION include FILES_MATCHING PATTERN "*.h"
   PATTERN BraeDiagnostics.h EXCLUDE) # only the development build has it
 
+install(FILES cmake/SDK-README.md DESTINATION . RENAME README.md)
+install(FILES CHANGELOG.md DESTINATION .)
 # Side by side as in the tree, so that the links between them lead somewhere.
-install(DIRECTORY samples docs DESTINATION share/OrvixCore
+install(DIRECTORY samples templates docs DESTINATION share/OrvixCore
   PATTERN build EXCLUDE PATTERN Doxyfile EXCLUDE PATTERN "*.dox" EXCLUDE) # the reference is built from the tree
 
 set(package lib/cmake/OrvixCore)
