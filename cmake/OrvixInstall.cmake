@@ -39,6 +39,14 @@ orvix_install_debug_file(archive bin/plugins)
 install(DIRECTORY include/ companions/braeutil/include/ DESTINATION include FILES_MATCHING PATTERN "*.h"
   PATTERN BraeDiagnostics.h EXCLUDE) # only the development build has it
 
+# How Visual Studio shows the records. It finds the file in OrvixCore.pdb; a project may also have it among its sources.
+set(natvis ${PROJECT_SOURCE_DIR}/cmake/OrvixCore.natvis)
+if(MSVC)
+  target_link_options(OrvixCore PRIVATE /NATVIS:${natvis})
+  set_property(TARGET OrvixCore APPEND PROPERTY LINK_DEPENDS ${natvis})
+endif()
+install(FILES ${natvis} DESTINATION share/OrvixCore)
+
 install(FILES cmake/SDK-README.md DESTINATION . RENAME README.md)
 install(FILES CHANGELOG.md DESTINATION .)
 # Side by side as in the tree, so that the links between them lead somewhere.
