@@ -9,6 +9,7 @@ import shutil
 import subprocess
 import sys
 import tempfile
+from concurrent.futures import ThreadPoolExecutor
 from pathlib import Path
 
 sys.path.append(str(Path(__file__).resolve().parents[1] / "docs"))
@@ -86,46 +87,68 @@ def check_debug_files(sdk, folder):
     index = re.search(r"^\s*\[ *(\d+)\].* GetIOrvixServices$", tables, re.M)[1]
     offset = int(re.search(rf"^\s*\[ *{index}\] \+base\[ *\d+\] (\w+) Export RVA", tables, re.M)[1], 16)
     source = place(library, hex(base + offset))[1].partition(":")[0]
-    if not source.endswith("/core/OrvixServices.cpp") or source.startswith("/"):
+    if not source.endswith("/core/OrvixServices.cpp"):
         raise Failure(f"GetIOrvixServices has the source {source}")
+    for file in [*modules, *sdk.rglob("*.debug")]:
+        if f"{examples.ROOT}/".encode() in file.read_bytes():
+            raise Failure(f"{file.name} names {examples.ROOT}")
     return len(modules)
 
 
 def follow_readme(template, sdk, folder):
-    """Types the commands of a template's README.md; what the last one prints."""
+    """Types the commands of a template's README.md; the build folder, and what the last command prints."""
     copy = shutil.copytree(template, folder / f"my {template.name}")
     page = (copy / "README.md").read_text(encoding="utf-8")
     lines = [line for fence in examples.FENCE.finditer(page) if fence["language"] == "sh"
              for line in fence["text"].splitlines()]
     if len(lines) != 3:
         raise Failure(f"{template.name}/README.md has {len(lines)} commands")
-    wine = folder / "commands/wine"
-    wine.parent.mkdir(exist_ok=True)
-    wine.write_text(f"#!/bin/sh\nexec '{WINE}' \"$@\"\n", encoding="utf-8")
-    wine.chmod(0o755)
-    environment = {**os.environ, "ORVIX_SDK": str(sdk), "PATH": f"{wine.parent}:{os.environ['PATH']}"}
+    commands = copy / "commands"
+    commands.mkdir()
+    (commands / "wine").write_text(f"#!/bin/sh\nexec '{WINE}' \"$@\"\n", encoding="utf-8")
+    (commands / "wine").chmod(0o755)
+    environment = {**os.environ, "ORVIX_SDK": str(sdk), "PATH": f"{commands}:{os.environ['PATH']}"}
     for line in lines:
         output = run("bash", "-c", line, cwd=copy, env=environment)
     return copy / "build", output
 
 
-def check_templates(sdk, sample, folder):
-    """The template plug-in meets its contract; the template host finds it and the sample, and shows the files of a
-    project."""
-    templates = sdk / "share/OrvixCore/templates"
-    plugin, rules = follow_readme(templates / "plugin", sdk, folder)
+def check_host(host, plugins, provider, folder):
+    """The host of the guide finds a provider and starts it."""
+    found = run(WINE, host / "host.exe", f"Z:{plugins}", cwd=folder)
+    if found.split("\n") != [f"0: {provider} starts", ""]:
+        raise Failure(f"the host finds in {plugins}:\n{found}")
+
+
+def check_template_host(host, plugins, provider, folder):
+    """The template host shows the files of a project with a provider."""
+    project = folder / "project ü"
+    project.mkdir(exist_ok=True)
+    (project / "größe.txt").touch()
+    shown = run(WINE, host / "myhost.exe", f"Z:{plugins}", provider, f"Z:{project}", cwd=folder)
+    if not re.fullmatch(r"not controlled: Z:\\.*\\project ü\\größe\.txt\n", shown):
+        raise Failure(f"the template host shows with {provider}:\n{shown}")
+
+
+def check_programs(folder, sdk):
+    """Builds everything outside the tree, and runs the hosts with the plug-ins."""
+    share = sdk / "share/OrvixCore"
+    with ThreadPoolExecutor(os.cpu_count()) as pool:
+        jobs = [pool.submit(follow_readme, share / "templates/plugin", sdk, folder),
+                pool.submit(build, share / "samples/archive", sdk),
+                pool.submit(build, folder / "plugin", sdk),
+                pool.submit(build, folder / "host", sdk),
+                pool.submit(follow_readme, share / "templates/host", sdk, folder)]
+        (my_plugin, rules), sample, plugin, host, (my_host, found) = (job.result() for job in jobs)
+    sample = sample / "bin/plugins"
     if not re.search(r"^\d+ rules, .*\b0 failed", rules, re.M):
         raise Failure(f"the template plug-in breaks its contract:\n{rules}")
-    host, found = follow_readme(templates / "host", sdk, folder)
     if found != "Archive\n":
         raise Failure(f"the template host finds:\n{found}")
-    project = folder / "project ü"
-    project.mkdir()
-    (project / "größe.txt").touch()
-    for plugins, provider in ((plugin, "My provider"), (sample, "Archive")):
-        shown = run(WINE, host / "myhost.exe", f"Z:{plugins}", provider, f"Z:{project}", cwd=folder)
-        if not re.fullmatch(r"not controlled: Z:\\.*\\project ü\\größe\.txt\n", shown):
-            raise Failure(f"the template host shows with {provider}:\n{shown}")
+    check_host(host, plugin, "Depot", folder)
+    check_host(host, sample, "Archive", folder)
+    check_template_host(my_host, my_plugin, "My provider", folder)
+    check_template_host(my_host, sample, "Archive", folder)
 
 
 def check_who_is_served(folder, sdk):
@@ -159,14 +182,7 @@ def main():
         count = check_debug_files(sdk, folder)
         check_links(sdk)
         write_examples(folder)
-        plugin = build(folder / "plugin", sdk)
-        sample = build(sdk / "share/OrvixCore/samples/archive", sdk)
-        host = build(folder / "host", sdk)
-        for plugins, provider in ((plugin, "Depot"), (sample / "bin/plugins", "Archive")):
-            found = run(WINE, host / "host.exe", f"Z:{plugins}", cwd=folder)
-            if found.split("\n") != [f"0: {provider} starts", ""]:
-                raise Failure(f"the host finds in {plugins}:\n{found}")
-        check_templates(sdk, sample / "bin/plugins", folder)
+        check_programs(folder, sdk)
         check_who_is_served(folder, sdk)
     print(f"two hosts and three plug-ins work outside the tree, and {count} modules have debug files")
 
