@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-/// The fenced examples of README.md, docs/ and samples/, as examples.py reads them.
+/// The fenced examples of every Markdown file of the tree outside build/, as examples.py reads them.
 namespace Guides
 {
 
@@ -31,18 +31,20 @@ inline void PrintTo(const Fence& fence, std::ostream* stream)
 inline std::vector<std::filesystem::path> Files()
 {
     const std::filesystem::path root = ORVIX_ROOT;
-    std::vector<std::filesystem::path> files = {L"README.md"};
-    for (const wchar_t* folder : {L"docs", L"samples"})
+    std::vector<std::filesystem::path> files;
+    for (std::filesystem::recursive_directory_iterator entry(root), end; entry != end; ++entry)
     {
-        for (const auto& entry : std::filesystem::recursive_directory_iterator(root / folder))
+        const std::filesystem::path file = entry->path().lexically_relative(root);
+        if (file == L"build" || file == L".git")
         {
-            if (entry.path().extension() == L".md")
-            {
-                files.push_back(entry.path().lexically_relative(root));
-            }
+            entry.disable_recursion_pending();
+        }
+        else if (file.extension() == L".md")
+        {
+            files.push_back(file);
         }
     }
-    std::sort(files.begin() + 1, files.end());
+    std::sort(files.begin(), files.end());
     return files;
 }
 

@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
 """Compiles every C++ example of the guides against the public headers, with the cross compiler and for Microsoft's ABI.
-An example with an #include is a file; any other is the body of a function behind all headers, with the parameters that
+An example with an #include is a file. Any other is the body of a function after all headers, with the parameters that
 its comment gives."""
 
 import sys

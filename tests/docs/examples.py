@@ -1,4 +1,4 @@
-"""The fenced examples of the guides.
+"""The fenced examples of the guides: of every Markdown file outside build/.
 
 A comment on the line above a fence says how the example is to be read:
 
@@ -11,7 +11,7 @@ from pathlib import Path
 from typing import NamedTuple
 
 ROOT = Path(__file__).resolve().parents[2]
-GUIDES = sorted([ROOT / "README.md", *(ROOT / "docs").rglob("*.md"), *(ROOT / "samples").rglob("*.md")])
+GUIDES = sorted(file for file in ROOT.rglob("*.md") if file.relative_to(ROOT).parts[0] != "build")
 FENCE = re.compile(r"^(?:<!-- (?P<mark>\w+): (?P<value>[^\n]*) -->\n)?"
                    r"```(?P<language>\w*)\n(?P<text>.*?)^```$", re.M | re.S)
 

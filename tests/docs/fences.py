@@ -6,7 +6,7 @@ import sys
 
 import examples
 
-# Who reads the fences of a language.
+# What reads the fences of a language.
 READERS = {
     "cmake": "tests/sdk/outside.py",
     "console": "tool_examples_test.cpp: its command lines",

@@ -32,7 +32,7 @@ std::string_view WithoutPrompt(std::string_view line)
     return line.starts_with("> ") || line.starts_with("$ ") ? line.substr(2) : line;
 }
 
-/// Every call behind a prompt, and in what a shell reads also without one.
+/// Every call after a prompt, and in fences for a shell also without a prompt.
 std::vector<Call> Calls()
 {
     std::vector<Call> calls;
@@ -63,7 +63,7 @@ std::vector<Call> Calls()
     return calls;
 }
 
-/// The line as the tool understands it. Throws `ToolError` where the tool does.
+/// The line as the tool understands it. Throws `ToolError` as the tool does.
 std::optional<CommandLine> Parse(const Call& call)
 {
     int count = 0;
@@ -72,8 +72,8 @@ std::optional<CommandLine> Parse(const Call& call)
     return CommandLine::Parse(count, arguments.get());
 }
 
-/// Whether both have the same members in the same order, and values of the same kinds; null stands for any. What one
-/// array holds is found in the other.
+/// Whether both have the same members in the same order, and values of the same kinds. Null means any value. Each
+/// element of `shown` has a counterpart in `printed`.
 bool HasShapeOf(const Json& printed, const Json& shown)
 {
     if (shown.is_null() || printed.is_null())

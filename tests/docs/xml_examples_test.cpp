@@ -17,15 +17,14 @@
 namespace
 {
 
-/// The text with other words in the place of those that the library assumes anyway: only so is it seen that they are
-/// read.
+/// The text with other words in place of the library's defaults: a default does not show whether it was read.
 std::string WithoutDefaults(const std::string& xml)
 {
     return std::regex_replace(std::regex_replace(xml, std::regex(">true<"), ">false<"), std::regex(">exclude<"),
                               ">include<");
 }
 
-/// The fenced XML of every guide. A fragment without one of the three roots is what stands below OrvixProviders.
+/// The fenced XML of every guide. A fragment without one of the three roots belongs below OrvixProviders.
 std::vector<Guides::Fence> Examples()
 {
     static const std::regex root("<(OrvixProviders|OrvixPrompts|MSSCCProjectSettings)\\b");
@@ -152,7 +151,7 @@ protected:
         return texts;
     }
 
-    /// What a library is handed when the project is opened.
+    /// The texts that a library gets when the project is opened.
     Texts ReadProjectSettings()
     {
         Texts texts;
@@ -174,7 +173,7 @@ protected:
 TEST_P(XmlExample, SaysOnlyWhatTheLibraryReads)
 {
     const std::wstring root = Root();
-    const Texts written = Written(); // before the file is opened as a project's settings, which writes it anew
+    const Texts written = Written(); // before it is opened as a project's settings, which overwrites it
     Texts read = root == L"OrvixProviders"         ? ReadProviders()
                  : root == L"OrvixPrompts"         ? ReadPrompts()
                  : root == L"MSSCCProjectSettings" ? ReadProjectSettings()
