@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 """Compiles every C++ example of the guides against the public headers, with the cross compiler and for Microsoft's ABI.
-An example with an #include is a file. Any other is the body of a function after all headers, with the parameters that
-its comment gives."""
+An example with an #include is a file. Any other is the body of a function, with the parameters that its comment gives;
+all of these are in one file, after all headers."""
 
 import sys
 
@@ -13,18 +13,26 @@ import compilers
 WARNINGS = ["-fsyntax-only", "-Wall", "-Wextra", "-Wshadow", "-Wconversion", "-Werror", "-Wno-unused-variable"]
 
 
-def source(example):
+def code(example):
     guide, line = example.place.split(":")
-    text = f'#line {line} "{guide}"\n{example.text}'
-    if "#include" in example.text:
-        return text
-    return (f"#include <windows.h>\n{compilers.include_all(compilers.HEADERS)}"
-            f"void Example({example.value});\nvoid Example({example.value})\n{{\n{text}}}\n")
+    return f'#line {line} "{guide}"\n{example.text}'
+
+
+def function(number, example):
+    head = f"void Example{number}({example.value})"
+    return f"{head};\n{head}\n{{\n{code(example)}}}\n"
+
+
+def sources(found):
+    files = [example for example in found if "#include" in example.text]
+    bodies = [example for example in found if "#include" not in example.text]
+    return [*map(code, files), "#include <windows.h>\n" + compilers.include_all(compilers.HEADERS) +
+            "".join(function(number, example) for number, example in enumerate(bodies))]
 
 
 def main():
     found = examples.all_examples("cpp")
-    results = compilers.compile_all([([*compiler, *WARNINGS], source(example)) for example in found
+    results = compilers.compile_all([([*compiler, *WARNINGS], source) for source in sources(found)
                                      for compiler in (compilers.gcc(), compilers.clang("x86_64-pc-windows-msvc"))])
     errors = [result.stderr for result in results if result.returncode != 0]
     if not found:
