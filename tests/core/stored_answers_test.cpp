@@ -1,0 +1,135 @@
+#include "StoredAnswers.h"
+
+#include "OrvixPrompt.h"
+
+#include <gtest/gtest.h>
+
+namespace
+{
+
+constexpr std::uint32_t Save = 7;
+constexpr std::uint32_t Other = 8;
+constexpr bool Locked = true;
+constexpr bool Overwrite = true;
+
+/// Answers with a table that the test fills.
+class StoredAnswersTest : public testing::Test
+{
+protected:
+    void AddRow(std::uint32_t id, std::uint32_t action, bool locked = false)
+    {
+        m_answers.Table().AddPrompt(static_cast<int>(id), L"text", 0, action, locked);
+    }
+
+    std::uint32_t ActionOfRow(unsigned int row) { return m_answers.Table().GetPrompt(row); }
+
+    StoredAnswers m_answers;
+};
+
+} // namespace
+
+TEST_F(StoredAnswersTest, AnswerNeutrallyWithoutARow)
+{
+    AddRow(Other, OrvixPromptAction::Yes, Locked);
+    EXPECT_EQ(m_answers.GetAction(Save), 0U);
+    EXPECT_FALSE(m_answers.IsLocked(Save));
+    EXPECT_FALSE(m_answers.SetAction(Save, OrvixPromptAction::No));
+    EXPECT_EQ(ActionOfRow(0), OrvixPromptAction::Yes);
+}
+
+TEST_F(StoredAnswersTest, AreReadFromTheFirstRowOfAnID)
+{
+    AddRow(Other, OrvixPromptAction::Ask);
+    AddRow(Save, OrvixPromptAction::Yes);
+    AddRow(Save, OrvixPromptAction::No);
+    EXPECT_EQ(m_answers.GetAction(Save), OrvixPromptAction::Yes);
+}
+
+TEST_F(StoredAnswersTest, AreWrittenToTheLastRowOfAnID)
+{
+    AddRow(Save, OrvixPromptAction::Yes);
+    AddRow(Save, OrvixPromptAction::No);
+    AddRow(Other, OrvixPromptAction::Ask);
+    EXPECT_TRUE(m_answers.SetAction(Save, OrvixPromptAction::NoToAll));
+    EXPECT_EQ(ActionOfRow(0), OrvixPromptAction::Yes);
+    EXPECT_EQ(ActionOfRow(1), OrvixPromptAction::NoToAll);
+    EXPECT_EQ(ActionOfRow(2), OrvixPromptAction::Ask);
+    EXPECT_EQ(m_answers.GetAction(Save), OrvixPromptAction::Yes);
+}
+
+TEST_F(StoredAnswersTest, AreLockedWhereTheFirstRowIs)
+{
+    AddRow(Save, OrvixPromptAction::Yes, Locked);
+    AddRow(Save, OrvixPromptAction::No);
+    AddRow(Other, OrvixPromptAction::Yes);
+    AddRow(Other, OrvixPromptAction::No, Locked);
+    EXPECT_TRUE(m_answers.IsLocked(Save));
+    EXPECT_FALSE(m_answers.IsLocked(Other));
+}
+
+TEST_F(StoredAnswersTest, AreNotWrittenWhereTheLastRowIsLocked)
+{
+    AddRow(Save, OrvixPromptAction::Yes);
+    AddRow(Save, OrvixPromptAction::No, Locked);
+    AddRow(Other, OrvixPromptAction::Yes, Locked);
+    AddRow(Other, OrvixPromptAction::No);
+    EXPECT_FALSE(m_answers.SetAction(Save, OrvixPromptAction::NoToAll));
+    EXPECT_EQ(ActionOfRow(1), OrvixPromptAction::No);
+    EXPECT_TRUE(m_answers.SetAction(Other, OrvixPromptAction::NoToAll));
+    EXPECT_EQ(ActionOfRow(3), OrvixPromptAction::NoToAll);
+}
+
+TEST_F(StoredAnswersTest, UseAll32BitsOfAnID)
+{
+    AddRow(OrvixPromptID::None - 1, OrvixPromptAction::Yes);
+    EXPECT_EQ(m_answers.GetAction(OrvixPromptID::None - 1), OrvixPromptAction::Yes);
+    EXPECT_TRUE(m_answers.SetAction(OrvixPromptID::None - 1, OrvixPromptAction::No));
+    EXPECT_EQ(ActionOfRow(0), OrvixPromptAction::No);
+}
+
+TEST_F(StoredAnswersTest, RegisterAddsAnUnlockedRow)
+{
+    m_answers.Register(Save, L"Save?", OrvixPromptAction::Yes, OrvixPromptOption::WarningIcon, !Overwrite);
+    OrvixPromptTable& table = m_answers.Table();
+    ASSERT_EQ(table.NumPrompts(), 1);
+    EXPECT_EQ(table.GetPromptID(0), static_cast<int>(Save));
+    EXPECT_STREQ(table.GetPromptText(0), L"Save?");
+    EXPECT_EQ(table.GetPrompt(0), OrvixPromptAction::Yes);
+    EXPECT_EQ(table.GetPromptOptions(0), OrvixPromptOption::WarningIcon);
+    EXPECT_FALSE(table.GetLocked(0));
+}
+
+TEST_F(StoredAnswersTest, RegisterGivesTheLastRowOfAnIDItsTextAlone)
+{
+    AddRow(Save, OrvixPromptAction::Yes);
+    AddRow(Save, OrvixPromptAction::No, Locked);
+    m_answers.Register(Save, L"new", OrvixPromptAction::NoToAll, OrvixPromptOption::WarningIcon, !Overwrite);
+    OrvixPromptTable& table = m_answers.Table();
+    ASSERT_EQ(table.NumPrompts(), 2);
+    EXPECT_STREQ(table.GetPromptText(0), L"text");
+    EXPECT_STREQ(table.GetPromptText(1), L"new");
+    EXPECT_EQ(table.GetPrompt(1), OrvixPromptAction::No);
+    EXPECT_EQ(table.GetPromptOptions(1), 0U);
+    EXPECT_TRUE(table.GetLocked(1));
+}
+
+TEST_F(StoredAnswersTest, RegisterWithOverwriteReplacesOptionsAndActionEvenOfALockedRow)
+{
+    AddRow(Save, OrvixPromptAction::Yes);
+    AddRow(Save, OrvixPromptAction::No, Locked);
+    m_answers.Register(Save, L"new", OrvixPromptAction::NoToAll, OrvixPromptOption::WarningIcon, Overwrite);
+    OrvixPromptTable& table = m_answers.Table();
+    EXPECT_EQ(table.GetPrompt(0), OrvixPromptAction::Yes);
+    EXPECT_EQ(table.GetPrompt(1), OrvixPromptAction::NoToAll);
+    EXPECT_EQ(table.GetPromptOptions(1), OrvixPromptOption::WarningIcon);
+    EXPECT_TRUE(table.GetLocked(1));
+}
+
+TEST_F(StoredAnswersTest, RegisterWithoutATextAddsNothingAndLeavesAnOldText)
+{
+    AddRow(Save, OrvixPromptAction::Yes);
+    m_answers.Register(Other, nullptr, OrvixPromptAction::No, 0, Overwrite);
+    m_answers.Register(Save, nullptr, OrvixPromptAction::No, 0, !Overwrite);
+    ASSERT_EQ(m_answers.Table().NumPrompts(), 1);
+    EXPECT_STREQ(m_answers.Table().GetPromptText(0), L"text");
+}
