@@ -151,25 +151,62 @@ TEST(AllocationFailure, DoesNotApplyTheDoubleSlashRuleToThePathThatStays)
     });
 }
 
-TEST(AllocationFailure, GivesZeroFromAddChildAndChangesNothing)
+TEST(AllocationFailure, LeavesAPathEmptyThatIsSetForTheFirstTime)
+{
+    const long failures = SweepAllocations([](AllocationRound& round) {
+        OrvixFileEntry entry;
+        round.Attempt([&] { entry.SetFile(LongText); });
+        EXPECT_STREQ(entry.GetFile(), round.Failed() ? L"" : LongText);
+        entry.SetFile(LongText);
+        EXPECT_STREQ(entry.GetFile(), LongText);
+    });
+    EXPECT_EQ(failures, 2) << "one allocation, failing once and for good";
+}
+
+TEST(AllocationFailure, GivesZeroFromAddChildAndKeepsTheOtherChildren)
 {
     long failures = 0;
     for (unsigned int present = 0; present < MostElements; ++present)
     {
         failures += SweepAllocations([&](AllocationRound& round) {
-            OrvixFileEntry child;
+            std::vector<OrvixFileEntry> children(MostElements + 1);
             OrvixFileEntry parent;
             for (unsigned int n = 0; n < present; ++n)
             {
-                parent.AddChild(&child);
+                parent.AddChild(&children[n]);
             }
-            const unsigned int count = round.Attempt([&] { return parent.AddChild(&child); });
+            const unsigned int count = round.Attempt([&] { return parent.AddChild(&children[present]); });
             EXPECT_EQ(count, round.Failed() ? 0 : present + 1);
             EXPECT_EQ(parent.NumChildren(), round.Failed() ? present : present + 1);
-            EXPECT_EQ(parent.AddChild(&child), round.Failed() ? present + 1 : present + 2);
+            EXPECT_EQ(parent.GetChild(present), round.Failed() ? nullptr : &children[present]);
+            EXPECT_EQ(parent.AddChild(&children.back()), round.Failed() ? present + 1 : present + 2);
+            EXPECT_EQ(parent.GetChild(parent.NumChildren() - 1), &children.back());
+            for (unsigned int n = 0; n < present; ++n)
+            {
+                EXPECT_EQ(parent.GetChild(n), &children[n]);
+            }
         });
     }
-    EXPECT_GT(failures, 0);
+    EXPECT_GE(failures, 4) << "the first child and a later one find no room";
+}
+
+TEST(AllocationFailure, RefusesOnlyTheChildrenThatNeedMoreRoom)
+{
+    constexpr unsigned int Count = 1000;
+    const long failures = SweepAllocations([](AllocationRound& round) {
+        OrvixFileEntry child;
+        OrvixFileEntry parent;
+        unsigned int accepted = 0;
+        round.Attempt([&] {
+            for (unsigned int n = 0; n < Count; ++n)
+            {
+                accepted += parent.AddChild(&child) != 0 ? 1 : 0;
+            }
+        });
+        EXPECT_EQ(parent.NumChildren(), accepted);
+        EXPECT_EQ(accepted == Count, !round.Failed());
+    });
+    EXPECT_LE(failures, 2 * 10) << "the storage grows in few steps";
 }
 
 TEST(AllocationFailure, GivesZeroFromAddAttachmentOfAPathAndChangesNothing)
