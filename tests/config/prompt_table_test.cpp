@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <climits>
+#include <iterator>
 #include <random>
 #include <string>
 #include <vector>
@@ -250,7 +251,32 @@ TEST(PromptTable, LimitsNeitherTextsNorRows)
     EXPECT_EQ(table.GetPromptID(19'999), 20'000);
 }
 
-TEST(PromptTableSlots, StandInThePublishedOrder)
+TEST(PromptTable, KeepsTheAddressOfATextWhileRowsAreAddedAndOthersChange)
+{
+    OrvixPromptTable table;
+    const std::wstring texts[] = {L"", L"Save?", LongText};
+    const wchar_t* addresses[std::size(texts)] = {};
+    for (unsigned int n = 0; n < std::size(texts); ++n)
+    {
+        table.AddPrompt(1, texts[n].c_str(), 0, 0, false);
+        addresses[n] = table.GetPromptText(n);
+    }
+    for (int n = 0; n < 10'000; ++n)
+    {
+        ASSERT_NE(table.AddPrompt(n, n % 2 == 0 ? L"short" : LongText.c_str(), 0, 0, false), -1);
+    }
+    for (unsigned int n = std::size(texts); n < static_cast<unsigned int>(table.NumPrompts()); ++n)
+    {
+        ASSERT_TRUE(table.SetPromptText(n, LongText.c_str()));
+    }
+    for (unsigned int n = 0; n < std::size(texts); ++n)
+    {
+        EXPECT_EQ(table.GetPromptText(n), addresses[n]) << "the text was moved";
+        EXPECT_EQ(addresses[n], texts[n]);
+    }
+}
+
+TEST(PromptTableSlots, AreInThePublishedOrder)
 {
     OrvixPromptTable table;
     const auto call = [&]<typename Result>(Result, std::size_t slot, auto... arguments) {

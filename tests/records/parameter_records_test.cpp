@@ -321,6 +321,27 @@ TEST(ExploreProviderParamsAddFilter, TakesManyFiltersWithinTheTimeLimit)
     }
 }
 
+TEST(ExploreProviderParamsGetFilter, KeepsTheAddressesOfItsTextsWhileFiltersAreAdded)
+{
+    const wchar_t* const longText = L"a text too long to lie inside a string object";
+    OrvixExploreProviderParams params;
+    params.AddFilter(L"Text", L"*.txt");
+    params.AddFilter(longText, longText);
+    const wchar_t* const shortName = params.GetFilterName(0);
+    const wchar_t* const shortExtensions = params.GetFilterExtensions(0);
+    const wchar_t* const longName = params.GetFilterName(1);
+    for (int n = 0; n < 10'000; ++n)
+    {
+        ASSERT_NE(params.AddFilter(n % 2 == 0 ? L"All" : longText, L"*.*"), 0u);
+    }
+    EXPECT_EQ(params.GetFilterName(0), shortName);
+    EXPECT_EQ(params.GetFilterExtensions(0), shortExtensions);
+    EXPECT_EQ(params.GetFilterName(1), longName);
+    EXPECT_STREQ(shortName, L"Text");
+    EXPECT_STREQ(shortExtensions, L"*.txt");
+    EXPECT_STREQ(longName, longText);
+}
+
 TEST(ExploreProviderParamsGetFilter, GivesNullForAnIndexOutOfRange)
 {
     OrvixExploreProviderParams params;
