@@ -1,10 +1,12 @@
-// A provider plug-in that keeps every rule of the contract but the one that `Defect` names. It remembers the state of
-// files for as long as it is loaded, and touches none.
+// A provider plug-in that breaks one rule of the contract, which `Defect` names, and keeps all others. It remembers the
+// state of files while it is loaded and changes no file.
 
 #include "Defect.h"
 #include "FakeProvider.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
+#include "OrvixProviderOption.h"
 #include "OrvixVersion.h"
 
 #include <cstdint>
@@ -15,9 +17,17 @@
 namespace
 {
 
-constexpr int Success = 0;
-constexpr int Failure = -1;
-constexpr int NotOffered = -2;
+using OrvixProviderResult::Failure;
+using OrvixProviderResult::NotOffered;
+using OrvixProviderResult::Success;
+
+// What the contract does not know.
+constexpr int UnknownResult = 7;
+constexpr int UnknownResultOfBadInput = 3;
+constexpr int UnknownResultOfDialog = 9;
+constexpr unsigned long UnknownState = 0x40;
+
+constexpr unsigned long CheckedOut = OrvixFileState::Controlled | OrvixFileState::CheckedOut;
 
 class DefectiveProvider final : public FakeProvider
 {
@@ -67,19 +77,19 @@ public:
     int Add(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
         Report("Add", options);
-        return Become(list, Controlled);
+        return Become(list, OrvixFileState::Controlled);
     }
 
     int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
         Report("CheckOut", options);
-        if (Defect::Is(L"option-bit") && (options & 0x4) != 0)
+        if (Defect::Is(L"option-bit") && (options & OrvixProviderOption::NoDialog) != 0)
         {
             return Failure;
         }
         if (Defect::Is(L"bad-input") && std::wstring(Last(list)).find(L'?') != std::wstring::npos)
         {
-            return 3;
+            return UnknownResultOfBadInput;
         }
         return Become(list, CheckedOut);
     }
@@ -91,14 +101,14 @@ public:
         {
             list->GetActiveFileEntry(0)->SetFlagsIn(0);
         }
-        return Become(list, Controlled);
+        return Become(list, OrvixFileState::Controlled);
     }
 
     int UndoCheckOut(OrvixFileList* list, unsigned long options) override
     {
         Report("UndoCheckOut", options);
-        const int result = Become(list, Controlled);
-        return Defect::Is(L"results") && options != 0 ? 7 : result;
+        const int result = Become(list, OrvixFileState::Controlled);
+        return Defect::Is(L"results") && options != 0 ? UnknownResult : result;
     }
 
     int GetLatest(OrvixFileList* list, unsigned long options) override
@@ -107,7 +117,10 @@ public:
         return list->NumActiveEntries() == 0 && !Defect::Is(L"empty-list") ? Failure : Success;
     }
 
-    int ShowHistory(OrvixFileList* list) override { return list->NumActiveEntries() == 0 ? Failure : 1; }
+    int ShowHistory(OrvixFileList* list) override
+    {
+        return list->NumActiveEntries() == 0 ? Failure : OrvixProviderResult::ReloadFiles;
+    }
     int ShowProperties(OrvixFileList* list) override { return list->NumActiveEntries() == 0 ? Failure : Success; }
 
     int QueryStatus(OrvixFileList* list, unsigned long) override
@@ -124,7 +137,7 @@ public:
             {
                 continue;
             }
-            list->GetActiveFileEntry(i)->SetFlagsOut(NotControlled); // too early
+            list->GetActiveFileEntry(i)->SetFlagsOut(OrvixFileState::NotControlled); // too early
         }
         for (unsigned int i = 0; i < count; ++i)
         {
@@ -188,15 +201,10 @@ public:
 
     bool ReservedI() override { return !Defect::Is(L"reserved-false"); }
 
-    int ShowOptions() override { return Defect::Is(L"dialogs") ? 9 : NotOffered; }
-    int RunProviderClient() override { return NotOffered; }
+    int ShowOptions() override { return Defect::Is(L"dialogs") ? UnknownResultOfDialog : NotOffered; }
 
 private:
-    static constexpr unsigned long NotControlled = 0x1;
-    static constexpr unsigned long Controlled = 0x2;
-    static constexpr unsigned long CheckedOut = 0x2 | 0x4;
-
-    /// Not of the rules that go through many sessions: these pass fewer options.
+    /// Reports the first session only: the rules that go through many sessions pass fewer options.
     void Report(const char* operation, unsigned long options) const
     {
         if (m_starts == 1)
@@ -225,15 +233,16 @@ private:
     {
         if (!m_open)
         {
-            return Defect::Is(L"status-closed") ? NotControlled | 0x100000 : NotControlled;
+            return Defect::Is(L"status-closed") ? OrvixFileState::NotControlled | OrvixFilePermission::Add
+                                                : OrvixFileState::NotControlled;
         }
         const auto found = m_states.find(entry.GetFile());
-        const unsigned long state = found == m_states.end() ? NotControlled : found->second;
+        const unsigned long state = found == m_states.end() ? OrvixFileState::NotControlled : found->second;
         if (Defect::Is(L"status-contradiction"))
         {
-            return state | NotControlled | Controlled;
+            return state | OrvixFileState::NotControlled | OrvixFileState::Controlled;
         }
-        return Defect::Is(L"status-bits") && state == CheckedOut ? state | 0x40 : state;
+        return Defect::Is(L"status-bits") && state == CheckedOut ? state | UnknownState : state;
     }
 
     std::map<std::wstring, unsigned long> m_states;
@@ -244,7 +253,7 @@ private:
     int m_starts = 0;
 };
 
-// Not within a function: what GCC guards such an object with leaves handles open in every load.
+// Outside a function: GCC guards an object inside one, and each load would leave the guard's handles open.
 DefectiveProvider provider;
 
 } // namespace

@@ -6,7 +6,7 @@
 #include <vector>
 
 /// What the scripted OrvixCoreUI.dll answers, and what the library asked of it. Link the test program with
-/// ScriptedCoreUI; the script is one for the whole process.
+/// ScriptedCoreUI. The process has one script.
 struct CoreUIScript
 {
     struct Prompt
@@ -29,17 +29,17 @@ struct CoreUIScript
         OrvixPromptTable* prompts;
     };
 
-    /// The dialogs; one that is not set is cancelled. They may throw.
+    /// The dialogs. One that is not set answers no, cancelled or unchanged. They may throw.
     std::function<std::int32_t(const Prompt&)> onPrompt;
     std::function<std::int32_t(const FileList&)> onFileList;
     std::function<std::int32_t(const Editor&)> onEditor;
 
-    /// Every dialog that was asked for, with the arguments as they came.
+    /// Every dialog that the library asked for, with its arguments.
     std::vector<Prompt> prompts;
     std::vector<FileList> fileLists;
     std::vector<Editor> editors;
 
-    /// The interface as it was handed out, given a client access, and handed back.
+    /// The interfaces that were obtained, their client accesses, and the interfaces that were released.
     std::vector<IOrvixCoreUI*> obtained;
     std::vector<IOrvixCoreUIClientAccess*> accesses;
     std::vector<IOrvixCoreUI*> released;
