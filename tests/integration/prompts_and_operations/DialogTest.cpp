@@ -13,7 +13,7 @@ void EditTable(IOrvixServices& services, CoreUIScript& script, const Work& work)
 {
     auto dialog = std::exchange(script.onEditor, [&work](const CoreUIScript::Editor& call) {
         work(*call.prompts);
-        return 0;
+        return OrvixPromptEditorResult::Unchanged;
     });
     services.EditPrompts(nullptr, nullptr);
     script.onEditor = std::move(dialog);

@@ -1,30 +1,32 @@
 #pragma once
 
 #include "OrvixClientInfo.h"
+#include "OrvixPrompt.h"
+#include "OrvixServicesPointer.h"
 #include "RecordingHost.h"
 #include "ScriptedCoreUI.h"
-#include "ServicesPointer.h"
 #include "TempFolder.h"
 
 #include <gtest/gtest.h>
 
 #include <bit>
 
-/// Prompt IDs and action bits of the tests.
-constexpr std::uint32_t NoPrompt = 0xFFFFFFFF;
-constexpr std::uint32_t Ask = 0x1;
-constexpr std::uint32_t AnswerOne = 0x2;
-constexpr std::uint32_t AnswerZero = 0x4;
-constexpr std::uint32_t AnswerTwo = 0x8;
-constexpr std::uint32_t AnswerThree = 0x10;
+namespace Action = OrvixPromptAction;
+namespace Answer = OrvixPromptAnswer;
 
-/// A pass-through argument: a value that nobody may look behind.
+/// A bit that no published name has, in any word of options, states or actions.
+inline constexpr std::uint32_t UnpublishedBit = 0x80000000;
+
+/// A word with every bit set.
+inline constexpr std::uint32_t AllBits = 0xFFFFFFFF;
+
+/// An argument that the library passes on: a pointer that nobody may follow.
 inline void* Token(std::uintptr_t value)
 {
     return std::bit_cast<void*>(value);
 }
 
-/// A services object with a host behind it, an empty configuration folder and a fresh script of dialogs.
+/// A services object of a recording host, with an empty configuration folder and a fresh script of dialogs.
 class DialogTest : public testing::Test
 {
 protected:
@@ -43,14 +45,14 @@ protected:
         m_services->Initialize(&info, 0);
     }
 
-    /// Appends a row to the prompt table. It goes through the prompt editor, since only there rows are locked.
+    /// Appends a row to the prompt table, through the prompt editor: only there rows are locked.
     void AddPrompt(std::uint32_t id, std::uint32_t action, bool locked = false);
 
-    /// The last row's action, which is the one that is written.
+    /// The action of the last row with the ID, which is the row that the library writes.
     std::uint32_t LastAction(std::uint32_t id);
 
     CoreUIScript& m_script = GetCoreUIScript();
     TempFolder m_config;
     RecordingHost m_host;
-    ServicesPointer m_services{GetIOrvixServices()};
+    OrvixServicesPointer m_services = MakeOrvixServices();
 };

@@ -3,6 +3,8 @@
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
 
+#include <sstream>
+
 std::string ActiveNames(OrvixFileList* list)
 {
     if (list == nullptr)
@@ -30,4 +32,24 @@ std::string Narrow(const wchar_t* text)
         narrow += static_cast<char>(*text);
     }
     return narrow;
+}
+
+std::string BitNames(unsigned long bits, std::initializer_list<NamedBit> names)
+{
+    std::string text;
+    for (const NamedBit& named : names)
+    {
+        if ((bits & named.bit) != 0)
+        {
+            text += std::string(" ") + named.name;
+            bits &= ~named.bit;
+        }
+    }
+    if (bits != 0)
+    {
+        std::ostringstream rest;
+        rest << " 0x" << std::hex << bits;
+        text += rest.str();
+    }
+    return text;
 }

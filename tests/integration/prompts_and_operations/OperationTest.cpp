@@ -1,6 +1,19 @@
 #include "OperationTest.h"
 
-#include <sstream>
+namespace
+{
+
+std::string OptionNames(std::uint32_t options)
+{
+    return BitNames(options, {{DialogOption::EntriesCanBeCleared, "EntriesCanBeCleared"},
+                              {DialogOption::OfferKeepCheckedOut, "OfferKeepCheckedOut"},
+                              {DialogOption::OfferGetLatest, "OfferGetLatest"},
+                              {DialogOption::OptionChecked, "OptionChecked"},
+                              {DialogOption::OfferRemember, "OfferRemember"},
+                              {DialogOption::RememberChecked, "RememberChecked"}});
+}
+
+} // namespace
 
 OperationTest::OperationTest()
 {
@@ -9,9 +22,7 @@ OperationTest::OperationTest()
     m_script.onFileList = [this](const CoreUIScript::FileList& call) {
         OrvixFileListDialogParams& params = *call.params;
         OrvixFileList& list = *params.GetOrvixFileList();
-        std::ostringstream line;
-        line << "Dialog " << ActiveNames(&list) << " " << std::hex << params.GetOptions();
-        m_log.push_back(line.str());
+        m_log.push_back("Dialog " + ActiveNames(&list) + OptionNames(params.GetOptions()));
         for (unsigned int i = 0; i < list.NumActiveEntries(); ++i)
         {
             OrvixFileEntry* entry = list.GetActiveFileEntry(i);
@@ -19,8 +30,9 @@ OperationTest::OperationTest()
             {
                 continue;
             }
-            const bool ticked = m_unticked.count(Narrow(entry->GetFile())) == 0;
-            entry->SetFlagsOut(ticked ? entry->GetFlagsOut() | 0x2 : entry->GetFlagsOut() & ~0x2UL);
+            const bool checked = !m_cleared.contains(Narrow(entry->GetFile()));
+            entry->SetFlagsOut(checked ? entry->GetFlagsOut() | OrvixFileSelection::Confirmed
+                                       : entry->GetFlagsOut() & ~OrvixFileSelection::Confirmed);
         }
         if (m_onDialog)
         {

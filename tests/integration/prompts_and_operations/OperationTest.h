@@ -2,9 +2,12 @@
 
 #include "DialogTest.h"
 #include "Log.h"
+#include "OrvixDialogOption.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixOperation.h"
 #include "RecordingListener.h"
 #include "RecordingProvider.h"
 
@@ -12,24 +15,11 @@
 #include <set>
 #include <string>
 
-/// Bits of the operations.
-constexpr std::uint32_t Notify = 0x1;
-constexpr std::uint32_t CheckIn = 0x2;
-constexpr std::uint32_t Add = 0x4;
-constexpr std::uint32_t GetLatest = 0x8;
-constexpr std::uint32_t CheckOut = 0x10;
-constexpr std::uint32_t UndoCheckOut = 0x20;
-
-/// Bits of the dialog's options.
-constexpr std::uint32_t DialogShown = 0x1;
-constexpr std::uint32_t KeepOption = 0x4;
-constexpr std::uint32_t LatestOption = 0x8;
-constexpr std::uint32_t OptionTicked = 0x10;
-constexpr std::uint32_t OfferRemember = 0x40;
-constexpr std::uint32_t Remember = 0x80;
-
-/// State of a file in FlagsOut.
-constexpr unsigned long Controlled = 0x2;
+namespace DialogOption = OrvixDialogOption;
+namespace DialogResult = OrvixDialogResult;
+namespace Operation = OrvixOperation;
+namespace OperationResult = OrvixOperationResult;
+namespace State = OrvixFileState;
 
 /// A record with a file list, a provider, a listener and a user at the dialog, all writing one log.
 class OperationTest : public DialogTest
@@ -41,18 +31,18 @@ protected:
     OperationTest();
 
     /// Appends an entry to the list and to its active list.
-    OrvixFileEntry& AddFile(const wchar_t* name, unsigned long flagsOut = Controlled);
+    OrvixFileEntry& AddFile(const wchar_t* name, unsigned long flagsOut = State::Controlled);
 
     /// Lets the record name both prompts.
     void UsePrompts();
 
-    std::int32_t Run(std::uint32_t operations, std::uint32_t flagsOutMask = 0xFFFFFFFF);
+    std::int32_t Run(std::uint32_t operations, std::uint32_t flagsOutMask = AllBits);
 
-    /// The user at the dialog: writes "Dialog [a b] 1" with the options, leaves every entry ticked save those
-    /// named here, does what `onDialog` says and answers.
-    std::set<std::string> m_unticked;
+    /// The user at the dialog: logs "Dialog [a b] OptionChecked" with the names of the options, clears the entries
+    /// named here, leaves every other entry checked, runs `m_onDialog` and answers.
+    std::set<std::string> m_cleared;
     std::function<void(OrvixFileListDialogParams&)> m_onDialog;
-    std::int32_t m_dialogResult = 1;
+    std::int32_t m_dialogResult = DialogResult::Confirmed;
 
     Lines m_log;
     RecordingProvider m_provider{m_log};

@@ -2,21 +2,23 @@
 
 #include "IOrvixNotifyCallback.h"
 #include "Log.h"
+#include "OrvixListenerRegistration.h"
+#include "OrvixNotificationID.h"
 #include "OrvixNotifyParams.h"
 
 #include <functional>
 
-/// A listener, registered as long as it lives, that writes down every notification: "Notify 13 [a b]", with
-/// " cancelled" at the end where the record says so.
+/// A listener, registered while it lives, that logs every notification: "Notify BeforeCheckIn [a b]", with " cancelled"
+/// at the end when the record is cancelled.
 class RecordingListener final : public IOrvixNotifyCallback
 {
 public:
     explicit RecordingListener(Lines& log, std::string name = "Notify");
     RecordingListener(const RecordingListener&) = delete;
     RecordingListener& operator=(const RecordingListener&) = delete;
-    ~RecordingListener();
+    ~RecordingListener() = default;
 
-    /// The listener's answer, 0 where none is set; may throw.
+    /// The listener's answer; accepts where none is set. May throw.
     std::function<std::uint32_t(OrvixNotifyParams&)> onNotify;
 
     /// Answers one notification with a value and accepts every other.
@@ -27,4 +29,5 @@ public:
 private:
     Lines& m_log;
     std::string m_name;
+    OrvixListenerRegistration m_registration{*this};
 };

@@ -5,17 +5,17 @@
 
 #include <functional>
 
-/// A provider that writes down every call: "Add [a b] comment 4".
+/// A provider that logs every call with the names of its options: "Add [a b] comment NoDialog".
 class RecordingProvider final : public FakeProvider
 {
 public:
     explicit RecordingProvider(Lines& log) : FakeProvider(L"Recording"), m_log(log) {}
 
-    /// What a call does besides, given the operation's name; may throw.
+    /// Runs after a call is logged, with the operation's name; may throw.
     std::function<void(const std::string& operation, OrvixFileList& list)> onCall;
 
     /// What every operation returns.
-    int result = 0;
+    int result = OrvixProviderResult::Success;
 
     int QueryStatus(OrvixFileList* list, unsigned long options) override;
     int Add(OrvixFileList* list, const wchar_t* comment, unsigned long options) override;
@@ -25,7 +25,7 @@ public:
     int UndoCheckOut(OrvixFileList* list, unsigned long options) override;
 
 private:
-    int Record(const char* operation, OrvixFileList* list, const std::string& arguments);
+    int Record(const char* operation, OrvixFileList* list, unsigned long options, const wchar_t* comment = nullptr);
 
     Lines& m_log;
 };

@@ -23,12 +23,12 @@ protected:
 
 TEST_F(CoreUIBridge, IsNeverObtainedNorReleasedByAnObjectThatShowsNoDialog)
 {
-    m_services->RegisterPrompt(DialogPrompt, L"text", AnswerOne, 0, true);
+    m_services->RegisterPrompt(DialogPrompt, L"text", Action::Yes, 0, true);
     bool dontAskAgain = false;
-    EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, 0, DialogPrompt, &dontAskAgain), 1);
+    EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, 0, DialogPrompt, &dontAskAgain), Answer::Yes);
     AddFile(L"a");
     m_params.SetDialogPromptID(DialogPrompt);
-    EXPECT_EQ(Run(Notify | CheckIn), 1);
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Done);
     m_services->Shutdown();
     m_services.reset();
     EXPECT_TRUE(m_script.obtained.empty());
@@ -39,10 +39,13 @@ TEST_F(CoreUIBridge, IsObtainedAndGivenItsClientAccessByTheFirstDialogOfEveryKin
 {
     AddFile(L"a");
     const std::vector<std::function<void(IOrvixServices&)>> dialogs = {
-        [](IOrvixServices& services) { services.ShowPrompt(nullptr, nullptr, nullptr, 0, NoPrompt, nullptr); },
+        [](IOrvixServices& services) {
+            services.ShowPrompt(nullptr, nullptr, nullptr, 0, OrvixPromptID::None, nullptr);
+        },
         [](IOrvixServices& services) { services.ShowFileListDialog(nullptr, nullptr); },
         [this](IOrvixServices& services) {
-            services.RunFileListOperation(nullptr, &m_params, false, &m_provider, CheckIn, Controlled);
+            services.RunFileListOperation(nullptr, &m_params, false, &m_provider, Operation::CheckIn,
+                                          State::Controlled);
         },
         [](IOrvixServices& services) { services.EditPrompts(nullptr, nullptr); },
     };
@@ -52,12 +55,12 @@ TEST_F(CoreUIBridge, IsObtainedAndGivenItsClientAccessByTheFirstDialogOfEveryKin
         bool accessCameFirst = false;
         const auto answer = [&](const auto&) {
             accessCameFirst = m_script.accesses.size() == 1;
-            return 0;
+            return 0; // no, cancelled or unchanged
         };
         m_script.onPrompt = answer;
         m_script.onFileList = answer;
         m_script.onEditor = answer;
-        const ServicesPointer services{GetIOrvixServices()};
+        const OrvixServicesPointer services = MakeOrvixServices();
         showFirst(*services);
         EXPECT_TRUE(accessCameFirst);
         for (const auto& showLater : dialogs)
@@ -84,7 +87,7 @@ TEST_F(CoreUIBridge, SurvivesShutdownAndIsReleasedByTheDestructor)
 
 TEST_F(CoreUIBridge, IsReleasedByAnObjectThatWasNeverInitialised)
 {
-    ServicesPointer services{GetIOrvixServices()};
+    OrvixServicesPointer services = MakeOrvixServices();
     services->EditPrompts(nullptr, nullptr);
     services.reset();
     EXPECT_EQ(m_script.obtained.size(), 1U);
@@ -93,7 +96,7 @@ TEST_F(CoreUIBridge, IsReleasedByAnObjectThatWasNeverInitialised)
 
 TEST_F(CoreUIBridge, BelongsToOneServicesObject)
 {
-    ServicesPointer other{GetIOrvixServices()};
+    OrvixServicesPointer other = MakeOrvixServices();
     Access(*m_services);
     Access(*other);
     ASSERT_EQ(m_script.obtained.size(), 2U);
@@ -104,7 +107,7 @@ TEST_F(CoreUIBridge, BelongsToOneServicesObject)
 
 TEST_F(CoreUIBridge, FallsBackToTheSystemBeforeInitialize)
 {
-    const ServicesPointer services{GetIOrvixServices()};
+    const OrvixServicesPointer services = MakeOrvixServices();
     IOrvixCoreUIClientAccess& access = Access(*services);
     for (const std::int32_t index : {COLOR_WINDOW, COLOR_WINDOWTEXT, COLOR_HIGHLIGHT, COLOR_BTNFACE})
     {
@@ -114,7 +117,7 @@ TEST_F(CoreUIBridge, FallsBackToTheSystemBeforeInitialize)
     EXPECT_EQ(access.ClientRelayB(m_tokens[0], m_tokens[1], m_tokens[2], m_tokens[3]), 0);
 }
 
-TEST_F(CoreUIBridge, FallsBackToTheSystemWhereTheHostGaveNoClientAccess)
+TEST_F(CoreUIBridge, FallsBackToTheSystemWhenTheHostGaveNoClientAccess)
 {
     Initialize(nullptr);
     IOrvixCoreUIClientAccess& access = Access(*m_services);

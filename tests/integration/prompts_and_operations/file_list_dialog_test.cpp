@@ -10,9 +10,9 @@ class ShowFileListDialog : public OperationTest
 {
 };
 
-TEST_F(ShowFileListDialog, HandsTheArgumentsToTheDialogAndReturnsItsResultUnchanged)
+TEST_F(ShowFileListDialog, PassesItsArgumentsToTheDialogAndReturnsAnyResult)
 {
-    for (const std::int32_t result : {0, 1, 2, -1, INT_MAX, INT_MIN})
+    for (const std::int32_t result : {DialogResult::Cancelled, DialogResult::Confirmed, 2, -1, INT_MAX, INT_MIN})
     {
         m_dialogResult = result;
         EXPECT_EQ(m_services->ShowFileListDialog(Token(5), &m_params), result);
@@ -26,22 +26,22 @@ TEST_F(ShowFileListDialog, IsNothingButTheDialog)
     AddFile(L"a");
     AddFile(L"b");
     UsePrompts();
-    AddPrompt(DialogPrompt, AnswerOne);
+    AddPrompt(DialogPrompt, Action::Yes);
     m_host.unattended = true;
-    m_unticked = {"b"};
-    m_params.SetOptions(Remember);
-    EXPECT_EQ(m_services->ShowFileListDialog(nullptr, &m_params), 1);
-    EXPECT_EQ(m_log, (Lines{"Dialog [a b] 80"}));
+    m_cleared = {"b"};
+    m_params.SetOptions(DialogOption::RememberChecked);
+    EXPECT_EQ(m_services->ShowFileListDialog(nullptr, &m_params), DialogResult::Confirmed);
+    EXPECT_EQ(m_log, (Lines{"Dialog [a b] RememberChecked"}));
     EXPECT_EQ(ActiveNames(&m_list), "[a b]");
-    EXPECT_EQ(m_params.GetOptions(), Remember);
+    EXPECT_EQ(m_params.GetOptions(), DialogOption::RememberChecked);
     EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsIn(), 0U);
-    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), AnswerOne);
+    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), Action::Yes);
 }
 
-TEST_F(ShowFileListDialog, GivesZeroWhereTheDialogThrows)
+TEST_F(ShowFileListDialog, IsCancelledWhenTheDialogThrows)
 {
     m_script.onFileList = [](const CoreUIScript::FileList&) -> std::int32_t { throw std::runtime_error("dialog"); };
-    EXPECT_EQ(m_services->ShowFileListDialog(nullptr, &m_params), 0);
+    EXPECT_EQ(m_services->ShowFileListDialog(nullptr, &m_params), DialogResult::Cancelled);
 }
 
 } // namespace

@@ -11,7 +11,7 @@
 namespace
 {
 
-/// Nothing that a host, a plug-in or a dialog does wrong reaches the host as an exception.
+/// No mistake of a host, a plug-in or a dialog reaches the host as an exception.
 class OperationFailures : public OperationTest
 {
 protected:
@@ -19,7 +19,8 @@ protected:
 
     std::int32_t RunAll()
     {
-        return m_services->RunFileListOperation(nullptr, &m_params, true, &m_provider, Notify | CheckIn, 0xFFFFFFFF);
+        return m_services->RunFileListOperation(nullptr, &m_params, true, &m_provider,
+                                                Operation::Notify | Operation::CheckIn, AllBits);
     }
 
     /// The object still does its work.
@@ -29,12 +30,12 @@ protected:
         m_listener.onNotify = nullptr;
         m_onDialog = nullptr;
         m_host.onUnattended = nullptr;
-        m_params.SetDialogPromptID(-1);
+        m_params.SetDialogPromptID(OrvixPromptID::Unset);
         m_params.SetOptions(0);
         m_log.clear();
-        EXPECT_EQ(RunAll(), 1);
-        EXPECT_EQ(m_log, (Lines{"QueryStatus [a] 0", "Notify 13 [a]", "Dialog [a] 1", "Notify 27 [a]",
-                                "CheckIn [a] comment 0", "Notify 14 [a]"}));
+        EXPECT_EQ(RunAll(), OperationResult::Done);
+        EXPECT_EQ(m_log, (Lines{"QueryStatus [a]", "Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared",
+                                "Notify FilesConfirmed [a]", "CheckIn [a] comment", "Notify AfterCheckIn [a]"}));
     }
 
     const std::vector<std::function<void()>> m_exceptions = {[] { throw std::runtime_error("foreign"); },
@@ -42,7 +43,7 @@ protected:
                                                              [] { throw _com_error(E_FAIL); }};
 };
 
-TEST_F(OperationFailures, AProviderThatThrowsEndsTheOperationWithZero)
+TEST_F(OperationFailures, AProviderThatThrowsCancelsTheOperation)
 {
     for (const auto& fail : m_exceptions)
     {
@@ -54,98 +55,103 @@ TEST_F(OperationFailures, AProviderThatThrowsEndsTheOperationWithZero)
                     fail();
                 }
             };
-            EXPECT_EQ(RunAll(), 0) << failing;
+            EXPECT_EQ(RunAll(), OperationResult::Cancelled) << failing;
             ExpectUsable();
         }
     }
 }
 
-TEST_F(OperationFailures, AListenerThatThrowsEndsTheOperationWithZero)
+TEST_F(OperationFailures, AListenerThatThrowsCancelsTheOperation)
 {
     for (const auto& fail : m_exceptions)
     {
-        for (const std::uint32_t id : {13U, 27U, 14U})
+        for (const std::uint32_t id : {OrvixNotificationID::BeforeCheckIn, OrvixNotificationID::FilesConfirmed,
+                                       OrvixNotificationID::AfterCheckIn})
         {
             m_listener.onNotify = [&](OrvixNotifyParams& params) {
                 if (params.GetID() == id)
                 {
                     fail();
                 }
-                return 0;
+                return OrvixListenerAnswer::Accept;
             };
-            EXPECT_EQ(RunAll(), 0) << id;
+            EXPECT_EQ(RunAll(), OperationResult::Cancelled) << id;
             ExpectUsable();
         }
     }
 }
 
-TEST_F(OperationFailures, ADialogThatThrowsEndsTheOperationWithZero)
+TEST_F(OperationFailures, ADialogThatThrowsCancelsTheOperation)
 {
     for (const auto& fail : m_exceptions)
     {
         m_onDialog = [&](OrvixFileListDialogParams&) { fail(); };
-        EXPECT_EQ(RunAll(), 0);
+        EXPECT_EQ(RunAll(), OperationResult::Cancelled);
         ExpectUsable();
     }
 }
 
-TEST_F(OperationFailures, ADialogThatThrowsIsNoAnswerToRemember)
+TEST_F(OperationFailures, ADialogThatThrowsLeavesTheStoredAnswer)
 {
     m_params.SetDialogPromptID(DialogPrompt);
-    AddPrompt(DialogPrompt, Ask);
-    m_params.SetOptions(Remember);
+    AddPrompt(DialogPrompt, Action::Ask);
+    m_params.SetOptions(DialogOption::RememberChecked);
     m_onDialog = [](OrvixFileListDialogParams&) { throw std::runtime_error("dialog"); };
-    EXPECT_EQ(Run(CheckIn), 0);
-    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), Ask);
+    EXPECT_EQ(Run(Operation::CheckIn), OperationResult::Cancelled);
+    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), Action::Ask);
 }
 
-TEST_F(OperationFailures, AHostThatThrowsEndsTheOperationWithZero)
+TEST_F(OperationFailures, AHostThatThrowsCancelsTheOperation)
 {
-    AddPrompt(DialogPrompt, Ask | AnswerOne);
+    AddPrompt(DialogPrompt, Action::Ask | Action::Yes);
     for (const auto& fail : m_exceptions)
     {
         m_params.SetDialogPromptID(DialogPrompt);
         m_host.onUnattended = fail;
-        EXPECT_EQ(RunAll(), 0);
-        EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, 0, DialogPrompt, nullptr), 0);
+        EXPECT_EQ(RunAll(), OperationResult::Cancelled);
+        EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, 0, DialogPrompt, nullptr), Answer::No);
         ExpectUsable();
     }
 }
 
-TEST_F(OperationFailures, ARecordThatIsMissingIsCancelledAtOnce)
+TEST_F(OperationFailures, AMissingRecordCancelsAtOnce)
 {
     for (const bool callProviderFirst : {false, true})
     {
-        EXPECT_EQ(m_services->RunFileListOperation(nullptr, nullptr, callProviderFirst, &m_provider, Notify | CheckIn,
-                                                   Controlled),
-                  0);
+        EXPECT_EQ(m_services->RunFileListOperation(nullptr, nullptr, callProviderFirst, &m_provider,
+                                                   Operation::Notify | Operation::CheckIn, State::Controlled),
+                  OperationResult::Cancelled);
     }
     EXPECT_TRUE(m_log.empty());
 }
 
-TEST_F(OperationFailures, ARecordWithoutAListIsCancelledAtOnce)
+TEST_F(OperationFailures, ARecordWithoutAListCancelsAtOnce)
 {
     m_params.SetOrvixFileList(nullptr);
-    EXPECT_EQ(RunAll(), 0);
+    EXPECT_EQ(RunAll(), OperationResult::Cancelled);
     EXPECT_TRUE(m_log.empty());
 }
 
-TEST_F(OperationFailures, AProviderThatIsMissingIsCancelledAtOnceWhereItWouldBeCalled)
+TEST_F(OperationFailures, AMissingProviderThatWouldBeCalledCancelsAtOnce)
 {
-    EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, true, nullptr, 0, Controlled), 0);
-    for (const std::uint32_t operation : {CheckIn, Add, GetLatest, CheckOut, UndoCheckOut})
+    EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, true, nullptr, 0, State::Controlled),
+              OperationResult::Cancelled);
+    for (const std::uint32_t operation :
+         {Operation::CheckIn, Operation::Add, Operation::GetLatest, Operation::CheckOut, Operation::UndoCheckOut})
     {
-        EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, false, nullptr, Notify | operation, Controlled),
-                  0);
+        EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, false, nullptr, Operation::Notify | operation,
+                                                   State::Controlled),
+                  OperationResult::Cancelled);
     }
     EXPECT_TRUE(m_log.empty());
     EXPECT_EQ(ActiveNames(&m_list), "[a]");
 }
 
-TEST_F(OperationFailures, AProviderThatIsMissingDoesNoHarmWhereNothingIsAskedOfIt)
+TEST_F(OperationFailures, AMissingProviderThatIsNotCalledDoesNoHarm)
 {
-    EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, false, nullptr, 0, Controlled), 1);
-    EXPECT_EQ(m_log, (Lines{"Dialog [a] 1"}));
+    EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, false, nullptr, 0, State::Controlled),
+              OperationResult::Done);
+    EXPECT_EQ(m_log, (Lines{"Dialog [a] EntriesCanBeCleared"}));
 }
 
 } // namespace

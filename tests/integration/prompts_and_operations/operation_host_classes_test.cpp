@@ -6,7 +6,7 @@
 namespace
 {
 
-/// A host's own entry: the base class knows nothing of its flags.
+/// An entry of the host's own class: the base class does not see its flags.
 class HostEntry final : public OrvixFileEntry
 {
 public:
@@ -24,7 +24,7 @@ private:
     unsigned long m_out;
 };
 
-/// A host's own list, which may hold null: the base class's active list stays empty.
+/// A list of the host's own class, which may hold null: the active list of the base class stays empty.
 class HostList final : public OrvixFileList
 {
 public:
@@ -53,7 +53,7 @@ private:
     std::vector<OrvixFileEntry*> m_entries;
 };
 
-/// A host's own record: the base class's fields keep their defaults.
+/// A record of the host's own class: the fields of the base class keep their defaults.
 class HostParams final : public OrvixFileListDialogParams
 {
 public:
@@ -66,15 +66,15 @@ public:
     std::int32_t GetDialogPromptID() override { return dialogPrompt; }
     std::int32_t GetOptionPromptID() override { return optionPrompt; }
 
-    std::int32_t dialogPrompt = -1;
-    std::int32_t optionPrompt = -1;
+    std::int32_t dialogPrompt = OrvixPromptID::Unset;
+    std::int32_t optionPrompt = OrvixPromptID::Unset;
 
 private:
     OrvixFileList& m_list;
     std::uint32_t m_options = 0;
 };
 
-/// The library touches records that come from outside through their virtual operations alone.
+/// The library uses only the virtual operations of records that a host passes.
 class HostClasses : public OperationTest
 {
 protected:
@@ -88,24 +88,26 @@ protected:
 
     std::int32_t RunOwn(std::uint32_t operations)
     {
-        return m_services->RunFileListOperation(nullptr, &m_record, false, &m_provider, operations, Controlled);
+        return m_services->RunFileListOperation(nullptr, &m_record, false, &m_provider, operations, State::Controlled);
     }
 
-    HostEntry m_a{L"a", Controlled};
-    HostEntry m_b{L"b", 0x10};
-    HostEntry m_c{L"c", Controlled};
+    HostEntry m_a{L"a", State::Controlled};
+    HostEntry m_b{L"b", State::OutOfDate};
+    HostEntry m_c{L"c", State::Controlled};
     HostList m_own;
     HostParams m_record{m_own};
 };
 
 TEST_F(HostClasses, RunAnOperationThroughTheDialog)
 {
-    m_unticked = {"c"};
-    m_record.SetOptions(OptionTicked | KeepOption);
-    EXPECT_EQ(RunOwn(Notify | CheckIn), 1);
-    EXPECT_EQ(m_log, (Lines{"Notify 13 [null a null c]", "Dialog [null a null c] 15", "Notify 27 [null a null]",
-                            "CheckIn [null a null] own 1", "Notify 14 [null a null]"}));
-    EXPECT_EQ(m_a.GetFlagsIn(), 1U);
+    m_cleared = {"c"};
+    m_record.SetOptions(DialogOption::OptionChecked | DialogOption::OfferKeepCheckedOut);
+    EXPECT_EQ(RunOwn(Operation::Notify | Operation::CheckIn), OperationResult::Done);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [null a null c]",
+                            "Dialog [null a null c] EntriesCanBeCleared OfferKeepCheckedOut OptionChecked",
+                            "Notify FilesConfirmed [null a null]", "CheckIn [null a null] own KeepCheckedOut",
+                            "Notify AfterCheckIn [null a null]"}));
+    EXPECT_EQ(m_a.GetFlagsIn(), OrvixFileSelection::Selected);
     EXPECT_EQ(m_b.GetFlagsIn(), 0U);
     EXPECT_EQ(m_record.OrvixFileListDialogParams::GetOptions(), 0U);
     EXPECT_EQ(m_a.OrvixFileEntry::GetFlagsIn(), 0U);
@@ -113,34 +115,34 @@ TEST_F(HostClasses, RunAnOperationThroughTheDialog)
 
 TEST_F(HostClasses, RunAnOperationFromStoredAnswers)
 {
-    AddPrompt(DialogPrompt, AnswerOne);
-    AddPrompt(OptionPrompt, AnswerTwo);
+    AddPrompt(DialogPrompt, Action::Yes);
+    AddPrompt(OptionPrompt, Action::OptionChecked);
     m_record.dialogPrompt = DialogPrompt;
     m_record.optionPrompt = OptionPrompt;
-    m_record.SetOptions(LatestOption);
-    EXPECT_EQ(RunOwn(CheckOut), 1);
-    EXPECT_EQ(m_log, (Lines{"CheckOut [null a null c] own 6"}));
+    m_record.SetOptions(DialogOption::OfferGetLatest);
+    EXPECT_EQ(RunOwn(Operation::CheckOut), OperationResult::Done);
+    EXPECT_EQ(m_log, (Lines{"CheckOut [null a null c] own GetLatest NoDialog"}));
 }
 
 TEST_F(HostClasses, StoreTheAnswersOfTheirOwnPrompts)
 {
-    AddPrompt(DialogPrompt, Ask);
-    AddPrompt(OptionPrompt, Ask);
+    AddPrompt(DialogPrompt, Action::Ask);
+    AddPrompt(OptionPrompt, Action::Ask);
     m_record.dialogPrompt = DialogPrompt;
     m_record.optionPrompt = OptionPrompt;
-    m_record.SetOptions(Remember);
-    EXPECT_EQ(RunOwn(CheckOut), 1);
-    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), AnswerOne);
-    EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), AnswerThree);
+    m_record.SetOptions(DialogOption::RememberChecked);
+    EXPECT_EQ(RunOwn(Operation::CheckOut), OperationResult::Done);
+    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), Action::Yes);
+    EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), Action::OptionCleared);
 }
 
-TEST_F(HostClasses, AreDoneAtOnceWhereOnlyNullEntriesAreActive)
+TEST_F(HostClasses, AreDoneAtOnceWhenOnlyNullEntriesAreActive)
 {
     for (OrvixFileEntry* entry : {&m_a, &m_b, &m_c})
     {
         m_own.RemoveActiveEntry(entry);
     }
-    EXPECT_EQ(RunOwn(Notify | CheckIn), 1);
+    EXPECT_EQ(RunOwn(Operation::Notify | Operation::CheckIn), OperationResult::Done);
     EXPECT_TRUE(m_log.empty());
     EXPECT_EQ(ActiveNames(&m_own), "[null null]");
 }

@@ -23,14 +23,16 @@ struct OperationRow
 };
 
 /// In the order in which the identifiers are chosen.
-constexpr std::array<OperationRow, 5> ByPrecedence = {{{CheckIn, "CheckIn [a] comment 0", "13", "14"},
-                                                       {Add, "Add [a] comment 0", "19", "20"},
-                                                       {GetLatest, "GetLatest [a] 0", "21", "22"},
-                                                       {CheckOut, "CheckOut [a] comment 0", "15", "16"},
-                                                       {UndoCheckOut, "UndoCheckOut [a] 0", "17", "18"}}};
+constexpr std::array<OperationRow, 5> ByPrecedence = {
+    {{Operation::CheckIn, "CheckIn [a] comment", "BeforeCheckIn", "AfterCheckIn"},
+     {Operation::Add, "Add [a] comment", "BeforeAdd", "AfterAdd"},
+     {Operation::GetLatest, "GetLatest [a]", "BeforeGetLatest", "AfterGetLatest"},
+     {Operation::CheckOut, "CheckOut [a] comment", "BeforeCheckOut", "AfterCheckOut"},
+     {Operation::UndoCheckOut, "UndoCheckOut [a]", "BeforeUndoCheckOut", "AfterUndoCheckOut"}}};
 
 /// In the order in which the provider is called.
-constexpr std::array<std::uint32_t, 5> ByCall = {Add, CheckIn, GetLatest, CheckOut, UndoCheckOut};
+constexpr std::array<std::uint32_t, 5> ByCall = {Operation::Add, Operation::CheckIn, Operation::GetLatest,
+                                                 Operation::CheckOut, Operation::UndoCheckOut};
 
 const OperationRow& RowOf(std::uint32_t bit)
 {
@@ -44,11 +46,15 @@ const OperationRow& RowOf(std::uint32_t bit)
     throw std::out_of_range("no such operation");
 }
 
-TEST_F(OperationNotifications, NameTheFirstOperationAndTheProviderRunsAllInItsOwnOrder)
+TEST_F(OperationNotifications, NameTheFirstOperationWhileTheProviderRunsAllInAnotherOrder)
 {
-    for (std::uint32_t bits = 1; bits < 32; ++bits)
+    for (unsigned int choice = 1; choice < 1U << ByCall.size(); ++choice)
     {
-        const std::uint32_t operations = bits << 1;
+        std::uint32_t operations = 0;
+        for (std::size_t i = 0; i < ByCall.size(); ++i)
+        {
+            operations |= (choice >> i & 1U) != 0 ? ByCall[i] : 0;
+        }
         const OperationRow* first = nullptr;
         for (const OperationRow& row : ByPrecedence)
         {
@@ -57,7 +63,7 @@ TEST_F(OperationNotifications, NameTheFirstOperationAndTheProviderRunsAllInItsOw
                 first = &row;
             }
         }
-        Lines expected = {"Dialog [a] 1"};
+        Lines expected = {"Dialog [a] EntriesCanBeCleared"};
         for (const std::uint32_t bit : ByCall)
         {
             if ((operations & bit) != 0)
@@ -68,178 +74,186 @@ TEST_F(OperationNotifications, NameTheFirstOperationAndTheProviderRunsAllInItsOw
 
         m_params.SetOptions(0);
         m_log.clear();
-        EXPECT_EQ(Run(operations), 1);
+        EXPECT_EQ(Run(operations), OperationResult::Done);
         EXPECT_EQ(m_log, expected) << operations;
 
         expected.insert(expected.begin(), "Notify " + std::string(first->before) + " [a]");
-        expected.insert(expected.begin() + 2, "Notify 27 [a]");
+        expected.insert(expected.begin() + 2, "Notify FilesConfirmed [a]");
         expected.push_back("Notify " + std::string(first->after) + " [a]");
         m_params.SetOptions(0);
         m_log.clear();
-        EXPECT_EQ(Run(operations | Notify), 1);
+        EXPECT_EQ(Run(operations | Operation::Notify), OperationResult::Done);
         EXPECT_EQ(m_log, expected) << operations;
     }
 }
 
 TEST_F(OperationNotifications, AreNotSentWithoutAnOperation)
 {
-    m_listener.onNotify = [](OrvixNotifyParams&) { return 1; };
+    constexpr std::uint32_t published = Operation::Notify | Operation::CheckIn | Operation::Add | Operation::GetLatest |
+                                        Operation::CheckOut | Operation::UndoCheckOut;
+    m_listener.onNotify = [](OrvixNotifyParams&) { return OrvixListenerAnswer::Veto; };
     m_params.SetDialogPromptID(DialogPrompt);
-    AddPrompt(DialogPrompt, AnswerOne);
-    for (const std::uint32_t operations : {0x0U, 0x1U, 0xFFFFFFC0U, 0xFFFFFFC1U})
+    AddPrompt(DialogPrompt, Action::Yes);
+    for (const std::uint32_t operations : {0U, Operation::Notify, ~published, ~published | Operation::Notify})
     {
-        EXPECT_EQ(Run(operations), 1);
+        EXPECT_EQ(Run(operations), OperationResult::Done);
         EXPECT_TRUE(m_log.empty()) << operations;
     }
-    m_services->SetPromptAction(DialogPrompt, AnswerZero);
-    EXPECT_EQ(Run(Notify), 0);
+    m_services->SetPromptAction(DialogPrompt, Action::No);
+    EXPECT_EQ(Run(Operation::Notify), OperationResult::Cancelled);
     EXPECT_TRUE(m_log.empty());
 }
 
-TEST_F(OperationNotifications, AreNotSentOfACancelledOperationWithoutTheNotifyBit)
+TEST_F(OperationNotifications, AreNotSentForACancelledOperationWithoutTheNotifyBit)
 {
-    m_dialogResult = 0;
-    EXPECT_EQ(Run(CheckIn), 0);
-    EXPECT_EQ(m_log, (Lines{"Dialog [a] 1"}));
+    m_dialogResult = DialogResult::Cancelled;
+    EXPECT_EQ(Run(Operation::CheckIn), OperationResult::Cancelled);
+    EXPECT_EQ(m_log, (Lines{"Dialog [a] EntriesCanBeCleared"}));
 }
 
 TEST_F(OperationNotifications, CarryTheFileListAndNothingElse)
 {
-    m_dialogResult = 1;
+    m_dialogResult = DialogResult::Confirmed;
     int records = 0;
     m_listener.onNotify = [&](OrvixNotifyParams& params) {
         ++records;
         EXPECT_EQ(params.GetOrvixFileList(), &m_list);
         EXPECT_EQ(params.GetProviderIndex(), 0U);
         EXPECT_FALSE(params.IsCancelled());
-        return 0;
+        return OrvixListenerAnswer::Accept;
     };
-    Run(Notify | CheckOut);
+    Run(Operation::Notify | Operation::CheckOut);
     EXPECT_EQ(records, 3);
 }
 
 TEST_F(OperationNotifications, ListTheEntriesThatAreLeft)
 {
-    AddFile(L"b", 0x10);
+    AddFile(L"b", State::OutOfDate);
     AddFile(L"c");
-    m_unticked = {"a"};
-    Run(Notify | CheckOut, Controlled);
-    EXPECT_EQ(m_log,
-              (Lines{"Notify 15 [a c]", "Dialog [a c] 1", "Notify 27 [c]", "CheckOut [c] comment 0", "Notify 16 [c]"}));
+    m_cleared = {"a"};
+    Run(Operation::Notify | Operation::CheckOut, State::Controlled);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckOut [a c]", "Dialog [a c] EntriesCanBeCleared",
+                            "Notify FilesConfirmed [c]", "CheckOut [c] comment", "Notify AfterCheckOut [c]"}));
 }
 
 TEST_F(OperationNotifications, LetAListenerVetoBeforeTheDialog)
 {
-    AddFile(L"b", 0x10);
-    m_listener.Answer(13, 1);
-    EXPECT_EQ(Run(Notify | CheckIn, Controlled), 0);
-    EXPECT_EQ(m_log, (Lines{"Notify 13 [a]"}));
+    AddFile(L"b", State::OutOfDate);
+    m_listener.Answer(OrvixNotificationID::BeforeCheckIn, OrvixListenerAnswer::Veto);
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn, State::Controlled), OperationResult::Cancelled);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [a]"}));
     EXPECT_EQ(ActiveNames(&m_list), "[a]");
 }
 
 TEST_F(OperationNotifications, LetAListenerVetoAStoredAnswer)
 {
     m_params.SetDialogPromptID(DialogPrompt);
-    AddPrompt(DialogPrompt, AnswerOne);
-    m_listener.Answer(13, 1);
-    EXPECT_EQ(Run(Notify | CheckIn), 0);
-    EXPECT_EQ(m_log, (Lines{"Notify 13 [a]"}));
+    AddPrompt(DialogPrompt, Action::Yes);
+    m_listener.Answer(OrvixNotificationID::BeforeCheckIn, OrvixListenerAnswer::Veto);
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Cancelled);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [a]"}));
 }
 
 TEST_F(OperationNotifications, TellTheListenersBeforeTheOneThatVetoedOnceMore)
 {
     RecordingListener second(m_log, "Second");
     const RecordingListener third(m_log, "Third");
-    second.Answer(15, 1);
-    EXPECT_EQ(Run(Notify | CheckOut), 0);
-    EXPECT_EQ(m_log, (Lines{"Notify 15 [a]", "Second 15 [a]", "Notify 15 [a] cancelled"}));
+    second.Answer(OrvixNotificationID::BeforeCheckOut, OrvixListenerAnswer::Veto);
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckOut), OperationResult::Cancelled);
+    EXPECT_EQ(m_log,
+              (Lines{"Notify BeforeCheckOut [a]", "Second BeforeCheckOut [a]", "Notify BeforeCheckOut [a] cancelled"}));
 }
 
-TEST_F(OperationNotifications, AreVetoedByExactlyOne)
+TEST_F(OperationNotifications, AreVetoedOnlyByTheAnswerThatMeansSo)
 {
-    for (const std::uint32_t answer : {2U, 0x80000001U, 0xFFFFFFFFU})
+    for (const std::uint32_t answer : {OrvixListenerAnswer::Stop, OrvixListenerAnswer::Veto | UnpublishedBit, AllBits})
     {
         m_params.SetOptions(0);
         m_log.clear();
-        m_listener.Answer(13, answer);
-        EXPECT_EQ(Run(Notify | CheckIn), 1) << answer;
-        EXPECT_EQ(m_log,
-                  (Lines{"Notify 13 [a]", "Dialog [a] 1", "Notify 27 [a]", "CheckIn [a] comment 0", "Notify 14 [a]"}));
+        m_listener.Answer(OrvixNotificationID::BeforeCheckIn, answer);
+        EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Done) << answer;
+        EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared",
+                                "Notify FilesConfirmed [a]", "CheckIn [a] comment", "Notify AfterCheckIn [a]"}));
     }
 }
 
-TEST_F(OperationNotifications, AreNotVetoedByARecordThatAListenerMarked)
+TEST_F(OperationNotifications, AreNotVetoedByAListenerThatMarksTheRecordAsCancelled)
 {
     m_listener.onNotify = [](OrvixNotifyParams& params) {
-        params.SetCancelled(params.GetID() == 13);
-        return 0;
+        params.SetCancelled(params.GetID() == OrvixNotificationID::BeforeCheckIn);
+        return OrvixListenerAnswer::Accept;
     };
-    EXPECT_EQ(Run(Notify | CheckIn), 1);
-    EXPECT_EQ(m_log,
-              (Lines{"Notify 13 [a]", "Dialog [a] 1", "Notify 27 [a]", "CheckIn [a] comment 0", "Notify 14 [a]"}));
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Done);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared", "Notify FilesConfirmed [a]",
+                            "CheckIn [a] comment", "Notify AfterCheckIn [a]"}));
 }
 
 TEST_F(OperationNotifications, CannotBeVetoedAfterTheDialogOrAfterTheOperation)
 {
-    for (const std::uint32_t id : {27U, 14U})
+    for (const std::uint32_t id : {OrvixNotificationID::FilesConfirmed, OrvixNotificationID::AfterCheckIn})
     {
         m_params.SetOptions(0);
         m_log.clear();
-        m_listener.Answer(id, 1);
-        EXPECT_EQ(Run(Notify | CheckIn), 1) << id;
-        EXPECT_EQ(m_log,
-                  (Lines{"Notify 13 [a]", "Dialog [a] 1", "Notify 27 [a]", "CheckIn [a] comment 0", "Notify 14 [a]"}));
+        m_listener.Answer(id, OrvixListenerAnswer::Veto);
+        EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Done) << id;
+        EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared",
+                                "Notify FilesConfirmed [a]", "CheckIn [a] comment", "Notify AfterCheckIn [a]"}));
     }
 }
 
-TEST_F(OperationNotifications, RepeatTheBeforeNotificationMarkedWhereTheUserCancels)
+TEST_F(OperationNotifications, RepeatTheBeforeNotificationAsCancelledWhenTheUserCancels)
 {
-    m_dialogResult = 0;
-    EXPECT_EQ(Run(Notify | UndoCheckOut), 0);
-    EXPECT_EQ(m_log, (Lines{"Notify 17 [a]", "Dialog [a] 1", "Notify 17 [a] cancelled"}));
+    m_dialogResult = DialogResult::Cancelled;
+    EXPECT_EQ(Run(Operation::Notify | Operation::UndoCheckOut), OperationResult::Cancelled);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeUndoCheckOut [a]", "Dialog [a] EntriesCanBeCleared",
+                            "Notify BeforeUndoCheckOut [a] cancelled"}));
 }
 
-TEST_F(OperationNotifications, RepeatTheBeforeNotificationMarkedWhereTheStoredAnswerIsNo)
+TEST_F(OperationNotifications, RepeatTheBeforeNotificationAsCancelledWhenTheStoredAnswerIsNo)
 {
     m_params.SetDialogPromptID(DialogPrompt);
-    AddPrompt(DialogPrompt, AnswerZero);
-    EXPECT_EQ(Run(Notify | GetLatest), 0);
-    EXPECT_EQ(m_log, (Lines{"Notify 21 [a]", "Notify 21 [a] cancelled"}));
+    AddPrompt(DialogPrompt, Action::No);
+    EXPECT_EQ(Run(Operation::Notify | Operation::GetLatest), OperationResult::Cancelled);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeGetLatest [a]", "Notify BeforeGetLatest [a] cancelled"}));
 }
 
 TEST_F(OperationNotifications, IgnoreAVetoOfACancelledOperation)
 {
     RecordingListener second(m_log, "Second");
-    m_listener.onNotify = [](OrvixNotifyParams& params) { return params.IsCancelled() ? 1U : 0U; };
-    m_dialogResult = 0;
-    EXPECT_EQ(Run(Notify | CheckIn), 0);
-    EXPECT_EQ(m_log, (Lines{"Notify 13 [a]", "Second 13 [a]", "Dialog [a] 1", "Notify 13 [a] cancelled"}));
+    m_listener.onNotify = [](OrvixNotifyParams& params) {
+        return params.IsCancelled() ? OrvixListenerAnswer::Veto : OrvixListenerAnswer::Accept;
+    };
+    m_dialogResult = DialogResult::Cancelled;
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Cancelled);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [a]", "Second BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared",
+                            "Notify BeforeCheckIn [a] cancelled"}));
 }
 
-TEST_F(OperationNotifications, SendNoAfterNotificationWhereTheUserUntickedEverything)
+TEST_F(OperationNotifications, SendNoAfterNotificationWhenTheUserClearedEverything)
 {
-    m_unticked = {"a"};
-    EXPECT_EQ(Run(Notify | CheckIn), 1);
-    EXPECT_EQ(m_log, (Lines{"Notify 13 [a]", "Dialog [a] 1", "Notify 27 []"}));
+    m_cleared = {"a"};
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Done);
+    EXPECT_EQ(m_log, (Lines{"Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared", "Notify FilesConfirmed []"}));
 }
 
-TEST_F(OperationNotifications, LetAListenerTakeEntriesAwayAfterTheDialog)
+TEST_F(OperationNotifications, LetAListenerRemoveEntriesAfterTheDialog)
 {
     m_listener.onNotify = [this](OrvixNotifyParams& params) {
-        if (params.GetID() == 27)
+        if (params.GetID() == OrvixNotificationID::FilesConfirmed)
         {
             m_list.RemoveActiveEntry(m_list.GetFileEntry(0));
         }
-        return 0;
+        return OrvixListenerAnswer::Accept;
     };
-    EXPECT_EQ(Run(Notify | CheckIn), 1);
-    EXPECT_EQ(m_log, (Lines{"Notify 13 [a]", "Dialog [a] 1", "Notify 27 [a]"}));
+    EXPECT_EQ(Run(Operation::Notify | Operation::CheckIn), OperationResult::Done);
+    EXPECT_EQ(m_log,
+              (Lines{"Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared", "Notify FilesConfirmed [a]"}));
 }
 
-TEST_F(OperationNotifications, TellOfTheDialogEvenWhereNoOperationFollows)
+TEST_F(OperationNotifications, TellOfTheDialogEvenWhenNoOperationFollows)
 {
-    EXPECT_EQ(Run(Notify), 1);
-    EXPECT_EQ(m_log, (Lines{"Dialog [a] 1", "Notify 27 [a]"}));
+    EXPECT_EQ(Run(Operation::Notify), OperationResult::Done);
+    EXPECT_EQ(m_log, (Lines{"Dialog [a] EntriesCanBeCleared", "Notify FilesConfirmed [a]"}));
 }
 
 } // namespace

@@ -1,15 +1,19 @@
 #include "DialogTest.h"
 
 #include <climits>
+#include <iterator>
 #include <stdexcept>
 #include <utility>
 #include <vector>
 
+using OrvixPromptOption::OfferStopAsking;
+
 namespace
 {
 
-constexpr std::uint32_t OfferDoNotAsk = 0x100;
 constexpr std::uint32_t Prompt = 7;
+constexpr std::uint32_t FirstOfMany = 1000;
+constexpr std::int32_t NoAnswer = Answer::NoToAll + 1;
 
 class ShowPrompt : public DialogTest
 {
@@ -28,119 +32,134 @@ protected:
         return m_services->ShowPrompt(Token(1), Token(2), Token(3), options, promptID, &m_dontAskAgain);
     }
 
-    std::int32_t m_answer = 1;
+    std::int32_t m_answer = Answer::Yes;
     bool m_userStopsAsking = false;
     bool m_flagOnEntry = true;
     bool m_dontAskAgain = false;
 };
 
-/// The answer that a stored action stands for, written out for every combination of the answer bits.
-constexpr std::int32_t AnswerOfBits[16] = {
-    0, // none
-    1, // 0x2
-    0, // 0x4
-    1, // 0x2 0x4
-    2, // 0x8
-    1, // 0x2 0x8
-    2, // 0x4 0x8
-    1, // 0x2 0x4 0x8
-    3, // 0x10
-    1, // 0x2 0x10
-    3, // 0x4 0x10
-    1, // 0x2 0x4 0x10
-    2, // 0x8 0x10
-    1, // 0x2 0x8 0x10
-    2, // 0x4 0x8 0x10
-    1, // all
+constexpr std::uint32_t AnswerBits[] = {Action::Yes, Action::No, Action::YesToAll, Action::NoToAll};
+constexpr unsigned int Combinations = 1U << std::size(AnswerBits);
+
+/// A stored action with some of the answer bits: the n-th one is set where the n-th bit of `combination` is.
+constexpr std::uint32_t ActionOf(unsigned int combination)
+{
+    std::uint32_t action = 0;
+    for (std::size_t n = 0; n < std::size(AnswerBits); ++n)
+    {
+        action |= (combination >> n & 1U) != 0 ? AnswerBits[n] : 0;
+    }
+    return action;
+}
+
+/// The answer of each combination.
+constexpr std::int32_t AnswerOf[Combinations] = {
+    Answer::No,       // no bit
+    Answer::Yes,      // Yes
+    Answer::No,       // No
+    Answer::Yes,      // Yes, No
+    Answer::YesToAll, // YesToAll
+    Answer::Yes,      // Yes, YesToAll
+    Answer::YesToAll, // No, YesToAll
+    Answer::Yes,      // Yes, No, YesToAll
+    Answer::NoToAll,  // NoToAll
+    Answer::Yes,      // Yes, NoToAll
+    Answer::NoToAll,  // No, NoToAll
+    Answer::Yes,      // Yes, No, NoToAll
+    Answer::YesToAll, // YesToAll, NoToAll
+    Answer::Yes,      // Yes, YesToAll, NoToAll
+    Answer::YesToAll, // No, YesToAll, NoToAll
+    Answer::Yes,      // all
 };
 
 TEST_F(ShowPrompt, AnswersFromTheStoredActionByPrecedenceWithoutADialog)
 {
-    for (std::uint32_t bits = 0; bits < 16; ++bits)
+    for (unsigned int n = 0; n < Combinations; ++n)
     {
-        AddPrompt(1000 + bits, bits << 1);
+        AddPrompt(FirstOfMany + n, ActionOf(n));
         m_dontAskAgain = false;
-        EXPECT_EQ(Show(OfferDoNotAsk, 1000 + bits), AnswerOfBits[bits]) << bits;
-        EXPECT_TRUE(m_dontAskAgain) << bits;
+        EXPECT_EQ(Show(OfferStopAsking, FirstOfMany + n), AnswerOf[n]) << n;
+        EXPECT_TRUE(m_dontAskAgain) << n;
     }
     EXPECT_TRUE(m_script.prompts.empty());
 }
 
-TEST_F(ShowPrompt, AnswersForAnUnattendedHostEvenWhereTheAskBitIsSet)
+TEST_F(ShowPrompt, AnswersForAnUnattendedHostEvenWhenTheAskBitIsSet)
 {
     m_host.unattended = true;
-    for (std::uint32_t bits = 0; bits < 16; ++bits)
+    for (unsigned int n = 0; n < Combinations; ++n)
     {
-        AddPrompt(1000 + bits, bits << 1 | Ask);
-        EXPECT_EQ(Show(OfferDoNotAsk, 1000 + bits), AnswerOfBits[bits]) << bits;
+        AddPrompt(FirstOfMany + n, ActionOf(n) | Action::Ask);
+        EXPECT_EQ(Show(OfferStopAsking, FirstOfMany + n), AnswerOf[n]) << n;
     }
     EXPECT_TRUE(m_script.prompts.empty());
 }
 
 TEST_F(ShowPrompt, IgnoresActionBitsWithoutMeaning)
 {
-    AddPrompt(Prompt, 0xFFFFFFE0);
-    EXPECT_EQ(Show(), 0);
+    AddPrompt(Prompt, AllBits & ~Action::Ask & ~ActionOf(Combinations - 1));
+    EXPECT_EQ(Show(), Answer::No);
     EXPECT_TRUE(m_script.prompts.empty());
 }
 
-TEST_F(ShowPrompt, AnswersZeroForAPromptWithoutARow)
+TEST_F(ShowPrompt, AnswersNoForAPromptWithoutARow)
 {
-    EXPECT_EQ(Show(), 0);
+    EXPECT_EQ(Show(), Answer::No);
     EXPECT_TRUE(m_dontAskAgain);
     EXPECT_TRUE(m_script.prompts.empty());
 }
 
-TEST_F(ShowPrompt, TellsAnUnattendedHostOnlyOfAnswersThatAreNotAsked)
+TEST_F(ShowPrompt, ReportsDontAskAgainToAnUnattendedHostOnlyWithoutTheAskBit)
 {
     m_host.unattended = true;
-    AddPrompt(Prompt, Ask | AnswerOne);
-    EXPECT_EQ(Show(), 1);
+    AddPrompt(Prompt, Action::Ask | Action::Yes);
+    EXPECT_EQ(Show(), Answer::Yes);
     EXPECT_FALSE(m_dontAskAgain);
     m_dontAskAgain = true;
-    EXPECT_EQ(Show(), 1);
+    EXPECT_EQ(Show(), Answer::Yes);
     EXPECT_TRUE(m_dontAskAgain);
 
     m_dontAskAgain = false;
-    AddPrompt(Prompt + 1, AnswerOne);
-    EXPECT_EQ(Show(0, Prompt + 1), 1);
+    AddPrompt(Prompt + 1, Action::Yes);
+    EXPECT_EQ(Show(0, Prompt + 1), Answer::Yes);
     EXPECT_TRUE(m_dontAskAgain);
 }
 
-TEST_F(ShowPrompt, HandsTheArgumentsToTheDialogUnchanged)
+TEST_F(ShowPrompt, PassesItsArgumentsToTheDialog)
 {
-    AddPrompt(Prompt, Ask);
-    Show(0xFFFFFFFF);
+    AddPrompt(Prompt, Action::Ask);
+    Show(AllBits);
     ASSERT_EQ(m_script.prompts.size(), 1U);
     const CoreUIScript::Prompt& call = m_script.prompts.front();
     EXPECT_EQ(call.a, Token(1));
     EXPECT_EQ(call.b, Token(2));
     EXPECT_EQ(call.c, Token(3));
-    EXPECT_EQ(call.options, 0xFFFFFFFF);
+    EXPECT_EQ(call.options, AllBits);
     EXPECT_NE(call.dontAskAgain, &m_dontAskAgain);
 }
 
 TEST_F(ShowPrompt, ReturnsTheDialogsAnswer)
 {
-    AddPrompt(Prompt, Ask | AnswerOne);
-    for (const std::int32_t answer : {0, 1, 2, 3, 4, -1, INT_MAX, INT_MIN})
+    AddPrompt(Prompt, Action::Ask | Action::Yes);
+    for (const std::int32_t answer :
+         {Answer::No, Answer::Yes, Answer::YesToAll, Answer::NoToAll, NoAnswer, -1, INT_MAX, INT_MIN})
     {
         m_answer = answer;
         EXPECT_EQ(Show(), answer);
     }
 }
 
-TEST_F(ShowPrompt, ShowsTheDialogWhereTheHostGaveNoClientAccess)
+TEST_F(ShowPrompt, ShowsTheDialogWhenTheHostGaveNoClientAccess)
 {
     Initialize(nullptr);
-    AddPrompt(Prompt, Ask);
-    EXPECT_EQ(Show(), 1);
+    AddPrompt(Prompt, Action::Ask);
+    EXPECT_EQ(Show(), Answer::Yes);
     EXPECT_EQ(m_script.prompts.size(), 1U);
 }
 
-TEST_F(ShowPrompt, StartsTheDialogWithAskingAndReportsItsChoice)
+TEST_F(ShowPrompt, StartsTheDialogWithoutDontAskAgainAndReportsTheChoice)
 {
-    AddPrompt(Prompt, Ask);
+    AddPrompt(Prompt, Action::Ask);
     m_dontAskAgain = true;
     Show();
     EXPECT_FALSE(m_flagOnEntry);
@@ -151,125 +170,126 @@ TEST_F(ShowPrompt, StartsTheDialogWithAskingAndReportsItsChoice)
     EXPECT_TRUE(m_dontAskAgain);
 }
 
-TEST_F(ShowPrompt, TakesNoPlaceForTheChoice)
+TEST_F(ShowPrompt, TakesNullForDontAskAgain)
 {
-    AddPrompt(Prompt, AnswerTwo);
-    EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, 0, Prompt, nullptr), 2);
+    AddPrompt(Prompt, Action::YesToAll);
+    EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, 0, Prompt, nullptr), Answer::YesToAll);
 
-    AddPrompt(Prompt + 1, Ask);
+    AddPrompt(Prompt + 1, Action::Ask);
     m_userStopsAsking = true;
-    EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, OfferDoNotAsk, Prompt + 1, nullptr), 1);
-    EXPECT_EQ(m_services->GetPromptAction(Prompt + 1), AnswerOne);
+    EXPECT_EQ(m_services->ShowPrompt(nullptr, nullptr, nullptr, OfferStopAsking, Prompt + 1, nullptr), Answer::Yes);
+    EXPECT_EQ(m_services->GetPromptAction(Prompt + 1), Action::Yes);
 }
 
-TEST_F(ShowPrompt, StoresTheAnswerWhereTheUserStopsAsking)
+TEST_F(ShowPrompt, StoresTheAnswerWhenTheUserStopsAsking)
 {
     const std::vector<std::pair<std::int32_t, std::uint32_t>> actionOfAnswer = {
-        {1, AnswerOne}, {0, AnswerZero}, {2, AnswerTwo}, {3, AnswerThree}, {4, AnswerThree}, {-1, AnswerThree}};
+        {Answer::Yes, Action::Yes},         {Answer::No, Action::No},    {Answer::YesToAll, Action::YesToAll},
+        {Answer::NoToAll, Action::NoToAll}, {NoAnswer, Action::NoToAll}, {-1, Action::NoToAll}};
     m_userStopsAsking = true;
     for (const auto& [answer, action] : actionOfAnswer)
     {
-        const auto id = static_cast<std::uint32_t>(1000 + answer);
-        AddPrompt(id, Ask);
+        const auto id = FirstOfMany + static_cast<std::uint32_t>(answer);
+        AddPrompt(id, Action::Ask);
         m_answer = answer;
-        EXPECT_EQ(Show(OfferDoNotAsk, id), answer);
+        EXPECT_EQ(Show(OfferStopAsking, id), answer);
         EXPECT_EQ(m_services->GetPromptAction(id), action) << answer;
     }
 }
 
-TEST_F(ShowPrompt, StoresNothingWhereTheUserGoesOnBeingAsked)
+TEST_F(ShowPrompt, StoresNothingWhenTheUserWantsToBeAsked)
 {
-    AddPrompt(Prompt, Ask | AnswerTwo);
-    Show(OfferDoNotAsk);
-    EXPECT_EQ(m_services->GetPromptAction(Prompt), Ask | AnswerTwo);
+    AddPrompt(Prompt, Action::Ask | Action::YesToAll);
+    Show(OfferStopAsking);
+    EXPECT_EQ(m_services->GetPromptAction(Prompt), Action::Ask | Action::YesToAll);
 }
 
-TEST_F(ShowPrompt, StoresNothingWhereTheHostDoesNotOfferIt)
+TEST_F(ShowPrompt, StoresNothingWhenTheHostDoesNotOfferIt)
 {
-    AddPrompt(Prompt, Ask);
+    AddPrompt(Prompt, Action::Ask);
     m_userStopsAsking = true;
-    Show(~OfferDoNotAsk);
-    EXPECT_EQ(m_services->GetPromptAction(Prompt), Ask);
+    Show(~OfferStopAsking);
+    EXPECT_EQ(m_services->GetPromptAction(Prompt), Action::Ask);
     EXPECT_TRUE(m_dontAskAgain);
 }
 
-TEST_F(ShowPrompt, OffersNothingForALockedPrompt)
+TEST_F(ShowPrompt, DoesNotOfferToStopAskingForALockedPrompt)
 {
-    AddPrompt(Prompt, Ask, true);
+    AddPrompt(Prompt, Action::Ask, true);
     m_userStopsAsking = true;
-    EXPECT_EQ(Show(0xFFFFFFFF), 1);
+    EXPECT_EQ(Show(AllBits), Answer::Yes);
     ASSERT_EQ(m_script.prompts.size(), 1U);
-    EXPECT_EQ(m_script.prompts.front().options, ~OfferDoNotAsk);
-    EXPECT_EQ(m_services->GetPromptAction(Prompt), Ask);
+    EXPECT_EQ(m_script.prompts.front().options, ~OfferStopAsking);
+    EXPECT_EQ(m_services->GetPromptAction(Prompt), Action::Ask);
     EXPECT_TRUE(m_dontAskAgain);
 }
 
 TEST_F(ShowPrompt, AnswersFromALockedPrompt)
 {
-    AddPrompt(Prompt, AnswerThree, true);
-    EXPECT_EQ(Show(OfferDoNotAsk), 3);
+    AddPrompt(Prompt, Action::NoToAll, true);
+    EXPECT_EQ(Show(OfferStopAsking), Answer::NoToAll);
     EXPECT_TRUE(m_script.prompts.empty());
 }
 
-TEST_F(ShowPrompt, ReadsTheFirstRowOfAnIdAndWritesTheLast)
+TEST_F(ShowPrompt, ReadsTheFirstRowOfAnIDAndWritesTheLast)
 {
-    AddPrompt(Prompt, Ask);
-    AddPrompt(Prompt, AnswerThree);
+    AddPrompt(Prompt, Action::Ask);
+    AddPrompt(Prompt, Action::NoToAll);
     m_userStopsAsking = true;
-    EXPECT_EQ(Show(OfferDoNotAsk), 1);
-    EXPECT_EQ(m_services->GetPromptAction(Prompt), Ask);
-    EXPECT_EQ(LastAction(Prompt), AnswerOne);
+    EXPECT_EQ(Show(OfferStopAsking), Answer::Yes);
+    EXPECT_EQ(m_services->GetPromptAction(Prompt), Action::Ask);
+    EXPECT_EQ(LastAction(Prompt), Action::Yes);
 }
 
-TEST_F(ShowPrompt, TakesTheLockFromTheFirstRowOfAnId)
+TEST_F(ShowPrompt, TakesTheLockFromTheFirstRowOfAnID)
 {
-    AddPrompt(Prompt, Ask, true);
-    AddPrompt(Prompt, AnswerThree);
+    AddPrompt(Prompt, Action::Ask, true);
+    AddPrompt(Prompt, Action::NoToAll);
     m_userStopsAsking = true;
-    Show(OfferDoNotAsk);
+    Show(OfferStopAsking);
     EXPECT_EQ(m_script.prompts.front().options, 0U);
-    EXPECT_EQ(LastAction(Prompt), AnswerThree);
+    EXPECT_EQ(LastAction(Prompt), Action::NoToAll);
 }
 
-TEST_F(ShowPrompt, LeavesALockedLastRowAlone)
+TEST_F(ShowPrompt, DoesNotWriteALockedLastRow)
 {
-    AddPrompt(Prompt, Ask);
-    AddPrompt(Prompt, AnswerThree, true);
+    AddPrompt(Prompt, Action::Ask);
+    AddPrompt(Prompt, Action::NoToAll, true);
     m_userStopsAsking = true;
-    Show(OfferDoNotAsk);
-    EXPECT_EQ(m_script.prompts.front().options, OfferDoNotAsk);
-    EXPECT_EQ(m_services->GetPromptAction(Prompt), Ask);
-    EXPECT_EQ(LastAction(Prompt), AnswerThree);
+    Show(OfferStopAsking);
+    EXPECT_EQ(m_script.prompts.front().options, OfferStopAsking);
+    EXPECT_EQ(m_services->GetPromptAction(Prompt), Action::Ask);
+    EXPECT_EQ(LastAction(Prompt), Action::NoToAll);
 }
 
 TEST_F(ShowPrompt, AlwaysAsksAQuestionWithoutAPrompt)
 {
-    // A row that carries the number for "no prompt" is not looked at either.
-    AddPrompt(NoPrompt, AnswerTwo, true);
+    // A row with the ID that means "no prompt" does not count either.
+    AddPrompt(OrvixPromptID::None, Action::YesToAll, true);
     m_host.unattended = true;
     m_userStopsAsking = true;
-    EXPECT_EQ(Show(OfferDoNotAsk, NoPrompt), 1);
+    EXPECT_EQ(Show(OfferStopAsking, OrvixPromptID::None), Answer::Yes);
     ASSERT_EQ(m_script.prompts.size(), 1U);
-    EXPECT_EQ(m_script.prompts.front().options, OfferDoNotAsk);
+    EXPECT_EQ(m_script.prompts.front().options, OfferStopAsking);
     EXPECT_TRUE(m_dontAskAgain);
 }
 
 TEST_F(ShowPrompt, StoresNothingForAQuestionWithoutAPrompt)
 {
-    AddPrompt(NoPrompt, AnswerTwo);
+    AddPrompt(OrvixPromptID::None, Action::YesToAll);
     m_userStopsAsking = true;
-    Show(OfferDoNotAsk, NoPrompt);
-    EXPECT_EQ(LastAction(NoPrompt), AnswerTwo);
+    Show(OfferStopAsking, OrvixPromptID::None);
+    EXPECT_EQ(LastAction(OrvixPromptID::None), Action::YesToAll);
 }
 
-TEST_F(ShowPrompt, GivesZeroWhereTheDialogThrowsAndAsksAgainLater)
+TEST_F(ShowPrompt, AnswersNoWhenTheDialogThrowsAndAsksAgainLater)
 {
-    AddPrompt(Prompt, Ask);
+    AddPrompt(Prompt, Action::Ask);
     auto dialog = m_script.onPrompt;
     m_script.onPrompt = [](const CoreUIScript::Prompt&) -> std::int32_t { throw std::runtime_error("dialog"); };
-    EXPECT_EQ(Show(OfferDoNotAsk), 0);
+    EXPECT_EQ(Show(OfferStopAsking), Answer::No);
     m_script.onPrompt = dialog;
-    EXPECT_EQ(Show(OfferDoNotAsk), 1);
+    EXPECT_EQ(Show(OfferStopAsking), Answer::Yes);
 }
 
 } // namespace
