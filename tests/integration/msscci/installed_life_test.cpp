@@ -1,5 +1,6 @@
 #include "InstalledTest.h"
 #include "ModulePath.h"
+#include "ProcessDllDirectory.h"
 
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -8,27 +9,6 @@ namespace
 {
 
 using InstalledLibrary = InstalledTest;
-
-/// The folder that the process searches for libraries; empty for none.
-std::wstring DllDirectory()
-{
-    std::wstring folder(MAX_PATH, L'\0');
-    folder.resize(GetDllDirectoryW(static_cast<DWORD>(folder.size()), folder.data()));
-    return folder;
-}
-
-/// Sets that folder for a scope; null for none.
-class TemporaryDllDirectory
-{
-public:
-    explicit TemporaryDllDirectory(const wchar_t* folder) : m_previous(DllDirectory()) { SetDllDirectoryW(folder); }
-    TemporaryDllDirectory(const TemporaryDllDirectory&) = delete;
-    TemporaryDllDirectory& operator=(const TemporaryDllDirectory&) = delete;
-    ~TemporaryDllDirectory() { SetDllDirectoryW(m_previous.empty() ? nullptr : m_previous.c_str()); }
-
-private:
-    std::wstring m_previous;
-};
 
 /// Every operation that needs the library fails; without an open project the status does not.
 void ExpectNotAvailable(IOrvixProvider& provider, OrvixClientInfo& info)
@@ -130,23 +110,23 @@ TEST_F(InstalledLibrary, LeavesTheFolderThatTheProcessSearchesAsItWas)
                    "</MSSCCDllSearchPath></a>");
     for (const wchar_t* folder : {static_cast<const wchar_t*>(nullptr), L"C:\\windows"})
     {
-        const TemporaryDllDirectory directory(folder);
+        const ProcessDllDirectory directory(folder);
         ASSERT_TRUE(Initialize(Installed));
-        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+        EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
         EXPECT_EQ(m_services->GetProvider(0)->Initialize(&m_info), 0);
         EXPECT_EQ(m_scc.dllDirectoryAtLoad, needed);
-        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+        EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
         EXPECT_EQ(m_services->GetProvider(1)->Initialize(&m_info), -1);
-        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+        EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
         m_services->Shutdown();
-        EXPECT_EQ(DllDirectory(), folder ? folder : L"");
+        EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
     }
 }
 
 TEST_F(InstalledLibrary, WithoutASearchFolderSeesTheHosts)
 {
     Install(L"Recorded");
-    const TemporaryDllDirectory directory(L"C:\\windows");
+    const ProcessDllDirectory directory(L"C:\\windows");
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
     EXPECT_EQ(provider->Initialize(&m_info), 0);

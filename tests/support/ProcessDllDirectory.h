@@ -4,19 +4,23 @@
 
 #include <string>
 
-/// The folder that the process searches for libraries; none again at the end.
+/// The folder that the process searches for libraries, for a scope; null for none. Afterwards as it was before.
 class ProcessDllDirectory
 {
 public:
-    explicit ProcessDllDirectory(const wchar_t* folder) { SetDllDirectoryW(folder); }
+    explicit ProcessDllDirectory(const wchar_t* folder) : m_previous(Current()) { SetDllDirectoryW(folder); }
     ProcessDllDirectory(const ProcessDllDirectory&) = delete;
     ProcessDllDirectory& operator=(const ProcessDllDirectory&) = delete;
-    ~ProcessDllDirectory() { SetDllDirectoryW(nullptr); }
+    ~ProcessDllDirectory() { SetDllDirectoryW(m_previous.empty() ? nullptr : m_previous.c_str()); }
 
+    /// The folder now; empty for none.
     static std::wstring Current()
     {
         std::wstring folder(MAX_PATH, L'\0');
         folder.resize(GetDllDirectoryW(static_cast<DWORD>(folder.size()), folder.data()));
         return folder;
     }
+
+private:
+    std::wstring m_previous;
 };

@@ -4,10 +4,10 @@
 
 #include <string>
 
-/// Path of a loaded module; null means the program.
+/// The full path of a loaded module; of the program for null.
 inline std::wstring ModulePath(HMODULE module)
 {
-    std::wstring path(1024, L'\0');
+    std::wstring path(32768, L'\0'); // the longest path of Windows
     path.resize(GetModuleFileNameW(module, path.data(), static_cast<DWORD>(path.size())));
     return path;
 }
