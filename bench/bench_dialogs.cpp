@@ -3,8 +3,8 @@
 #include "FileLists.h"
 #include "Measure.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixServicesPointer.h"
 #include "PrivateUserKey.h"
-#include "ServicesPointer.h"
 
 #include <windows.h>
 
@@ -172,7 +172,7 @@ void BenchDialogs(MeasureTable& table)
         return;
     }
     const PrivateUserKey userKey;
-    const ServicesPointer services(GetIOrvixServices());
+    const OrvixServicesPointer services = MakeOrvixServices();
     const HostWindow owner(&UseDialog);
     OrvixFileListDialogParams params;
     const auto show = [&] { services->ShowFileListDialog(owner.Handle(), &params); };

@@ -5,8 +5,8 @@
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixServicesPointer.h"
 #include "PrivateUserKey.h"
-#include "ServicesPointer.h"
 #include "TempFolder.h"
 #include "User.h"
 
@@ -64,7 +64,7 @@ protected:
     PrivateUserKey m_userKey;
     TempFolder m_config;
     ColourfulHost m_host;
-    ServicesPointer m_services;
+    OrvixServicesPointer m_services;
     OrvixFileList m_list;
     OrvixFileListDialogParams m_params;
 };

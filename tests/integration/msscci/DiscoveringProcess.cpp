@@ -1,7 +1,8 @@
-// Looks for installed MSSCCI libraries and ends with their number as its exit code. It marks how far it comes.
+// Looks for installed MSSCCI libraries; the exit code is their number. It marks each step that it reaches.
 
 #include "OrvixClientInfo.h"
-#include "ServicesPointer.h"
+#include "OrvixProviderSource.h"
+#include "OrvixServicesPointer.h"
 
 #include <cstdlib>
 
@@ -11,9 +12,9 @@ int main()
 {
     std::atexit([] { Mark("atexit "); });
     Mark("started ");
-    const ServicesPointer services(GetIOrvixServices());
+    const OrvixServicesPointer services = MakeOrvixServices();
     OrvixClientInfo info;
-    services->Initialize(&info, 0x2);
+    services->Initialize(&info, OrvixProviderSource::InstalledMSSCCI);
     Mark("initialised ");
     return static_cast<int>(services->GetProviderCount());
 }

@@ -1,6 +1,6 @@
-// Appends words to the file that the environment names, the last one when it is detached.
+// Appends words to the file that an environment variable names. The last word comes when the library is detached.
 
-#include <windows.h>
+#include "UniqueHandle.h"
 
 #include <cstring>
 
@@ -11,14 +11,13 @@ extern "C" __declspec(dllexport) void Mark(const char* word)
     {
         return;
     }
-    const HANDLE file = CreateFileW(path, FILE_APPEND_DATA, 0, nullptr, OPEN_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
-    if (file == INVALID_HANDLE_VALUE)
+    const UniqueFile file(CreateFileW(path, FILE_APPEND_DATA, 0, nullptr, OPEN_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
+    if (!file)
     {
         return;
     }
     DWORD written = 0;
-    WriteFile(file, word, static_cast<DWORD>(std::strlen(word)), &written, nullptr);
-    CloseHandle(file);
+    WriteFile(file.Get(), word, static_cast<DWORD>(std::strlen(word)), &written, nullptr);
 }
 
 BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)

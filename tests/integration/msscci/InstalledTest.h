@@ -1,6 +1,7 @@
 #pragma once
 
 #include "IOrvixProvider.h"
+#include "OrvixProviderResult.h"
 #include "OutputHost.h"
 #include "RegistryKey.h"
 #include "SccRecorder.h"
@@ -21,7 +22,7 @@ inline std::wstring Recording(const std::wstring& name)
     return ORVIX_RECORDING_MSSCCI L"\\" + name + L".dll";
 }
 
-/// The bytes of a text without terminator, and what follows it: filled with zeros, or cut, to `size`.
+/// The bytes of a text without its terminator: filled with zeros, or cut, to `size` bytes.
 inline std::string Bytes(const std::wstring& text, std::size_t size)
 {
     std::string bytes(reinterpret_cast<const char*>(text.data()), text.size() * sizeof(wchar_t));
@@ -36,13 +37,13 @@ protected:
     InstalledTest() { m_scc = {}; }
     void TearDown() override { m_scc = {}; }
 
-    /// A provider's key that nothing in the list names.
+    /// Makes a provider's key that the list does not name.
     TemporaryRegistryKey& AddKey()
     {
         return m_keys.emplace_back(L"Software\\OrvixTest\\" + std::to_wstring(m_keys.size() + 1));
     }
 
-    /// A provider's key with both texts.
+    /// Makes a provider's key with name and path, which the list does not name.
     TemporaryRegistryKey& AddProvider(const std::wstring& name, const std::wstring& path = Recording(L"recording_full"))
     {
         TemporaryRegistryKey& key = AddKey();
@@ -51,7 +52,7 @@ protected:
         return key;
     }
 
-    /// A provider that stands in the list under the number of its key.
+    /// Makes a provider's key with name and path, which the list names in a value of the key's number.
     TemporaryRegistryKey& Install(const std::wstring& name, const std::wstring& path = Recording(L"recording_full"))
     {
         TemporaryRegistryKey& key = AddProvider(name, path);
@@ -59,17 +60,17 @@ protected:
         return key;
     }
 
-    /// Initialises with installed libraries alone and gives the first provider.
+    /// Initialises with installed libraries alone and returns the only provider.
     IOrvixProvider* InitializeAndGet()
     {
-        EXPECT_TRUE(Initialize(Installed));
+        EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
         EXPECT_EQ(m_services->GetProviderCount(), 1u);
         return m_services->GetProvider(0);
     }
 
     static void SetBytes(TemporaryRegistryKey& key, const std::wstring& name, DWORD type, const std::string& bytes)
     {
-        // Wine adds the terminator that is missing in a text when it stands behind the bytes.
+        // Where zeros follow the bytes in memory, Wine takes them for the missing terminator and stores them too.
         const std::string guarded = bytes + "xxxx";
         key.SetBytes(name, type, guarded.data(), bytes.size());
     }

@@ -9,20 +9,20 @@ using testing::HasSubstr;
 namespace
 {
 
-/// How a process that looked for installed libraries has ended.
+/// How a process that looks for installed libraries has ended.
 struct Outcome
 {
     DWORD exitCode = 0;
     std::string debugOutput;
-    std::string marks; ///< how far it came
+    std::string marks; ///< the steps that it reached
 };
 
-/// Listens to the debug output of all processes, as a monitor program does. (A debugger proper would not do: a library
-/// that throws and catches while it is loaded does not survive one under Wine.)
+/// Listens to the debug output of all processes, as a monitor program does. It is no debugger, since under Wine a
+/// library that throws and catches while it is loaded does not survive one.
 class DebugOutput
 {
 public:
-    /// What the process puts out until it ends, which it is to do within a minute.
+    /// The debug output of the process until it ends. It must end within a minute.
     std::string ReadUntilTheEnd(const PROCESS_INFORMATION& process)
     {
         std::string output;
@@ -86,17 +86,17 @@ protected:
         return outcome;
     }
 
-    /// The process has ended at once, with the system's code for that and a reason, and ran nothing more.
+    /// The process ended at once, with the code of a failure that cannot be handled and a reason, and ran nothing more.
     void ExpectFatal() const
     {
         const Outcome outcome = Discover();
-        EXPECT_EQ(outcome.exitCode, 0xC0000409u);
+        EXPECT_EQ(outcome.exitCode, STATUS_STACK_BUFFER_OVERRUN);
         EXPECT_THAT(outcome.debugOutput,
                     HasSubstr("OrvixCore: the process ends: a text of an installed MSSCCI provider"));
         EXPECT_EQ(outcome.marks, "started ");
     }
 
-    static constexpr std::size_t Unterminable = 2048;
+    static constexpr std::size_t Unterminable = 2048; ///< bytes of a text that leave no room for a terminator
 };
 
 } // namespace

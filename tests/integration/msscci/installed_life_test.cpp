@@ -13,14 +13,14 @@ using InstalledLibrary = InstalledTest;
 /// Every operation that needs the library fails; without an open project the status does not.
 void ExpectNotAvailable(IOrvixProvider& provider, OrvixClientInfo& info)
 {
-    EXPECT_EQ(provider.Initialize(&info), -1);
+    EXPECT_EQ(provider.Initialize(&info), OrvixProviderResult::Failure);
     EXPECT_FALSE(provider.IsInitialized());
-    EXPECT_EQ(provider.OpenProject(L"C:\\p", L""), -1);
+    EXPECT_EQ(provider.OpenProject(L"C:\\p", L""), OrvixProviderResult::Failure);
     EXPECT_FALSE(provider.IsProjectOpen());
-    EXPECT_EQ(provider.RunProviderClient(), -1);
-    EXPECT_EQ(provider.ShowOptions(), -1);
-    EXPECT_EQ(provider.CloseProject(), -1);
-    EXPECT_EQ(provider.Uninitialize(), -1);
+    EXPECT_EQ(provider.RunProviderClient(), OrvixProviderResult::Failure);
+    EXPECT_EQ(provider.ShowOptions(), OrvixProviderResult::Failure);
+    EXPECT_EQ(provider.CloseProject(), OrvixProviderResult::Failure);
+    EXPECT_EQ(provider.Uninitialize(), OrvixProviderResult::Failure);
 }
 
 } // namespace
@@ -36,7 +36,7 @@ TEST_F(InstalledLibrary, IsLoadedOnFirstUseOnly)
     EXPECT_FALSE(provider->IsProjectOpen());
     EXPECT_THAT(m_scc.calls, IsEmpty());
     m_info.SetClientName(L"Test host");
-    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
     EXPECT_THAT(m_scc.calls, ElementsAre("load recording_full", "SccGetVersion()",
                                          R"(SccInitialize(0x0, 0x0, "Test host", "Recorded", ""))"));
 }
@@ -45,7 +45,7 @@ TEST_F(InstalledLibrary, HasOneProviderForAllRequests)
 {
     Install(L"Recorded");
     Install(L"Other");
-    ASSERT_TRUE(Initialize(Installed));
+    ASSERT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_NE(m_services->GetProvider(0), nullptr);
     EXPECT_EQ(m_services->GetProvider(0), m_services->GetProvider(0));
     EXPECT_NE(m_services->GetProvider(0), m_services->GetProvider(1));
@@ -64,7 +64,7 @@ TEST_F(InstalledLibrary, ThatIsMissingIsListedAndNotAvailable)
     ExpectNotAvailable(*provider, m_info);
 }
 
-TEST_F(InstalledLibrary, ThatIsNoneIsListedAndNotAvailable)
+TEST_F(InstalledLibrary, ThatIsNoLibraryIsListedAndNotAvailable)
 {
     const std::filesystem::path file = m_config.Path() / L"notes.dll";
     WriteBytes(file, "These are notes, not a library.");
@@ -80,9 +80,9 @@ TEST_F(InstalledLibrary, IsTriedAgainAfterAFailedLoad)
     Install(L"Recorded", file.wstring());
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    EXPECT_EQ(provider->Initialize(&m_info), -1);
+    EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Failure);
     std::filesystem::copy_file(Recording(L"recording_full"), file);
-    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
 }
 
 TEST_F(InstalledLibrary, IsLoadedUnderOrvixCoresManifest)
@@ -93,7 +93,7 @@ TEST_F(InstalledLibrary, IsLoadedUnderOrvixCoresManifest)
     HANDLE before = nullptr;
     HANDLE after = nullptr;
     ASSERT_TRUE(GetCurrentActCtx(&before));
-    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
     ASSERT_TRUE(GetCurrentActCtx(&after));
     EXPECT_EQ(before, after);
     const std::wstring core = ModulePath(GetModuleHandleW(L"OrvixCore.dll"));
@@ -101,7 +101,7 @@ TEST_F(InstalledLibrary, IsLoadedUnderOrvixCoresManifest)
         << std::filesystem::path(m_scc.manifestAtLoad);
 }
 
-TEST_F(InstalledLibrary, LeavesTheFolderThatTheProcessSearchesAsItWas)
+TEST_F(InstalledLibrary, LeavesTheDllDirectoryOfTheProcessAsItWas)
 {
     const std::wstring needed = ORVIX_RECORDING_MSSCCI L"\\needed";
     Install(L"Recorded");
@@ -111,25 +111,25 @@ TEST_F(InstalledLibrary, LeavesTheFolderThatTheProcessSearchesAsItWas)
     for (const wchar_t* folder : {static_cast<const wchar_t*>(nullptr), L"C:\\windows"})
     {
         const ProcessDllDirectory directory(folder);
-        ASSERT_TRUE(Initialize(Installed));
+        ASSERT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
         EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
-        EXPECT_EQ(m_services->GetProvider(0)->Initialize(&m_info), 0);
+        EXPECT_EQ(m_services->GetProvider(0)->Initialize(&m_info), OrvixProviderResult::Success);
         EXPECT_EQ(m_scc.dllDirectoryAtLoad, needed);
         EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
-        EXPECT_EQ(m_services->GetProvider(1)->Initialize(&m_info), -1);
+        EXPECT_EQ(m_services->GetProvider(1)->Initialize(&m_info), OrvixProviderResult::Failure);
         EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
         m_services->Shutdown();
         EXPECT_EQ(ProcessDllDirectory::Current(), folder ? folder : L"");
     }
 }
 
-TEST_F(InstalledLibrary, WithoutASearchFolderSeesTheHosts)
+TEST_F(InstalledLibrary, WithoutASearchFolderIsLoadedWithTheHostsDllDirectory)
 {
     Install(L"Recorded");
     const ProcessDllDirectory directory(L"C:\\windows");
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
     EXPECT_EQ(m_scc.dllDirectoryAtLoad, L"C:\\windows");
 }
 
@@ -138,8 +138,8 @@ TEST_F(InstalledLibrary, IsEndedAndFreedAtShutdown)
     Install(L"Recorded");
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    ASSERT_EQ(provider->Initialize(&m_info), 0);
-    ASSERT_EQ(provider->OpenProject(L"C:\\p", L""), 0);
+    ASSERT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
+    ASSERT_EQ(provider->OpenProject(L"C:\\p", L""), OrvixProviderResult::Success);
     m_scc.Take();
     m_services->Shutdown();
     EXPECT_THAT(m_scc.calls, ElementsAre("SccCloseProject(0x0)", "SccUninitialize(0x0)", "unload recording_full"));
@@ -154,7 +154,7 @@ TEST_F(InstalledLibrary, IsEndedAndFreedWithTheServicesObject)
     Install(L"Recorded");
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    ASSERT_EQ(provider->Initialize(&m_info), 0);
+    ASSERT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
     m_scc.Take();
     m_services.reset();
     EXPECT_THAT(m_scc.calls, ElementsAre("SccUninitialize(0x0)", "unload recording_full"));
@@ -164,11 +164,11 @@ TEST_F(InstalledLibrary, MayLetTheHostCallBackWhileItIsEnded)
 {
     Install(L"First");
     Install(L"Second");
-    ASSERT_TRUE(Initialize(Installed));
+    ASSERT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     ASSERT_EQ(m_services->GetProviderCount(), 2u);
     for (std::uint32_t i = 0; i < 2; ++i)
     {
-        ASSERT_EQ(m_services->GetProvider(i)->Initialize(&m_info), 0);
+        ASSERT_EQ(m_services->GetProvider(i)->Initialize(&m_info), OrvixProviderResult::Success);
     }
     int called = 0;
     m_scc.uninitialize = [&](LPVOID) {
@@ -186,7 +186,7 @@ TEST_F(InstalledLibrary, MayLetTheHostCallBackWhileItIsEnded)
 TEST_F(InstalledLibrary, ThatWasNeverUsedIsNotLoadedAtTheEnd)
 {
     Install(L"Recorded");
-    ASSERT_TRUE(Initialize(Installed));
+    ASSERT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     m_services.reset();
     EXPECT_THAT(m_scc.calls, IsEmpty());
 }
@@ -198,7 +198,7 @@ TEST_F(InstalledLibrary, CanBeFoundAgainAfterShutdown)
     m_services->Shutdown();
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    EXPECT_EQ(provider->Initialize(&m_info), 0);
+    EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
 }
 
 TEST_F(InstalledLibrary, SendsItsTextOutputToTheHost)
@@ -208,10 +208,10 @@ TEST_F(InstalledLibrary, SendsItsTextOutputToTheHost)
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
     m_info.SetIOrvixClientAccess(&host);
-    ASSERT_EQ(provider->Initialize(&m_info), 0);
+    ASSERT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
     m_scc.openProject = [](LPVOID, HWND, LPSTR, LPCSTR, LPCSTR, LPSTR, LPCSTR, LPTEXTOUTPROC output, LONG) {
         return output("opening", SCC_MSG_WARNING);
     };
-    EXPECT_EQ(provider->OpenProject(L"C:\\p", L""), 0);
+    EXPECT_EQ(provider->OpenProject(L"C:\\p", L""), OrvixProviderResult::Success);
     EXPECT_THAT(host.lines, ElementsAre(OutputHost::Line(L"opening", 0)));
 }

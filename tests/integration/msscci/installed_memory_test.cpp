@@ -2,6 +2,7 @@
 #include "InstalledTest.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
+#include "OrvixProviderOption.h"
 
 #include <algorithm>
 #include <cstdlib>
@@ -18,7 +19,8 @@ using InstalledWithoutMemory = InstalledTest;
 const wchar_t* const LongName = L"A provider's name that is long enough to need memory of its own";
 const wchar_t* const OtherLongName = L"Another provider's name, which is long enough as well";
 
-/// Makes the n-th allocation of braeutil's texts fail, and counts all of them. It has another heap than the records.
+/// Makes the n-th allocation of braeutil's texts fail, and counts all of them. They lie on another heap than the
+/// records.
 class TextMemory
 {
 public:
@@ -45,16 +47,19 @@ struct Operation
 
 const Operation Operations[] = {
     {"CheckIn", [](IOrvixProvider& p, OrvixFileList& list) { return p.CheckIn(&list, L"comment", 0); }},
-    {"CheckOut", [](IOrvixProvider& p, OrvixFileList& list) { return p.CheckOut(&list, L"comment", 0x2); }},
-    {"UndoCheckOut", [](IOrvixProvider& p, OrvixFileList& list) { return p.UndoCheckOut(&list, 0x2); }},
+    {"CheckOut", [](IOrvixProvider& p,
+                    OrvixFileList& list) { return p.CheckOut(&list, L"comment", OrvixProviderOption::GetLatest); }},
+    {"UndoCheckOut",
+     [](IOrvixProvider& p, OrvixFileList& list) { return p.UndoCheckOut(&list, OrvixProviderOption::GetLatest); }},
     {"GetLatest", [](IOrvixProvider& p, OrvixFileList& list) { return p.GetLatest(&list, 0); }},
-    {"Add", [](IOrvixProvider& p, OrvixFileList& list) { return p.Add(&list, L"comment", 0x1); }},
+    {"Add", [](IOrvixProvider& p,
+               OrvixFileList& list) { return p.Add(&list, L"comment", OrvixProviderOption::KeepCheckedOut); }},
     {"ShowHistory", [](IOrvixProvider& p, OrvixFileList& list) { return p.ShowHistory(&list); }},
     {"ShowProperties", [](IOrvixProvider& p, OrvixFileList& list) { return p.ShowProperties(&list); }},
     {"QueryStatus", [](IOrvixProvider& p, OrvixFileList& list) { return p.QueryStatus(&list, 0); }},
 };
 
-/// An operation on two files of an open project, one of which has letters outside ASCII.
+/// An operation on two files of an open project. One path is not all ASCII.
 class InstalledOperationWithoutMemory : public InstalledTest, public testing::WithParamInterface<Operation>
 {
 protected:
@@ -63,8 +68,8 @@ protected:
         Install(L"Recorded");
         m_provider = InitializeAndGet();
         ASSERT_NE(m_provider, nullptr);
-        ASSERT_EQ(m_provider->Initialize(&m_info), 0);
-        ASSERT_EQ(m_provider->OpenProject(L"C:\\p", L""), 0);
+        ASSERT_EQ(m_provider->Initialize(&m_info), OrvixProviderResult::Success);
+        ASSERT_EQ(m_provider->OpenProject(L"C:\\p", L""), OrvixProviderResult::Success);
         for (const wchar_t* file : {L"C:\\\u00E9", L"C:\\b"})
         {
             m_files.AddActiveEntry(m_files.CreateEntry(file, nullptr, 0, 0));
@@ -74,7 +79,7 @@ protected:
 
     void ExpectOutcome(int result, bool failed)
     {
-        EXPECT_EQ(result, failed ? -1 : 0);
+        EXPECT_EQ(result, failed ? OrvixProviderResult::Failure : OrvixProviderResult::Success);
         EXPECT_EQ(m_scc.Take().empty(), failed);
         EXPECT_TRUE(!failed || m_files.GetActiveFileEntry(0)->GetFlagsOut() == 0);
     }
@@ -85,13 +90,14 @@ protected:
 
 } // namespace
 
-TEST_F(InstalledWithoutMemory, DiscoveryPassesOverWhatItCannotHold)
+TEST_F(InstalledWithoutMemory, DiscoverySkipsWhatItHasNoMemoryFor)
 {
     Install(LongName);
     Install(OtherLongName);
     const long failures = SweepAllocations([&](AllocationRound& round) {
-        ServicesPointer services(GetIOrvixServices());
-        const bool found = round.Attempt([&] { return services->Initialize(&m_info, Installed); });
+        OrvixServicesPointer services = MakeOrvixServices();
+        const bool found =
+            round.Attempt([&] { return services->Initialize(&m_info, OrvixProviderSource::InstalledMSSCCI); });
         EXPECT_TRUE(found || round.Failed());
         EXPECT_LE(services->GetProviderCount(), 2u);
         EXPECT_TRUE(round.Failed() || services->GetProviderCount() == 2);
@@ -99,17 +105,17 @@ TEST_F(InstalledWithoutMemory, DiscoveryPassesOverWhatItCannotHold)
         {
             ASSERT_NE(services->GetProvider(i), nullptr);
             EXPECT_STREQ(services->GetProvider(i)->GetName(), services->GetProviderName(i));
-            EXPECT_EQ(services->GetProvider(i)->RunProviderClient(), 0);
+            EXPECT_EQ(services->GetProvider(i)->RunProviderClient(), OrvixProviderResult::Success);
         }
         services->Shutdown();
         EXPECT_FALSE(IsLoaded(Recording(L"recording_full")));
-        EXPECT_TRUE(services->Initialize(&m_info, Installed));
+        EXPECT_TRUE(services->Initialize(&m_info, OrvixProviderSource::InstalledMSSCCI));
         EXPECT_EQ(services->GetProviderCount(), 2u);
     });
     EXPECT_GE(failures, 20);
 }
 
-TEST_F(InstalledWithoutMemory, DiscoveryGoesOnBehindTheProviderThatItCannotHold)
+TEST_F(InstalledWithoutMemory, DiscoveryGoesOnAfterAProviderThatItHasNoMemoryFor)
 {
     Install(LongName);
     Install(OtherLongName);
@@ -121,9 +127,9 @@ TEST_F(InstalledWithoutMemory, DiscoveryGoesOnBehindTheProviderThatItCannotHold)
         bool failed = true;
         for (long n = 1; failed; ++n)
         {
-            m_services.reset(GetIOrvixServices());
+            m_services = MakeOrvixServices();
             AllocationRound round(*heap, n, false);
-            round.Attempt([&] { return Initialize(Installed); });
+            round.Attempt([&] { return Initialize(OrvixProviderSource::InstalledMSSCCI); });
             failed = round.Failed();
             goesOn |= ProviderNames() == Names{OtherLongName};
         }
@@ -131,27 +137,29 @@ TEST_F(InstalledWithoutMemory, DiscoveryGoesOnBehindTheProviderThatItCannotHold)
     }
 }
 
-TEST_F(InstalledWithoutMemory, InitializeAndOpenProjectFailBeforeTheLibraryIsCalledOrWorkWholly)
+TEST_F(InstalledWithoutMemory, InitializeAndOpenProjectFailBeforeTheyCallTheLibraryOrSucceed)
 {
     Install(L"Recorded");
     m_info.SetClientName(LongName);
     const long failures = SweepAllocations([&](AllocationRound& round) {
-        const ServicesPointer services(GetIOrvixServices());
-        ASSERT_TRUE(services->Initialize(&m_info, Installed));
+        const OrvixServicesPointer services = MakeOrvixServices();
+        ASSERT_TRUE(services->Initialize(&m_info, OrvixProviderSource::InstalledMSSCCI));
         IOrvixProvider* provider = services->GetProvider(0);
         m_scc.Take();
         const int result = round.Attempt([&] {
             const int initialized = provider->Initialize(&m_info);
-            return initialized == 0 ? provider->OpenProject(L"C:\\p", LongName) : initialized;
+            return initialized == OrvixProviderResult::Success ? provider->OpenProject(L"C:\\p", LongName)
+                                                               : initialized;
         });
-        EXPECT_TRUE(result == 0 || (result == -1 && round.Failed())) << result;
-        EXPECT_EQ(provider->IsProjectOpen(), result == 0);
+        const bool opened = result == OrvixProviderResult::Success;
+        EXPECT_TRUE(opened || (result == OrvixProviderResult::Failure && round.Failed())) << result;
+        EXPECT_EQ(provider->IsProjectOpen(), opened);
         const std::vector<std::string> calls = m_scc.Take();
         EXPECT_EQ(std::any_of(calls.begin(), calls.end(),
                               [](const std::string& call) { return call.starts_with("SccOpenProject"); }),
-                  result == 0);
-        EXPECT_EQ(provider->Initialize(&m_info), 0);
-        EXPECT_EQ(provider->OpenProject(L"C:\\p", LongName), 0);
+                  opened);
+        EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
+        EXPECT_EQ(provider->OpenProject(L"C:\\p", LongName), OrvixProviderResult::Success);
     });
     EXPECT_GE(failures, 2);
 }
@@ -161,7 +169,7 @@ TEST_P(InstalledOperationWithoutMemory, SendsNothing)
     const long failures = SweepAllocations([&](AllocationRound& round) {
         const int result = round.Attempt([&] { return GetParam().run(*m_provider, m_files); });
         ExpectOutcome(result, round.Failed());
-        EXPECT_EQ(GetParam().run(*m_provider, m_files), 0);
+        EXPECT_EQ(GetParam().run(*m_provider, m_files), OrvixProviderResult::Success);
         m_scc.Take();
         m_files.GetActiveFileEntry(0)->SetFlagsOut(0);
     });
@@ -193,13 +201,13 @@ TEST_F(InstalledWithoutMemory, TextOutputIsDropped)
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
     m_info.SetIOrvixClientAccess(&host);
-    ASSERT_EQ(provider->Initialize(&m_info), 0);
+    ASSERT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
     LPTEXTOUTPROC output = nullptr;
     m_scc.openProject = [&](LPVOID, HWND, LPSTR, LPCSTR, LPCSTR, LPSTR, LPCSTR, LPTEXTOUTPROC given, LONG) {
         output = given;
         return SCC_OK;
     };
-    ASSERT_EQ(provider->OpenProject(L"C:\\p", L""), 0);
+    ASSERT_EQ(provider->OpenProject(L"C:\\p", L""), OrvixProviderResult::Success);
     const TextMemory memory(1);
     EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
     EXPECT_TRUE(memory.Failed());

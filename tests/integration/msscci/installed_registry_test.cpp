@@ -1,5 +1,6 @@
 #include "ImportHook.h"
 #include "InstalledTest.h"
+#include "UniqueHandle.h"
 
 #include <map>
 
@@ -21,8 +22,8 @@ constexpr std::size_t MaxBytes = 2047;
 Names EnumeratedTexts()
 {
     Names texts;
-    HKEY key = nullptr;
-    if (RegOpenKeyExW(HKEY_LOCAL_MACHINE, ListPath, 0, KEY_READ, &key) != ERROR_SUCCESS)
+    UniqueRegistryKey key;
+    if (RegOpenKeyExW(HKEY_LOCAL_MACHINE, ListPath, 0, KEY_READ, key.Out()) != ERROR_SUCCESS)
     {
         return texts;
     }
@@ -32,18 +33,17 @@ Names EnumeratedTexts()
         wchar_t data[256] = {};
         DWORD nameSize = 64;
         DWORD dataSize = sizeof data;
-        if (RegEnumValueW(key, index, name, &nameSize, nullptr, nullptr, reinterpret_cast<BYTE*>(data), &dataSize) !=
-            ERROR_SUCCESS)
+        if (RegEnumValueW(key.Get(), index, name, &nameSize, nullptr, nullptr, reinterpret_cast<BYTE*>(data),
+                          &dataSize) != ERROR_SUCCESS)
         {
             break;
         }
         texts.emplace_back(data);
     }
-    RegCloseKey(key);
     return texts;
 }
 
-/// Makes OrvixCore.dll's enumeration of a registry key go wrong, after a number of values that it gives well.
+/// Disturbs the enumeration of a registry key by OrvixCore.dll after a number of good values.
 class EnumerationTrouble
 {
 public:
@@ -109,20 +109,20 @@ private:
 TEST_F(InstalledList, ThatIsMissingGivesFalse)
 {
     m_list.Remove();
-    EXPECT_FALSE(Initialize(Installed));
+    EXPECT_FALSE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
 TEST_F(InstalledList, ThatIsEmptyGivesTrue)
 {
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
 TEST_F(InstalledList, WithoutAUsableProviderGivesTrue)
 {
     m_list.SetString(L"1", L"Software\\OrvixTest\\Missing");
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
@@ -130,10 +130,10 @@ TEST_F(InstalledList, IsReadOnlyWhenItsSourceBitIsSet)
 {
     Install(L"Recorded");
     EXPECT_FALSE(Initialize(0));
-    EXPECT_FALSE(Initialize(Plugins));
-    EXPECT_FALSE(Initialize(0xFFFFFFFC));
+    EXPECT_FALSE(Initialize(OrvixProviderSource::Plugins));
+    EXPECT_FALSE(Initialize(OtherSources));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
 }
 
@@ -141,7 +141,7 @@ TEST_F(InstalledList, FollowsThePlugins)
 {
     AddPlugin(L"good");
     Install(L"Recorded");
-    EXPECT_TRUE(Initialize(Plugins | Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), (Names{L"Fake Depot", L"Recorded"}));
 }
 
@@ -149,26 +149,26 @@ TEST_F(InstalledList, IsLookedForWithoutPlugins)
 {
     AddPlugin(L"good");
     Install(L"Recorded");
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
     EXPECT_EQ(FakeJournal::Read(), L"");
 }
 
 TEST_F(InstalledList, AndPluginsAreLookedForIndependently)
 {
-    EXPECT_TRUE(Initialize(Plugins | Installed)) << "an empty list";
+    EXPECT_TRUE(Initialize(OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI)) << "an empty list";
     m_list.Remove();
-    EXPECT_FALSE(Initialize(Plugins | Installed));
+    EXPECT_FALSE(Initialize(OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI));
     AddPlugin(L"good");
-    EXPECT_TRUE(Initialize(Plugins | Installed)) << "a plug-in";
+    EXPECT_TRUE(Initialize(OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI)) << "a plug-in";
     EXPECT_EQ(ProviderNames(), Names{L"Fake Depot"});
 }
 
-TEST_F(InstalledList, IsAddedAgainBySecondInitialize)
+TEST_F(InstalledList, IsAddedAgainByASecondInitialize)
 {
     Install(L"Recorded");
-    EXPECT_TRUE(Initialize(Installed));
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), (Names{L"Recorded", L"Recorded"}));
     EXPECT_NE(m_services->GetProvider(0), m_services->GetProvider(1));
 }
@@ -189,7 +189,7 @@ TEST_F(InstalledList, KeepsTheRegistrysOrder)
         expected.push_back(nameOfKey[path]);
     }
     ASSERT_EQ(expected.size(), 5u);
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), expected);
 }
 
@@ -197,7 +197,7 @@ TEST_F(InstalledList, MayNameAKeyTwice)
 {
     TemporaryRegistryKey& key = Install(L"Recorded");
     m_list.SetString(L"again", key.Path());
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), (Names{L"Recorded", L"Recorded"}));
 }
 
@@ -215,7 +215,7 @@ TEST_F(InstalledList, SkipsValuesThatAreNoStrings)
     m_list.SetDword(L"16", 1);
     m_list.SetString(L"99", AddProvider(L"Last").Path());
     const OpenKeys keys;
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), (Names{L"First", L"Last"}));
     EXPECT_EQ(keys.Opened(), 3) << "the list and two providers";
 }
@@ -227,11 +227,11 @@ TEST_F(InstalledList, SkipsValuesWhoseNameIsTooLong)
     m_list.SetString(std::wstring(1024, L'b'), key.Path());
     m_list.SetString(std::wstring(3000, L'c'), key.Path());
     m_list.SetString(L"z", key.Path());
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), (Names{L"Recorded", L"Recorded"}));
 }
 
-TEST_F(InstalledList, ThatIsDeletedMeanwhileEndsThere)
+TEST_F(InstalledList, ThatIsDeletedMeanwhileEndsAtOnce)
 {
     Install(L"First");
     Install(L"Second");
@@ -239,18 +239,18 @@ TEST_F(InstalledList, ThatIsDeletedMeanwhileEndsThere)
         RegDeleteTreeW(HKEY_LOCAL_MACHINE, ListPath);
         return ERROR_SUCCESS;
     });
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names{L"First"});
 }
 
-TEST_F(InstalledList, PassesOverAValueThatCannotBeRead)
+TEST_F(InstalledList, SkipsAValueThatCannotBeRead)
 {
     Install(L"First");
     Install(L"Second");
     Install(L"Third");
     const EnumerationTrouble unreadable(
         1, [](DWORD index) -> LSTATUS { return index == 1 ? ERROR_ACCESS_DENIED : ERROR_SUCCESS; });
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), (Names{L"First", L"Third"}));
 }
 
@@ -261,12 +261,12 @@ TEST_F(InstalledList, LeavesNoKeyOpen)
     AddKey().SetString(ServerName, L"No path");
     m_list.SetString(L"9", m_keys.back().Path());
     const OpenKeys keys;
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(keys.Opened(), 3);
     EXPECT_EQ(keys.Open(), 0);
 }
 
-TEST_F(InstalledProvider, WhoseKeyLacksSomethingIsSkipped)
+TEST_F(InstalledProvider, WhoseKeyIsIncompleteIsSkipped)
 {
     m_list.SetString(L"1", L"Software\\OrvixTest\\Missing");
     m_list.SetString(L"2", AddKey().Path());
@@ -275,7 +275,7 @@ TEST_F(InstalledProvider, WhoseKeyLacksSomethingIsSkipped)
     m_list.SetString(L"4", AddKey().Path());
     m_keys.back().SetString(ServerPath, Recording(L"recording_full"));
     m_list.SetString(L"5", AddProvider(L"Recorded").Path());
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
 }
 
@@ -290,11 +290,11 @@ TEST_F(InstalledProvider, MayHaveItsTextsInValuesOfAnyType)
         SetBytes(key, ServerPath, type, Bytes(path, path.size() * sizeof(wchar_t)));
         m_list.SetString(std::to_wstring(type), key.Path());
     }
-    ASSERT_TRUE(Initialize(Installed));
+    ASSERT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names(5, L"%TEMP%"));
     for (std::uint32_t i = 0; i < 5; ++i)
     {
-        EXPECT_EQ(m_services->GetProvider(i)->RunProviderClient(), 0) << i;
+        EXPECT_EQ(m_services->GetProvider(i)->RunProviderClient(), OrvixProviderResult::Success) << i;
     }
 }
 
@@ -308,7 +308,7 @@ TEST_F(InstalledProvider, NeedsNoTerminatorsInTheRegistry)
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
     EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
-    EXPECT_EQ(provider->RunProviderClient(), 0);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Success);
 }
 
 TEST_F(InstalledProvider, LosesHalfACharacterAtTheEndOfAText)
@@ -321,7 +321,7 @@ TEST_F(InstalledProvider, LosesHalfACharacterAtTheEndOfAText)
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
     EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
-    EXPECT_EQ(provider->RunProviderClient(), 0);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Success);
 }
 
 TEST_F(InstalledProvider, EndsATextAtItsFirstZero)
@@ -335,7 +335,7 @@ TEST_F(InstalledProvider, EndsATextAtItsFirstZero)
     ASSERT_NE(provider, nullptr);
     EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
     EXPECT_STREQ(provider->GetName(), L"Recorded");
-    EXPECT_EQ(provider->RunProviderClient(), 0);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Success);
 }
 
 TEST_F(InstalledProvider, MayHaveEmptyTexts)
@@ -349,13 +349,13 @@ TEST_F(InstalledProvider, MayHaveEmptyTexts)
     ASSERT_NE(provider, nullptr);
     EXPECT_EQ(ProviderNames(), Names{L""});
     EXPECT_STREQ(provider->GetName(), L"");
-    EXPECT_EQ(provider->RunProviderClient(), -1);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Failure);
 }
 
-TEST_F(InstalledProvider, MayHaveAnyLettersInItsName)
+TEST_F(InstalledProvider, MayHaveNonAsciiLettersInItsName)
 {
     Install(L"D\u00E9p\u00F4t \u5009\u5EAB \xD83D\xDE00");
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names{L"D\u00E9p\u00F4t \u5009\u5EAB \xD83D\xDE00"});
 }
 
@@ -369,7 +369,7 @@ TEST_P(InstalledTextThatFits, WorksInAllThreePlaces)
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
     EXPECT_EQ(ProviderNames(), Names{std::wstring(GetParam() / 2, L'n')});
-    EXPECT_EQ(provider->RunProviderClient(), 0);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Success);
 }
 
 INSTANTIATE_TEST_SUITE_P(Bytes, InstalledTextThatFits, testing::Values(2000, MaxBytes - 1, MaxBytes));
@@ -380,7 +380,7 @@ TEST_P(InstalledTextThatIsTooLong, SkipsThatProviderAlone)
     SetBytes(Install(L"replaced"), ServerName, REG_SZ, Bytes(L"Long name", GetParam()));
     SetBytes(Install(L"Long path"), ServerPath, REG_SZ, Bytes(Recording(L"recording_full"), GetParam()));
     Install(L"Recorded");
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names{L"Recorded"});
 }
 

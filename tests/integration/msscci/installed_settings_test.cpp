@@ -18,8 +18,7 @@ std::string Utf8(const std::wstring& ascii)
     return {ascii.begin(), ascii.end()};
 }
 
-/// The path of the library that OrvixCore.dll loaded last and the search folder that it set first, which are not
-/// handed on.
+/// The path that OrvixCore.dll tried to load last, and the DLL directories that it set. The system gets neither.
 class LoadWatch
 {
 public:
@@ -51,22 +50,22 @@ private:
 
 } // namespace
 
-TEST_F(InstalledSettings, SwitchAProviderOff)
+TEST_F(InstalledSettings, DisableAProvider)
 {
     Install(L"Recorded");
     Install(L"Other", Recording(L"recording_without_SccAdd"));
     WriteProviders("<a><Name>recorded</Name><Enabled>false</Enabled></a>");
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(ProviderNames(), Names{L"Other"});
-    EXPECT_EQ(m_services->GetProvider(0)->RunProviderClient(), 0);
+    EXPECT_EQ(m_services->GetProvider(0)->RunProviderClient(), OrvixProviderResult::Success);
     EXPECT_THAT(m_scc.calls, Not(Contains("load recording_full")));
 }
 
-TEST_F(InstalledSettings, SwitchAProviderOffWithoutLookingAtItsPath)
+TEST_F(InstalledSettings, DisableAProviderWithoutReadingItsPath)
 {
     SetBytes(Install(L"Recorded"), ServerPath, REG_SZ, std::string(2048, 'x'));
     WriteProviders("<a><Name>Recorded</Name><Enabled>false</Enabled></a>");
-    EXPECT_TRUE(Initialize(Installed)) << "a text that would end the process is not read";
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI)) << "a text that would end the process is not read";
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
@@ -77,7 +76,7 @@ TEST_F(InstalledSettings, OfTheProvidersNameBelongToIt)
     WriteProviders("<a><Name>recorded</Name><FixedProjectRoot>root</FixedProjectRoot>"
                    "<AltProviderExecutable>a.exe</AltProviderExecutable>"
                    "<Filters><f><Name>Temporary</Name><FileType>tmp</FileType></f></Filters></a>");
-    EXPECT_TRUE(Initialize(Installed));
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     ASSERT_EQ(ProviderNames(), (Names{L"My Recorded Things", L"Other"}));
     EXPECT_STREQ(m_services->GetProviderFixedProjectRoot(0), L"root");
     EXPECT_STREQ(m_services->GetProviderAltExecutable(0), L"a.exe");
@@ -93,7 +92,7 @@ TEST_F(InstalledSettings, ReplaceTheRegisteredLibrary)
                    "</MSSCCDllFullPath></a>");
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    EXPECT_EQ(provider->RunProviderClient(), 0);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Success);
     EXPECT_THAT(m_scc.calls, Contains("load recording_without_SccAdd"));
     EXPECT_THAT(m_scc.calls, Not(Contains("load recording_full")));
 }
@@ -105,10 +104,10 @@ TEST_F(InstalledSettings, NameTheLibraryOfAProviderThatRegistersNone)
     Install(L"Recorded too").SetBytes(ServerPath, REG_SZ, std::string(2048, 'x').data(), 2048);
     WriteProviders("<a><Name>Recorded</Name><MSSCCDllFullPath>" + Utf8(Recording(L"recording_full")) +
                    "</MSSCCDllFullPath></a>");
-    EXPECT_TRUE(Initialize(Installed)) << "a text that would end the process is not read";
+    EXPECT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI)) << "a text that would end the process is not read";
     ASSERT_EQ(ProviderNames(), (Names{L"Recorded", L"Recorded too"}));
-    EXPECT_EQ(m_services->GetProvider(0)->RunProviderClient(), 0);
-    EXPECT_EQ(m_services->GetProvider(1)->RunProviderClient(), 0);
+    EXPECT_EQ(m_services->GetProvider(0)->RunProviderClient(), OrvixProviderResult::Success);
+    EXPECT_EQ(m_services->GetProvider(1)->RunProviderClient(), OrvixProviderResult::Success);
 }
 
 TEST_F(InstalledSettings, WithoutALibraryLeaveTheRegisteredOne)
@@ -119,7 +118,7 @@ TEST_F(InstalledSettings, WithoutALibraryLeaveTheRegisteredOne)
     WriteProviders("<a><Name>Recorded</Name><MSSCCDllFullPath></MSSCCDllFullPath></a>");
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    EXPECT_EQ(provider->RunProviderClient(), 0);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Success);
 }
 
 TEST_F(InstalledSettings, AreCutAtTheirLongest)
@@ -134,7 +133,7 @@ TEST_F(InstalledSettings, AreCutAtTheirLongest)
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
     const LoadWatch loads;
-    EXPECT_EQ(provider->RunProviderClient(), -1);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Failure);
     EXPECT_EQ(loads.Path(), std::wstring(path.begin(), path.begin() + 1024));
     ASSERT_THAT(loads.Folders(), Not(IsEmpty()));
     EXPECT_EQ(loads.Folders().front(), std::wstring(folder.begin(), folder.begin() + 260));
@@ -145,14 +144,15 @@ TEST_F(InstalledSettings, NameTheFolderOfWhatTheLibraryNeeds)
     Install(L"Recorded", Recording(L"recording_dependent"));
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    EXPECT_EQ(provider->RunProviderClient(), -1) << "what the library needs is found without the setting";
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Failure)
+        << "what the library needs is found without the setting";
     m_services->Shutdown();
 
     const std::wstring needed = ORVIX_RECORDING_MSSCCI L"\\needed";
     WriteProviders("<a><Name>Recorded</Name><MSSCCDllSearchPath>" + Utf8(needed) + "</MSSCCDllSearchPath></a>");
     provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    EXPECT_EQ(provider->RunProviderClient(), 0);
+    EXPECT_EQ(provider->RunProviderClient(), OrvixProviderResult::Success);
     EXPECT_EQ(m_scc.dllDirectoryAtLoad, needed);
 }
 
@@ -162,13 +162,13 @@ TEST_F(InstalledSettings, NameTheFileBesideTheProject)
     WriteProviders("<a><Name>Recorded</Name><MSSCCProjectFile>project.xml</MSSCCProjectFile></a>");
     IOrvixProvider* provider = InitializeAndGet();
     ASSERT_NE(provider, nullptr);
-    ASSERT_EQ(provider->Initialize(&m_info), 0);
+    ASSERT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
     m_scc.openProject = [](LPVOID, HWND, LPSTR, LPCSTR, LPCSTR, LPSTR aux, LPCSTR, LPTEXTOUTPROC, LONG) {
         std::strcpy(aux, "server:1");
         return SCC_OK;
     };
     const TempFolder project;
-    ASSERT_EQ(provider->OpenProject(project.Text().c_str(), L""), 0);
+    ASSERT_EQ(provider->OpenProject(project.Text().c_str(), L""), OrvixProviderResult::Success);
     EXPECT_THAT(ReadBytes(project.Path() / L"project.xml"), HasSubstr("<AuxPath>server:1</AuxPath>"));
 }
 
@@ -177,13 +177,13 @@ TEST_F(InstalledSettings, WithoutAFileLeaveTheProjectFolderAlone)
     Install(L"Recorded");
     Install(L"Other");
     WriteProviders("<a><Name>Recorded</Name></a>");
-    ASSERT_TRUE(Initialize(Installed));
+    ASSERT_TRUE(Initialize(OrvixProviderSource::InstalledMSSCCI));
     for (std::uint32_t i = 0; i < 2; ++i)
     {
         const TempFolder project;
         IOrvixProvider* provider = m_services->GetProvider(i);
-        ASSERT_EQ(provider->Initialize(&m_info), 0);
-        ASSERT_EQ(provider->OpenProject(project.Text().c_str(), L""), 0);
+        ASSERT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
+        ASSERT_EQ(provider->OpenProject(project.Text().c_str(), L""), OrvixProviderResult::Success);
         EXPECT_TRUE(std::filesystem::is_empty(project.Path()));
     }
 }

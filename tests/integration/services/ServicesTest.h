@@ -3,7 +3,9 @@
 #include "FakeJournal.h"
 #include "Files.h"
 #include "OrvixClientInfo.h"
-#include "ServicesPointer.h"
+#include "OrvixPrompt.h"
+#include "OrvixProviderSource.h"
+#include "OrvixServicesPointer.h"
 #include "TempFolder.h"
 
 #include <gtest/gtest.h>
@@ -15,10 +17,18 @@
 #include <string>
 #include <vector>
 
-constexpr std::uint32_t Plugins = 0x1;
-constexpr std::uint32_t Installed = 0x2;
+namespace Action = OrvixPromptAction;
 
-/// A stored prompt as it stands in the file.
+/// Bits of the sources that have no published name.
+inline constexpr std::uint32_t OtherSources = ~(OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI);
+
+/// A number as the prompt file has it: decimal and signed.
+inline std::string InFile(std::uint32_t number)
+{
+    return std::to_string(static_cast<std::int32_t>(number));
+}
+
+/// A stored prompt with the texts that are in the file.
 struct StoredPrompt
 {
     std::string text = "text";
@@ -28,7 +38,7 @@ struct StoredPrompt
     std::string action = "0";
 };
 
-/// The whole prompt file, in the form that the library writes.
+/// The whole prompt file in the form that the library writes.
 inline std::string PromptsXml(const std::vector<StoredPrompt>& prompts)
 {
     std::string xml = R"(<?xml version="1.0" standalone="yes"?><OrvixPrompts version="1.0">)";
@@ -52,9 +62,12 @@ protected:
         FakeJournal::Clear();
     }
 
-    bool Initialize(std::uint32_t sources = Plugins) { return m_services->Initialize(&m_info, sources); }
+    bool Initialize(std::uint32_t sources = OrvixProviderSource::Plugins)
+    {
+        return m_services->Initialize(&m_info, sources);
+    }
 
-    /// Puts a fake plug-in into the plug-in folder, under another file name where one is given.
+    /// Copies a fake plug-in into the plug-in folder, under its own file name or another one.
     std::filesystem::path AddPlugin(const std::wstring& fake, const std::wstring& fileName = {})
     {
         std::filesystem::path target = m_plugins.Path() / (fileName.empty() ? fake + L".dll" : fileName);
@@ -74,7 +87,7 @@ protected:
         WriteBytes(PromptsFile(), PromptsXml(prompts));
     }
 
-    /// The prompt file without its line ends, which are the XML service's choice.
+    /// The prompt file without line ends, which the XML service chooses.
     std::string SavedPrompts() const
     {
         std::string xml = ReadBytes(PromptsFile());
@@ -97,7 +110,7 @@ protected:
     TempFolder m_config;
     TempFolder m_plugins;
     OrvixClientInfo m_info;
-    ServicesPointer m_services{GetIOrvixServices()};
+    OrvixServicesPointer m_services = MakeOrvixServices();
 };
 
 using Names = std::vector<std::wstring>;

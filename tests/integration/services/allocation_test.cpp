@@ -4,7 +4,7 @@
 namespace
 {
 
-/// Too long for the place that a short text has within a string object.
+/// Too long to lie inside a string object.
 const wchar_t* const LongText = L"A question that is long enough to need memory of its own";
 const std::string LongTextInFile = "A question that is long enough to need memory of its own";
 
@@ -13,7 +13,8 @@ using OutOfMemory = ServicesTest;
 /// Two answered prompts in the file.
 std::vector<StoredPrompt> TwoPrompts()
 {
-    return {{.text = LongTextInFile, .id = "1", .action = "2"}, {.text = LongTextInFile, .id = "2", .action = "4"}};
+    return {{.text = LongTextInFile, .id = "1", .action = InFile(Action::Yes)},
+            {.text = LongTextInFile, .id = "2", .action = InFile(Action::No)}};
 }
 
 } // namespace
@@ -21,9 +22,9 @@ std::vector<StoredPrompt> TwoPrompts()
 TEST_F(OutOfMemory, GetServicesGivesNull)
 {
     const long failures = SweepAllocations([](AllocationRound& round) {
-        const ServicesPointer services(round.Attempt([] { return GetIOrvixServices(); }));
+        const OrvixServicesPointer services = round.Attempt([] { return MakeOrvixServices(); });
         EXPECT_EQ(services == nullptr, round.Failed());
-        EXPECT_NE(ServicesPointer(GetIOrvixServices()), nullptr);
+        EXPECT_NE(MakeOrvixServices(), nullptr);
     });
     EXPECT_GE(failures, 2);
 }
@@ -31,12 +32,12 @@ TEST_F(OutOfMemory, GetServicesGivesNull)
 TEST_F(OutOfMemory, RegisterOfANewPromptAddsTheWholeRowOrNone)
 {
     const long failures = SweepAllocations([](AllocationRound& round) {
-        const ServicesPointer services(GetIOrvixServices());
-        EXPECT_TRUE(round.Attempt([&] { return services->RegisterPrompt(1, LongText, 2, 0, false); }));
-        EXPECT_EQ(services->GetPromptAction(1), round.Failed() ? 0u : 2u);
-        EXPECT_EQ(services->SetPromptAction(1, 8), !round.Failed());
-        EXPECT_TRUE(services->RegisterPrompt(2, LongText, 4, 0, false));
-        EXPECT_EQ(services->GetPromptAction(2), 4u);
+        const OrvixServicesPointer services = MakeOrvixServices();
+        EXPECT_TRUE(round.Attempt([&] { return services->RegisterPrompt(1, LongText, Action::Yes, 0, false); }));
+        EXPECT_EQ(services->GetPromptAction(1), round.Failed() ? 0u : Action::Yes);
+        EXPECT_EQ(services->SetPromptAction(1, Action::YesToAll), !round.Failed());
+        EXPECT_TRUE(services->RegisterPrompt(2, LongText, Action::No, 0, false));
+        EXPECT_EQ(services->GetPromptAction(2), Action::No);
     });
     EXPECT_GE(failures, 10);
 }
@@ -44,32 +45,32 @@ TEST_F(OutOfMemory, RegisterOfANewPromptAddsTheWholeRowOrNone)
 TEST_F(OutOfMemory, RegisterOfAKnownPromptKeepsTheRow)
 {
     const long failures = SweepAllocations([](AllocationRound& round) {
-        const ServicesPointer services(GetIOrvixServices());
-        services->RegisterPrompt(1, L"", 2, 0, false);
-        EXPECT_TRUE(round.Attempt([&] { return services->RegisterPrompt(1, LongText, 4, 0, false); }));
-        EXPECT_EQ(services->GetPromptAction(1), 2u);
-        EXPECT_TRUE(services->RegisterPrompt(1, LongText, 4, 0, true));
-        EXPECT_EQ(services->GetPromptAction(1), 4u);
+        const OrvixServicesPointer services = MakeOrvixServices();
+        services->RegisterPrompt(1, L"", Action::Yes, 0, false);
+        EXPECT_TRUE(round.Attempt([&] { return services->RegisterPrompt(1, LongText, Action::No, 0, false); }));
+        EXPECT_EQ(services->GetPromptAction(1), Action::Yes);
+        EXPECT_TRUE(services->RegisterPrompt(1, LongText, Action::No, 0, true));
+        EXPECT_EQ(services->GetPromptAction(1), Action::No);
     });
     EXPECT_GE(failures, 2);
 }
 
-TEST_F(OutOfMemory, InitializeAndShutdownNeverCostAStoredAnswer)
+TEST_F(OutOfMemory, InitializeAndShutdownLoseNoStoredAnswer)
 {
     WritePrompts(TwoPrompts());
     const std::filesystem::path good = AddPlugin(L"good");
     const long failures = SweepAllocations([&](AllocationRound& round) {
-        ServicesPointer services(GetIOrvixServices());
-        const bool found = round.Attempt([&] { return services->Initialize(&m_info, Plugins); });
+        OrvixServicesPointer services = MakeOrvixServices();
+        const bool found = round.Attempt([&] { return services->Initialize(&m_info, OrvixProviderSource::Plugins); });
         EXPECT_EQ(found, services->GetProviderCount() == 1);
         EXPECT_TRUE(found || round.Failed());
         services->Shutdown();
         EXPECT_EQ(SavedPrompts(), PromptsXml(TwoPrompts()));
         EXPECT_FALSE(IsLoaded(good));
 
-        EXPECT_TRUE(services->Initialize(&m_info, Plugins));
+        EXPECT_TRUE(services->Initialize(&m_info, OrvixProviderSource::Plugins));
         EXPECT_EQ(services->GetProviderCount(), 1u);
-        EXPECT_EQ(services->GetPromptAction(2), 4u);
+        EXPECT_EQ(services->GetPromptAction(2), Action::No);
         services.reset();
         EXPECT_EQ(SavedPrompts(), PromptsXml(TwoPrompts()));
     });
@@ -81,12 +82,12 @@ TEST_F(OutOfMemory, WhatInitializeCouldReadIsSavedAtTheEnd)
     AddPlugin(L"good");
     AddPlugin(L"other");
     std::vector<StoredPrompt> after = TwoPrompts();
-    after[0].action = "8";
+    after[0].action = InFile(Action::YesToAll);
     SweepAllocations([&](AllocationRound& round) {
         WritePrompts(TwoPrompts());
-        ServicesPointer services(GetIOrvixServices());
-        round.Attempt([&] { services->Initialize(&m_info, Plugins); });
-        const bool read = services->SetPromptAction(1, 8);
+        OrvixServicesPointer services = MakeOrvixServices();
+        round.Attempt([&] { services->Initialize(&m_info, OrvixProviderSource::Plugins); });
+        const bool read = services->SetPromptAction(1, Action::YesToAll);
         services.reset();
         EXPECT_EQ(SavedPrompts(), PromptsXml(read ? after : TwoPrompts()));
     });
@@ -96,35 +97,35 @@ TEST_F(OutOfMemory, ShutdownReleasesEverythingAndWritesTheWholeFileOrNothing)
 {
     const std::filesystem::path good = AddPlugin(L"good");
     std::vector<StoredPrompt> after = TwoPrompts();
-    after[0].action = "8";
+    after[0].action = InFile(Action::YesToAll);
     const long failures = SweepAllocations([&](AllocationRound& round) {
         WritePrompts(TwoPrompts());
-        const ServicesPointer services(GetIOrvixServices());
-        ASSERT_TRUE(services->Initialize(&m_info, Plugins));
-        services->SetPromptAction(1, 8);
+        const OrvixServicesPointer services = MakeOrvixServices();
+        ASSERT_TRUE(services->Initialize(&m_info, OrvixProviderSource::Plugins));
+        services->SetPromptAction(1, Action::YesToAll);
         round.Attempt([&] { services->Shutdown(); });
         EXPECT_EQ(services->GetProviderCount(), 0u);
         EXPECT_FALSE(IsLoaded(good));
         EXPECT_TRUE(SavedPrompts() == PromptsXml(after) ||
                     (round.Failed() && SavedPrompts() == PromptsXml(TwoPrompts())))
             << SavedPrompts();
-        EXPECT_EQ(services->GetPromptAction(1), 8u);
+        EXPECT_EQ(services->GetPromptAction(1), Action::YesToAll);
         services->Shutdown();
         EXPECT_EQ(SavedPrompts(), PromptsXml(after));
     });
     EXPECT_GE(failures, 2);
 }
 
-TEST_F(OutOfMemory, TheReleaseWritesTheWholeFileOrNothing)
+TEST_F(OutOfMemory, ReleaseWritesTheWholeFileOrNothing)
 {
     const std::filesystem::path good = AddPlugin(L"good");
     std::vector<StoredPrompt> after = TwoPrompts();
-    after[0].action = "8";
+    after[0].action = InFile(Action::YesToAll);
     SweepAllocations([&](AllocationRound& round) {
         WritePrompts(TwoPrompts());
-        ServicesPointer services(GetIOrvixServices());
-        ASSERT_TRUE(services->Initialize(&m_info, Plugins));
-        services->SetPromptAction(1, 8);
+        OrvixServicesPointer services = MakeOrvixServices();
+        ASSERT_TRUE(services->Initialize(&m_info, OrvixProviderSource::Plugins));
+        services->SetPromptAction(1, Action::YesToAll);
         round.Attempt([&] { services.reset(); });
         EXPECT_FALSE(IsLoaded(good));
         EXPECT_TRUE(SavedPrompts() == PromptsXml(after) ||
@@ -133,9 +134,9 @@ TEST_F(OutOfMemory, TheReleaseWritesTheWholeFileOrNothing)
     });
 }
 
-// Provider configurations live until the process ends, so what their loading keeps is no leak: the rounds are
-// counted here without the sweep's look at the heaps.
-TEST_F(OutOfMemory, InitializeWithProviderSettingsLetsNothingOutAndCanBeRepeated)
+// Provider configurations live until the process ends, so that memory which stays allocated is no leak here. The rounds
+// are therefore counted without the sweep, which looks at the heaps.
+TEST_F(OutOfMemory, InitializeWithProviderSettingsThrowsNothingAndCanBeRepeated)
 {
     WritePrompts(TwoPrompts());
     AddPlugin(L"good");
@@ -150,15 +151,15 @@ TEST_F(OutOfMemory, InitializeWithProviderSettingsLetsNothingOutAndCanBeRepeated
         for (bool failed = true; failed; ++n)
         {
             SCOPED_TRACE(n);
-            ServicesPointer services(GetIOrvixServices());
+            OrvixServicesPointer services = MakeOrvixServices();
             AllocationRound round(heap, n, forGood);
-            round.Attempt([&] { services->Initialize(&m_info, Plugins); });
+            round.Attempt([&] { services->Initialize(&m_info, OrvixProviderSource::Plugins); });
             failed = round.Failed();
             services->Shutdown();
             ASSERT_EQ(SavedPrompts(), PromptsXml(TwoPrompts()));
 
-            services.reset(GetIOrvixServices());
-            ASSERT_TRUE(services->Initialize(&m_info, Plugins));
+            services = MakeOrvixServices();
+            ASSERT_TRUE(services->Initialize(&m_info, OrvixProviderSource::Plugins));
             ASSERT_STREQ(services->GetProviderFixedProjectRoot(0), LongText);
             ASSERT_TRUE(services->IsFileExcludedByProvider(0, L"a.tmp", nullptr));
         }
@@ -194,8 +195,8 @@ TEST_F(OutOfMemory, LookUpsNeedNoMemory)
             return m_services->GetProviderCount() == 1 && m_services->GetProvider(0) &&
                    m_services->GetProviderName(0) == std::wstring_view(L"Fake Depot") &&
                    m_services->GetProviderFixedProjectRoot(0) == std::wstring_view(L"root") &&
-                   m_services->GetProviderAltExecutable(0) && m_services->GetPromptAction(2) == 4 &&
-                   m_services->SetPromptAction(2, 4);
+                   m_services->GetProviderAltExecutable(0) && m_services->GetPromptAction(2) == Action::No &&
+                   m_services->SetPromptAction(2, Action::No);
         }));
     });
     EXPECT_EQ(failures, 0);

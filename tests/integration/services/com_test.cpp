@@ -10,7 +10,7 @@
 namespace
 {
 
-/// What the thread's COM is like. APTTYPE_CURRENT stands for none at all.
+/// The thread's COM apartment; APTTYPE_CURRENT when it is in none.
 APTTYPE Apartment()
 {
     APTTYPE type = APTTYPE_CURRENT;
@@ -18,8 +18,8 @@ APTTYPE Apartment()
     return CoGetApartmentType(&type, &qualifier) == S_OK ? type : APTTYPE_CURRENT;
 }
 
-/// Runs `work` on a thread of its own; `before` is what the thread does with COM first. True when COM on the
-/// thread was afterwards as `before` left it.
+/// Runs `before`, which may initialise COM, and then `work` on a thread of its own. True when COM on the thread is
+/// afterwards as `before` left it.
 bool LeavesComAlone(const std::function<HRESULT()>& before, const std::function<void()>& work)
 {
     bool unchanged = false;
@@ -32,7 +32,7 @@ bool LeavesComAlone(const std::function<HRESULT()>& before, const std::function<
         {
             CoUninitialize();
         }
-        // A thread that is in no apartment can enter either kind, and is the first to do so.
+        // A thread that is in no apartment can enter either kind, and gets S_OK as the first to do so.
         unchanged = unchanged && CoInitializeEx(nullptr, COINIT_MULTITHREADED) == S_OK;
         CoUninitialize();
     });
@@ -61,27 +61,27 @@ protected:
     ComOfTheThread()
     {
         WriteProviders("<a><Name>P</Name></a>");
-        WritePrompts({{.id = "1", .action = "2"}});
+        WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     }
 
     /// Loads and saves both files with an object of its own.
     std::function<void()> LoadAndSave(std::uint32_t* action = nullptr)
     {
         return [this, action] {
-            const ServicesPointer services(GetIOrvixServices());
+            const OrvixServicesPointer services = MakeOrvixServices();
             services->Initialize(&m_info, 0);
             if (action != nullptr)
             {
                 *action = services->GetPromptAction(1);
             }
-            services->RegisterPrompt(2, L"second", 4, 0, true);
+            services->RegisterPrompt(2, L"second", Action::No, 0, true);
             services->Shutdown();
         };
     }
 };
 
-/// Watches the documents of OrvixCore.dll: holds a pointer of its own to the latest, and looks how many others
-/// there are whenever the library leaves COM.
+/// Watches the documents of OrvixCore.dll: it holds a pointer of its own to the latest, and counts the other pointers
+/// when the library leaves COM.
 class DocumentWatch
 {
 public:
@@ -132,7 +132,7 @@ private:
     IUnknown* m_document = nullptr;
 };
 
-/// Makes the n-th text that OrvixCore.dll hands to COM fail for want of memory.
+/// Makes the allocation of the n-th text fail that OrvixCore.dll passes to COM.
 class TextAllocationFailure
 {
 public:
@@ -175,7 +175,7 @@ TEST_F(ComOfTheThread, IsNeitherNeededNorLeftInitialised)
 {
     std::uint32_t action = 0;
     EXPECT_TRUE(LeavesComAlone(NoApartment, LoadAndSave(&action)));
-    EXPECT_EQ(action, 2u);
+    EXPECT_EQ(action, Action::Yes);
     EXPECT_NE(SavedPrompts().find("second"), std::string::npos);
 }
 
@@ -183,7 +183,7 @@ TEST_F(ComOfTheThread, StaysInItsOwnApartment)
 {
     std::uint32_t action = 0;
     EXPECT_TRUE(LeavesComAlone(SingleThreaded, LoadAndSave(&action)));
-    EXPECT_EQ(action, 2u);
+    EXPECT_EQ(action, Action::Yes);
     EXPECT_NE(SavedPrompts().find("second"), std::string::npos);
 }
 
@@ -239,12 +239,12 @@ TEST_F(ComError, LeavesInitializeAndTheObjectStaysUsable)
 {
     AddPlugin(L"good");
     WriteProviders("<a><Name>Depot</Name><FixedProjectRoot>root</FixedProjectRoot></a>");
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     const std::string before = SavedPrompts();
     long n = 1;
     for (bool failed = true; failed; ++n)
     {
-        m_services.reset(GetIOrvixServices());
+        m_services = MakeOrvixServices();
         TextAllocationFailure failure(n);
         ASSERT_TRUE(failure.IsActive());
         try
@@ -263,19 +263,20 @@ TEST_F(ComError, LeavesInitializeAndTheObjectStaysUsable)
             EXPECT_EQ(SavedPrompts(), before);
             EXPECT_TRUE(Initialize());
         }
-        EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+        EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
     }
     EXPECT_GT(n, 3) << "two files are opened by name";
 }
 
 TEST_F(ComError, LeavesShutdownAndNothingStoredIsLost)
 {
-    WritePrompts({{.text = "first", .id = "1", .action = "2"}, {.text = "second", .id = "2", .action = "4"}});
+    WritePrompts({{.text = "first", .id = "1", .action = InFile(Action::Yes)},
+                  {.text = "second", .id = "2", .action = InFile(Action::No)}});
     Initialize(0);
-    m_services->SetPromptAction(1, 8);
+    m_services->SetPromptAction(1, Action::YesToAll);
     const std::string before = ReadBytes(PromptsFile());
-    const std::string after =
-        PromptsXml({{.text = "first", .id = "1", .action = "8"}, {.text = "second", .id = "2", .action = "4"}});
+    const std::string after = PromptsXml({{.text = "first", .id = "1", .action = InFile(Action::YesToAll)},
+                                          {.text = "second", .id = "2", .action = InFile(Action::No)}});
     long errors = 0;
     for (long n = 1;; ++n)
     {
@@ -303,7 +304,7 @@ TEST_F(ComError, DoesNotLeaveTheRelease)
 {
     const std::filesystem::path good = AddPlugin(L"good");
     Initialize();
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     const TextAllocationFailure failure(1, true);
     m_services.reset();
     EXPECT_TRUE(failure.HasFailed());

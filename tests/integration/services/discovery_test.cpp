@@ -1,5 +1,6 @@
 #include "ModulePath.h"
 #include "ServicesTest.h"
+#include "UniqueHandle.h"
 
 namespace
 {
@@ -12,8 +13,8 @@ Names NamesInSearchOrder(const std::filesystem::path& folder)
 {
     Names names;
     WIN32_FIND_DATAW found;
-    const HANDLE search = FindFirstFileW((folder / L"*.dll").c_str(), &found);
-    if (search == INVALID_HANDLE_VALUE)
+    const UniqueFind search(FindFirstFileW((folder / L"*.dll").c_str(), &found));
+    if (!search)
     {
         return names;
     }
@@ -28,12 +29,11 @@ Names NamesInSearchOrder(const std::filesystem::path& folder)
         {
             names.push_back(L"Other");
         }
-        else if (file == L"foreign.dll")
+        else if (file == L"nonascii.dll")
         {
             names.push_back(L"D\u00E9p\u00F4t \u5009\u5EAB");
         }
-    } while (FindNextFileW(search, &found) != 0);
-    FindClose(search);
+    } while (FindNextFileW(search.Get(), &found) != 0);
     return names;
 }
 
@@ -74,7 +74,7 @@ TEST_F(Discovery, AFolderWithoutSeparatorAtItsEndFindsNothing)
     EXPECT_EQ(FakeJournal::Read(), L"");
 }
 
-TEST_F(Discovery, AFolderWithoutSeparatorIsGluedToTheFoundName)
+TEST_F(Discovery, AFolderWithoutSeparatorIsJoinedToTheFoundName)
 {
     // The search for "<folder>\sub*.dll" finds "sub1.dll"; its path then is "<folder>\subsub1.dll".
     AddPlugin(L"good", L"sub1.dll");
@@ -89,7 +89,7 @@ TEST_F(Discovery, KeepsTheOrderOfTheFileSearch)
 {
     AddPlugin(L"other");
     AddPlugin(L"good");
-    AddPlugin(L"foreign");
+    AddPlugin(L"nonascii");
     EXPECT_TRUE(Initialize());
     const Names expected = NamesInSearchOrder(m_plugins.Path());
     ASSERT_EQ(expected.size(), 3u);
@@ -107,22 +107,22 @@ TEST_F(Discovery, ListsTwoPluginsOfTheSameNameWithTheSameConfiguration)
     EXPECT_EQ(m_services->GetProviderFixedProjectRoot(0), m_services->GetProviderFixedProjectRoot(1));
 }
 
-TEST_F(Discovery, TakesFileNamesWithBlanksAndForeignLetters)
+TEST_F(Discovery, TakesFileNamesWithBlanksAndNonAsciiLetters)
 {
-    const std::filesystem::path file = AddPlugin(L"foreign", L"\u5009\u5EAB prov\u00EDder 1.DLL");
+    const std::filesystem::path file = AddPlugin(L"nonascii", L"\u5009\u5EAB prov\u00EDder 1.DLL");
     EXPECT_TRUE(Initialize());
     EXPECT_EQ(ProviderNames(), Names{L"D\u00E9p\u00F4t \u5009\u5EAB"});
     EXPECT_TRUE(IsLoaded(file));
 }
 
-TEST_F(Discovery, ConfigurationOfANameWithForeignLettersApplies)
+TEST_F(Discovery, AConfigurationOfANonAsciiNameApplies)
 {
-    AddPlugin(L"foreign");
+    AddPlugin(L"nonascii");
     WriteProviders("<a><Name>\xE5\x80\x89\xE5\xBA\xAB</Name><Enabled>false</Enabled></a>");
     EXPECT_FALSE(Initialize());
 }
 
-TEST_F(Discovery, UnloadsAndSkipsAPluginThatIsSwitchedOff)
+TEST_F(Discovery, UnloadsAndSkipsAPluginThatIsDisabled)
 {
     const std::filesystem::path good = AddPlugin(L"good");
     AddPlugin(L"other");
@@ -133,7 +133,7 @@ TEST_F(Discovery, UnloadsAndSkipsAPluginThatIsSwitchedOff)
     EXPECT_NE(FakeJournal::Read().find(L"good.load good.version good.name good.unload "), std::wstring::npos);
 }
 
-TEST_F(Discovery, GivesFalseWhenTheOnlyPluginIsSwitchedOff)
+TEST_F(Discovery, GivesFalseWhenTheOnlyPluginIsDisabled)
 {
     AddPlugin(L"good");
     WriteProviders("<a><Name>Fake Depot</Name><Enabled>false</Enabled></a>");
@@ -247,7 +247,7 @@ TEST_F(Plugin, WhoseStartUpCodeFailsIsNeverAsked)
     EXPECT_EQ(FakeJournal::Read().find(L"startfails.version"), std::wstring::npos);
 }
 
-TEST_F(Plugin, IsAskedForItsProviderAfreshOnEveryRequest)
+TEST_F(Plugin, IsAskedForItsProviderOnEveryRequest)
 {
     AddPlugin(L"good");
     ASSERT_TRUE(Initialize());
@@ -288,8 +288,8 @@ TEST_F(Plugin, StaysLoadedUntilShutdown)
 {
     const std::filesystem::path good = AddPlugin(L"good");
     ASSERT_TRUE(Initialize());
-    const ServicesPointer other(GetIOrvixServices());
-    ASSERT_TRUE(other->Initialize(&m_info, Plugins));
+    const OrvixServicesPointer other = MakeOrvixServices();
+    ASSERT_TRUE(other->Initialize(&m_info, OrvixProviderSource::Plugins));
     m_services->Shutdown();
     EXPECT_TRUE(IsLoaded(good)) << "another services object still uses it";
     other->Shutdown();

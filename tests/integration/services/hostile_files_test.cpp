@@ -35,7 +35,7 @@ std::string NestedEntities()
     return dtd + "]>";
 }
 
-/// One long entity, to be named often.
+/// One long entity, to be used often.
 std::string LongEntity()
 {
     return "<!DOCTYPE a [<!ENTITY e \"" + std::string(1000000, 'x') + "\">]>";
@@ -43,7 +43,7 @@ std::string LongEntity()
 
 const std::string Declaration = "<?xml version=\"1.0\"?>";
 
-/// Bytes that are no XML document, or one that uses entities of its own: both files answer as if they were missing.
+/// Bytes that are no XML document, or one that uses entities of its own. Both files then count as missing.
 struct Unreadable
 {
     const char* name;
@@ -59,7 +59,7 @@ class UnreadableFile : public ServicesTest, public testing::WithParamInterface<U
 {
 };
 
-/// Well-formed files that mean to exhaust the reader.
+/// Well-formed files that try to exhaust the reader.
 class HostileFile : public ServicesTest
 {
 protected:
@@ -78,9 +78,9 @@ protected:
 TEST_P(UnreadableFile, OfPromptsIsAnEmptyTableAndStaysAsItIs)
 {
     const std::string bytes = GetParam().bytes();
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     Initialize(0);
-    ASSERT_EQ(m_services->GetPromptAction(1), 2u);
+    ASSERT_EQ(m_services->GetPromptAction(1), Action::Yes);
     WriteBytes(PromptsFile(), bytes);
     EXPECT_FALSE(Initialize(0));
     EXPECT_EQ(m_services->GetPromptAction(1), 0u);
@@ -105,7 +105,7 @@ INSTANTIATE_TEST_SUITE_P(
         Unreadable{"ByteOrderMarkOnly", [] { return std::string("\xEF\xBB\xBF"); }},
         Unreadable{"Truncated",
                    [] {
-                       const std::string whole = PromptsXml({{.id = "1", .action = "2"}});
+                       const std::string whole = PromptsXml({{.id = "1", .action = InFile(Action::Yes)}});
                        return whole.substr(0, whole.size() - 3);
                    }},
         Unreadable{"TruncatedProviders",
@@ -127,7 +127,7 @@ INSTANTIATE_TEST_SUITE_P(
                    }},
         Unreadable{"DocumentTypeOfPrompts",
                    [] {
-                       std::string xml = PromptsXml({{.id = "1", .action = "2"}});
+                       std::string xml = PromptsXml({{.id = "1", .action = InFile(Action::Yes)}});
                        return xml.insert(xml.find("<OrvixPrompts"), "<!DOCTYPE OrvixPrompts>");
                    }},
         Unreadable{"EntityOfAnotherFile",
@@ -152,13 +152,13 @@ TEST_F(HostileFile, InUtf16IsReadLikeAnyOther)
                Utf16(u"<?xml version=\"1.0\" encoding=\"UTF-16\"?><OrvixProviders><a><Name>Depot</Name>"
                      u"<FixedProjectRoot>\u5009</FixedProjectRoot></a></OrvixProviders>"));
     EXPECT_TRUE(Initialize());
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
     EXPECT_STREQ(m_services->GetProviderFixedProjectRoot(0), L"\u5009");
     m_services->Shutdown();
-    EXPECT_EQ(SavedPrompts(), PromptsXml({{.text = "\xE5\x80\x89", .action = "2"}}));
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.text = "\xE5\x80\x89", .action = InFile(Action::Yes)}}));
 }
 
-TEST_F(HostileFile, WithADocumentTypeThatNothingRefersToStillSwitchesAProviderOff)
+TEST_F(HostileFile, WithADocumentTypeThatNothingRefersToStillDisablesAProvider)
 {
     AddPlugin(L"good");
     for (const char* type : {"<!DOCTYPE a>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
@@ -176,15 +176,15 @@ TEST_F(HostileFile, WithTenMegabytesOfTextKeepsTheOtherRows)
 {
     AddPlugin(L"good");
     const std::string text(10 << 20, 'x');
-    WritePrompts({{.text = text, .id = "1", .action = "2"}, {.id = "2", .action = "4"}});
+    WritePrompts({{.text = text, .id = "1", .action = InFile(Action::Yes)}, {.id = "2", .action = InFile(Action::No)}});
     WriteProviders("<a><Name>Depot</Name><FixedProjectRoot>" + text + "</FixedProjectRoot></a>");
     EXPECT_TRUE(Initialize());
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
-    EXPECT_EQ(m_services->GetPromptAction(2), 4u);
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
+    EXPECT_EQ(m_services->GetPromptAction(2), Action::No);
     EXPECT_EQ(std::wcslen(m_services->GetProviderFixedProjectRoot(0)), text.size());
     m_services->Shutdown();
-    EXPECT_EQ(SavedPrompts(),
-              PromptsXml({{.text = std::string(1024, 'x'), .id = "1", .action = "2"}, {.id = "2", .action = "4"}}));
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.text = std::string(1024, 'x'), .id = "1", .action = InFile(Action::Yes)},
+                                          {.id = "2", .action = InFile(Action::No)}}));
 }
 
 TEST_F(HostileFile, WithAVeryLongProviderNameMatchesNothing)
@@ -196,11 +196,11 @@ TEST_F(HostileFile, WithAVeryLongProviderNameMatchesNothing)
 
 TEST_F(HostileFile, WithAHugeAttributeIsRead)
 {
-    std::string xml = PromptsXml({{.id = "1", .action = "2"}});
+    std::string xml = PromptsXml({{.id = "1", .action = InFile(Action::Yes)}});
     xml.replace(xml.find("1.0\"", xml.find("<OrvixPrompts")), 3, std::string(5 << 20, 'x'));
     WriteBytes(PromptsFile(), xml);
     Initialize(0);
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
 }
 
 TEST_F(HostileFile, WithManyRowsIsReadWhole)
@@ -210,10 +210,10 @@ TEST_F(HostileFile, WithManyRowsIsReadWhole)
     {
         prompts[i].id = std::to_string(i);
     }
-    prompts.back().action = "2";
+    prompts.back().action = InFile(Action::Yes);
     WritePrompts(prompts);
     Initialize(0);
-    EXPECT_EQ(m_services->GetPromptAction(19999), 2u);
+    EXPECT_EQ(m_services->GetPromptAction(19999), Action::Yes);
 }
 
 TEST_F(HostileFile, NestedTooDeepDoesNoHarm)
@@ -230,11 +230,11 @@ TEST_F(HostileFile, NestedTooDeepDoesNoHarm)
     EXPECT_EQ(ReadBytes(PromptsFile()), Declaration + deep);
 }
 
-TEST_F(HostileFile, OfALongEntityNamedOftenIsAnsweredInBoundedTimeAndMemory)
+TEST_F(HostileFile, WithALongEntityUsedOftenTakesBoundedTimeAndMemory)
 {
     AddPlugin(L"good");
     const std::string references = Repeated("&e;", 1000);
-    // Without a declaration the root would stand where the prompts are looked for.
+    // Without a declaration the root comes second, after the document type: there the reader looks for it.
     const std::string prompts = LongEntity() + "<p><Prompt><Text>" + references +
                                 "</Text><ID>1</ID><Locked>false</Locked><ActionOpts>0</ActionOpts><Action>2</Action>"
                                 "</Prompt></p>";

@@ -5,7 +5,7 @@
 namespace
 {
 
-/// A host's own record that names no folder.
+/// A record of the host's own class, without folders.
 class NamelessClientInfo : public OrvixClientInfo
 {
 public:
@@ -45,11 +45,11 @@ TEST_F(ServicesEntry, IsReachedThroughTheNamesOfTheExportedFunctions)
 
 TEST_F(ServicesEntry, EveryServicesObjectIsIndependent)
 {
-    const ServicesPointer other(GetIOrvixServices());
+    const OrvixServicesPointer other = MakeOrvixServices();
     ASSERT_NE(other, nullptr);
     ASSERT_NE(other, m_services);
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
     EXPECT_EQ(other->GetPromptAction(1), 0u);
     AddPlugin(L"good");
     EXPECT_TRUE(Initialize());
@@ -73,20 +73,20 @@ TEST_F(ServicesEntry, ANewObjectHasNoProvidersAndNoPrompts)
     EXPECT_FALSE(m_services->IsFileExcludedByProvider(0, L"a", &name));
     EXPECT_EQ(name, L"before");
     EXPECT_EQ(m_services->GetPromptAction(1), 0u);
-    EXPECT_FALSE(m_services->SetPromptAction(1, 2));
+    EXPECT_FALSE(m_services->SetPromptAction(1, Action::Yes));
 }
 
 TEST_F(ServicesInitialize, WithoutSourcesLoadsBothFilesAddsNoProviderAndStillInitialises)
 {
     AddPlugin(L"good");
     WriteProviders("<a><Name>Fake Depot</Name><FixedProjectRoot>root</FixedProjectRoot></a>");
-    WritePrompts({{.id = "7", .action = "2"}});
+    WritePrompts({{.id = "7", .action = InFile(Action::Yes)}});
     EXPECT_FALSE(Initialize(0));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
-    EXPECT_EQ(m_services->GetPromptAction(7), 2u);
+    EXPECT_EQ(m_services->GetPromptAction(7), Action::Yes);
     EXPECT_EQ(FakeJournal::Read(), L"");
 
-    // Initialised: its end saves the prompts.
+    // The object is initialised, so that its end saves the prompts.
     std::filesystem::remove(PromptsFile());
     m_services.reset();
     EXPECT_TRUE(std::filesystem::exists(PromptsFile()));
@@ -114,7 +114,7 @@ TEST_F(ServicesInitialize, AMissingConfigurationFolderIsNoError)
     AddPlugin(L"good");
     m_info.SetConfigFilePath((m_config.Text() + L"\\no\\such\\folder").c_str());
     EXPECT_TRUE(Initialize());
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     m_services->Shutdown();
     EXPECT_FALSE(std::filesystem::exists(m_config.Path() / L"no"));
 }
@@ -122,7 +122,7 @@ TEST_F(ServicesInitialize, AMissingConfigurationFolderIsNoError)
 TEST_F(ServicesInitialize, OtherSourceBitsFindNothing)
 {
     AddPlugin(L"good");
-    EXPECT_FALSE(Initialize(0xFFFFFFFC));
+    EXPECT_FALSE(Initialize(OtherSources));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
@@ -130,15 +130,15 @@ TEST_F(ServicesInitialize, TwiceAddsEveryProviderTwiceAndReloadsThePrompts)
 {
     AddPlugin(L"good");
     AddPlugin(L"other");
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     EXPECT_TRUE(Initialize());
     const Names once = ProviderNames();
     ASSERT_EQ(once.size(), 2u);
-    m_services->RegisterPrompt(2, L"text", 4, 0, false);
+    m_services->RegisterPrompt(2, L"text", Action::No, 0, false);
     EXPECT_TRUE(Initialize());
     EXPECT_EQ(ProviderNames(), (Names{once[0], once[1], once[0], once[1]}));
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
-    EXPECT_EQ(m_services->GetPromptAction(2), 0u) << "the table was not emptied before it was loaded again";
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
+    EXPECT_EQ(m_services->GetPromptAction(2), 0u) << "the table was not cleared before it was loaded again";
 }
 
 TEST_F(ServicesInitialize, TwiceKeepsTheFirstProviderSettingsBeforeTheSecond)
@@ -155,24 +155,24 @@ TEST_F(ServicesInitialize, TwiceKeepsTheFirstProviderSettingsBeforeTheSecond)
 TEST_F(ServicesInitialize, TakesTheLatestConfigurationFolder)
 {
     const TempFolder second;
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     EXPECT_FALSE(Initialize());
     m_info.SetConfigFilePath(second.Text().c_str());
     EXPECT_FALSE(Initialize());
     EXPECT_EQ(m_services->GetPromptAction(1), 0u);
-    m_services->RegisterPrompt(3, L"text", 8, 0, false);
+    m_services->RegisterPrompt(3, L"text", Action::YesToAll, 0, false);
     m_services->Shutdown();
     EXPECT_TRUE(std::filesystem::exists(second.Path() / L"OrvixPrompts.xml"));
 }
 
 TEST_F(ServicesInitialize, ANullConfigurationPathKeepsTheFolderOfTheCallBefore)
 {
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     EXPECT_FALSE(Initialize());
     NamelessClientInfo nameless;
-    m_services->SetPromptAction(1, 4);
-    EXPECT_FALSE(m_services->Initialize(&nameless, Plugins));
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u) << "not read again from the same file";
+    m_services->SetPromptAction(1, Action::No);
+    EXPECT_FALSE(m_services->Initialize(&nameless, OrvixProviderSource::Plugins));
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes) << "not read again from the same file";
 }
 
 TEST_F(ServicesInitialize, ANullConfigurationPathUsesTheCurrentFolder)
@@ -180,7 +180,7 @@ TEST_F(ServicesInitialize, ANullConfigurationPathUsesTheCurrentFolder)
     AddPlugin(L"good");
     const CurrentFolder current(m_config.Path());
     WriteProviders("<a><Name>Fake Depot</Name><Enabled>false</Enabled></a>");
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     class PluginsOnly : public NamelessClientInfo
     {
     public:
@@ -190,19 +190,19 @@ TEST_F(ServicesInitialize, ANullConfigurationPathUsesTheCurrentFolder)
     private:
         std::wstring m_folder;
     } info(m_plugins.Text() + L"\\");
-    EXPECT_FALSE(m_services->Initialize(&info, Plugins));
+    EXPECT_FALSE(m_services->Initialize(&info, OrvixProviderSource::Plugins));
     EXPECT_EQ(m_services->GetProviderCount(), 0u) << "the provider settings were not read";
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u) << "the prompts were not read";
-    EXPECT_TRUE(m_services->SetPromptAction(1, 4));
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes) << "the prompts were not read";
+    EXPECT_TRUE(m_services->SetPromptAction(1, Action::No));
     m_services->Shutdown();
-    EXPECT_EQ(SavedPrompts(), PromptsXml({{.id = "1", .action = "4"}}));
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.id = "1", .action = InFile(Action::No)}}));
 }
 
 TEST_F(ServicesInitialize, AnEmptyConfigurationPathMeansTheRootFolder)
 {
-    // One backslash is appended to an empty text as to any other; nothing lies there.
+    // One backslash is appended to an empty path as to any other. The root folder has no such files.
     const CurrentFolder current(m_config.Path());
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     m_info.SetConfigFilePath(L"");
     EXPECT_FALSE(Initialize());
     EXPECT_EQ(m_services->GetPromptAction(1), 0u);
@@ -212,14 +212,14 @@ TEST_F(ServicesInitialize, AConfigurationPathThatEndsInABackslashStillReachesThe
 {
     AddPlugin(L"good");
     WriteProviders("<a><Name>Fake Depot</Name><FixedProjectRoot>root</FixedProjectRoot></a>");
-    WritePrompts({{.id = "1", .action = "2"}});
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
     m_info.SetConfigFilePath((m_config.Text() + L"\\").c_str());
     EXPECT_TRUE(Initialize());
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
     EXPECT_STREQ(m_services->GetProviderFixedProjectRoot(0), L"root");
-    m_services->SetPromptAction(1, 4);
+    m_services->SetPromptAction(1, Action::No);
     m_services->Shutdown();
-    EXPECT_EQ(SavedPrompts(), PromptsXml({{.id = "1", .action = "4"}}));
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.id = "1", .action = InFile(Action::No)}}));
 }
 
 TEST_F(ServicesInitialize, ANullPluginPathFindsNothing)
@@ -227,13 +227,13 @@ TEST_F(ServicesInitialize, ANullPluginPathFindsNothing)
     NamelessClientInfo nameless;
     const TempFolder folder;
     const CurrentFolder current(folder.Path());
-    EXPECT_FALSE(m_services->Initialize(&nameless, Plugins));
+    EXPECT_FALSE(m_services->Initialize(&nameless, OrvixProviderSource::Plugins));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
 TEST_F(ServicesInitialize, ANullRecordDoesNothing)
 {
-    EXPECT_FALSE(m_services->Initialize(nullptr, Plugins | Installed));
+    EXPECT_FALSE(m_services->Initialize(nullptr, OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI));
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
@@ -254,9 +254,9 @@ TEST_F(ServicesInitialize, WorksThroughAHostsOwnRecord)
         std::wstring m_hostPlugins;
     } info(m_config.Text(), m_plugins.Text() + L"\\");
     AddPlugin(L"good");
-    WritePrompts({{.id = "1", .action = "2"}});
-    EXPECT_TRUE(m_services->Initialize(&info, Plugins));
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u);
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
+    EXPECT_TRUE(m_services->Initialize(&info, OrvixProviderSource::Plugins));
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
 }
 
 TEST_F(ServicesShutdown, SavesThePromptsAndReleasesEveryProvider)
@@ -266,14 +266,14 @@ TEST_F(ServicesShutdown, SavesThePromptsAndReleasesEveryProvider)
     EXPECT_TRUE(Initialize());
     EXPECT_TRUE(IsLoaded(good));
     EXPECT_TRUE(IsLoaded(other));
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     m_services->Shutdown();
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
     EXPECT_EQ(m_services->GetProviderName(0), nullptr);
     EXPECT_FALSE(IsLoaded(good));
     EXPECT_FALSE(IsLoaded(other));
-    EXPECT_EQ(SavedPrompts(), PromptsXml({{.action = "2"}}));
-    EXPECT_EQ(m_services->GetPromptAction(1), 2u) << "the table lives as long as the object";
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.action = InFile(Action::Yes)}}));
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes) << "the table lives as long as the object";
 }
 
 TEST_F(ServicesShutdown, AProviderAddedTwiceIsReleasedTwice)
@@ -299,9 +299,9 @@ TEST_F(ServicesShutdown, TheObjectCanBeInitialisedAgain)
 TEST_F(ServicesShutdown, WithoutInitializeSavesIntoTheCurrentFolder)
 {
     const CurrentFolder current(m_config.Path());
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     m_services->Shutdown();
-    EXPECT_EQ(SavedPrompts(), PromptsXml({{.action = "2"}}));
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.action = InFile(Action::Yes)}}));
 }
 
 TEST_F(ServicesShutdown, TwiceIsHarmless)
@@ -313,7 +313,7 @@ TEST_F(ServicesShutdown, TwiceIsHarmless)
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
-TEST_F(ServicesShutdown, NeverHandsAPluginsObjectBackToIt)
+TEST_F(ServicesShutdown, NeverReleasesAPluginsObject)
 {
     AddPlugin(L"good");
     Initialize();
@@ -326,16 +326,16 @@ TEST_F(ServicesDestructor, DoesWhatShutdownDoesWhenInitialised)
 {
     const std::filesystem::path good = AddPlugin(L"good");
     Initialize();
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     m_services.reset();
     EXPECT_FALSE(IsLoaded(good));
-    EXPECT_EQ(SavedPrompts(), PromptsXml({{.action = "2"}}));
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.action = InFile(Action::Yes)}}));
 }
 
 TEST_F(ServicesDestructor, SavesNothingWhenNeverInitialised)
 {
     const CurrentFolder current(m_config.Path());
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     m_services.reset();
     EXPECT_FALSE(std::filesystem::exists(PromptsFile()));
 }
@@ -343,15 +343,15 @@ TEST_F(ServicesDestructor, SavesNothingWhenNeverInitialised)
 TEST_F(ServicesDestructor, SavesASecondTimeOnlyWhenInitializeWasCalledAfterShutdown)
 {
     Initialize();
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     m_services->Shutdown();
     std::filesystem::remove(PromptsFile());
     m_services.reset();
     EXPECT_FALSE(std::filesystem::exists(PromptsFile()));
 
-    m_services.reset(GetIOrvixServices());
+    m_services = MakeOrvixServices();
     Initialize();
-    m_services->RegisterPrompt(1, L"text", 2, 0, false);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
     m_services->Shutdown();
     Initialize();
     std::filesystem::remove(PromptsFile());

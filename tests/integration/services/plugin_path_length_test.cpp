@@ -3,14 +3,13 @@
 namespace
 {
 
-/// How a path is named where it may be longer than the system's usual limit.
+/// The path in a form in which its length has no limit.
 std::filesystem::path Unlimited(const std::wstring& path)
 {
     return L"\\\\?\\" + path;
 }
 
-/// A plug-in folder in which a file name of a few characters, foreign ones among them, makes a path of about
-/// 260 characters.
+/// A plug-in folder in which a short file name with non-ASCII letters makes a path of about 260 characters.
 class PluginPathLength : public ServicesTest
 {
 protected:
@@ -24,7 +23,7 @@ protected:
         m_info.SetProviderPluginPath(m_folder.c_str());
     }
 
-    // Here rather than at the end of the folder, which knows no such paths.
+    // Here rather than in the destructor of the folder, which cannot delete such paths.
     void TearDown() override
     {
         std::error_code ignored;

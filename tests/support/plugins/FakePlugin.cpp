@@ -19,7 +19,7 @@
 #ifndef FAKE_VERSION
 #define FAKE_VERSION 200
 #endif
-#if defined(FAKE_NAME_FOREIGN)
+#if defined(FAKE_NAME_NON_ASCII)
 #define FAKE_NAME L"D\u00E9p\u00F4t \u5009\u5EAB"
 #elif !defined(FAKE_NAME)
 #define FAKE_NAME L"Fake Depot"
