@@ -12,7 +12,7 @@
 #include <utility>
 #include <vector>
 
-/// A bridge to a recording library, which stores `Context` and `m_capabilities` when it is started.
+/// A bridge to a recording library. When it is started, the library gives 0x77 as its context and `m_capabilities`.
 class Bridge : public testing::Test
 {
 protected:
@@ -39,7 +39,7 @@ protected:
         return std::wstring(ORVIX_RECORDING_MSSCCI) + L"\\" + library + L".dll";
     }
 
-    /// Puts a fresh bridge in place of the last one.
+    /// Replaces the bridge by a new one.
     void NewBridge(const std::wstring& library, const wchar_t* searchFolder = nullptr)
     {
         m_bridge = std::make_unique<OrvixMSSCC>();
@@ -68,7 +68,7 @@ protected:
     /// The project's folder as the host names it.
     std::string Project() const { return m_folder.Path().string(); }
 
-    /// What SccOpenProject writes down for the project.
+    /// The call of SccOpenProject for the project.
     std::string OpenCall(const std::string& user, const std::string& projectName, const std::string& auxPath) const
     {
         return "SccOpenProject(0x77, 0x1234, \"" + user + "\", \"" + projectName + "\", \"" + Project() + "\", \"" +
@@ -82,10 +82,10 @@ protected:
                auxPath + "\", 0x1, 0x1)";
     }
 
-    /// The calls since the last time, loading and freeing left out.
+    /// The calls since the last time, without loading and freeing.
     std::vector<std::string> Calls() { return m_recorder.Take(); }
 
-    /// The calls since the last time, loading and freeing included.
+    /// The calls since the last time, with loading and freeing.
     std::vector<std::string> AllCalls() { return std::exchange(m_recorder.calls, {}); }
 
     SccRecorder& m_recorder = *TheSccRecorder();

@@ -4,8 +4,7 @@
 
 #include <windows.h>
 
-/// Another ANSI code page for the conversions of the program's own code and of the host utility library, for as long
-/// as the object lives.
+/// Another ANSI code page, for a scope, in the conversions of the program's own code and of the host utility library.
 class CodePage
 {
 public:
@@ -27,7 +26,7 @@ private:
 
     static UINT Replace(UINT page) { return page == CP_ACP ? s_page : page; }
 
-    /// The function itself, not what the program imports.
+    /// The function of the system, whatever the program imports.
     template <typename Function>
     static Function* System(const char* name)
     {

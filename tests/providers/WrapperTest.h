@@ -2,8 +2,11 @@
 
 #include "OrvixClientInfo.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixMSSCC.h"
+#include "OrvixProviderOption.h"
+#include "OrvixProviderResult.h"
 #include "OrvixProviderWrapper.h"
 #include "OutputHost.h"
 #include "SccRecorder.h"
@@ -16,7 +19,15 @@
 #include <string>
 #include <vector>
 
+namespace Option = OrvixProviderOption;
+namespace Permission = OrvixFilePermission;
+namespace Result = OrvixProviderResult;
+namespace State = OrvixFileState;
+
 using Calls = std::vector<std::string>;
+
+/// A word of options or flags with every bit set.
+inline constexpr unsigned long AllBits = 0xFFFFFFFF;
 
 /// A list whose entries are all active.
 class ActiveList
@@ -70,18 +81,18 @@ protected:
         return bridge;
     }
 
-    /// The host of most tests; it lives as long as the program, since wrappers keep it between tests.
+    /// The host of most tests. It lives as long as the program, since wrappers keep it after a test.
     static OutputHost& Host()
     {
         static OutputHost host;
         return host;
     }
 
-    /// Initialises and opens a project; what the library was called with is forgotten.
+    /// Initialises, opens a project and forgets the calls of the library.
     void Open()
     {
-        ASSERT_EQ(m_wrapper->Initialize(&m_info), 0);
-        ASSERT_EQ(m_wrapper->OpenProject(L"C:\\Project", L""), 0);
+        ASSERT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
+        ASSERT_EQ(m_wrapper->OpenProject(L"C:\\Project", L""), Result::Success);
         m_scc.Take();
         Host() = {};
     }
@@ -91,7 +102,7 @@ protected:
     std::unique_ptr<OrvixProviderWrapper> m_wrapper{new OrvixProviderWrapper};
 };
 
-/// An operation on a list, and the library's function that does it.
+/// An operation on a list, and the function of the library that carries it out.
 struct ListOperation
 {
     const char* name;
@@ -101,7 +112,8 @@ struct ListOperation
 
 inline const ListOperation ListOperations[] = {
     {"CheckIn", "SccCheckin", [](IOrvixProvider& p, OrvixFileList* list) { return p.CheckIn(list, L"", 0); }},
-    {"CheckOut", "SccCheckout", [](IOrvixProvider& p, OrvixFileList* list) { return p.CheckOut(list, L"", 0x2); }},
+    {"CheckOut", "SccCheckout",
+     [](IOrvixProvider& p, OrvixFileList* list) { return p.CheckOut(list, L"", Option::GetLatest); }},
     {"UndoCheckOut", "SccUncheckout", [](IOrvixProvider& p, OrvixFileList* list) { return p.UndoCheckOut(list, 0); }},
     {"GetLatest", "SccGet", [](IOrvixProvider& p, OrvixFileList* list) { return p.GetLatest(list, 0); }},
     {"Add", "SccAdd", [](IOrvixProvider& p, OrvixFileList* list) { return p.Add(list, L"", 0); }},

@@ -9,7 +9,7 @@ using testing::IsEmpty;
 namespace
 {
 
-/// The slots behind the destructor.
+/// The slots after the destructor.
 enum Slot : std::size_t
 {
     GetProviderName,
@@ -64,7 +64,7 @@ protected:
         return CallSlot<Result>(bridge, DestructorSlots + slot, arguments...);
     }
 
-    /// The operation makes this one call, and the function's result is the operation's.
+    /// The operation makes this one call, and returns the result of the function.
     template <typename... Arguments>
     void ExpectCall(const std::string& call, Slot slot, Arguments... arguments)
     {
@@ -83,7 +83,7 @@ protected:
 using BridgeCommandOptions = BridgeCalls;
 using BridgeAddFromScc = BridgeCalls;
 
-TEST_F(BridgeCalls, TellTheNamesAndTheState)
+TEST_F(BridgeCalls, ReportTheNamesAndTheState)
 {
     EXPECT_STREQ(Call<const wchar_t*>(GetProviderName), L"Depot");
     EXPECT_EQ(Call<const wchar_t*>(GetDllPath), LibraryPath(L"recording_full"));
@@ -150,7 +150,7 @@ TEST_F(BridgeCalls, PassNullOn)
     ExpectCall("SccRunScc(0x77, 0x1234, 0x0, null)", RunScc, 0L, NoNames);
 }
 
-TEST_F(BridgeCalls, GoWithoutContextAndWindowBeforeTheyAreThere)
+TEST_F(BridgeCalls, PassNullForContextAndWindowBeforeTheyAreKnown)
 {
     m_bridge->SetParentWindow(nullptr);
     EXPECT_EQ(Call(RunScc, 1L, m_names), SCC_OK);
@@ -174,7 +174,7 @@ TEST_F(BridgeCalls, LetQueryInfoFillTheStatusWords)
     EXPECT_THAT(status, ElementsAre(SCC_STATUS_CONTROLLED, SCC_STATUS_INVALID));
 }
 
-TEST_F(BridgeCalls, LetAddReadTheHostsOwnOptionWords)
+TEST_F(BridgeCalls, PassTheHostsOwnOptionWordsToAdd)
 {
     Start();
     LONG* given = nullptr;
@@ -222,7 +222,7 @@ TEST_F(BridgeCalls, OfReservedOperationsSucceedAndLoadNothing)
     EXPECT_THAT(AllCalls(), IsEmpty());
 }
 
-TEST_F(BridgeCommandOptions, AreAskedForUntilTheLibraryOnceHasSome)
+TEST_F(BridgeCommandOptions, AreAskedForUntilTheLibraryHasThem)
 {
     Start();
     const std::string ask = "SccGetCommandOptions(0x77, 0x1234, 0xa, null)";
@@ -276,7 +276,7 @@ TEST_F(BridgeAddFromScc, IsRefusedWithoutTheCapability)
     EXPECT_THAT(Calls(), IsEmpty());
 }
 
-TEST_F(BridgeAddFromScc, IsRefusedWhenTheHostMayNotNameTheFolder)
+TEST_F(BridgeAddFromScc, IsRefusedWhenTheHostMayNotSetTheFolder)
 {
     m_capabilities = SCC_CAP_ADDFROMSCC;
     Start();
@@ -289,7 +289,7 @@ TEST_F(BridgeAddFromScc, IsRefusedWhenTheHostMayNotNameTheFolder)
     }
 }
 
-TEST_F(BridgeAddFromScc, LetsTheLibraryFillTheHostsPlaces)
+TEST_F(BridgeAddFromScc, LetsTheLibraryFillTheHostsVariables)
 {
     m_capabilities = SCC_CAP_ADDFROMSCC;
     m_recorder.results["SccSetOption"] = SCC_I_SHARESUBPROJOK;

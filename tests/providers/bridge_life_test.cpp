@@ -22,7 +22,7 @@ TEST_F(BridgeInitialize, OfAStartedLibraryCallsNothing)
     EXPECT_THAT(Calls(), IsEmpty());
 }
 
-TEST_F(BridgeInitialize, HandsTheHostsOwnNameOn)
+TEST_F(BridgeInitialize, PassesTheHostsOwnName)
 {
     const std::string name(400, 'h');
     LPCSTR given = nullptr;
@@ -52,7 +52,7 @@ TEST_F(BridgeInitialize, CutsTheProviderNameTo31Bytes)
     }
 }
 
-TEST_F(BridgeInitialize, TakesBackTheNameAndTheAuxiliaryPathLabel)
+TEST_F(BridgeInitialize, KeepsTheNameAndTheAuxiliaryPathLabelOfTheLibrary)
 {
     m_recorder.initialize = [](LPVOID*, HWND, LPCSTR, LPSTR sccName, LPLONG, LPSTR label, LPLONG checkoutLength,
                                LPLONG length) {
@@ -114,7 +114,7 @@ TEST_F(BridgeUninitialize, EndsALibraryThatWasNeverStarted)
                 ElementsAre("load recording_full", "SccGetVersion()", "SccUninitialize(0x0)", "SccUninitialize(0x0)"));
 }
 
-TEST_F(BridgeUninitialize, ClosesAnOpenProjectWhateverThatGives)
+TEST_F(BridgeUninitialize, ClosesAnOpenProjectWhateverTheResult)
 {
     StartAndOpen();
     m_recorder.results["SccCloseProject"] = SCC_E_NONSPECIFICERROR;

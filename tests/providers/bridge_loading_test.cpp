@@ -4,9 +4,11 @@
 #include "Files.h"
 #include "ImportHook.h"
 #include "ProcessDllDirectory.h"
+#include "SccFunctions.h"
 
 #include <algorithm>
 #include <filesystem>
+#include <iterator>
 
 using testing::Contains;
 using testing::ElementsAre;
@@ -18,7 +20,7 @@ namespace
 
 const std::wstring NeededFolder = std::wstring(ORVIX_RECORDING_MSSCCI) + L"\\needed";
 
-/// What the program gives as the folder that it searches for libraries; "none" for null.
+/// The folders that the program sets as DLL directory, in order; "none" for null.
 class GivenDllDirectories
 {
 public:
@@ -45,7 +47,7 @@ private:
     ImportHook m_hook{GetModuleHandleW(nullptr), "SetDllDirectoryW", reinterpret_cast<void*>(&Set)};
 };
 
-/// The functions that the program asks the system for.
+/// Counts the functions that the program looks up in libraries.
 class AskedNames
 {
 public:
@@ -81,33 +83,35 @@ struct Operation
 };
 
 /// In an order in which a host may call them.
-const std::vector<Operation> Operations = {
-    {"SccGetVersion", [](OrvixMSSCC& bridge) { return bridge.GetVersion(); }, 0x00010003},
-    {"SccInitialize", [](OrvixMSSCC& bridge) { return bridge.Initialize("host"); }},
-    {"SccOpenProject", [](OrvixMSSCC& bridge) { return bridge.OpenProject("C:\\p", "", nullptr); }},
-    {"SccGetProjPath",
+const Operation Operations[] = {
+    {SccFunctions::GetVersion.name, [](OrvixMSSCC& bridge) { return bridge.GetVersion(); }, 0x00010003},
+    {SccFunctions::Initialize.name, [](OrvixMSSCC& bridge) { return bridge.Initialize("host"); }},
+    {SccFunctions::OpenProject.name, [](OrvixMSSCC& bridge) { return bridge.OpenProject("C:\\p", "", nullptr); }},
+    {SccFunctions::GetProjPath.name,
      [](OrvixMSSCC& bridge) { return bridge.GetProjPath(nullptr, nullptr, nullptr, nullptr, FALSE); }},
-    {"SccGet", [](OrvixMSSCC& bridge) { return bridge.Get(0, nullptr, 0, nullptr); }},
-    {"SccCheckout", [](OrvixMSSCC& bridge) { return bridge.Checkout(0, nullptr, "", 0, nullptr); }},
-    {"SccUncheckout", [](OrvixMSSCC& bridge) { return bridge.Uncheckout(0, nullptr, 0, nullptr); }},
-    {"SccCheckin", [](OrvixMSSCC& bridge) { return bridge.Checkin(0, nullptr, "", 0, nullptr); }},
-    {"SccAdd", [](OrvixMSSCC& bridge) { return bridge.Add(0, nullptr, "", nullptr, nullptr); }},
-    {"SccBeginBatch", [](OrvixMSSCC& bridge) { return bridge.BeginBatch(); }},
-    {"SccEndBatch", [](OrvixMSSCC& bridge) { return bridge.EndBatch(); }},
-    {"SccHistory", [](OrvixMSSCC& bridge) { return bridge.History(0, nullptr, 0, nullptr); }},
-    {"SccProperties", [](OrvixMSSCC& bridge) { return bridge.Properties(""); }},
-    {"SccQueryInfo", [](OrvixMSSCC& bridge) { return bridge.QueryInfo(0, nullptr, nullptr); }},
-    {"SccPopulateList",
+    {SccFunctions::Get.name, [](OrvixMSSCC& bridge) { return bridge.Get(0, nullptr, 0, nullptr); }},
+    {SccFunctions::Checkout.name, [](OrvixMSSCC& bridge) { return bridge.Checkout(0, nullptr, "", 0, nullptr); }},
+    {SccFunctions::Uncheckout.name, [](OrvixMSSCC& bridge) { return bridge.Uncheckout(0, nullptr, 0, nullptr); }},
+    {SccFunctions::Checkin.name, [](OrvixMSSCC& bridge) { return bridge.Checkin(0, nullptr, "", 0, nullptr); }},
+    {SccFunctions::Add.name, [](OrvixMSSCC& bridge) { return bridge.Add(0, nullptr, "", nullptr, nullptr); }},
+    {SccFunctions::BeginBatch.name, [](OrvixMSSCC& bridge) { return bridge.BeginBatch(); }},
+    {SccFunctions::EndBatch.name, [](OrvixMSSCC& bridge) { return bridge.EndBatch(); }},
+    {SccFunctions::History.name, [](OrvixMSSCC& bridge) { return bridge.History(0, nullptr, 0, nullptr); }},
+    {SccFunctions::Properties.name, [](OrvixMSSCC& bridge) { return bridge.Properties(""); }},
+    {SccFunctions::QueryInfo.name, [](OrvixMSSCC& bridge) { return bridge.QueryInfo(0, nullptr, nullptr); }},
+    {SccFunctions::PopulateList.name,
      [](OrvixMSSCC& bridge) {
          return bridge.PopulateList(SCC_COMMAND_OPTIONS, 0, nullptr, nullptr, nullptr, nullptr, 0);
      }},
-    {"SccRunScc", [](OrvixMSSCC& bridge) { return bridge.RunScc(0, nullptr); }},
-    {"SccGetCommandOptions", [](OrvixMSSCC& bridge) { return bridge.GetCommandOptions(); }, SCC_I_ADV_SUPPORT},
-    {"SccSetOption", [](OrvixMSSCC& bridge) { return bridge.SetOption(1, 1); }, SCC_I_SHARESUBPROJOK},
-    {"SccAddFromScc", [](OrvixMSSCC& bridge) { return bridge.AddFromScc(nullptr, nullptr); }},
-    {"SccCloseProject", [](OrvixMSSCC& bridge) { return bridge.CloseProject(); }},
-    {"SccUninitialize", [](OrvixMSSCC& bridge) { return bridge.Uninitialize(); }},
+    {SccFunctions::RunScc.name, [](OrvixMSSCC& bridge) { return bridge.RunScc(0, nullptr); }},
+    {SccFunctions::GetCommandOptions.name, [](OrvixMSSCC& bridge) { return bridge.GetCommandOptions(); },
+     SCC_I_ADV_SUPPORT},
+    {SccFunctions::SetOption.name, [](OrvixMSSCC& bridge) { return bridge.SetOption(1, 1); }, SCC_I_SHARESUBPROJOK},
+    {SccFunctions::AddFromScc.name, [](OrvixMSSCC& bridge) { return bridge.AddFromScc(nullptr, nullptr); }},
+    {SccFunctions::CloseProject.name, [](OrvixMSSCC& bridge) { return bridge.CloseProject(); }},
+    {SccFunctions::Uninitialize.name, [](OrvixMSSCC& bridge) { return bridge.Uninitialize(); }},
 };
+static_assert(std::size(Operations) == std::size(SccFunctions::Names), "every function has its operation");
 
 class BridgeLoading : public Bridge
 {
@@ -165,7 +169,7 @@ TEST_F(BridgeLoading, IsNotCausedByAddFromSccOrCloseProjectBeforeTheyHaveWork)
     EXPECT_THAT(AllCalls(), IsEmpty());
 }
 
-TEST_F(BridgeLoading, GivesTheNamesOfSetProviderAndAStateOfNothingDone)
+TEST_F(BridgeLoading, ReportsTheNamesOfSetProviderAndThatNothingIsDoneYet)
 {
     EXPECT_STREQ(m_bridge->GetProviderName(), L"Depot");
     EXPECT_EQ(m_bridge->GetDllPath(), LibraryPath(L"recording_full"));
@@ -174,7 +178,7 @@ TEST_F(BridgeLoading, GivesTheNamesOfSetProviderAndAStateOfNothingDone)
     EXPECT_THAT(AllCalls(), IsEmpty());
 }
 
-TEST_F(BridgeLoading, AtOnceTellsWhetherTheLibraryLoaded)
+TEST_F(BridgeLoading, AtOnceReportsWhetherTheLibraryLoaded)
 {
     OrvixMSSCC bridge;
     EXPECT_TRUE(bridge.SetProvider(LibraryPath(L"recording_full").c_str(), nullptr, L"Depot", true));
@@ -239,13 +243,13 @@ TEST_F(BridgeLoading, FindsWhatTheLibraryNeedsInTheSearchFolder)
     EXPECT_EQ(m_bridge->Initialize("host"), SCC_E_INITIALIZEFAILED);
 }
 
-TEST_F(BridgeLoading, KeepsTheSearchFolderWhenSetProviderNamesNone)
+TEST_F(BridgeLoading, KeepsTheSearchFolderWhenSetProviderHasNone)
 {
     NewBridge(L"recording_dependent", NeededFolder.c_str());
     EXPECT_TRUE(m_bridge->SetProvider(LibraryPath(L"recording_dependent").c_str(), nullptr, L"Depot", true));
 }
 
-TEST_F(BridgeDllDirectory, IsTheSearchFolderDuringTheLoadAndAsBeforeAfterwards)
+TEST_F(BridgeDllDirectory, IsTheSearchFolderDuringTheLoadAndIsRestored)
 {
     const ProcessDllDirectory process(L"C:\\some folder");
     NewBridge(L"recording_full", NeededFolder.c_str());

@@ -25,7 +25,7 @@ public:
         s_remaining = n;
     }
 
-    /// Whether the allocation that was to fail was asked for.
+    /// Whether the failing allocation was reached.
     static bool WasMet() { return s_remaining <= 0; }
 
 private:

@@ -19,7 +19,7 @@ LONG TextOutput(LPCSTR, LONG)
     return 0;
 }
 
-TEST_F(BridgeOpenProject, HandsTheHostsArgumentsOn)
+TEST_F(BridgeOpenProject, PassesTheHostsArguments)
 {
     Start();
     const std::string folder = Project();
@@ -37,7 +37,7 @@ TEST_F(BridgeOpenProject, HandsTheHostsArgumentsOn)
     EXPECT_EQ(Calls().size(), 1u);
 }
 
-TEST_F(BridgeOpenProject, HandsNullOn)
+TEST_F(BridgeOpenProject, PassesNull)
 {
     Start();
     m_bridge->SetProjectSettingsFile(L"settings.xml");
@@ -46,7 +46,7 @@ TEST_F(BridgeOpenProject, HandsNullOn)
     EXPECT_THAT(Calls(), ElementsAre("SccOpenProject(0x77, 0x1234, \"\", \"\", null, \"\", null, 0x1)"));
 }
 
-TEST_F(BridgeOpenProject, TakesBackTheUserAndTheAuxiliaryPath)
+TEST_F(BridgeOpenProject, KeepsTheUserAndTheAuxiliaryPathOfTheLibrary)
 {
     Start();
     m_recorder.openProject = [](LPVOID, HWND, LPSTR user, LPCSTR, LPCSTR, LPSTR auxPath, LPCSTR, LPTEXTOUTPROC, LONG) {
@@ -60,7 +60,7 @@ TEST_F(BridgeOpenProject, TakesBackTheUserAndTheAuxiliaryPath)
     EXPECT_THAT(Calls(), ElementsAre(OpenCall("", "", ""), "SccCloseProject(0x77)", OpenCall("ada", "", "server")));
 }
 
-TEST_F(BridgeOpenProject, ThatFailsTakesNothingBack)
+TEST_F(BridgeOpenProject, ThatFailsKeepsNoText)
 {
     Start();
     m_recorder.openProject = [](LPVOID, HWND, LPSTR user, LPCSTR, LPCSTR, LPSTR auxPath, LPCSTR, LPTEXTOUTPROC, LONG) {
@@ -85,7 +85,7 @@ TEST_F(BridgeOpenProject, WithAPositiveResultHasNotOpenedIt)
     EXPECT_THAT(Calls(), ElementsAre(OpenCall("", "", "")));
 }
 
-TEST_F(BridgeOpenProject, ClosesTheOpenOneFirstWhateverThatGives)
+TEST_F(BridgeOpenProject, ClosesTheOpenOneFirstWhateverTheResult)
 {
     StartAndOpen();
     m_recorder.results["SccCloseProject"] = SCC_E_NONSPECIFICERROR;
@@ -96,7 +96,7 @@ TEST_F(BridgeOpenProject, ClosesTheOpenOneFirstWhateverThatGives)
     EXPECT_FALSE(m_bridge->IsProjectOpen());
 }
 
-TEST_F(BridgeOpenProject, ThatIsRefusedForItsTextsAsksForNewOnesAndTriesTheOldOnesAgain)
+TEST_F(BridgeOpenProject, ThatIsRefusedForItsTextsLetsTheUserChooseAndTriesTheOldTextsAgain)
 {
     Start();
     int attempts = 0;
@@ -127,7 +127,7 @@ TEST_F(BridgeOpenProject, ThatIsRefusedForItsTextsAsksForNewOnesAndTriesTheOldOn
     ASSERT_EQ(buffers.size(), 6u);
     EXPECT_TRUE(std::equal(buffers.begin(), buffers.begin() + 3, buffers.begin() + 3));
 
-    // What the successful attempt left counts for the user and the auxiliary path, what was chosen for the rest.
+    // User and auxiliary path are those of the successful attempt, the other texts are the chosen ones.
     m_recorder.getProjPath = nullptr;
     EXPECT_EQ(m_bridge->GetProjPath(nullptr, nullptr, nullptr, nullptr, TRUE), SCC_OK);
     EXPECT_THAT(Calls(), ElementsAre(GetProjPathCall("first", "$/song", "C:\\song", "try")));
@@ -173,7 +173,7 @@ TEST_F(BridgeCloseProject, WithoutOneOpenFailsAndLoadsNothing)
     EXPECT_THAT(AllCalls(), IsEmpty());
 }
 
-TEST_F(BridgeCloseProject, HasClosedItWhateverTheLibraryGives)
+TEST_F(BridgeCloseProject, HasClosedItWhateverTheResult)
 {
     StartAndOpen();
     m_recorder.results["SccCloseProject"] = SCC_E_NONSPECIFICERROR;
@@ -192,7 +192,7 @@ TEST_F(BridgeCloseProject, HasClosedItWhenTheLibraryThrows)
     EXPECT_FALSE(m_bridge->IsProjectOpen());
 }
 
-TEST_F(BridgeGetProjPath, LetsTheLibraryMakeANewProjectAndWritesNoneOfTheHostsPlaces)
+TEST_F(BridgeGetProjPath, LetsTheLibraryMakeANewProjectAndWritesToNoTextOfTheHost)
 {
     Start();
     for (const BOOL allow : {TRUE, FALSE})

@@ -24,7 +24,7 @@ protected:
 
     void Write(const std::string& xml) const { WriteBytes(Path(), xml); }
 
-    /// The file without line ends, which are the XML service's choice.
+    /// The file without line ends, which the XML service chooses.
     std::string Content() const
     {
         std::string xml = ReadBytes(Path());
@@ -38,7 +38,7 @@ protected:
                "</AuxPath><ProjectName>" + projectName + "</ProjectName></MSSCCProjectSettings>";
     }
 
-    /// The library chooses these when it opens a project: the project name by way of SccGetProjPath.
+    /// The library chooses these texts in SccGetProjPath.
     void Choose(const std::string& auxPath, const std::string& projectName)
     {
         m_recorder.getProjPath = [=](LPVOID, HWND, LPSTR, LPSTR name, LPSTR, LPSTR path, BOOL, LPBOOL) {
@@ -50,8 +50,8 @@ protected:
         m_recorder.calls.clear();
     }
 
-    /// Opens a project beside this file with "old" as auxiliary path and "name" as project name; what the library is
-    /// handed tells what was read.
+    /// Opens a project with "old" as auxiliary path and "name" as project name beside this file. The texts that the
+    /// library gets then show what was read.
     void ExpectRead(const std::string& xml, const std::string& auxPath, const std::string& projectName)
     {
         SCOPED_TRACE(xml.substr(0, 200));
@@ -91,7 +91,7 @@ TEST_F(SettingsFileReading, TakesTheLastOfSeveral)
                "b", "d");
 }
 
-TEST_F(SettingsFileReading, PassesOverEverythingElse)
+TEST_F(SettingsFileReading, IgnoresEverythingElse)
 {
     ExpectRead("<?xml version=\"1.0\"?><!-- c --><?other pi?><MSSCCProjectSettings><!-- c --><Path>x</Path>text"
                "<AuxPathName>y</AuxPathName><AuxPath>a</AuxPath><Deeper><ProjectName>z</ProjectName></Deeper>"
@@ -99,14 +99,14 @@ TEST_F(SettingsFileReading, PassesOverEverythingElse)
                "a", "name");
 }
 
-TEST_F(SettingsFileReading, FindsARootBehindOtherNodes)
+TEST_F(SettingsFileReading, FindsARootAfterOtherNodes)
 {
     ExpectRead("<?xml version=\"1.0\"?><!-- first --><!-- second --><MSSCCProjectSettings><AuxPath>a</AuxPath>"
                "</MSSCCProjectSettings><!-- last -->",
                "a", "name");
 }
 
-TEST_F(SettingsFileReading, FindsTheRootBehindADocumentTypeThatNothingRefersTo)
+TEST_F(SettingsFileReading, FindsTheRootAfterADocumentTypeThatNothingRefersTo)
 {
     for (const char* type :
          {"<!DOCTYPE MSSCCProjectSettings>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
@@ -167,7 +167,7 @@ TEST_F(SettingsFileReading, CountsEvenWhenTheProjectDoesNotOpen)
     EXPECT_THAT(Calls(), ElementsAre(OpenCall("", "$/song", "server"), OpenCall("", "$/song", "server")));
 }
 
-TEST_F(SettingsFileReading, HappensNotForALibraryThatCannotOpenProjects)
+TEST_F(SettingsFileReading, DoesNotHappenForALibraryThatCannotOpenProjects)
 {
     NewBridge(L"recording_without_SccOpenProject");
     m_bridge->SetProjectSettingsFile(L"settings.xml");
@@ -178,7 +178,7 @@ TEST_F(SettingsFileReading, HappensNotForALibraryThatCannotOpenProjects)
     EXPECT_THAT(Calls(), ElementsAre(GetProjPathCall("", "", "", "")));
 }
 
-TEST_F(SettingsFileReading, LeavesTheFileFree)
+TEST_F(SettingsFileReading, ClosesTheFile)
 {
     Write(Shape("server", "$/song"));
     StartAndOpen();
@@ -199,7 +199,7 @@ TEST_F(SettingsFileWriting, OfEmptyTextsKeepsTheElements)
     EXPECT_EQ(Content(), Shape("", ""));
 }
 
-TEST_F(SettingsFileWriting, KeepsWhatTheLibraryGaveForTheNextRun)
+TEST_F(SettingsFileWriting, KeepsTheTextsOfTheLibraryForTheNextRun)
 {
     Start();
     m_recorder.openProject = [](LPVOID, HWND, LPSTR, LPCSTR, LPCSTR, LPSTR auxPath, LPCSTR, LPTEXTOUTPROC, LONG) {
@@ -216,7 +216,7 @@ TEST_F(SettingsFileWriting, KeepsWhatTheLibraryGaveForTheNextRun)
     EXPECT_THAT(Calls(), ElementsAre(OpenCall("", "", "given")));
 }
 
-TEST_F(SettingsFileWriting, ReplacesAnEarlierFileWhole)
+TEST_F(SettingsFileWriting, ReplacesAnEarlierFileCompletely)
 {
     Write("<MSSCCProjectSettings><AuxPath>a</AuxPath><Other>lost</Other></MSSCCProjectSettings>");
     StartAndOpen();
@@ -272,7 +272,7 @@ TEST_F(SettingsFileWriting, DoesNotFollowAFailedOpening)
     EXPECT_TRUE(std::filesystem::is_empty(m_folder.Path()));
 }
 
-TEST_F(SettingsFileWriting, AndReadingHappenNotWithoutAName)
+TEST_F(SettingsFileWriting, AndReadingDoNotHappenWithoutAName)
 {
     m_bridge->SetProjectSettingsFile({});
     Write(Shape("server", "$/song"));
@@ -306,7 +306,7 @@ TEST_F(SettingsFileWriting, ThatFailsIsSilent)
     EXPECT_TRUE(std::filesystem::is_empty(Path()));
 }
 
-TEST_F(SettingsFileWriting, InAFolderThatEndsWithABackslashGoesThereAsWell)
+TEST_F(SettingsFileWriting, WorksForAFolderThatEndsWithABackslash)
 {
     Start();
     EXPECT_EQ(m_bridge->OpenProject((Project() + "\\").c_str(), "comment", nullptr), SCC_OK);
@@ -316,7 +316,7 @@ TEST_F(SettingsFileWriting, InAFolderThatEndsWithABackslashGoesThereAsWell)
     EXPECT_THAT(Calls().back(), HasSubstr("\"server\""));
 }
 
-TEST_F(SettingsFileWriting, GoesToAFolderWithForeignLetters)
+TEST_F(SettingsFileWriting, GoesToAFolderWithANonAsciiName)
 {
     const CodePage western(Western);
     const std::filesystem::path folder = m_folder.Path() / L"r\u00e9sum\u00e9";

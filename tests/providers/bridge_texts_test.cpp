@@ -1,4 +1,4 @@
-// Texts that are cut, and libraries that use the whole of what the interface lets them write.
+// Texts that are cut, and libraries that write as much as the interface lets them.
 
 #include "Bridge.h"
 #include "CodePage.h"
@@ -44,7 +44,7 @@ protected:
 
     std::string Settings() const { return ReadBytes(m_folder.Path() / L"settings.xml"); }
 
-    /// From now on the library does this to each text that it may write while it opens a project.
+    /// From now on the library does this with each text that it may write in SccOpenProject.
     void WriteInOpenProject(const std::function<void(char* text)>& write)
     {
         m_recorder.openProject = [write](LPVOID, HWND, LPSTR user, LPCSTR, LPCSTR, LPSTR auxPath, LPCSTR, LPTEXTOUTPROC,
@@ -55,7 +55,7 @@ protected:
         };
     }
 
-    /// The same for the choice of a project.
+    /// The same for SccGetProjPath.
     void WriteInGetProjPath(const std::function<void(char* text)>& write)
     {
         m_recorder.getProjPath = [write](LPVOID, HWND, LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath,
@@ -70,7 +70,7 @@ protected:
 
     SCCRTN Choose() { return m_bridge->GetProjPath(nullptr, nullptr, nullptr, nullptr, TRUE); }
 
-    /// What the bridge hands over for the choice of a project.
+    /// The call of SccGetProjPath when the user chooses a project.
     std::string Choice()
     {
         m_recorder.getProjPath = nullptr;
@@ -82,7 +82,7 @@ protected:
 
 using BridgeWildLibrary = BridgeTexts;
 
-TEST_F(BridgeTexts, HandTheFirst31BytesOfTheAuxiliaryPathAndTheWholeProjectName)
+TEST_F(BridgeTexts, PassTheFirst31BytesOfTheAuxiliaryPathAndTheWholeProjectName)
 {
     WriteSettings(std::string(32, 'a'), std::string(260, 'p'));
     Start();
@@ -109,7 +109,7 @@ TEST_F(BridgeTexts, DropTheRestOfACutAuxiliaryPathThatComesBackShorter)
     EXPECT_THAT(Settings(), HasSubstr("<AuxPath>new</AuxPath>"));
 }
 
-TEST_F(BridgeTexts, LeaveNothingOfALongerOneBehind)
+TEST_F(BridgeTexts, LeaveNothingOfALongerOne)
 {
     WriteSettings(std::string(50, 'a'), "song");
     Start();
@@ -120,7 +120,7 @@ TEST_F(BridgeTexts, LeaveNothingOfALongerOneBehind)
     EXPECT_THAT(Settings(), HasSubstr("<AuxPath>" + std::string(31, 'o') + "</AuxPath>"));
 }
 
-TEST_F(BridgeTexts, AreTakenBackUpToTheirOwnLimits)
+TEST_F(BridgeTexts, AreReadUpToTheirOwnLimits)
 {
     Start();
     WriteInGetProjPath([](char* text) { std::strcpy(text, std::string(300, 'x').c_str()); });
@@ -132,7 +132,7 @@ TEST_F(BridgeTexts, AreTakenBackUpToTheirOwnLimits)
     EXPECT_THAT(Calls(), ElementsAre(OpenCall(std::string(31, 'x'), std::string(260, 'x'), std::string(31, 'x'))));
 }
 
-TEST_F(BridgeTexts, AreWrittenToTheSettingsFileAsFarAsTheyWereTakenBack)
+TEST_F(BridgeTexts, AreWrittenToTheSettingsFileAsFarAsTheyWereRead)
 {
     m_recorder.initialize = [](LPVOID*, HWND, LPCSTR, LPSTR, LPLONG, LPSTR label, LPLONG, LPLONG) {
         std::strcpy(label, std::string(40, 'l').c_str());
@@ -158,7 +158,7 @@ TEST_F(BridgeTexts, AreWrittenToTheSettingsFileAsFarAsTheyWereTakenBack)
     EXPECT_THAT(Settings(), HasSubstr("<ProjectName>" + std::string(260, 'x') + "</ProjectName>"));
 }
 
-TEST_F(BridgeTexts, GoOverAsAnsiAndComeBackAsWide)
+TEST_F(BridgeTexts, ArePassedAsAnsiAndReadAsWide)
 {
     const CodePage shiftJis(ShiftJis);
     WriteSettings(KanaUtf8, Repeat(KanaUtf8, 2));
@@ -254,7 +254,7 @@ TEST_F(BridgeWildLibrary, MayFillTheTextsOfItsStart)
     }
 }
 
-TEST_F(BridgeWildLibrary, MayWriteIntoTheProjectNameOfOpenProjectToNoEffect)
+TEST_F(BridgeWildLibrary, MayWriteIntoTheProjectNameOfOpenProjectWithoutEffect)
 {
     Start();
     m_recorder.openProject = [](LPVOID, HWND, LPSTR, LPCSTR projectName, LPCSTR, LPSTR, LPCSTR, LPTEXTOUTPROC, LONG) {
@@ -277,7 +277,7 @@ TEST_F(BridgeWildLibrary, MayFillTheLocalPathOfOpenProjectUpToItsMaximum)
     EXPECT_EQ(folder, "C:\\p");
 }
 
-TEST_F(BridgeWildLibrary, FindsTheProjectNameThatItWroteInTheSecondAttempt)
+TEST_F(BridgeWildLibrary, GetsTheProjectNameThatItWroteInTheSecondAttempt)
 {
     Start();
     int attempts = 0;

@@ -32,7 +32,7 @@ TEST(NarrowBufferText, IsInTheAnsiCodePage)
     EXPECT_EQ(Narrow(L"r\u00e9sum\u00e9 \u20ac", NarrowBuffer::Unlimited), "r\xe9sum\xe9 \x80");
 }
 
-TEST(NarrowBufferText, LosesWhatTheCodePageLacks)
+TEST(NarrowBufferText, LosesCharactersThatTheCodePageDoesNotHave)
 {
     const CodePage western(Western);
     EXPECT_EQ(Narrow(L"a\u5009b", NarrowBuffer::Unlimited), "a?b");
@@ -63,7 +63,7 @@ TEST(NarrowBufferText, IsCutBeforeACharacterOfTwoBytesThatTheLimitWouldSplit)
 TEST(NarrowBufferText, EndsAtTheCharacterThatDoesNotFit)
 {
     const CodePage shiftJis(ShiftJis);
-    EXPECT_EQ(Narrow(L"ab\u30bdcd", 3), "ab"); // the letter behind it would fit
+    EXPECT_EQ(Narrow(L"ab\u30bdcd", 3), "ab"); // the letter after it would fit
 }
 
 TEST(NarrowBufferText, KeepsPairsOfSurrogatesWhole)
@@ -92,7 +92,7 @@ TEST(NarrowBufferText, OfMoreBytesThanTheMemoryHoldsIsCut)
     EXPECT_EQ(Narrow(L"ab" + std::wstring(400, L'\u30bd'), NarrowBuffer::Unlimited).size(), 2u + 3 * 346);
 }
 
-TEST(NarrowBufferMemory, HoldsTheLongestTextOfTheInterfaceAndIsZeroBehindTheText)
+TEST(NarrowBufferMemory, HoldsTheLongestTextOfTheInterfaceAndIsZeroAfterTheText)
 {
     static_assert(sizeof(NarrowBuffer) >= 301 + 1);
     NarrowBuffer buffer(L"abc", 31);

@@ -19,7 +19,7 @@ class WrapperOperation : public WrapperTest, public testing::WithParamInterface<
 {
 };
 
-/// Every code that the interface knows, and the two ends of the number.
+/// Every code of the interface, and the smallest and the greatest number.
 std::vector<SCCRTN> CodesOtherThanOK()
 {
     std::vector<SCCRTN> codes = {LONG_MIN, LONG_MAX};
@@ -35,7 +35,7 @@ std::vector<SCCRTN> CodesOtherThanOK()
 
 } // namespace
 
-TEST_F(Wrapper, NameIsTheBridgesAndNothingIsLoadedForIt)
+TEST_F(Wrapper, NameIsThatOfTheBridgeAndLoadsNothing)
 {
     EXPECT_STREQ(m_wrapper->GetName(), L"Recorded");
     EXPECT_FALSE(m_wrapper->IsInitialized());
@@ -45,15 +45,15 @@ TEST_F(Wrapper, NameIsTheBridgesAndNothingIsLoadedForIt)
 
 TEST_F(Wrapper, LifeIsTheLibrarysLife)
 {
-    EXPECT_EQ(m_wrapper->Initialize(&m_info), 0);
+    EXPECT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
     EXPECT_TRUE(m_wrapper->IsInitialized());
     EXPECT_FALSE(m_wrapper->IsProjectOpen());
-    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\Project", L"a comment"), 0);
+    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\Project", L"a comment"), Result::Success);
     EXPECT_TRUE(m_wrapper->IsProjectOpen());
-    EXPECT_EQ(m_wrapper->CloseProject(), 0);
+    EXPECT_EQ(m_wrapper->CloseProject(), Result::Success);
     EXPECT_FALSE(m_wrapper->IsProjectOpen());
     EXPECT_TRUE(m_wrapper->IsInitialized());
-    EXPECT_EQ(m_wrapper->Uninitialize(), 0);
+    EXPECT_EQ(m_wrapper->Uninitialize(), Result::Success);
     EXPECT_FALSE(m_wrapper->IsInitialized());
     EXPECT_THAT(m_scc.calls, ElementsAre("load recording_full", "SccGetVersion()",
                                          R"(SccInitialize(0x0, 0x1234, "Test host", "Recorded", ""))",
@@ -65,15 +65,15 @@ TEST_F(Wrapper, InitializeOfAnInitialisedLibraryOnlyTakesTheWindow)
 {
     Open();
     m_info.SetParentWindow(nullptr);
-    EXPECT_EQ(m_wrapper->Initialize(&m_info), 0);
+    EXPECT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
-    EXPECT_EQ(m_wrapper->RunProviderClient(), 0);
+    EXPECT_EQ(m_wrapper->RunProviderClient(), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre("SccRunScc(0x77, 0x0, 0x0, null)"));
 }
 
 TEST_F(Wrapper, InitializeWithoutInfoFailsAndSendsNothing)
 {
-    EXPECT_EQ(m_wrapper->Initialize(nullptr), -1);
+    EXPECT_EQ(m_wrapper->Initialize(nullptr), Result::Failure);
     EXPECT_THAT(m_scc.calls, IsEmpty());
 }
 
@@ -83,30 +83,30 @@ TEST_F(Wrapper, InitializeAcceptsEveryCapabilityBit)
         *capabilities = static_cast<LONG>(0x80000000);
         return SCC_OK;
     };
-    EXPECT_EQ(m_wrapper->Initialize(&m_info), 0);
+    EXPECT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
     EXPECT_TRUE(m_wrapper->IsInitialized());
 }
 
-TEST_F(Wrapper, CheckInHandsOverPathsCommentAndKeepOption)
+TEST_F(Wrapper, CheckInPassesPathsCommentAndKeepOption)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b"};
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", 0x1), 0);
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", 0xFFFFFFFF), 0);
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", 0), 0);
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", 0xFFFFFFFE), 0);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", Option::KeepCheckedOut), Result::Success);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", AllBits), Result::Success);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", 0), Result::Success);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"why", ~Option::KeepCheckedOut), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccCheckin(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "why", 0x1000, 0x0))",
                                           R"(SccCheckin(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "why", 0x1000, 0x0))",
                                           R"(SccCheckin(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "why", 0x0, 0x0))",
                                           R"(SccCheckin(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "why", 0x0, 0x0))"));
 }
 
-TEST_F(Wrapper, CheckOutHandsOverPathsAndComment)
+TEST_F(Wrapper, CheckOutPassesPathsAndComment)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b"};
-    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"why", 0), 0);
-    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"why", 0xFFFFFFFD), 0);
+    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"why", 0), Result::Success);
+    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"why", ~Option::GetLatest), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccCheckout(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "why", 0x0, 0x0))",
                                           R"(SccCheckout(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "why", 0x0, 0x0))"));
 }
@@ -115,28 +115,28 @@ TEST_F(Wrapper, CheckOutGetsFirstWhenAskedTo)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b"};
-    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"why", 0x2), 0);
+    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"why", Option::GetLatest), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccGet(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))",
                                           R"(SccCheckout(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "why", 0x0, 0x0))"));
 }
 
-TEST_F(Wrapper, CheckOutGoesOnAfterAFailedGetAndAnswersForItselfAlone)
+TEST_F(Wrapper, CheckOutGoesOnAfterAFailedGetAndReturnsItsOwnResult)
 {
     Open();
     ActiveList list{L"C:\\a"};
-    m_scc.results = {{"SccGet", -8}};
-    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"", 0x2), 0);
+    m_scc.results = {{"SccGet", SCC_E_ACCESSFAILURE}};
+    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"", Option::GetLatest), Result::Success);
     EXPECT_EQ(m_scc.Take().size(), 2u);
-    m_scc.results = {{"SccCheckout", -5}};
-    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"", 0x2), -1);
+    m_scc.results = {{"SccCheckout", SCC_E_NONSPECIFICERROR}};
+    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"", Option::GetLatest), Result::Failure);
 }
 
-TEST_F(Wrapper, UndoCheckOutHandsOverPaths)
+TEST_F(Wrapper, UndoCheckOutPassesPaths)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b"};
-    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), 0), 0);
-    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), 0xFFFFFFFD), 0);
+    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), 0), Result::Success);
+    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), ~Option::GetLatest), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccUncheckout(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))",
                                           R"(SccUncheckout(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))"));
 }
@@ -145,49 +145,49 @@ TEST_F(Wrapper, UndoCheckOutGetsAfterwardsWhenAskedTo)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b"};
-    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), 0x2), 0);
+    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), Option::GetLatest), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccUncheckout(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))",
                                           R"(SccGet(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))"));
 }
 
-TEST_F(Wrapper, UndoCheckOutAnswersForTheGetThatFollows)
+TEST_F(Wrapper, UndoCheckOutReturnsTheResultOfTheGetThatFollows)
 {
     Open();
     ActiveList list{L"C:\\a"};
-    m_scc.results = {{"SccUncheckout", -4}};
-    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), 0x2), 0);
+    m_scc.results = {{"SccUncheckout", SCC_E_NOTCHECKEDOUT}};
+    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), Option::GetLatest), Result::Success);
     EXPECT_EQ(m_scc.Take().size(), 2u);
-    m_scc.results = {{"SccGet", -8}};
-    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), 0x2), -1);
+    m_scc.results = {{"SccGet", SCC_E_ACCESSFAILURE}};
+    EXPECT_EQ(m_wrapper->UndoCheckOut(list.Get(), Option::GetLatest), Result::Failure);
 }
 
 TEST_F(Wrapper, GetLatestIgnoresItsOptions)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b"};
-    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), 0);
-    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0xFFFFFFFF), 0);
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), Result::Success);
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), AllBits), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccGet(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))",
                                           R"(SccGet(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))"));
 }
 
-TEST_F(Wrapper, AddGivesEveryFileItsOptionWord)
+TEST_F(Wrapper, AddPassesAnOptionWordForEachFile)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b", L"C:\\c"};
-    EXPECT_EQ(m_wrapper->Add(list.Get(), L"new", 0x1), 0);
-    EXPECT_EQ(m_wrapper->Add(list.Get(), L"new", 0xFFFFFFFE), 0);
+    EXPECT_EQ(m_wrapper->Add(list.Get(), L"new", Option::KeepCheckedOut), Result::Success);
+    EXPECT_EQ(m_wrapper->Add(list.Get(), L"new", ~Option::KeepCheckedOut), Result::Success);
     EXPECT_THAT(
         m_scc.Take(),
         ElementsAre(R"(SccAdd(0x77, 0x1234, 0x3, ["C:\a", "C:\b", "C:\c"], "new", [0x1000, 0x1000, 0x1000], 0x0))",
                     R"(SccAdd(0x77, 0x1234, 0x3, ["C:\a", "C:\b", "C:\c"], "new", [0x0, 0x0, 0x0], 0x0))"));
 }
 
-TEST_F(Wrapper, ShowHistoryHandsOverPaths)
+TEST_F(Wrapper, ShowHistoryPassesPaths)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b"};
-    EXPECT_EQ(m_wrapper->ShowHistory(list.Get()), 0);
+    EXPECT_EQ(m_wrapper->ShowHistory(list.Get()), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccHistory(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))"));
 }
 
@@ -196,38 +196,38 @@ TEST_F(Wrapper, ShowPropertiesShowsTheFirstActiveFileAlone)
     Open();
     ActiveList list{L"C:\\inactive", L"C:\\b", L"C:\\c", L"C:\\\u5009"};
     list->RemoveActiveEntry(list->GetFileEntry(0));
-    EXPECT_EQ(m_wrapper->ShowProperties(list.Get()), 0);
+    EXPECT_EQ(m_wrapper->ShowProperties(list.Get()), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(R"(SccProperties(0x77, 0x1234, "C:\b"))"));
 }
 
-TEST_F(Wrapper, ShowOptionsShowsTheOptionsOfALibraryThatHasSome)
+TEST_F(Wrapper, ShowOptionsShowsTheOptionsOfALibraryThatHasThem)
 {
     Open();
     m_scc.getCommandOptions = [](LPVOID, HWND, SCCCOMMAND, LPCMDOPTS* block) {
         return block != nullptr ? SCC_OK : SCC_I_ADV_SUPPORT;
     };
-    EXPECT_EQ(m_wrapper->ShowOptions(), 0);
+    EXPECT_EQ(m_wrapper->ShowOptions(), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre("SccGetCommandOptions(0x77, 0x1234, 0xa, null)",
                                           "SccGetCommandOptions(0x77, 0x1234, 0xa, block 0x0)"));
     m_scc.getCommandOptions = [](LPVOID, HWND, SCCCOMMAND, LPCMDOPTS*) { return SCC_I_OPERATIONCANCELED; };
-    EXPECT_EQ(m_wrapper->ShowOptions(), -1);
+    EXPECT_EQ(m_wrapper->ShowOptions(), Result::Failure);
 }
 
 TEST_F(Wrapper, ShowOptionsFailsForALibraryThatHasNone)
 {
     Open();
-    EXPECT_EQ(m_wrapper->ShowOptions(), -1);
+    EXPECT_EQ(m_wrapper->ShowOptions(), Result::Failure);
     EXPECT_THAT(m_scc.Take(), ElementsAre("SccGetCommandOptions(0x77, 0x1234, 0xa, null)"));
 }
 
-TEST_F(Wrapper, RunProviderClientNamesNoFiles)
+TEST_F(Wrapper, RunProviderClientPassesNoFiles)
 {
     Open();
-    EXPECT_EQ(m_wrapper->RunProviderClient(), 0);
+    EXPECT_EQ(m_wrapper->RunProviderClient(), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre("SccRunScc(0x77, 0x1234, 0x0, null)"));
 }
 
-TEST_F(Wrapper, EveryOtherAnswerThanZeroFailsTheOperationsWithoutFiles)
+TEST_F(Wrapper, OperationsWithoutFilesFailForEveryCodeExceptOK)
 {
     for (const SCCRTN code : CodesOtherThanOK())
     {
@@ -235,48 +235,48 @@ TEST_F(Wrapper, EveryOtherAnswerThanZeroFailsTheOperationsWithoutFiles)
         m_scc.results = {{"SccOpenProject", code}, {"SccGetProjPath", code}, {"SccRunScc", code}};
         m_scc.initialize = nullptr;
         m_scc.results["SccInitialize"] = code;
-        EXPECT_EQ(m_wrapper->Initialize(&m_info), -1);
+        EXPECT_EQ(m_wrapper->Initialize(&m_info), Result::Failure);
         EXPECT_FALSE(m_wrapper->IsInitialized());
         m_scc.results.erase("SccInitialize");
-        EXPECT_EQ(m_wrapper->Initialize(&m_info), 0);
-        EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", L""), -1);
+        EXPECT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
+        EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", L""), Result::Failure);
         EXPECT_FALSE(m_wrapper->IsProjectOpen());
-        EXPECT_EQ(m_wrapper->RunProviderClient(), -1);
+        EXPECT_EQ(m_wrapper->RunProviderClient(), Result::Failure);
         m_scc.results = {{"SccCloseProject", code}, {"SccUninitialize", code}};
-        EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", L""), 0);
-        EXPECT_EQ(m_wrapper->CloseProject(), -1);
-        EXPECT_EQ(m_wrapper->Uninitialize(), -1);
+        EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", L""), Result::Success);
+        EXPECT_EQ(m_wrapper->CloseProject(), Result::Failure);
+        EXPECT_EQ(m_wrapper->Uninitialize(), Result::Failure);
     }
 }
 
 TEST_F(Wrapper, CloseProjectWithoutAProjectFailsAndLoadsNothing)
 {
-    EXPECT_EQ(m_wrapper->CloseProject(), -1);
+    EXPECT_EQ(m_wrapper->CloseProject(), Result::Failure);
     EXPECT_THAT(m_scc.calls, IsEmpty());
 }
 
-TEST_F(Wrapper, ShowHistoryTellsThatAFileIsToBeReloaded)
+TEST_F(Wrapper, ShowHistoryReportsFilesToReload)
 {
     Open();
     ActiveList list{L"C:\\a"};
-    m_scc.results["SccHistory"] = 5;
-    EXPECT_EQ(m_wrapper->ShowHistory(list.Get()), 1);
+    m_scc.results["SccHistory"] = SCC_I_RELOADFILE;
+    EXPECT_EQ(m_wrapper->ShowHistory(list.Get()), Result::ReloadFiles);
     for (const SCCRTN code : CodesOtherThanOK())
     {
-        if (code == 5)
+        if (code == SCC_I_RELOADFILE)
         {
             continue;
         }
         m_scc.results["SccHistory"] = code;
-        EXPECT_EQ(m_wrapper->ShowHistory(list.Get()), code < 0 ? -1 : 0) << code;
+        EXPECT_EQ(m_wrapper->ShowHistory(list.Get()), code < 0 ? Result::Failure : Result::Success) << code;
     }
 }
 
 TEST_F(Wrapper, OperationsWorkWithoutAnOpenProject)
 {
     ActiveList list{L"C:\\a"};
-    ASSERT_EQ(m_wrapper->Initialize(&m_info), 0);
-    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), 0);
+    ASSERT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), Result::Success);
     EXPECT_THAT(m_scc.Take(), Contains(R"(SccGet(0x77, 0x1234, 0x1, ["C:\a"], 0x0, 0x0))"));
 }
 
@@ -286,17 +286,17 @@ TEST_F(Wrapper, HostMayCallBackDuringAnOperation)
     ActiveList list{L"C:\\a"};
     ActiveList other{L"C:\\other", L"C:\\one more"};
     m_scc.add = [&](LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR comment, LONG* options, LPCMDOPTS) {
-        EXPECT_EQ(m_wrapper->CheckIn(other.Get(), L"inner", 0), 0);
-        EXPECT_EQ(m_wrapper->QueryStatus(other.Get(), 0), 0);
+        EXPECT_EQ(m_wrapper->CheckIn(other.Get(), L"inner", 0), Result::Success);
+        EXPECT_EQ(m_wrapper->QueryStatus(other.Get(), 0), Result::Success);
         EXPECT_EQ(count, 1);
         EXPECT_STREQ(names[0], "C:\\a");
         EXPECT_STREQ(comment, "outer");
-        EXPECT_EQ(options[0], 0x1000);
+        EXPECT_EQ(options[0], SCC_KEEP_CHECKEDOUT);
         return SCC_OK;
     };
-    EXPECT_EQ(m_wrapper->Add(list.Get(), L"outer", 0x1), 0);
+    EXPECT_EQ(m_wrapper->Add(list.Get(), L"outer", Option::KeepCheckedOut), Result::Success);
     EXPECT_EQ(m_scc.Take().size(), 3u);
-    EXPECT_EQ(other.FlagsOf(1), 0x100001u);
+    EXPECT_EQ(other.FlagsOf(1), State::NotControlled | Permission::Add);
 }
 
 TEST_F(Wrapper, LibraryMayReorderTheArrayOfNames)
@@ -307,8 +307,8 @@ TEST_F(Wrapper, LibraryMayReorderTheArrayOfNames)
         names[0] = nullptr;
         return SCC_OK;
     };
-    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), 0);
-    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), 0);
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), Result::Success);
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), Result::Success);
     EXPECT_THAT(m_scc.Take(), Each(R"(SccGet(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], 0x0, 0x0))"));
 }
 
@@ -317,7 +317,7 @@ TEST_P(WrapperOperation, SendsNothingForAnEmptyActiveList)
     Open();
     ActiveList list{L"C:\\a"};
     list->RemoveActiveEntry(list->GetFileEntry(0));
-    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), -1);
+    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), Result::Failure);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
     EXPECT_EQ(list.FlagsOf(0), 0u);
 }
@@ -325,11 +325,11 @@ TEST_P(WrapperOperation, SendsNothingForAnEmptyActiveList)
 TEST_P(WrapperOperation, SendsNothingForNoList)
 {
     Open();
-    EXPECT_EQ(GetParam().run(*m_wrapper, nullptr), -1);
+    EXPECT_EQ(GetParam().run(*m_wrapper, nullptr), Result::Failure);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
 }
 
-TEST_P(WrapperOperation, SendsNothingForAListThatLacksAnEntry)
+TEST_P(WrapperOperation, SendsNothingForAListWithAMissingEntry)
 {
     class ListWithAHole : public OrvixFileList
     {
@@ -339,7 +339,7 @@ TEST_P(WrapperOperation, SendsNothingForAListThatLacksAnEntry)
     Open();
     ListWithAHole list;
     list.AddActiveEntry(list.CreateEntry(L"C:\\a", nullptr, 0, 0));
-    EXPECT_EQ(GetParam().run(*m_wrapper, &list), -1);
+    EXPECT_EQ(GetParam().run(*m_wrapper, &list), Result::Failure);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
 }
 
@@ -352,11 +352,11 @@ TEST_P(WrapperOperation, WhoseListThrowsFails)
     };
     Open();
     ThrowingList list;
-    EXPECT_EQ(GetParam().run(*m_wrapper, &list), -1);
+    EXPECT_EQ(GetParam().run(*m_wrapper, &list), Result::Failure);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
 }
 
-TEST_P(WrapperOperation, FailsForEveryOtherAnswerThanZero)
+TEST_P(WrapperOperation, FailsForEveryCodeExceptOK)
 {
     Open();
     ActiveList list{L"C:\\a"};
@@ -367,17 +367,17 @@ TEST_P(WrapperOperation, FailsForEveryOtherAnswerThanZero)
             continue;
         }
         m_scc.results[GetParam().function] = code;
-        EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), -1) << code;
+        EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), Result::Failure) << code;
     }
 }
 
-TEST_P(WrapperOperation, FailsWhenTheLibraryDoesNotHaveItsFunction)
+TEST_P(WrapperOperation, FailsWhenTheLibraryHasNoSuchFunction)
 {
     const std::string function = GetParam().function;
     m_wrapper->SetMSSCC(NewBridge(L"recording_without_" + std::wstring(function.begin(), function.end())));
     Open();
     ActiveList list{L"C:\\a"};
-    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), -1);
+    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), Result::Failure);
     EXPECT_THAT(m_scc.Take(), Not(Contains(HasSubstr(function))));
 }
 
@@ -386,7 +386,7 @@ TEST_P(WrapperOperation, FailsWhenThereIsNoLibrary)
     m_wrapper->SetMSSCC(NewBridge(L"missing"));
     ActiveList list{L"C:\\a"};
     const bool asksNothing = GetParam().name == std::string_view("QueryStatus"); // without a project
-    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), asksNothing ? 0 : -1);
+    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), asksNothing ? Result::Success : Result::Failure);
 }
 
 INSTANTIATE_TEST_SUITE_P(Each, WrapperOperation, testing::ValuesIn(ListOperations), NameOfOperation());
@@ -411,6 +411,6 @@ TEST_F(Wrapper, NewBridgeReplacesAndDeletesTheOldOne)
     EXPECT_THAT(m_scc.calls, ElementsAre("SccCloseProject(0x77)", "SccUninitialize(0x77)", "unload recording_full"));
     m_scc.calls.clear();
     EXPECT_FALSE(m_wrapper->IsInitialized());
-    EXPECT_EQ(m_wrapper->Initialize(&m_info), 0);
+    EXPECT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
     EXPECT_THAT(m_scc.calls, Contains("load recording_without_SccAdd"));
 }

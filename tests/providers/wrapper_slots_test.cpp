@@ -9,16 +9,16 @@ namespace
 
 using WrapperSlots = WrapperTest;
 
-/// Calls the n-th operation behind the destructor.
-template <typename Result, typename... Arguments>
-Result Call(OrvixProviderWrapper& wrapper, std::size_t n, Arguments... arguments)
+/// Calls the n-th operation after the destructor.
+template <typename Value, typename... Arguments>
+Value Call(OrvixProviderWrapper& wrapper, std::size_t n, Arguments... arguments)
 {
-    return CallSlot<Result>(static_cast<IOrvixProvider*>(&wrapper), DestructorSlots + n, arguments...);
+    return CallSlot<Value>(static_cast<IOrvixProvider*>(&wrapper), DestructorSlots + n, arguments...);
 }
 
 } // namespace
 
-TEST_F(WrapperSlots, StandInTheOrderOfTheContract)
+TEST_F(WrapperSlots, AreInTheOrderOfTheContract)
 {
     OrvixProviderWrapper& wrapper = *m_wrapper;
     ActiveList files{L"C:\\a"};
@@ -30,26 +30,26 @@ TEST_F(WrapperSlots, StandInTheOrderOfTheContract)
 
     EXPECT_STREQ(Call<const wchar_t*>(wrapper, 0), L"Recorded");
     EXPECT_FALSE(Call<bool>(wrapper, 2));
-    EXPECT_EQ(Call<int>(wrapper, 4, &m_info), 0);
+    EXPECT_EQ(Call<int>(wrapper, 4, &m_info), Result::Success);
     EXPECT_TRUE(Call<bool>(wrapper, 2));
     EXPECT_FALSE(Call<bool>(wrapper, 3));
-    EXPECT_EQ(Call<int>(wrapper, 6, L"C:\\p", L"open"), 0);
+    EXPECT_EQ(Call<int>(wrapper, 6, L"C:\\p", L"open"), Result::Success);
     EXPECT_TRUE(Call<bool>(wrapper, 3));
     m_scc.Take();
 
-    EXPECT_EQ(Call<int>(wrapper, 10, list, L"in", 0x1ul), 0);
-    EXPECT_EQ(Call<int>(wrapper, 11, list, L"out", 0x2ul), 0);
-    EXPECT_EQ(Call<int>(wrapper, 12, list, 0ul), 0);
-    EXPECT_EQ(Call<int>(wrapper, 13, list, 0ul), 0);
-    EXPECT_EQ(Call<int>(wrapper, 16, list, L"add", 0x1ul), 0);
-    EXPECT_EQ(Call<int>(wrapper, 17, list), 1);
-    EXPECT_EQ(Call<int>(wrapper, 18, list), 0);
-    EXPECT_EQ(Call<int>(wrapper, 19, list, 0ul), 0);
-    EXPECT_EQ(files.FlagsOf(0), 0x100001u);
-    EXPECT_EQ(Call<int>(wrapper, 22), 0);
-    EXPECT_EQ(Call<int>(wrapper, 23), 0);
-    EXPECT_EQ(Call<int>(wrapper, 7), 0);
-    EXPECT_EQ(Call<int>(wrapper, 5), 0);
+    EXPECT_EQ(Call<int>(wrapper, 10, list, L"in", Option::KeepCheckedOut), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 11, list, L"out", Option::GetLatest), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 12, list, 0ul), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 13, list, 0ul), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 16, list, L"add", Option::KeepCheckedOut), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 17, list), Result::ReloadFiles);
+    EXPECT_EQ(Call<int>(wrapper, 18, list), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 19, list, 0ul), Result::Success);
+    EXPECT_EQ(files.FlagsOf(0), State::NotControlled | Permission::Add);
+    EXPECT_EQ(Call<int>(wrapper, 22), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 23), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 7), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 5), Result::Success);
     EXPECT_THAT(m_scc.Take(),
                 ElementsAre(R"(SccCheckin(0x77, 0x1234, 0x1, ["C:\a"], "in", 0x1000, 0x0))",
                             R"(SccGet(0x77, 0x1234, 0x1, ["C:\a"], 0x0, 0x0))",
@@ -64,26 +64,26 @@ TEST_F(WrapperSlots, StandInTheOrderOfTheContract)
                             "SccCloseProject(0x77)", "SccUninitialize(0x77)"));
 }
 
-TEST_F(WrapperSlots, OfReservedOperationsGiveTheirFixedAnswersAndLoadNothing)
+TEST_F(WrapperSlots, OfReservedOperationsGiveTheirFixedResultsAndLoadNothing)
 {
     OrvixProviderWrapper& wrapper = *m_wrapper;
-    EXPECT_EQ(Call<int>(wrapper, 1), 0);
-    EXPECT_EQ(Call<int>(wrapper, 8), 0);
-    EXPECT_EQ(Call<int>(wrapper, 9), -2);
+    EXPECT_EQ(Call<int>(wrapper, 1), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 8), Result::Success);
+    EXPECT_EQ(Call<int>(wrapper, 9), Result::NotOffered);
     unsigned long first = 7;
     unsigned long second = 8;
-    EXPECT_EQ(Call<int>(wrapper, 14, static_cast<void*>(nullptr), &first, &second), -2);
+    EXPECT_EQ(Call<int>(wrapper, 14, static_cast<void*>(nullptr), &first, &second), Result::NotOffered);
     EXPECT_EQ(first, 0u);
     EXPECT_EQ(second, 0u);
-    EXPECT_EQ(Call<int>(wrapper, 15), -2);
-    EXPECT_EQ(Call<int>(wrapper, 20), -2);
-    EXPECT_EQ(Call<int>(wrapper, 21), -2);
-    EXPECT_EQ(Call<int>(wrapper, 24), -2);
+    EXPECT_EQ(Call<int>(wrapper, 15), Result::NotOffered);
+    EXPECT_EQ(Call<int>(wrapper, 20), Result::NotOffered);
+    EXPECT_EQ(Call<int>(wrapper, 21), Result::NotOffered);
+    EXPECT_EQ(Call<int>(wrapper, 24), Result::NotOffered);
     EXPECT_TRUE(Call<bool>(wrapper, 25));
     EXPECT_THAT(m_scc.calls, IsEmpty());
 }
 
-TEST_F(WrapperSlots, DestructorStandsFirstAndDeletesTheBridge)
+TEST_F(WrapperSlots, BeginWithTheDestructorWhichDeletesTheBridge)
 {
     Open();
     DeleteThroughTable(static_cast<IOrvixProvider*>(m_wrapper.release()));

@@ -11,7 +11,7 @@ using testing::IsEmpty;
 namespace
 {
 
-/// The tests' letters are those of the code page 1252.
+/// The letters of these tests are in code page 1252.
 class WrapperTexts : public WrapperTest
 {
 protected:
@@ -43,7 +43,7 @@ constexpr const wchar_t* InexactPaths[] = {
 class WrapperOutput : public WrapperTest
 {
 protected:
-    /// Opens a project and gives the callback that the library got.
+    /// Opens a project and returns the callback that the library got.
     LPTEXTOUTPROC OpenForOutput(OrvixProviderWrapper& wrapper)
     {
         LPTEXTOUTPROC output = nullptr;
@@ -51,7 +51,7 @@ protected:
             output = given;
             return SCC_OK;
         };
-        EXPECT_EQ(wrapper.OpenProject(L"C:\\Project", L""), 0);
+        EXPECT_EQ(wrapper.OpenProject(L"C:\\Project", L""), Result::Success);
         m_scc.openProject = nullptr;
         return output;
     }
@@ -60,29 +60,29 @@ protected:
     {
         Host() = {};
         m_info.SetIOrvixClientAccess(access);
-        EXPECT_EQ(wrapper.Initialize(&m_info), 0);
+        EXPECT_EQ(wrapper.Initialize(&m_info), Result::Success);
     }
 };
 
 } // namespace
 
-TEST_P(WrapperTextsOperation, SendsNothingForAPathThatTheCodePageDoesNotCarryExactly)
+TEST_P(WrapperTextsOperation, SendsNothingForAPathThatTheCodePageCannotExpress)
 {
     Open();
     for (const wchar_t* path : InexactPaths)
     {
         ActiveList list{path, L"C:\\plain"};
-        EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), -1);
+        EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), Result::Failure);
         EXPECT_THAT(m_scc.Take(), IsEmpty());
         EXPECT_EQ(list.FlagsOf(1), 0u);
     }
 }
 
-TEST_P(WrapperTextsOperation, SendsAPathThatTheCodePageCarriesAsItIs)
+TEST_P(WrapperTextsOperation, SendsAPathThatTheCodePageCanExpress)
 {
     Open();
     ActiveList list{L"C:\\Caf\u00E9\\\u20AC 100.txt"};
-    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), 0);
+    EXPECT_EQ(GetParam().run(*m_wrapper, list.Get()), Result::Success);
     EXPECT_THAT(m_scc.Take(), Each(HasSubstr("\"C:\\Caf\xE9\\\x80 100.txt\"")));
 }
 
@@ -92,34 +92,34 @@ TEST_F(WrapperTexts, OneInexactPathAmongManyStopsTheOperation)
 {
     Open();
     ActiveList list{L"C:\\a", L"C:\\b", L"C:\\\uFF21"};
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"", 0), -1);
-    EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), -1);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"", 0), Result::Failure);
+    EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), Result::Failure);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
 }
 
 TEST_F(WrapperTexts, ProjectFolderMustBeExact)
 {
-    ASSERT_EQ(m_wrapper->Initialize(&m_info), 0);
+    ASSERT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
     m_scc.Take();
     for (const wchar_t* path : InexactPaths)
     {
-        EXPECT_EQ(m_wrapper->OpenProject(path, L""), -1);
+        EXPECT_EQ(m_wrapper->OpenProject(path, L""), Result::Failure);
     }
     EXPECT_THAT(m_scc.Take(), IsEmpty());
-    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\Caf\u00E9", L""), 0);
+    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\Caf\u00E9", L""), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre(HasSubstr("\"C:\\Caf\xE9\"")));
 }
 
 TEST_F(WrapperTexts, CommentsAndNamesMayLoseCharacters)
 {
     m_info.SetClientName(L"H\u00F4te \u5009");
-    EXPECT_EQ(m_wrapper->Initialize(&m_info), 0);
+    EXPECT_EQ(m_wrapper->Initialize(&m_info), Result::Success);
     EXPECT_THAT(m_scc.Take(), Contains(HasSubstr("\"H\xF4te ?\"")));
-    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", L"\u00E9 \u5009"), 0);
+    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", L"\u00E9 \u5009"), Result::Success);
     ActiveList list{L"C:\\a"};
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"\u00E9 \u5009", 0), 0);
-    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"\u00E9 \u5009", 0), 0);
-    EXPECT_EQ(m_wrapper->Add(list.Get(), L"\u00E9 \u5009", 0), 0);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"\u00E9 \u5009", 0), Result::Success);
+    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), L"\u00E9 \u5009", 0), Result::Success);
+    EXPECT_EQ(m_wrapper->Add(list.Get(), L"\u00E9 \u5009", 0), Result::Success);
     const Calls calls = m_scc.Take();
     EXPECT_EQ(calls.size(), 4u);
     EXPECT_THAT(calls, Each(HasSubstr("\"\xE9 ?\"")));
@@ -127,11 +127,11 @@ TEST_F(WrapperTexts, CommentsAndNamesMayLoseCharacters)
 
 TEST_F(WrapperTest, NullCommentIsAnEmptyOne)
 {
-    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", nullptr), 0);
+    EXPECT_EQ(m_wrapper->OpenProject(L"C:\\p", nullptr), Result::Success);
     ActiveList list{L"C:\\a"};
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), nullptr, 0), 0);
-    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), nullptr, 0), 0);
-    EXPECT_EQ(m_wrapper->Add(list.Get(), nullptr, 0), 0);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), nullptr, 0), Result::Success);
+    EXPECT_EQ(m_wrapper->CheckOut(list.Get(), nullptr, 0), Result::Success);
+    EXPECT_EQ(m_wrapper->Add(list.Get(), nullptr, 0), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre("SccGetVersion()", R"(SccOpenProject(0x0, 0x0, "", "", "C:\p", "", "", 0x1))",
                                           R"(SccCheckin(0x0, 0x0, 0x1, ["C:\a"], "", 0x0, 0x0))",
                                           R"(SccCheckout(0x0, 0x0, 0x1, ["C:\a"], "", 0x0, 0x0))",
@@ -140,7 +140,7 @@ TEST_F(WrapperTest, NullCommentIsAnEmptyOne)
 
 TEST_F(WrapperTest, NullProjectFolderSendsNothing)
 {
-    EXPECT_EQ(m_wrapper->OpenProject(nullptr, L""), -1);
+    EXPECT_EQ(m_wrapper->OpenProject(nullptr, L""), Result::Failure);
     EXPECT_THAT(m_scc.calls, IsEmpty());
 }
 
@@ -155,7 +155,7 @@ TEST_F(WrapperTest, EntryWithoutAPathSendsNothing)
     NullEntry entry;
     OrvixFileList list;
     list.AddActiveEntry(&entry);
-    EXPECT_EQ(m_wrapper->GetLatest(&list, 0), -1);
+    EXPECT_EQ(m_wrapper->GetLatest(&list, 0), Result::Failure);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
 }
 
@@ -165,7 +165,7 @@ TEST_F(WrapperTest, LongPathsAndCommentsArriveWhole)
     const std::wstring path = L"C:\\" + std::wstring(5000, L'p');
     const std::wstring comment(70000, L'c');
     ActiveList list{path.c_str()};
-    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), comment.c_str(), 0), 0);
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), comment.c_str(), 0), Result::Success);
     EXPECT_THAT(m_scc.Take(), ElementsAre("SccCheckin(0x77, 0x1234, 0x1, [\"C:\\" + std::string(5000, 'p') + "\"], \"" +
                                           std::string(70000, 'c') + "\", 0x0, 0x0)"));
 }
@@ -185,7 +185,7 @@ TEST_F(WrapperTest, ManyPathsArriveInTheOrderOfTheList)
         received.assign(names, names + count);
         return SCC_OK;
     };
-    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), 0);
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), Result::Success);
     EXPECT_EQ(received, expected);
 }
 
@@ -197,7 +197,7 @@ TEST_F(WrapperOutput, BeforeAnyInitializeIsIgnored)
     }
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
     ASSERT_NE(output, nullptr);
-    EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
 }
 
 TEST_F(WrapperOutput, WithoutClientAccessIsIgnored)
@@ -207,7 +207,7 @@ TEST_F(WrapperOutput, WithoutClientAccessIsIgnored)
     other.SetMSSCC(NewBridge(L"recording_full"));
     InitializeFor(other, nullptr);
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
-    EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_THAT(Host().lines, IsEmpty());
 }
 
@@ -217,31 +217,31 @@ TEST_F(WrapperOutput, ReachesTheHostAsWideTextOfKindZero)
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
     for (LONG kind = -1; kind <= 12; ++kind)
     {
-        EXPECT_EQ(output("text", kind), 0);
+        EXPECT_EQ(output("text", kind), SCC_MSG_RTN_OK);
     }
-    EXPECT_EQ(output("text", 999), 0);
-    EXPECT_EQ(output("", SCC_MSG_INFO), 0);
+    EXPECT_EQ(output("text", 999), SCC_MSG_RTN_OK);
+    EXPECT_EQ(output("", SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_EQ(Host().lines.size(), 16u);
     EXPECT_EQ(Host().lines.back(), OutputHost::Line(L"", 0));
     Host().lines.pop_back();
     EXPECT_THAT(Host().lines, Each(OutputHost::Line(L"text", 0)));
 }
 
-TEST_F(WrapperOutput, IsTakenForAnsiText)
+TEST_F(WrapperOutput, IsReadAsAnsiText)
 {
     if (GetACP() != 1252)
     {
         GTEST_SKIP() << "another ANSI code page";
     }
     InitializeFor(*m_wrapper, &Host());
-    EXPECT_EQ(OpenForOutput(*m_wrapper)("caf\xE9 \x80", SCC_MSG_INFO), 0);
+    EXPECT_EQ(OpenForOutput(*m_wrapper)("caf\xE9 \x80", SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_THAT(Host().lines, ElementsAre(OutputHost::Line(L"caf\u00E9 \u20AC", 0)));
 }
 
 TEST_F(WrapperOutput, WithoutATextIsIgnored)
 {
     InitializeFor(*m_wrapper, &Host());
-    EXPECT_EQ(OpenForOutput(*m_wrapper)(nullptr, 5), 0);
+    EXPECT_EQ(OpenForOutput(*m_wrapper)(nullptr, SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_THAT(Host().lines, IsEmpty());
 }
 
@@ -249,21 +249,21 @@ TEST_F(WrapperOutput, ComesToTheHostDuringAnOperation)
 {
     InitializeFor(*m_wrapper, &Host());
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
-    m_scc.get = [&](LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS) { return output("getting", 4); };
+    m_scc.get = [&](LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS) { return output("getting", SCC_MSG_WARNING); };
     ActiveList list{L"C:\\a"};
-    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), 0);
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), Result::Success);
     EXPECT_THAT(Host().lines, ElementsAre(OutputHost::Line(L"getting", 0)));
 }
 
 TEST_F(WrapperOutput, OfEveryLibraryGoesToTheHostOfTheLastInitialize)
 {
-    static OutputHost lastHost; // kept by the wrappers behind the test
+    static OutputHost lastHost; // the wrappers keep it after the test
     OrvixProviderWrapper other;
     other.SetMSSCC(NewBridge(L"recording_full"));
     InitializeFor(*m_wrapper, &Host());
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
     InitializeFor(other, &lastHost);
-    EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_THAT(Host().lines, IsEmpty());
     EXPECT_THAT(lastHost.lines, ElementsAre(OutputHost::Line(L"text", 0)));
 }
@@ -275,17 +275,17 @@ TEST_F(WrapperOutput, GoesToTheHostOfAnInitializeThatTheLibraryRefused)
     OrvixProviderWrapper other;
     other.SetMSSCC(NewBridge(L"missing"));
     m_info.SetIOrvixClientAccess(&Host());
-    EXPECT_EQ(other.Initialize(&m_info), -1);
-    EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
+    EXPECT_EQ(other.Initialize(&m_info), Result::Failure);
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_THAT(Host().lines, ElementsAre(OutputHost::Line(L"text", 0)));
 }
 
-TEST_F(WrapperOutput, ThatTheHostRefusesByThrowingDoesNotReachTheLibrary)
+TEST_F(WrapperOutput, OfAHostThatThrowsLetsNothingReachTheLibrary)
 {
     InitializeFor(*m_wrapper, &Host());
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
     Host().onOutput = [] { throw std::runtime_error("no window"); };
-    EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_EQ(Host().lines.size(), 1u);
 }
 
@@ -294,7 +294,7 @@ TEST_F(WrapperOutput, LetsTheHostCallBack)
     InitializeFor(*m_wrapper, &Host());
     const LPTEXTOUTPROC output = OpenForOutput(*m_wrapper);
     ActiveList list{L"C:\\a"};
-    Host().onOutput = [&] { EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), 0); };
-    EXPECT_EQ(output("text", SCC_MSG_INFO), 0);
-    EXPECT_EQ(list.FlagsOf(0), 0x100001u);
+    Host().onOutput = [&] { EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), Result::Success); };
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
+    EXPECT_EQ(list.FlagsOf(0), State::NotControlled | Permission::Add);
 }

@@ -1,5 +1,5 @@
-// An MSSCCI library that keeps every rule of the interface but the one that `Defect` names. It remembers the status of
-// files for as long as it is loaded, and touches none.
+// An MSSCCI library that breaks one rule of the interface, which `Defect` names, and keeps all others. It remembers the
+// status of files while it is loaded and changes no file.
 
 #include "Defect.h"
 #include "ImportHook.h"
@@ -13,7 +13,14 @@
 namespace
 {
 
-constexpr LONG Controlled = SCC_STATUS_CONTROLLED;
+constexpr LONG Version = 0x00010003;        // 1.3, the major number in the high word
+constexpr LONG SwappedVersion = 0x00030001; // the numbers in the wrong order
+
+// What the interface does not know.
+constexpr SCCRTN UnknownResult = 42;
+constexpr LONG UnknownKind = 99;
+constexpr LONG UnknownStatus = 0x4000;
+
 constexpr LONG CheckedOut = SCC_STATUS_CONTROLLED | SCC_STATUS_CHECKEDOUT;
 
 std::optional<ImportHook> refusal; // of the program's private registration
@@ -53,7 +60,7 @@ extern "C" {
 
 LONG SccGetVersion()
 {
-    return Defect::Is(L"version") ? 0x00030001 : 0x00010003;
+    return Defect::Is(L"version") ? SwappedVersion : Version;
 }
 
 SCCRTN SccInitialize(LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabilities, LPSTR auxPathLabel,
@@ -104,7 +111,7 @@ SCCRTN SccGet(LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS)
 {
     if (Defect::Is(L"text-without-kind"))
     {
-        Print("got", 99);
+        Print("got", UnknownKind);
     }
     else if (Defect::Is(L"text-null"))
     {
@@ -114,7 +121,7 @@ SCCRTN SccGet(LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS)
     {
         Print(Defect::Is(L"text-output") ? "got\r\n" : "got", SCC_MSG_INFO);
     }
-    return Defect::Is(L"codes") ? 42 : SCC_OK;
+    return Defect::Is(L"codes") ? UnknownResult : SCC_OK;
 }
 
 SCCRTN SccCheckout(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDOPTS)
@@ -124,29 +131,29 @@ SCCRTN SccCheckout(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDO
 
 SCCRTN SccUncheckout(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
 {
-    return Become(count, names, Controlled);
+    return Become(count, names, SCC_STATUS_CONTROLLED);
 }
 
 SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG options, LPCMDOPTS)
 {
     if (Defect::Is(L"codes-given-back") && options == 0)
     {
-        return 42;
+        return UnknownResult;
     }
     if (Defect::Is(L"input-names") && count > 0)
     {
         const_cast<LPSTR>(names[0])[0] = '#';
     }
-    return Become(count, names, Controlled);
+    return Become(count, names, SCC_STATUS_CONTROLLED);
 }
 
 SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG* options, LPCMDOPTS)
 {
     if (Defect::Is(L"codes-kept") && count > 0 && options[0] == SCC_KEEP_CHECKEDOUT)
     {
-        return 42;
+        return UnknownResult;
     }
-    return Become(count, names, Controlled);
+    return Become(count, names, SCC_STATUS_CONTROLLED);
 }
 
 SCCRTN SccQueryInfo(LPVOID, LONG count, LPCSTR* names, LPLONG status)
@@ -162,7 +169,7 @@ SCCRTN SccQueryInfo(LPVOID, LONG count, LPCSTR* names, LPLONG status)
             break;
         }
         status[i] = statuses.contains(names[i]) ? statuses[names[i]] : 0;
-        status[i] |= Defect::Is(L"info-bits") && status[i] == CheckedOut ? 0x4000 : 0;
+        status[i] |= Defect::Is(L"info-bits") && status[i] == CheckedOut ? UnknownStatus : 0;
     }
     if (Defect::Is(L"info-overrun"))
     {

@@ -1,4 +1,4 @@
-// A library that another one needs and that lies in a folder of its own.
+// A library in a folder of its own, which another library needs.
 
 extern "C" __declspec(dllexport) int SccDependency()
 {

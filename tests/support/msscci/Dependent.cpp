@@ -1,4 +1,4 @@
-// Makes a recording library need SccDependency.dll to be loaded.
+// Makes a recording library depend on scc_dependency.dll.
 
 extern "C" __declspec(dllimport) int SccDependency();
 

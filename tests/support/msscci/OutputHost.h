@@ -7,7 +7,7 @@
 #include <utility>
 #include <vector>
 
-/// The host's side, which writes down the text output that it gets.
+/// The host's side, which notes the text output that it gets.
 class OutputHost final : public IOrvixClientAccess
 {
 public:

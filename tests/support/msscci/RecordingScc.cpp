@@ -1,7 +1,9 @@
-// An MSSCCI library for tests, built several times: the export list leaves functions out. It writes down what it is
-// called with in the recorder of the program that loaded it.
+// An MSSCCI library for tests, built several times with export lists in which functions are missing. It notes its calls
+// in the recorder of the program that loaded it.
 
-#include "../ActiveManifest.h"
+#include "ActiveManifest.h"
+#include "ModulePath.h"
+#include "ProcessDllDirectory.h"
 #include "SccRecorder.h"
 
 #include <filesystem>
@@ -119,9 +121,7 @@ SCCRTN Answer(SCCRTN result, const Handler& handler, Arguments... arguments)
 
 std::string LibraryName(HINSTANCE library)
 {
-    std::wstring path(MAX_PATH, L'\0');
-    path.resize(GetModuleFileNameW(library, path.data(), static_cast<DWORD>(path.size())));
-    return std::filesystem::path(path).stem().string();
+    return std::filesystem::path(ModulePath(library)).stem().string();
 }
 
 } // namespace
@@ -130,133 +130,131 @@ extern "C" {
 
 LONG SccGetVersion()
 {
-    const SCCRTN result = Record("SccGetVersion");
+    const SCCRTN result = Record(__func__);
     return result ? result : 0x00010003;
 }
 
 SCCRTN SccInitialize(LPVOID* context, HWND window, LPCSTR caller, LPSTR sccName, LPLONG capabilities,
                      LPSTR auxPathLabel, LPLONG checkoutCommentLength, LPLONG commentLength)
 {
-    const SCCRTN result = Record("SccInitialize", *context, window, caller, sccName, auxPathLabel);
+    const SCCRTN result = Record(__func__, *context, window, caller, sccName, auxPathLabel);
     return Answer(result, Recorder().initialize, context, window, caller, sccName, capabilities, auxPathLabel,
                   checkoutCommentLength, commentLength);
 }
 
 SCCRTN SccUninitialize(LPVOID context)
 {
-    return Answer(Record("SccUninitialize", context), Recorder().uninitialize, context);
+    return Answer(Record(__func__, context), Recorder().uninitialize, context);
 }
 
 SCCRTN SccOpenProject(LPVOID context, HWND window, LPSTR user, LPCSTR projectName, LPCSTR localPath, LPSTR auxPath,
                       LPCSTR comment, LPTEXTOUTPROC output, LONG flags)
 {
-    const SCCRTN result =
-        Record("SccOpenProject", context, window, user, projectName, localPath, auxPath, comment, flags);
+    const SCCRTN result = Record(__func__, context, window, user, projectName, localPath, auxPath, comment, flags);
     return Answer(result, Recorder().openProject, context, window, user, projectName, localPath, auxPath, comment,
                   output, flags);
 }
 
 SCCRTN SccCloseProject(LPVOID context)
 {
-    return Record("SccCloseProject", context);
+    return Record(__func__, context);
 }
 
 SCCRTN SccGetProjPath(LPVOID context, HWND window, LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath,
                       BOOL allowChangePath, LPBOOL isNew)
 {
     const SCCRTN result =
-        Record("SccGetProjPath", context, window, user, projectName, localPath, auxPath, allowChangePath, *isNew);
+        Record(__func__, context, window, user, projectName, localPath, auxPath, allowChangePath, *isNew);
     return Answer(result, Recorder().getProjPath, context, window, user, projectName, localPath, auxPath,
                   allowChangePath, isNew);
 }
 
 SCCRTN SccGet(LPVOID context, HWND window, LONG count, LPCSTR* names, LONG options, LPCMDOPTS block)
 {
-    const SCCRTN result = Record("SccGet", context, window, count, Names(count, names), options, block);
+    const SCCRTN result = Record(__func__, context, window, count, Names(count, names), options, block);
     return Answer(result, Recorder().get, context, window, count, names, options, block);
 }
 
 SCCRTN SccCheckout(LPVOID context, HWND window, LONG count, LPCSTR* names, LPCSTR comment, LONG options,
                    LPCMDOPTS block)
 {
-    return Record("SccCheckout", context, window, count, Names(count, names), comment, options, block);
+    return Record(__func__, context, window, count, Names(count, names), comment, options, block);
 }
 
 SCCRTN SccUncheckout(LPVOID context, HWND window, LONG count, LPCSTR* names, LONG options, LPCMDOPTS block)
 {
-    return Record("SccUncheckout", context, window, count, Names(count, names), options, block);
+    return Record(__func__, context, window, count, Names(count, names), options, block);
 }
 
 SCCRTN SccCheckin(LPVOID context, HWND window, LONG count, LPCSTR* names, LPCSTR comment, LONG options, LPCMDOPTS block)
 {
-    return Record("SccCheckin", context, window, count, Names(count, names), comment, options, block);
+    return Record(__func__, context, window, count, Names(count, names), comment, options, block);
 }
 
 SCCRTN SccAdd(LPVOID context, HWND window, LONG count, LPCSTR* names, LPCSTR comment, LONG* options, LPCMDOPTS block)
 {
-    const SCCRTN result = Record("SccAdd", context, window, count, Names(count, names), comment,
+    const SCCRTN result = Record(__func__, context, window, count, Names(count, names), comment,
                                  std::span(options, static_cast<std::size_t>(count)), block);
     return Answer(result, Recorder().add, context, window, count, names, comment, options, block);
 }
 
 SCCRTN SccBeginBatch()
 {
-    return Record("SccBeginBatch");
+    return Record(__func__);
 }
 
 SCCRTN SccEndBatch()
 {
-    return Record("SccEndBatch");
+    return Record(__func__);
 }
 
 SCCRTN SccHistory(LPVOID context, HWND window, LONG count, LPCSTR* names, LONG options, LPCMDOPTS block)
 {
-    const SCCRTN result = Record("SccHistory", context, window, count, Names(count, names), options, block);
+    const SCCRTN result = Record(__func__, context, window, count, Names(count, names), options, block);
     return Answer(result, Recorder().history, context, window, count, names, options, block);
 }
 
 SCCRTN SccProperties(LPVOID context, HWND window, LPCSTR name)
 {
-    return Record("SccProperties", context, window, name);
+    return Record(__func__, context, window, name);
 }
 
 SCCRTN SccQueryInfo(LPVOID context, LONG count, LPCSTR* names, LPLONG status)
 {
     const SCCRTN result =
-        Record("SccQueryInfo", context, count, Names(count, names), std::span(status, static_cast<std::size_t>(count)));
+        Record(__func__, context, count, Names(count, names), std::span(status, static_cast<std::size_t>(count)));
     return Answer(result, Recorder().queryInfo, context, count, names, status);
 }
 
 SCCRTN SccPopulateList(LPVOID context, SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback,
                        LPVOID callerData, LPLONG status, LONG options)
 {
-    const SCCRTN result =
-        Record("SccPopulateList", context, command, count, Names(count, names), callerData, status, options);
+    const SCCRTN result = Record(__func__, context, command, count, Names(count, names), callerData, status, options);
     return Answer(result, Recorder().populateList, context, command, count, names, callback, callerData, status,
                   options);
 }
 
 SCCRTN SccRunScc(LPVOID context, HWND window, LONG count, LPCSTR* names)
 {
-    return Record("SccRunScc", context, window, count, Names(count, names));
+    return Record(__func__, context, window, count, Names(count, names));
 }
 
 SCCRTN SccGetCommandOptions(LPVOID context, HWND window, SCCCOMMAND command, LPCMDOPTS* block)
 {
-    const SCCRTN result = Record("SccGetCommandOptions", context, window, command,
-                                 block != nullptr ? "block " + Show(*block) : std::string("null"));
+    const SCCRTN result =
+        Record(__func__, context, window, command, block != nullptr ? "block " + Show(*block) : std::string("null"));
     return Answer(result, Recorder().getCommandOptions, context, window, command, block);
 }
 
 SCCRTN SccAddFromScc(LPVOID context, HWND window, LPLONG count, LPCSTR** names)
 {
-    const SCCRTN result = Record("SccAddFromScc", context, window, count, names);
+    const SCCRTN result = Record(__func__, context, window, count, names);
     return Answer(result, Recorder().addFromScc, context, window, count, names);
 }
 
 SCCRTN SccSetOption(LPVOID context, LONG option, LONG value)
 {
-    return Record("SccSetOption", context, option, value);
+    return Record(__func__, context, option, value);
 }
 
 } // extern "C"
@@ -267,9 +265,7 @@ BOOL WINAPI DllMain(HINSTANCE library, DWORD reason, void* processEnds)
     {
         Recorder().calls.push_back("load " + LibraryName(library));
         Recorder().manifestAtLoad = ActiveManifest();
-        std::wstring folder(MAX_PATH, L'\0');
-        folder.resize(GetDllDirectoryW(static_cast<DWORD>(folder.size()), folder.data()));
-        Recorder().dllDirectoryAtLoad = folder;
+        Recorder().dllDirectoryAtLoad = ProcessDllDirectory::Current();
     }
     else if (reason == DLL_PROCESS_DETACH && processEnds == nullptr)
     {

@@ -8,20 +8,20 @@
 #include <string>
 #include <vector>
 
-/// What the recording MSSCCI libraries of this process were called with, and what they are to answer.
+/// The calls of the recording MSSCCI libraries of this process, and their answers.
 ///
-/// One line a call, in order: the function's name and its arguments in brackets, pointers and numbers in hexadecimal
-/// ("0x0" for null and 0), texts in quotes ("null" for none), file names and words as lists:
+/// A call is one line: the name of the function and its arguments in brackets. Pointers and numbers are hexadecimal
+/// ("0x0" for null and 0), texts are in quotes ("null" for none), file names and words are lists:
 ///
 ///     SccCheckin(0x77, 0x1234, 0x2, ["C:\a", "C:\b"], "comment", 0x1000, 0x0)
 ///
-/// A function answers `results` by its name, or 0, after its handler, where one is set, has run: a handler's result
-/// counts instead. A library adds "load NAME" when it is loaded and "unload NAME" when it is freed.
+/// A function returns what `results` has for its name, or SCC_OK. Where a handler is set, it runs and its result counts
+/// instead. A library adds "load NAME" when it is loaded and "unload NAME" when it is freed.
 struct SccRecorder
 {
     std::vector<std::string> calls;
     std::map<std::string, SCCRTN> results;
-    std::set<std::string> throwing; ///< functions that throw an exception once they have written down their call
+    std::set<std::string> throwing; ///< functions that note their call and then throw an exception
 
     std::function<decltype(SccInitialize)> initialize;
     std::function<decltype(SccUninitialize)> uninitialize;
@@ -35,11 +35,11 @@ struct SccRecorder
     std::function<decltype(SccGetCommandOptions)> getCommandOptions;
     std::function<decltype(SccAddFromScc)> addFromScc;
 
-    // As a library's start-up code found them when it was loaded last.
+    // What the start-up code of the library that was loaded last found.
     std::wstring manifestAtLoad;     ///< file of the active manifest
     std::wstring dllDirectoryAtLoad; ///< of the process
 
-    /// The calls without "load" and "unload", and forgets all of them.
+    /// Returns the calls without "load" and "unload", and forgets all calls.
     std::vector<std::string> Take();
 };
 

@@ -1,5 +1,8 @@
 #pragma once
 
+#include "ModulePath.h"
+#include "UniqueHandle.h"
+
 #include <windows.h>
 
 #include <cwchar>
@@ -7,8 +10,8 @@
 #include <fstream>
 #include <string>
 
-/// What is wrong with the defective plug-in and MSSCCI library. It stands in an environment variable, which the
-/// processes inherit that load them; without it nothing is wrong.
+/// The defects of the defective plug-in and MSSCCI library. An environment variable lists them, which the processes
+/// inherit that load them; without it there is none.
 class Defect
 {
 public:
@@ -21,32 +24,30 @@ public:
         return (L' ' + text + L' ').find(L' ' + name + L' ') != std::wstring::npos;
     }
 
-    // Ways in which a library takes its process along.
-
-    /// As a write through null does, also where a sanitizer would be the first to see that.
+    /// Ends the process as a write through null does, but without being caught by a sanitizer first.
     static void Crash() { RaiseException(EXCEPTION_ACCESS_VIOLATION, EXCEPTION_NONCONTINUABLE, 0, nullptr); }
     static void Hang() { Sleep(INFINITE); }
 
-    /// Starts this program once more with its own arguments, so that it hangs, and writes its number to the file that
+    /// Starts this program again with the same arguments and the defect to hang. Writes its process ID to the file that
     /// ORVIX_DEFECT_FILE names.
     static void StartDescendant()
     {
         SetEnvironmentVariableW(Variable, L"hang");
-        std::wstring program(MAX_PATH, L'\0');
-        GetModuleFileNameW(nullptr, program.data(), MAX_PATH);
         std::wstring commandLine = GetCommandLineW();
         STARTUPINFOW startup{};
         startup.cb = sizeof startup;
         PROCESS_INFORMATION started{};
-        if (!CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &startup,
-                            &started))
+        if (!CreateProcessW(ModulePath(nullptr).c_str(), commandLine.data(), nullptr, nullptr, FALSE, 0, nullptr,
+                            nullptr, &startup, &started))
         {
             return;
         }
+        const UniqueKernelHandle thread(started.hThread);
+        const UniqueKernelHandle process(started.hProcess);
         std::ofstream(File()) << started.dwProcessId;
     }
 
-    /// Writes an operation and its options to that file, where "report-options" asks for it.
+    /// Appends an operation and its options to that file when "report-options" is set.
     static void Report(const char* operation, unsigned long options)
     {
         if (Is(L"report-options"))
@@ -55,11 +56,10 @@ public:
         }
     }
 
-    /// Renames this program's file, so that it cannot be started once more.
+    /// Renames the file of this program, so that it cannot be started again.
     static void MoveProgram()
     {
-        std::wstring program(MAX_PATH, L'\0');
-        program.resize(GetModuleFileNameW(nullptr, program.data(), MAX_PATH));
+        const std::wstring program = ModulePath(nullptr);
         MoveFileW(program.c_str(), (program + L".moved").c_str());
     }
 

@@ -4,8 +4,8 @@
 
 #include <string>
 
-/// What the fake plug-ins were asked, as words with a blank behind each. It stands in an environment variable
-/// of the process, so that it outlives a plug-in that is unloaded at once.
+/// What the fake plug-ins were asked: words with a blank after each. An environment variable of the process holds it,
+/// so that it outlives a plug-in that is unloaded at once.
 class FakeJournal
 {
 public:

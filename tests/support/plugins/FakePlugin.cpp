@@ -1,9 +1,10 @@
-// A provider plug-in for tests, built once per defect: the build sets FAKE_TAG (its word in the journal),
-// FAKE_NAME, FAKE_VERSION and what is to go wrong; the export list leaves functions out.
+// A provider plug-in for tests, built once per defect. The build sets FAKE_TAG (its word in the journal), FAKE_NAME,
+// FAKE_VERSION and the defect; functions may be missing in the export list.
 
-#include "../ActiveManifest.h"
+#include "ActiveManifest.h"
 #include "FakeJournal.h"
 #include "FakeProvider.h"
+#include "OrvixVersion.h"
 
 #include <windows.h>
 
@@ -17,7 +18,7 @@
 #include <new>
 
 #ifndef FAKE_VERSION
-#define FAKE_VERSION 200
+#define FAKE_VERSION ORVIX_PLUGIN_CONTRACT_VERSION
 #endif
 #if defined(FAKE_NAME_NON_ASCII)
 #define FAKE_NAME L"D\u00E9p\u00F4t \u5009\u5EAB"
@@ -33,8 +34,8 @@ void Note(const wchar_t* what)
     FakeJournal::Add(std::wstring(FAKE_TAG L".") + what);
 }
 
-/// Leaves a text for a test in another process, in the file that ORVIX_FAKE_MANIFEST_FILE names, if any.
-void Leave(const std::wstring& text)
+/// Writes a text for a test in another process to the file that ORVIX_FAKE_MANIFEST_FILE names, if any.
+void Report(const std::wstring& text)
 {
     std::wstring file(1024, L'\0');
     file.resize(GetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST_FILE", file.data(), static_cast<DWORD>(file.size())));
@@ -44,7 +45,7 @@ void Leave(const std::wstring& text)
     }
 }
 
-/// Prints both as C code does and past its buffers.
+/// Prints through the C run-time and through the system.
 void Print([[maybe_unused]] const char* text)
 {
 #ifdef FAKE_PRINTS
@@ -71,7 +72,7 @@ IOrvixProvider* GetIOrvixProvider()
 #ifdef FAKE_PROVIDER_THROWS
     throw FAKE_PROVIDER_THROWS;
 #else
-    // One of several in turn, so that the caller cannot have kept the last one.
+    // Another object each time, so that the test sees whether the caller keeps one.
     static FakeProvider providers[] = {FakeProvider(FAKE_NAME), FakeProvider(FAKE_NAME), FakeProvider(FAKE_NAME)};
     static unsigned int next = 0;
     return &providers[next++ % 3];
@@ -102,7 +103,7 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
         Note(L"load");
         Print("I am loaded");
         SetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST", ActiveManifest().c_str());
-        Leave(ActiveManifest());
+        Report(ActiveManifest());
 #ifdef FAKE_START_FAILS
         return FALSE;
 #endif

@@ -1,10 +1,12 @@
 /* A complete plug-in, but for 32-bit processes. */
 
+#include "OrvixVersion.h"
+
 #include <wchar.h>
 
 int GetOrvixVersion(void)
 {
-    return 200;
+    return ORVIX_PLUGIN_CONTRACT_VERSION;
 }
 
 void* GetIOrvixProvider(void)
