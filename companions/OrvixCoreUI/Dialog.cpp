@@ -29,18 +29,39 @@ LONG HeightOf(HWND window)
     return place.bottom - place.top;
 }
 
-/// How high a static control has to be to show its text in its width.
+/// A control's device context, with the control's font selected.
+class ControlContext
+{
+public:
+    explicit ControlContext(HWND control)
+        : m_control(control), m_context(GetDC(control)),
+          m_previousFont(SelectObject(m_context, std::bit_cast<HFONT>(SendMessageW(control, WM_GETFONT, 0, 0))))
+    {
+    }
+    ControlContext(const ControlContext&) = delete;
+    ControlContext& operator=(const ControlContext&) = delete;
+    ~ControlContext()
+    {
+        SelectObject(m_context, m_previousFont);
+        ReleaseDC(m_control, m_context);
+    }
+
+    HDC Get() const { return m_context; }
+
+private:
+    HWND m_control;
+    HDC m_context;
+    HGDIOBJ m_previousFont;
+};
+
+/// The height that a static control needs to show its text in its width.
 LONG NeededHeight(HWND control, const std::wstring& text)
 {
-    const HDC context = GetDC(control);
-    auto* const font = std::bit_cast<HFONT>(SendMessageW(control, WM_GETFONT, 0, 0));
-    const HGDIOBJ before = SelectObject(context, font);
+    const ControlContext context(control);
     RECT area{};
     GetClientRect(control, &area);
-    DrawTextW(context, text.c_str(), static_cast<int>(text.size()), &area,
+    DrawTextW(context.Get(), text.c_str(), static_cast<int>(text.size()), &area,
               DT_CALCRECT | DT_WORDBREAK | DT_EDITCONTROL | DT_NOPREFIX | DT_EXPANDTABS);
-    SelectObject(context, before);
-    ReleaseDC(control, context);
     return area.bottom;
 }
 
@@ -48,7 +69,9 @@ LONG NeededHeight(HWND control, const std::wstring& text)
 
 std::int32_t Dialog::Run(HWND owner)
 {
-    const ActivationContext look;
+    // Version 6 of the common controls. Without it the dialog has the host's look.
+    const UniqueActivationContext manifest = MakeManifestContext(ThisModule());
+    const ActivationScope look(manifest);
     const DpiAwareness resolution;
     const INITCOMMONCONTROLSEX classes{sizeof classes, ICC_LISTVIEW_CLASSES | ICC_STANDARD_CLASSES};
     InitCommonControlsEx(&classes);

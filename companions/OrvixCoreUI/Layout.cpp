@@ -81,14 +81,14 @@ void Layout::SetDpi(UINT dpi)
     m_dpi = dpi;
     LOGFONTW letters = m_letters;
     letters.lfHeight = Scaled(letters.lfHeight);
-    GdiObject<HFONT> font(CreateFontIndirectW(&letters));
+    UniqueGdiObject<HFONT> font(CreateFontIndirectW(&letters));
     if (!font)
     {
         return;
     }
     for (const Control& control : m_controls)
     {
-        SendMessageW(control.window, WM_SETFONT, reinterpret_cast<WPARAM>(font.get()), FALSE);
+        SendMessageW(control.window, WM_SETFONT, reinterpret_cast<WPARAM>(font.Get()), FALSE);
     }
     m_font = std::move(font);
 }

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "GdiObject.h"
+#include "UniqueGdiObject.h"
 
 #include <windows.h>
 
@@ -59,7 +59,7 @@ private:
     std::vector<Control> m_controls;
     SIZE m_inside{};
     LOGFONTW m_letters{};
-    GdiObject<HFONT> m_font;
+    UniqueGdiObject<HFONT> m_font;
     UINT m_baseDpi = USER_DEFAULT_SCREEN_DPI;
     UINT m_dpi = USER_DEFAULT_SCREEN_DPI;
 };

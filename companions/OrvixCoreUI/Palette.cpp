@@ -28,12 +28,12 @@ HBRUSH Palette::Apply(UINT message, HDC context) const
     case WM_CTLCOLORBTN:
         SetBkColor(context, m_face);
         SetTextColor(context, m_faceText);
-        return m_faceBrush.get();
+        return m_faceBrush.Get();
     case WM_CTLCOLOREDIT:
     case WM_CTLCOLORLISTBOX:
         SetBkColor(context, m_window);
         SetTextColor(context, m_windowText);
-        return m_windowBrush.get();
+        return m_windowBrush.Get();
     default:
         return nullptr;
     }

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "GdiObject.h"
+#include "UniqueGdiObject.h"
 
 #include <windows.h>
 
@@ -28,6 +28,6 @@ private:
     COLORREF m_faceText;
     COLORREF m_window;
     COLORREF m_windowText;
-    GdiObject<HBRUSH> m_faceBrush;
-    GdiObject<HBRUSH> m_windowBrush;
+    UniqueGdiObject<HBRUSH> m_faceBrush;
+    UniqueGdiObject<HBRUSH> m_windowBrush;
 };

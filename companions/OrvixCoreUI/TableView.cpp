@@ -1,14 +1,13 @@
 #include "TableView.h"
 
 #include "Texts.h"
+#include "UniqueHandle.h"
 #include "resource.h"
 
 #include <algorithm>
 #include <bit>
 #include <iterator>
-#include <memory>
 #include <numeric>
-#include <type_traits>
 #include <utility>
 
 namespace
@@ -20,11 +19,13 @@ constexpr UINT StateImageShift = 12;
 /// The control's -1: every place to set a state of, and the place before the first.
 constexpr auto AllPlaces = static_cast<std::size_t>(-1);
 
-struct DestroyMenuDeleter
+struct MenuPolicy
 {
-    void operator()(HMENU menu) const { DestroyMenu(menu); }
+    using Handle = HMENU;
+    static Handle None() noexcept { return nullptr; }
+    static void Close(Handle menu) noexcept { DestroyMenu(menu); }
 };
-using Menu = std::unique_ptr<std::remove_pointer_t<HMENU>, DestroyMenuDeleter>;
+using UniqueMenu = UniqueHandle<MenuPolicy>;
 
 /// Lets a window change many times at the cost of one drawing.
 class DrawnOnce
@@ -138,14 +139,14 @@ void TableView::ShowMenu(POINT point)
         point = {};
         ClientToScreen(m_window, &point);
     }
-    const Menu menu(CreatePopupMenu());
+    const UniqueMenu menu(CreatePopupMenu());
     for (std::size_t column = 0; column < m_columns; ++column)
     {
         const std::wstring heading = Heading(column);
         const std::wstring words = FormatText(IDS_SORT_BY, {reinterpret_cast<DWORD_PTR>(heading.c_str())});
-        AppendMenuW(menu.get(), MF_STRING, column + 1, words.c_str());
+        AppendMenuW(menu.Get(), MF_STRING, column + 1, words.c_str());
     }
-    const int chosen = TrackPopupMenu(menu.get(), TPM_RETURNCMD, point.x, point.y, 0, m_window, nullptr);
+    const int chosen = TrackPopupMenu(menu.Get(), TPM_RETURNCMD, point.x, point.y, 0, m_window, nullptr);
     if (chosen > 0)
     {
         SortBy(static_cast<std::size_t>(chosen) - 1);

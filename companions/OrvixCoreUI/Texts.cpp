@@ -1,8 +1,7 @@
 #include "Texts.h"
 
 #include "Module.h"
-
-#include <memory>
+#include "UniqueHandle.h"
 
 std::wstring Text(UINT id)
 {
@@ -13,18 +12,13 @@ std::wstring Text(UINT id)
 
 std::wstring FormatText(UINT id, std::initializer_list<DWORD_PTR> inserts)
 {
-    struct FreeLocal
-    {
-        void operator()(wchar_t* text) const { LocalFree(text); }
-    };
-    wchar_t* made = nullptr;
+    UniqueLocalMemory text;
     const std::wstring form = Text(id);
     auto* arguments = reinterpret_cast<va_list*>(const_cast<DWORD_PTR*>(inserts.begin()));
     const DWORD length =
         FormatMessageW(FORMAT_MESSAGE_FROM_STRING | FORMAT_MESSAGE_ARGUMENT_ARRAY | FORMAT_MESSAGE_ALLOCATE_BUFFER,
-                       form.c_str(), 0, 0, reinterpret_cast<wchar_t*>(&made), 0, arguments);
-    const std::unique_ptr<wchar_t, FreeLocal> owned(made);
-    return {made, length};
+                       form.c_str(), 0, 0, reinterpret_cast<wchar_t*>(text.Out()), 0, arguments);
+    return {static_cast<const wchar_t*>(text.Get()), length};
 }
 
 std::wstring OneLine(std::wstring text)
