@@ -2,6 +2,7 @@
 
 #include "ActivationContext.h"
 #include "DpiAwareness.h"
+#include "ExceptionBarrier.h"
 #include "Module.h"
 #include "Settings.h"
 #include "resource.h"
@@ -67,7 +68,7 @@ LONG NeededHeight(HWND control, const std::wstring& text)
 
 } // namespace
 
-std::int32_t Dialog::Run(HWND owner)
+std::optional<std::int32_t> Dialog::Run(HWND owner)
 {
     // Version 6 of the common controls. Without it the dialog has the host's look.
     const UniqueActivationContext manifest = MakeManifestContext(ThisModule());
@@ -75,9 +76,9 @@ std::int32_t Dialog::Run(HWND owner)
     const DpiAwareness resolution;
     const INITCOMMONCONTROLSEX classes{sizeof classes, ICC_LISTVIEW_CLASSES | ICC_STANDARD_CLASSES};
     InitCommonControlsEx(&classes);
-    const INT_PTR result = DialogBoxParamW(ThisModule(), ResourceName(static_cast<std::uintptr_t>(m_templateId)), owner,
-                                           &Procedure, reinterpret_cast<LPARAM>(this));
-    return static_cast<std::int32_t>(std::max<INT_PTR>(result, 0));
+    DialogBoxParamW(ThisModule(), ResourceName(static_cast<std::uintptr_t>(m_templateId)), owner, &Procedure,
+                    reinterpret_cast<LPARAM>(this));
+    return m_result;
 }
 
 std::wstring Dialog::GetText(int control) const
@@ -89,9 +90,15 @@ std::wstring Dialog::GetText(int control) const
     return text;
 }
 
-void Dialog::SetTicked(int control, bool ticked) const
+void Dialog::SetChecked(int control, bool checked) const
 {
-    CheckDlgButton(m_window, control, ticked ? BST_CHECKED : BST_UNCHECKED);
+    CheckDlgButton(m_window, control, checked ? BST_CHECKED : BST_UNCHECKED);
+}
+
+void Dialog::End(std::int32_t result)
+{
+    m_result = result;
+    EndDialog(m_window, 0);
 }
 
 void Dialog::Hide(int control) const
@@ -112,15 +119,12 @@ INT_PTR CALLBACK Dialog::Procedure(HWND window, UINT message, WPARAM wParam, LPA
     {
         return FALSE;
     }
-    try
+    INT_PTR result = TRUE;
+    if (!Completes([&] { result = dialog->Handle(message, wParam, lParam); }))
     {
-        return dialog->Handle(message, wParam, lParam);
+        EndDialog(window, 0);
     }
-    catch (...)
-    {
-        dialog->End(0);
-        return TRUE;
-    }
+    return result;
 }
 
 INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)

@@ -6,6 +6,7 @@
 #include <windows.h>
 
 #include <cstdint>
+#include <optional>
 #include <span>
 #include <string>
 
@@ -17,9 +18,9 @@ public:
     Dialog(const Dialog&) = delete;
     Dialog& operator=(const Dialog&) = delete;
 
-    /// Shows the dialog until it is ended and returns its result. A dialog that cannot be shown, or fails
-    /// while it is, is cancelled: 0.
-    std::int32_t Run(HWND owner);
+    /// Shows the dialog until it is ended and returns its result; nothing when it cannot be shown or fails while it is
+    /// open. `owner` may be null.
+    std::optional<std::int32_t> Run(HWND owner);
 
 protected:
     /// `name` is the one under which the user's size of the dialog is remembered; null: its size is not.
@@ -48,7 +49,8 @@ protected:
     /// The controls have followed a new size.
     virtual void OnSize() {}
 
-    void End(std::int32_t result) const { EndDialog(m_window, result); }
+    /// Closes the dialog; `Run` returns `result`.
+    void End(std::int32_t result);
 
     const Palette& Colors() const { return m_palette; }
     HWND Window() const { return m_window; }
@@ -56,8 +58,8 @@ protected:
     void SetTitle(const wchar_t* text) const { SetWindowTextW(m_window, text); }
     void SetText(int control, const wchar_t* text) const { SetDlgItemTextW(m_window, control, text); }
     std::wstring GetText(int control) const;
-    void SetTicked(int control, bool ticked) const;
-    bool IsTicked(int control) const { return IsDlgButtonChecked(m_window, control) == BST_CHECKED; }
+    void SetChecked(int control, bool checked) const;
+    bool IsChecked(int control) const { return IsDlgButtonChecked(m_window, control) == BST_CHECKED; }
 
     void Focus(int control) const { SendMessageW(m_window, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(Item(control)), 1); }
 
@@ -85,4 +87,5 @@ private:
     Layout m_layout;
     LONG m_roomForMessage = 0; // by which the window is higher, at 96 dots per inch
     HWND m_window = nullptr;
+    std::optional<std::int32_t> m_result;
 };

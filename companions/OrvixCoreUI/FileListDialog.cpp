@@ -1,6 +1,7 @@
 #include "FileListDialog.h"
 
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
 #include "Settings.h"
@@ -11,11 +12,6 @@
 
 namespace
 {
-
-/// FlagsIn: the entry starts ticked.
-constexpr unsigned long StartsTicked = 0x1;
-/// FlagsOut: the user left the entry ticked.
-constexpr unsigned long Ticked = 0x2;
 
 constexpr Layout::Rule FileListRules[] = {{IDC_MESSAGE, Layout::GrowX},
                                           {IDC_FILTER, Layout::GrowX},
@@ -95,9 +91,10 @@ void FileListDialog::OnInit()
     SetText(IDC_COMMENT, m_params.GetComment());
     FillList();
     ShowRecentComments();
-    SetText(IDC_OPTION, Text(Has(OptionKeepsCheckedOut) ? IDS_KEEP_CHECKED_OUT : IDS_GET_LATEST).c_str());
-    InitBox(IDC_OPTION, OffersOption(), OptionTicked);
-    InitBox(IDC_REMEMBER, Has(OfferRemember), RememberTicked);
+    SetText(IDC_OPTION,
+            Text(Has(OrvixDialogOption::OfferKeepCheckedOut) ? IDS_KEEP_CHECKED_OUT : IDS_GET_LATEST).c_str());
+    InitBox(IDC_OPTION, OffersOption(), OrvixDialogOption::OptionChecked);
+    InitBox(IDC_REMEMBER, Has(OrvixDialogOption::OfferRemember), OrvixDialogOption::RememberChecked);
 }
 
 void FileListDialog::OnCommand(int control, int notification)
@@ -112,7 +109,7 @@ void FileListDialog::OnCommand(int control, int notification)
         break;
     case IDC_SELECT_ALL:
     case IDC_SELECT_NONE:
-        m_files.TickShown(control == IDC_SELECT_ALL);
+        m_files.CheckShown(control == IDC_SELECT_ALL);
         break;
     case IDC_RECENT:
         // In the open list alone: in the closed one keys and the wheel pass over items that nobody chose. An open list
@@ -129,11 +126,11 @@ void FileListDialog::OnCommand(int control, int notification)
     case IDOK:
         StoreOptions();
         StoreChoice();
-        End(1);
+        End(OrvixDialogResult::Confirmed);
         return;
     case IDCANCEL:
         StoreOptions();
-        End(0);
+        End(OrvixDialogResult::Cancelled);
         return;
     default:
         return;
@@ -163,16 +160,17 @@ bool FileListDialog::OnContextMenu(HWND control, POINT point)
 
 void FileListDialog::FillList()
 {
-    m_files = TableView(Item(IDC_LIST), Colors(), Has(OfferTicks));
+    m_files = TableView(Item(IDC_LIST), Colors(), EntriesCanBeCleared());
     m_files.AddColumn(Text(IDS_NAME), 28);
     m_files.AddColumn(Text(IDS_FOLDER), 34);
     m_files.AddColumn(Text(IDS_STATE), 38);
     for (OrvixFileEntry* entry : m_entries)
     {
-        m_files.AddRow(CellsOf(*entry), !Has(OfferTicks) || (entry->GetFlagsIn() & StartsTicked) != 0);
+        m_files.AddRow(CellsOf(*entry),
+                       !EntriesCanBeCleared() || (entry->GetFlagsIn() & OrvixFileSelection::Selected) != 0);
     }
     m_files.Refresh();
-    if (!Has(OfferTicks))
+    if (!EntriesCanBeCleared())
     {
         Hide(IDC_SELECT_ALL);
         Hide(IDC_SELECT_NONE);
@@ -184,7 +182,7 @@ void FileListDialog::ShowCount() const
 {
     const bool all = m_files.NumShown() == m_files.NumRows();
     const auto count =
-        FormatText(all ? IDS_COUNT : IDS_COUNT_SHOWN, {m_files.NumTicked(), m_files.NumRows(), m_files.NumShown()});
+        FormatText(all ? IDS_COUNT : IDS_COUNT_SHOWN, {m_files.NumChecked(), m_files.NumRows(), m_files.NumShown()});
     if (count != GetText(IDC_COUNT))
     {
         SetText(IDC_COUNT, count.c_str());
@@ -215,11 +213,11 @@ void FileListDialog::TakeRecentComment() const
     SendDlgItemMessageW(Window(), IDC_COMMENT, EM_REPLACESEL, TRUE, reinterpret_cast<LPARAM>(comment.c_str()));
 }
 
-void FileListDialog::InitBox(int control, bool offered, std::uint32_t tickedBit) const
+void FileListDialog::InitBox(int control, bool offered, std::uint32_t checkedBit) const
 {
     if (offered)
     {
-        SetTicked(control, Has(tickedBit));
+        SetChecked(control, Has(checkedBit));
     }
     else
     {
@@ -227,20 +225,20 @@ void FileListDialog::InitBox(int control, bool offered, std::uint32_t tickedBit)
     }
 }
 
-void FileListDialog::StoreBox(int control, bool offered, std::uint32_t tickedBit) const
+void FileListDialog::StoreBox(int control, bool offered, std::uint32_t checkedBit) const
 {
     if (!offered)
     {
         return;
     }
     const std::uint32_t options = m_params.GetOptions();
-    m_params.SetOptions(IsTicked(control) ? options | tickedBit : options & ~tickedBit);
+    m_params.SetOptions(IsChecked(control) ? options | checkedBit : options & ~checkedBit);
 }
 
 void FileListDialog::StoreOptions() const
 {
-    StoreBox(IDC_OPTION, OffersOption(), OptionTicked);
-    StoreBox(IDC_REMEMBER, Has(OfferRemember), RememberTicked);
+    StoreBox(IDC_OPTION, OffersOption(), OrvixDialogOption::OptionChecked);
+    StoreBox(IDC_REMEMBER, Has(OrvixDialogOption::OfferRemember), OrvixDialogOption::RememberChecked);
 }
 
 void FileListDialog::StoreChoice() const
@@ -251,7 +249,8 @@ void FileListDialog::StoreChoice() const
     for (std::size_t row = 0; OrvixFileEntry * entry : m_entries)
     {
         const unsigned long flags = entry->GetFlagsOut();
-        entry->SetFlagsOut(m_files.IsTicked(row) ? flags | Ticked : flags & ~Ticked);
+        entry->SetFlagsOut(m_files.IsChecked(row) ? flags | OrvixFileSelection::Confirmed
+                                                  : flags & ~OrvixFileSelection::Confirmed);
         ++row;
     }
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Dialog.h"
+#include "OrvixDialogOption.h"
 #include "TableView.h"
 
 #include <string>
@@ -9,18 +10,10 @@
 class OrvixFileEntry;
 class OrvixFileListDialogParams;
 
-/// Shows the active entries of a file list and lets the user confirm them: 1 confirmed, 0 cancelled.
+/// Shows the active entries of a file list and lets the user confirm them. The result is an `OrvixDialogResult`.
 class FileListDialog final : public Dialog
 {
 public:
-    /// Bits of the record's options.
-    static constexpr std::uint32_t OfferTicks = 0x1;
-    static constexpr std::uint32_t OptionKeepsCheckedOut = 0x4;
-    static constexpr std::uint32_t OptionGetsLatest = 0x8;
-    static constexpr std::uint32_t OptionTicked = 0x10;
-    static constexpr std::uint32_t OfferRemember = 0x40;
-    static constexpr std::uint32_t RememberTicked = 0x80;
-
     /// `params` has a file list; both outlive the dialog.
     FileListDialog(IOrvixCoreUIClientAccess* access, OrvixFileListDialogParams& params);
 
@@ -36,12 +29,17 @@ private:
     void ShowCount() const;
     void ShowRecentComments();
     void TakeRecentComment() const;
-    void InitBox(int control, bool offered, std::uint32_t tickedBit) const;
-    void StoreBox(int control, bool offered, std::uint32_t tickedBit) const;
+    void InitBox(int control, bool offered, std::uint32_t checkedBit) const;
+    void StoreBox(int control, bool offered, std::uint32_t checkedBit) const;
     void StoreOptions() const;
     void StoreChoice() const;
+    /// Whether the record has one of these bits of `OrvixDialogOption`.
     bool Has(std::uint32_t options) const;
-    bool OffersOption() const { return Has(OptionKeepsCheckedOut | OptionGetsLatest); }
+    bool EntriesCanBeCleared() const { return Has(OrvixDialogOption::EntriesCanBeCleared); }
+    bool OffersOption() const
+    {
+        return Has(OrvixDialogOption::OfferKeepCheckedOut | OrvixDialogOption::OfferGetLatest);
+    }
 
     OrvixFileListDialogParams& m_params;
     std::vector<OrvixFileEntry*> m_entries;

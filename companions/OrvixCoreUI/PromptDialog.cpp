@@ -1,5 +1,6 @@
 #include "PromptDialog.h"
 
+#include "OrvixPrompt.h"
 #include "Texts.h"
 #include "resource.h"
 
@@ -11,8 +12,17 @@
 namespace
 {
 
-/// From the right.
-constexpr int Buttons[] = {IDC_NO_TO_ALL, IDNO, IDC_YES_TO_ALL, IDYES};
+struct Button
+{
+    int control;
+    std::int32_t answer;
+};
+
+/// From right to left.
+constexpr Button Buttons[] = {{IDC_NO_TO_ALL, OrvixPromptAnswer::NoToAll},
+                              {IDNO, OrvixPromptAnswer::No},
+                              {IDC_YES_TO_ALL, OrvixPromptAnswer::YesToAll},
+                              {IDYES, OrvixPromptAnswer::Yes}};
 
 constexpr Layout::Rule PromptRules[] = {
     {IDC_MESSAGE, Layout::GrowX | Layout::GrowY}, {IDC_DO_NOT_ASK, Layout::GrowX | Layout::MoveY},
@@ -21,20 +31,9 @@ constexpr Layout::Rule PromptRules[] = {
 
 std::optional<std::int32_t> AnswerOf(int control)
 {
-    switch (control)
-    {
-    case IDYES:
-        return 1;
-    case IDNO:
-    case IDCANCEL:
-        return 0;
-    case IDC_YES_TO_ALL:
-        return 2;
-    case IDC_NO_TO_ALL:
-        return 3;
-    default:
-        return std::nullopt;
-    }
+    const auto* found = std::find_if(std::begin(Buttons), std::end(Buttons),
+                                     [control](const Button& button) { return button.control == control; });
+    return found == std::end(Buttons) ? std::nullopt : std::optional(found->answer);
 }
 
 RECT PlaceOf(HWND control)
@@ -65,72 +64,78 @@ void PromptDialog::OnInit()
     SetText(IDC_MESSAGE, m_message);
     SendDlgItemMessageW(Window(), IDC_ICON_OF_PROMPT, STM_SETICON, reinterpret_cast<WPARAM>(LoadIconW(nullptr, Icon())),
                         0);
-    if (Has(OnlyOk))
+    if (Has(OrvixPromptOption::OnlyOK))
     {
         SetText(IDYES, Text(IDS_OK).c_str());
     }
-    if (!Has(OfferDoNotAsk))
+    if (!Has(OrvixPromptOption::OfferStopAsking))
     {
         Hide(IDC_DO_NOT_ASK);
     }
+    ArrangeButtons();
+}
 
-    // The buttons that are offered take the places on the right.
+/// Moves the buttons that are offered to the right and hides the others.
+void PromptDialog::ArrangeButtons() const
+{
     RECT places[std::size(Buttons)];
     std::transform(std::begin(Buttons), std::end(Buttons), places,
-                   [this](int button) { return PlaceOf(Item(button)); });
+                   [this](const Button& button) { return PlaceOf(Item(button.control)); });
     const RECT* place = places;
-    for (const int button : Buttons)
+    for (const Button& button : Buttons)
     {
-        if (Offers(button))
+        if (Offers(m_options, button.answer))
         {
-            SetWindowPos(Item(button), nullptr, place->left, place->top, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
+            SetWindowPos(Item(button.control), nullptr, place->left, place->top, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
             ++place;
         }
         else
         {
-            Hide(button);
+            Hide(button.control);
         }
     }
 }
 
 void PromptDialog::OnCommand(int control, int)
 {
-    // Where OK is all that can be said, closing says it.
-    const auto answer = AnswerOf(control == IDCANCEL && Has(OnlyOk) ? IDYES : control);
-    if (!answer)
+    if (control == IDCANCEL)
     {
-        return;
+        control = Has(OrvixPromptOption::OnlyOK) ? IDYES : IDNO; // with one button, closing means OK
     }
-    m_doNotAskAgain = IsTicked(IDC_DO_NOT_ASK);
-    End(*answer);
+    if (const auto answer = AnswerOf(control))
+    {
+        m_doNotAskAgain = IsChecked(IDC_DO_NOT_ASK);
+        End(*answer);
+    }
 }
 
-bool PromptDialog::Offers(int button) const
+bool PromptDialog::Offers(std::uint32_t options, std::int32_t answer)
 {
-    switch (button)
+    const bool onlyOK = (options & OrvixPromptOption::OnlyOK) != 0;
+    switch (answer)
     {
-    case IDYES:
+    case OrvixPromptAnswer::Yes:
         return true;
-    case IDNO:
-        return !Has(OnlyOk);
-    case IDC_YES_TO_ALL:
-        return Has(OfferYesToAll) && !Has(OnlyOk);
+    case OrvixPromptAnswer::YesToAll:
+        return !onlyOK && (options & OrvixPromptOption::OfferYesToAll) != 0;
+    case OrvixPromptAnswer::NoToAll:
+        return !onlyOK && (options & OrvixPromptOption::OfferNoToAll) != 0;
     default:
-        return Has(OfferNoToAll) && !Has(OnlyOk);
+        return !onlyOK;
     }
 }
 
 const wchar_t* PromptDialog::Icon() const
 {
-    switch (m_options & Icons)
+    switch (m_options & OrvixPromptOption::IconMask)
     {
-    case InformationIcon:
+    case OrvixPromptOption::InformationIcon:
         return IDI_INFORMATION;
-    case WarningIcon:
+    case OrvixPromptOption::WarningIcon:
         return IDI_WARNING;
-    case ErrorIcon:
+    case OrvixPromptOption::ErrorIcon:
         return IDI_ERROR;
     default:
-        return Has(OnlyOk) ? IDI_INFORMATION : IDI_QUESTION;
+        return Has(OrvixPromptOption::OnlyOK) ? IDI_INFORMATION : IDI_QUESTION;
     }
 }

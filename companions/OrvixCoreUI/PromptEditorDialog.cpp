@@ -1,5 +1,6 @@
 #include "PromptEditorDialog.h"
 
+#include "OrvixPrompt.h"
 #include "OrvixPromptTable.h"
 #include "PromptDialog.h"
 #include "Texts.h"
@@ -24,13 +25,16 @@ constexpr Layout::Rule EditorRules[] = {{IDC_FILTER, Layout::GrowX},
 
 struct Answer
 {
-    unsigned long action;
+    std::uint32_t action;
     UINT words;
 };
 
-/// In the order of precedence in which a stored action is read; the last one also stands for no answer at all.
-constexpr Answer Answers[] = {
-    {0x1, IDS_ASK}, {0x2, IDS_YES}, {0x8, IDS_YES_TO_ALL}, {0x10, IDS_NO_TO_ALL}, {0x4, IDS_NO}};
+/// Of an action with several bits the first one in this order counts. An action without any of them is read as No.
+constexpr Answer Answers[] = {{OrvixPromptAction::Ask, IDS_ASK},
+                              {OrvixPromptAction::Yes, IDS_YES},
+                              {OrvixPromptAction::YesToAll, IDS_YES_TO_ALL},
+                              {OrvixPromptAction::NoToAll, IDS_NO_TO_ALL},
+                              {OrvixPromptAction::No, IDS_NO}};
 constexpr std::size_t Ask = 0;
 
 std::size_t AnswerIndex(unsigned long action)
@@ -95,10 +99,10 @@ void PromptEditorDialog::OnCommand(int control, int notification)
         ShowSelected();
         break;
     case IDOK:
-        End(Store() ? 1 : 0);
+        End(Store() ? OrvixPromptEditorResult::Changed : OrvixPromptEditorResult::Unchanged);
         break;
     case IDCANCEL:
-        End(0);
+        End(OrvixPromptEditorResult::Unchanged);
         break;
     default:
         break;
@@ -137,18 +141,8 @@ std::wstring PromptEditorDialog::AnswerInWords(unsigned int row) const
 
 bool PromptEditorDialog::IsOffered(unsigned int row, std::size_t answer) const
 {
-    const unsigned long options = m_prompts.GetPromptOptions(row);
-    switch (Answers[answer].words)
-    {
-    case IDS_NO:
-        return (options & PromptDialog::OnlyOk) == 0;
-    case IDS_YES_TO_ALL:
-        return (options & PromptDialog::OnlyOk) == 0 && (options & PromptDialog::OfferYesToAll) != 0;
-    case IDS_NO_TO_ALL:
-        return (options & PromptDialog::OnlyOk) == 0 && (options & PromptDialog::OfferNoToAll) != 0;
-    default:
-        return true;
-    }
+    return answer == Ask ||
+           PromptDialog::Offers(m_prompts.GetPromptOptions(row), OrvixPromptAction::ToAnswer(Answers[answer].action));
 }
 
 void PromptEditorDialog::ShowSelected()

@@ -7,7 +7,8 @@
 
 class OrvixPromptTable;
 
-/// Shows the stored answers and lets the user change those that are not locked: 1 when one was changed, else 0.
+/// Shows the stored answers and lets the user change those that are not locked. The result is an
+/// `OrvixPromptEditorResult`.
 class PromptEditorDialog final : public Dialog
 {
 public:

@@ -13,7 +13,7 @@
 namespace
 {
 
-/// The state image of a row with a check box: number 1 not ticked, number 2 ticked.
+/// The state image of a row with a check box: number 1 clear, number 2 checked.
 constexpr UINT StateImageShift = 12;
 
 /// The control's -1: every place to set a state of, and the place before the first.
@@ -73,10 +73,10 @@ void TableView::AddColumn(const std::wstring& heading, int share)
     Send(LVM_INSERTCOLUMNW, m_columns++, &column);
 }
 
-void TableView::AddRow(std::vector<std::wstring> cells, bool ticked)
+void TableView::AddRow(std::vector<std::wstring> cells, bool checked)
 {
     m_table.Add(std::move(cells));
-    m_ticked.push_back(ticked);
+    m_checked.push_back(checked);
 }
 
 void TableView::Refresh()
@@ -95,16 +95,16 @@ void TableView::Filter(const std::wstring& text)
     KeepingSelection([&] { m_table.Filter(text); });
 }
 
-std::size_t TableView::NumTicked() const
+std::size_t TableView::NumChecked() const
 {
-    return static_cast<std::size_t>(std::count(m_ticked.begin(), m_ticked.end(), true));
+    return static_cast<std::size_t>(std::count(m_checked.begin(), m_checked.end(), true));
 }
 
-void TableView::TickShown(bool ticked)
+void TableView::CheckShown(bool checked)
 {
     std::vector<std::size_t> places(m_table.NumShown());
     std::iota(places.begin(), places.end(), std::size_t{0});
-    Tick(places, ticked);
+    Check(places, checked);
 }
 
 std::optional<std::size_t> TableView::Selected() const
@@ -206,7 +206,7 @@ void TableView::GiveItem(LVITEMW& item) const
     }
     if ((item.mask & LVIF_STATE) != 0 && m_checkBoxes)
     {
-        item.state = (m_ticked[row] ? 2U : 1U) << StateImageShift;
+        item.state = (m_checked[row] ? 2U : 1U) << StateImageShift;
     }
 }
 
@@ -299,7 +299,7 @@ void TableView::ToggleFocused()
     {
         places = {*focused};
     }
-    Tick(places, !m_ticked[m_table.RowAt(*focused)]);
+    Check(places, !m_checked[m_table.RowAt(*focused)]);
 }
 
 void TableView::ToggleClicked(const NMITEMACTIVATE& click)
@@ -312,15 +312,15 @@ void TableView::ToggleClicked(const NMITEMACTIVATE& click)
         return;
     }
     const auto place = static_cast<std::size_t>(found);
-    Tick({place}, !m_ticked[m_table.RowAt(place)]);
+    Check({place}, !m_checked[m_table.RowAt(place)]);
 }
 
 /// The control does not know that anything changes. Screen readers are told of one row, or of the whole list.
-void TableView::Tick(const std::vector<std::size_t>& places, bool ticked)
+void TableView::Check(const std::vector<std::size_t>& places, bool checked)
 {
     for (const std::size_t place : places)
     {
-        m_ticked[m_table.RowAt(place)] = ticked;
+        m_checked[m_table.RowAt(place)] = checked;
     }
     InvalidateRect(m_window, nullptr, FALSE);
     NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT,

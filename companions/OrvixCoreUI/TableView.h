@@ -26,7 +26,7 @@ public:
 
     /// Columns go before rows. `share` of the width, in percent.
     void AddColumn(const std::wstring& heading, int share);
-    void AddRow(std::vector<std::wstring> cells, bool ticked);
+    void AddRow(std::vector<std::wstring> cells, bool checked);
 
     /// Shows the rows added since.
     void Refresh();
@@ -36,11 +36,11 @@ public:
     std::size_t NumRows() const { return m_table.NumRows(); }
     std::size_t NumShown() const { return m_table.NumShown(); }
 
-    bool IsTicked(std::size_t row) const { return m_ticked[row]; }
-    std::size_t NumTicked() const;
+    bool IsChecked(std::size_t row) const { return m_checked[row]; }
+    std::size_t NumChecked() const;
 
     /// Ticks or unticks the rows that are shown.
-    void TickShown(bool ticked);
+    void CheckShown(bool checked);
 
     /// The first selected row.
     std::optional<std::size_t> Selected() const;
@@ -63,7 +63,7 @@ private:
     void SetState(std::size_t place, UINT states, UINT value) const;
     void ToggleFocused();
     /// Does not draw.
-    void Tick(const std::vector<std::size_t>& places, bool ticked);
+    void Check(const std::vector<std::size_t>& places, bool checked);
     void ToggleClicked(const NMITEMACTIVATE& click);
     LRESULT Find(const NMLVFINDITEMW& search) const;
     std::vector<std::size_t> SelectedPlaces() const;
@@ -73,7 +73,7 @@ private:
 
     HWND m_window = nullptr;
     TextTable m_table;
-    std::vector<bool> m_ticked;
+    std::vector<bool> m_checked;
     std::size_t m_columns = 0;
     std::size_t m_sortColumn = 0;
     bool m_sorted = false;
