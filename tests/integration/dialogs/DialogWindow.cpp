@@ -162,7 +162,7 @@ bool DialogWindow::Has(const std::wstring& name) const
     return Find(m_window, name) != nullptr;
 }
 
-bool DialogWindow::IsTicked(const std::wstring& name) const
+bool DialogWindow::IsChecked(const std::wstring& name) const
 {
     return SendMessageW(Control(name), BM_GETCHECK, 0, 0) == BST_CHECKED;
 }
@@ -267,7 +267,7 @@ std::vector<std::wstring> DialogWindow::Column(const std::wstring& list, int col
     return cells;
 }
 
-bool DialogWindow::IsRowTicked(const std::wstring& list, int row) const
+bool DialogWindow::IsRowChecked(const std::wstring& list, int row) const
 {
     const LRESULT state = SendMessageW(Control(list), LVM_GETITEMSTATE, static_cast<WPARAM>(row), LVIS_STATEIMAGEMASK);
     return state >> 12 == 2;
@@ -279,16 +279,16 @@ bool DialogWindow::IsRowInView(const std::wstring& list, int row) const
     return row >= top && row < top + SendMessageW(Control(list), LVM_GETCOUNTPERPAGE, 0, 0);
 }
 
-std::vector<bool> DialogWindow::Ticks(const std::wstring& list) const
+std::vector<bool> DialogWindow::CheckedRows(const std::wstring& list) const
 {
     const int count = NumRows(list);
-    std::vector<bool> ticks;
-    ticks.reserve(static_cast<std::size_t>(count));
+    std::vector<bool> checked;
+    checked.reserve(static_cast<std::size_t>(count));
     for (int row = 0; row < count; ++row)
     {
-        ticks.push_back(IsRowTicked(list, row));
+        checked.push_back(IsRowChecked(list, row));
     }
-    return ticks;
+    return checked;
 }
 
 void DialogWindow::SelectRow(const std::wstring& list, int row) const

@@ -36,7 +36,7 @@ public:
     HWND Control(const std::wstring& name) const;
     bool Has(const std::wstring& name) const;
     bool IsEnabled(const std::wstring& name) const { return IsWindowEnabled(Control(name)) != FALSE; }
-    bool IsTicked(const std::wstring& name) const;
+    bool IsChecked(const std::wstring& name) const;
 
     /// The visible buttons, check boxes left out, from left to right.
     std::vector<std::wstring> Buttons() const;
@@ -58,9 +58,9 @@ public:
     int NumRows(const std::wstring& list) const;
     std::wstring Cell(const std::wstring& list, int row, int column) const;
     std::vector<std::wstring> Column(const std::wstring& list, int column) const;
-    bool IsRowTicked(const std::wstring& list, int row) const;
+    bool IsRowChecked(const std::wstring& list, int row) const;
     bool IsRowInView(const std::wstring& list, int row) const;
-    std::vector<bool> Ticks(const std::wstring& list) const;
+    std::vector<bool> CheckedRows(const std::wstring& list) const;
     void SelectRow(const std::wstring& list, int row) const;
     void SelectEveryRow(const std::wstring& list) const;
     void UnselectRow(const std::wstring& list, int row) const;

@@ -3,8 +3,10 @@
 #include "IOrvixClientAccess.h"
 #include "IOrvixServices.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixPrompt.h"
 #include "OrvixServicesPointer.h"
 #include "PrivateUserKey.h"
 #include "TempFolder.h"
@@ -19,7 +21,7 @@
 
 using Texts = std::vector<std::wstring>;
 
-/// A host with colours of its own for some of the system's.
+/// A host that replaces some of the system's colours.
 class ColourfulHost final : public IOrvixClientAccess
 {
 public:
@@ -36,29 +38,35 @@ public:
     std::intptr_t RelayB(void*, void*, void*, void*) override { return 0; }
 };
 
-/// A services object over the reference dialogs, and a user. What dialogs remember in the registry is the test's own.
+/// A services object with the reference dialogs, and a user. Each test has an empty registry for what dialogs remember.
 /// Skipped without a display.
 class DialogsTest : public testing::Test
 {
 protected:
-    static constexpr std::uint32_t NoPrompt = 0xFFFFFFFF;
     static constexpr const wchar_t* Title = L"Sesame";
 
     DialogsTest();
     void SetUp() override;
 
-    /// Initialises the services object anew, with the stored answers of the last one.
+    /// Makes a new services object, which reads the answers that the last one stored.
     void Restart();
 
-    std::int32_t ShowPrompt(std::uint32_t options, const std::function<void(const DialogWindow&)>& handle,
-                            std::uint32_t promptID = NoPrompt, bool* dontAskAgain = nullptr,
-                            const std::wstring& message = L"Open?");
+    /// What the user does at a dialog.
+    using Handler = std::function<void(const DialogWindow&)>;
 
-    OrvixFileEntry& AddFile(const wchar_t* path, unsigned long flagsOut = 0x2, bool ticked = true);
-    std::int32_t ShowFileList(std::uint32_t options, const std::function<void(const DialogWindow&)>& handle);
-    std::int32_t ShowEditor(const std::function<void(const DialogWindow&)>& handle);
+    std::int32_t ShowPrompt(std::uint32_t options, const Handler& handle, std::uint32_t promptID = OrvixPromptID::None,
+                            bool* dontAskAgain = nullptr, const std::wstring& message = L"Open?");
 
-    /// The stored answers as they lie on the disk.
+    /// Adds an active entry, which the dialog shows checked or not.
+    OrvixFileEntry& AddFile(const wchar_t* path, unsigned long flagsOut = OrvixFileState::Controlled,
+                            bool checked = true);
+    std::int32_t ShowFileList(std::uint32_t options, const Handler& handle);
+
+    /// The same with `OrvixDialogOption::EntriesCanBeCleared` alone.
+    std::int32_t ShowFileList(const Handler& handle);
+    std::int32_t ShowEditor(const Handler& handle);
+
+    /// The bytes of the file that stores the answers.
     std::string PromptFile() const;
 
     PrivateUserKey m_userKey;

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "UniqueHandle.h"
+
 #include <windows.h>
 
 #include <string>
@@ -10,10 +12,9 @@ class PrivateUserKey
 public:
     PrivateUserKey() : m_path(L"Software\\OrvixCoreTest" + std::to_wstring(GetCurrentProcessId()))
     {
-        HKEY key = nullptr;
-        RegCreateKeyExW(HKEY_CURRENT_USER, m_path.c_str(), 0, nullptr, 0, KEY_ALL_ACCESS, nullptr, &key, nullptr);
-        RegOverridePredefKey(HKEY_CURRENT_USER, key);
-        RegCloseKey(key);
+        UniqueRegistryKey key;
+        RegCreateKeyExW(HKEY_CURRENT_USER, m_path.c_str(), 0, nullptr, 0, KEY_ALL_ACCESS, nullptr, key.Out(), nullptr);
+        RegOverridePredefKey(HKEY_CURRENT_USER, key.Get());
     }
     PrivateUserKey(const PrivateUserKey&) = delete;
     PrivateUserKey& operator=(const PrivateUserKey&) = delete;

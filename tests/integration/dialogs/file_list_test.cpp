@@ -1,5 +1,9 @@
 #include "DialogsTest.h"
 #include "FakeProvider.h"
+#include "OrvixDialogOption.h"
+#include "OrvixOperation.h"
+#include "OrvixProviderOption.h"
+#include "OrvixProviderResult.h"
 
 #include <commctrl.h>
 #include <windows.h>
@@ -13,15 +17,7 @@ namespace
 
 constexpr const wchar_t* List = L"Files:";
 
-/// Bits of the options.
-constexpr std::uint32_t Ticks = 0x1;
-constexpr std::uint32_t KeepOption = 0x4;
-constexpr std::uint32_t LatestOption = 0x8;
-constexpr std::uint32_t OptionTicked = 0x10;
-constexpr std::uint32_t OfferRemember = 0x40;
-constexpr std::uint32_t Remember = 0x80;
-
-/// A click on the arrow of a drop-down list.
+/// Clicks the arrow of a drop-down list.
 void ClickArrow(HWND box)
 {
     RECT inside{};
@@ -35,20 +31,29 @@ class FileListDialog : public DialogsTest
 {
 protected:
     static void Cancel(const DialogWindow& dialog) { dialog.Press(VK_ESCAPE); }
+
+    /// Whether the dialog confirmed an entry.
+    bool IsConfirmed(unsigned int index)
+    {
+        return (m_list.GetFileEntry(index)->GetFlagsOut() & OrvixFileSelection::Confirmed) != 0;
+    }
 };
 
 TEST_F(FileListDialog, ShowsTitleMessageAndEachFileWithFolderAndState)
 {
+    namespace State = OrvixFileState;
     const std::pair<unsigned long, const wchar_t*> states[] = {
         {0, L"Unknown"},
-        {0x1, L"Not under source control"},
-        {0x2, L"Checked in"},
-        {0x2 | 0x4, L"Checked out by you"},
-        {0x2 | 0x8, L"Checked out by another user"},
-        {0x2 | 0x10, L"Out of date"},
-        {0x2 | 0x20, L"Deleted"},
-        {0x2 | 0x80, L"Modified"},
-        {0x4700BE, L"Checked out by you, Checked out by another user, Out of date, Deleted, Modified"}};
+        {State::NotControlled, L"Not under source control"},
+        {State::Controlled, L"Checked in"},
+        {State::Controlled | State::CheckedOut, L"Checked out by you"},
+        {State::Controlled | State::CheckedOutByOther, L"Checked out by another user"},
+        {State::Controlled | State::OutOfDate, L"Out of date"},
+        {State::Controlled | State::Deleted, L"Deleted"},
+        {State::Controlled | State::Modified, L"Modified"},
+        {State::Controlled | State::CheckedOut | State::CheckedOutByOther | State::OutOfDate | State::Deleted |
+             State::Modified | OrvixFilePermission::CheckIn | OrvixFilePermission::ShowHistory,
+         L"Checked out by you, Checked out by another user, Out of date, Deleted, Modified"}};
     Texts words;
     for (const auto& [flags, text] : states)
     {
@@ -57,7 +62,7 @@ TEST_F(FileListDialog, ShowsTitleMessageAndEachFileWithFolderAndState)
     }
     AddFile(L"town/church.model", 0);
     AddFile(L"tower.model", 0);
-    ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+    ShowFileList([&](const DialogWindow& dialog) {
         EXPECT_TRUE(dialog.Has(L"These files are opened."));
         const int last = static_cast<int>(words.size());
         Texts shown = dialog.Column(List, 2);
@@ -85,7 +90,7 @@ TEST_F(FileListDialog, IsHighEnoughForItsMessage)
     const auto heightsWith = [this](const std::wstring& message) {
         Heights heights{};
         m_params.SetMessage(message.c_str());
-        ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+        ShowFileList([&](const DialogWindow& dialog) {
             const RECT place = dialog.Place(message);
             const RECT list = dialog.Place(List);
             EXPECT_LE(place.bottom, dialog.Place(L"Filter:").top);
@@ -120,7 +125,7 @@ TEST_F(FileListDialog, IsHighEnoughForItsMessage)
     EXPECT_EQ(heightsWith(lines(500)).list, one.list) << "and a message has no more than the monitor";
 }
 
-TEST_F(FileListDialog, KeepsItsHeightBehindAMessageForWhichTheMonitorHasNoRoom)
+TEST_F(FileListDialog, KeepsItsHeightAfterAMessageForWhichTheMonitorHasNoRoom)
 {
     AddFile(L"a");
     RECT work{};
@@ -129,7 +134,7 @@ TEST_F(FileListDialog, KeepsItsHeightBehindAMessageForWhichTheMonitorHasNoRoom)
     const auto heightWith = [&](const wchar_t* message, bool resize) {
         LONG height = 0;
         m_params.SetMessage(message);
-        ShowFileList(Ticks, [&](const DialogWindow& dialog) {
+        ShowFileList([&](const DialogWindow& dialog) {
             RECT place{};
             GetWindowRect(dialog.Handle(), &place);
             height = place.bottom - place.top;
@@ -147,93 +152,92 @@ TEST_F(FileListDialog, KeepsItsHeightBehindAMessageForWhichTheMonitorHasNoRoom)
     EXPECT_NEAR(heightWith(L"short", false), high, 2);
 }
 
-TEST_F(FileListDialog, MarksTickedEntriesAndOnlyThem)
+TEST_F(FileListDialog, ConfirmsCheckedEntriesAndOnlyThem)
 {
-    OrvixFileEntry& kept = AddFile(L"a", 0x4);
-    OrvixFileEntry& unticked = AddFile(L"b", 0x6);
-    OrvixFileEntry& ticked = AddFile(L"c", 0x1, false);
-    OrvixFileEntry& left = AddFile(L"d", 0x2, false);
-    EXPECT_EQ(ShowFileList(Ticks,
-                           [](const DialogWindow& dialog) {
-                               EXPECT_TRUE(dialog.IsRowTicked(List, 0));
-                               EXPECT_FALSE(dialog.IsRowTicked(List, 3));
-                               dialog.ClickCheckBox(List, 1);
-                               dialog.ClickCheckBox(List, 2);
-                               dialog.Click(L"OK");
-                           }),
-              1);
-    EXPECT_EQ(kept.GetFlagsOut(), 0x6U);
-    EXPECT_EQ(unticked.GetFlagsOut(), 0x4U);
-    EXPECT_EQ(ticked.GetFlagsOut(), 0x3U);
-    EXPECT_EQ(left.GetFlagsOut(), 0x0U);
+    OrvixFileEntry& leftChecked = AddFile(L"a", OrvixFileState::CheckedOut);
+    OrvixFileEntry& cleared = AddFile(L"b", OrvixFileState::Controlled | OrvixFileState::CheckedOut);
+    OrvixFileEntry& checked = AddFile(L"c", OrvixFileState::NotControlled, false);
+    OrvixFileEntry& leftClear = AddFile(L"d", OrvixFileState::Controlled, false);
+    EXPECT_EQ(ShowFileList([](const DialogWindow& dialog) {
+                  EXPECT_TRUE(dialog.IsRowChecked(List, 0));
+                  EXPECT_FALSE(dialog.IsRowChecked(List, 3));
+                  dialog.ClickCheckBox(List, 1);
+                  dialog.ClickCheckBox(List, 2);
+                  dialog.Click(L"OK");
+              }),
+              OrvixDialogResult::Confirmed);
+    EXPECT_EQ(leftChecked.GetFlagsOut(), OrvixFileSelection::Confirmed | OrvixFileState::CheckedOut);
+    EXPECT_EQ(cleared.GetFlagsOut(), OrvixFileState::CheckedOut);
+    EXPECT_EQ(checked.GetFlagsOut(), OrvixFileSelection::Confirmed | OrvixFileState::NotControlled);
+    EXPECT_EQ(leftClear.GetFlagsOut(), 0U);
 }
 
-TEST_F(FileListDialog, IsTickedByTheSpaceBar)
+TEST_F(FileListDialog, IsCheckedAndClearedByTheSpaceBar)
 {
     AddFile(L"a");
     AddFile(L"b");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.Focus(List);
         dialog.SelectRow(List, 1);
         dialog.Press(VK_SPACE);
-        EXPECT_TRUE(dialog.IsRowTicked(List, 0));
-        EXPECT_FALSE(dialog.IsRowTicked(List, 1));
+        EXPECT_TRUE(dialog.IsRowChecked(List, 0));
+        EXPECT_FALSE(dialog.IsRowChecked(List, 1));
         dialog.Press(VK_SPACE);
-        EXPECT_TRUE(dialog.IsRowTicked(List, 1));
+        EXPECT_TRUE(dialog.IsRowChecked(List, 1));
         dialog.Press(VK_SPACE);
         dialog.Press(VK_RETURN);
     });
-    EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0x2U);
-    EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut() & 0x2, 0U);
+    EXPECT_TRUE(IsConfirmed(0));
+    EXPECT_FALSE(IsConfirmed(1));
 }
 
-TEST_F(FileListDialog, IsTickedByTabSpaceAndArrowsAlone)
+TEST_F(FileListDialog, IsOperatedByTabSpaceAndArrowsAlone)
 {
     AddFile(L"a");
     AddFile(L"b");
     AddFile(L"c");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.Press(VK_TAB);
         EXPECT_EQ(dialog.Focused(), List);
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, true, true}));
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false, true, true}));
         dialog.Press(VK_DOWN);
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, false, true}));
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false, false, true}));
         Cancel(dialog);
     });
 }
 
-TEST_F(FileListDialog, TicksTheRowWithTheFocusAndNotASelectedOneElsewhere)
+TEST_F(FileListDialog, ClearsTheRowWithTheFocusAndNotASelectedOneElsewhere)
 {
     AddFile(L"a");
     AddFile(L"b");
     AddFile(L"c");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.SelectRow(List, 0);
         dialog.FocusRow(List, 2);
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.Ticks(List), (std::vector{true, true, false}));
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{true, true, false}));
         Cancel(dialog);
     });
 }
 
-TEST_F(FileListDialog, TicksTheSelectedRowsTogether)
+TEST_F(FileListDialog, ClearsTheSelectedRowsTogether)
 {
-    AddFile(L"a", 0x2, false);
+    AddFile(L"a", OrvixFileState::Controlled, false);
     AddFile(L"b");
     AddFile(L"c");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.Focus(List);
         dialog.SelectEveryRow(List);
         dialog.FocusRow(List, 1);
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.Ticks(List), (std::vector{false, false, false})) << "as the one with the focus";
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false, false, false})) << "as the one with the focus";
         Cancel(dialog);
     });
 }
 
-/// Writes down what screen readers are told of changed states in this process.
+/// Records what screen readers are told of changed states in this process.
 class StateChanges
 {
 public:
@@ -282,13 +286,13 @@ private:
     HWINEVENTHOOK m_hook;
 };
 
-TEST_F(FileListDialog, TellsScreenReadersOfChangedTicks)
+TEST_F(FileListDialog, TellsScreenReadersOfChangedCheckBoxes)
 {
     AddFile(L"a");
     AddFile(L"b");
     AddFile(L"c");
     const StateChanges changes;
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         const HWND list = dialog.Control(List);
         StateChanges::Of(list);
         dialog.SelectRow(List, 1);
@@ -311,19 +315,19 @@ TEST_F(FileListDialog, LetsTheKeyboardGoOnFromTheSameRowAfterSortingAndFiltering
     AddFile(L"b");
     AddFile(L"a");
     AddFile(L"x");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.ClickHeading(List, 0);
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"a", L"b", L"x"}));
         dialog.Focus(List);
         dialog.Press(VK_DOWN);
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.Ticks(List), (std::vector{true, true, false})) << "x stands below b";
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{true, true, false})) << "x is below b";
         SetWindowTextW(dialog.Control(L"Filter:"), L"x");
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.Ticks(List), (std::vector{true}));
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{true}));
         SetWindowTextW(dialog.Control(L"Filter:"), L"b");
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.Ticks(List), (std::vector{false})) << "the only row is reached without an arrow key";
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false})) << "the only row is reached without an arrow key";
         Cancel(dialog);
     });
 }
@@ -334,7 +338,7 @@ TEST_F(FileListDialog, ScrollsToTheRowWithTheFocusAfterSortingAndFiltering)
     {
         AddFile(std::to_wstring(i).c_str());
     }
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.ClickHeading(List, 0);
         EXPECT_EQ(dialog.Cell(List, 899, 0), L"999");
         EXPECT_TRUE(dialog.IsRowInView(List, 899));
@@ -344,39 +348,38 @@ TEST_F(FileListDialog, ScrollsToTheRowWithTheFocusAfterSortingAndFiltering)
     });
 }
 
-TEST_F(FileListDialog, TakesEveryEntryWhereNoTicksAreOffered)
+TEST_F(FileListDialog, ConfirmsEveryEntryWhereNoneCanBeCleared)
 {
-    OrvixFileEntry& entry = AddFile(L"a", 0x4, false);
+    OrvixFileEntry& entry = AddFile(L"a", OrvixFileState::CheckedOut, false);
     EXPECT_EQ(ShowFileList(0,
                            [](const DialogWindow& dialog) {
                                EXPECT_FALSE(dialog.Has(L"Select all"));
                                dialog.Press(VK_RETURN);
                            }),
-              1);
-    EXPECT_EQ(entry.GetFlagsOut(), 0x6U);
+              OrvixDialogResult::Confirmed);
+    EXPECT_EQ(entry.GetFlagsOut(), OrvixFileSelection::Confirmed | OrvixFileState::CheckedOut);
 }
 
 TEST_F(FileListDialog, ChangesNoEntryAndNoCommentWhenItIsCancelled)
 {
-    OrvixFileEntry& entry = AddFile(L"a", 0x4);
+    OrvixFileEntry& entry = AddFile(L"a", OrvixFileState::CheckedOut);
     m_params.SetComment(L"before");
-    EXPECT_EQ(ShowFileList(Ticks,
-                           [](const DialogWindow& dialog) {
-                               dialog.Focus(L"Comment:");
-                               dialog.Type(L"after");
-                               dialog.Click(L"Cancel");
-                           }),
-              0);
-    EXPECT_EQ(entry.GetFlagsOut(), 0x4U);
+    EXPECT_EQ(ShowFileList([](const DialogWindow& dialog) {
+                  dialog.Focus(L"Comment:");
+                  dialog.Type(L"after");
+                  dialog.Click(L"Cancel");
+              }),
+              OrvixDialogResult::Cancelled);
+    EXPECT_EQ(entry.GetFlagsOut(), OrvixFileState::CheckedOut);
     EXPECT_STREQ(m_params.GetComment(), L"before");
 }
 
 TEST_F(FileListDialog, FiltersByNameFolderAndStateWhileTyping)
 {
     AddFile(L"C:\\town\\bridge.model");
-    AddFile(L"C:\\town\\Church.model", 0x1);
+    AddFile(L"C:\\town\\Church.model", OrvixFileState::NotControlled);
     AddFile(L"C:\\church\\tower.model");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.PressAlt(L'l');
         dialog.Type(L"c");
         EXPECT_EQ(dialog.NumRows(List), 3);
@@ -395,34 +398,34 @@ TEST_F(FileListDialog, SelectsAllAndNoneOfWhatIsShownAndCounts)
 {
     AddFile(L"bridge");
     AddFile(L"church");
-    AddFile(L"tower", 0x2, false);
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
-        EXPECT_TRUE(dialog.Has(L"2 of 3 files ticked"));
+    AddFile(L"tower", OrvixFileState::Controlled, false);
+    ShowFileList([](const DialogWindow& dialog) {
+        EXPECT_TRUE(dialog.Has(L"2 of 3 files checked"));
         dialog.PressAlt(L'n');
-        EXPECT_TRUE(dialog.Has(L"0 of 3 files ticked"));
+        EXPECT_TRUE(dialog.Has(L"0 of 3 files checked"));
         dialog.PressAlt(L'l');
         dialog.Type(L"chur");
-        EXPECT_TRUE(dialog.Has(L"0 of 3 files ticked, 1 shown"));
+        EXPECT_TRUE(dialog.Has(L"0 of 3 files checked, 1 shown"));
         dialog.PressAlt(L'a');
-        EXPECT_TRUE(dialog.Has(L"1 of 3 files ticked, 1 shown"));
+        EXPECT_TRUE(dialog.Has(L"1 of 3 files checked, 1 shown"));
         dialog.Click(L"OK");
     });
     EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut(), 0U);
-    EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut(), 0x2U);
+    EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut(), OrvixFileSelection::Confirmed);
     EXPECT_EQ(m_list.GetFileEntry(2)->GetFlagsOut(), 0U);
 }
 
-TEST_F(FileListDialog, SortsByTheColumnThatIsClickedAndTurnsTheOrderRound)
+TEST_F(FileListDialog, SortsByTheClickedColumnAndReversesTheOrder)
 {
-    AddFile(L"x\\b", 0x2, false);
-    AddFile(L"z\\A", 0x2, true);
-    AddFile(L"y\\c", 0x1, true);
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    AddFile(L"x\\b", OrvixFileState::Controlled, false);
+    AddFile(L"z\\A");
+    AddFile(L"y\\c", OrvixFileState::NotControlled);
+    ShowFileList([](const DialogWindow& dialog) {
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"b", L"A", L"c"}));
         dialog.ClickHeading(List, 0);
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"A", L"b", L"c"}));
-        EXPECT_TRUE(dialog.IsRowTicked(List, 0));
-        EXPECT_FALSE(dialog.IsRowTicked(List, 1));
+        EXPECT_TRUE(dialog.IsRowChecked(List, 0));
+        EXPECT_FALSE(dialog.IsRowChecked(List, 1));
         dialog.ClickHeading(List, 0);
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"c", L"b", L"A"}));
         dialog.ClickHeading(List, 1);
@@ -432,16 +435,16 @@ TEST_F(FileListDialog, SortsByTheColumnThatIsClickedAndTurnsTheOrderRound)
         dialog.ClickCheckBox(List, 0);
         dialog.Click(L"OK");
     });
-    EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0x2U) << "b, the first one of the checked in";
-    EXPECT_EQ(m_list.GetFileEntry(1)->GetFlagsOut() & 0x2, 0x2U);
-    EXPECT_EQ(m_list.GetFileEntry(2)->GetFlagsOut() & 0x2, 0x2U);
+    EXPECT_TRUE(IsConfirmed(0)) << "b, the first of the files that are checked in";
+    EXPECT_TRUE(IsConfirmed(1));
+    EXPECT_TRUE(IsConfirmed(2));
 }
 
 TEST_F(FileListDialog, IsSortedByKeysThroughItsMenu)
 {
     AddFile(L"x\\b");
     AddFile(L"y\\a");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.ChooseFromMenu(List, 1);
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"a", L"b"}));
         dialog.ChooseFromMenu(List, 2);
@@ -456,14 +459,14 @@ TEST_F(FileListDialog, TakesTheCommentAndOffersItAgain)
     for (const wchar_t* comment : {L"first", L"second", L"first"})
     {
         m_params.SetComment(L"");
-        ShowFileList(Ticks, [comment](const DialogWindow& dialog) {
+        ShowFileList([comment](const DialogWindow& dialog) {
             dialog.PressAlt(L'm');
             dialog.Type(comment);
             dialog.Click(L"OK");
         });
         EXPECT_STREQ(m_params.GetComment(), comment);
     }
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         EXPECT_EQ(dialog.Items(L"Recent comments:"), (Texts{L"first", L"second"}));
         dialog.Choose(L"Recent comments:", L"second");
         EXPECT_EQ(dialog.Text(L"Comment:"), L"second");
@@ -476,9 +479,9 @@ TEST_F(FileListDialog, LeavesTheTypedCommentAloneUntilARecentOneIsChosenInTheOpe
 {
     AddFile(L"a");
     m_params.SetComment(L"recent");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) { dialog.Click(L"OK"); });
+    ShowFileList([](const DialogWindow& dialog) { dialog.Click(L"OK"); });
     m_params.SetComment(L"");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         constexpr const wchar_t* Recent = L"Recent comments:";
         const HWND comment = dialog.Control(L"Comment:");
         dialog.Focus(L"Comment:");
@@ -488,11 +491,11 @@ TEST_F(FileListDialog, LeavesTheTypedCommentAloneUntilARecentOneIsChosenInTheOpe
         dialog.Type(L"r");
         PostMessageW(dialog.Control(Recent), WM_MOUSEWHEEL, MAKEWPARAM(0, -WHEEL_DELTA), 0);
         dialog.Press(VK_UP);
-        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "nobody opened the list";
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "the list is not open";
         dialog.Press(VK_DOWN);
         EXPECT_TRUE(SendMessageW(dialog.Control(Recent), CB_GETDROPPEDSTATE, 0, 0));
         dialog.Press(VK_END);
-        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "nobody chose yet";
+        EXPECT_EQ(dialog.Text(L"Comment:"), L"typed") << "nothing is chosen yet";
         dialog.Press(VK_ESCAPE);
         EXPECT_EQ(dialog.Text(L"Comment:"), L"typed");
         dialog.Choose(Recent, L"recent");
@@ -519,28 +522,28 @@ TEST_F(FileListDialog, TakesARecentCommentOfAnyLength)
         longComment += std::wstring(80, L'x') + L"\r\n";
     }
     m_params.SetComment(longComment.c_str());
-    ShowFileList(Ticks, [](const DialogWindow& dialog) { dialog.Click(L"OK"); });
+    ShowFileList([](const DialogWindow& dialog) { dialog.Click(L"OK"); });
     m_params.SetComment(L"");
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.Choose(L"Recent comments:", dialog.Items(L"Recent comments:").front());
         dialog.Click(L"OK");
     });
     EXPECT_TRUE(m_params.GetComment() == longComment);
 }
 
-TEST_F(FileListDialog, TakesBadRecentCommentsForNone)
+TEST_F(FileListDialog, IgnoresRecentCommentsThatCannotBeRead)
 {
     AddFile(L"a");
     constexpr const wchar_t* Key = L"Software\\OrvixCore\\Dialogs";
     const DWORD number = 7;
     RegSetKeyValueW(HKEY_CURRENT_USER, Key, L"RecentComments", REG_DWORD, &number, sizeof number);
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         EXPECT_FALSE(dialog.IsEnabled(L"Recent comments:"));
         Cancel(dialog);
     });
     // No null at the end.
     RegSetKeyValueW(HKEY_CURRENT_USER, Key, L"RecentComments", REG_MULTI_SZ, L"abc", 6);
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         EXPECT_EQ(dialog.Items(L"Recent comments:"), (Texts{L"abc"}));
         Cancel(dialog);
     });
@@ -559,12 +562,14 @@ TEST_F(FileListDialog, OffersTheBoxesThatItsOptionsName)
         bool latest;
         bool remember;
     };
-    const Offer offers[] = {{Ticks, false, false, false},
-                            {Ticks | KeepOption, true, false, false},
-                            {Ticks | LatestOption, false, true, false},
-                            {Ticks | KeepOption | LatestOption, true, false, false},
-                            {Ticks | OfferRemember, false, false, true},
-                            {Ticks | Remember | OptionTicked, false, false, false}};
+    namespace Option = OrvixDialogOption;
+    const Offer offers[] = {
+        {Option::EntriesCanBeCleared, false, false, false},
+        {Option::EntriesCanBeCleared | Option::OfferKeepCheckedOut, true, false, false},
+        {Option::EntriesCanBeCleared | Option::OfferGetLatest, false, true, false},
+        {Option::EntriesCanBeCleared | Option::OfferKeepCheckedOut | Option::OfferGetLatest, true, false, false},
+        {Option::EntriesCanBeCleared | Option::OfferRemember, false, false, true},
+        {Option::EntriesCanBeCleared | Option::RememberChecked | Option::OptionChecked, false, false, false}};
     for (const Offer& offer : offers)
     {
         ShowFileList(offer.options, [&](const DialogWindow& dialog) {
@@ -573,28 +578,29 @@ TEST_F(FileListDialog, OffersTheBoxesThatItsOptionsName)
             EXPECT_EQ(dialog.Has(RememberBox), offer.remember);
             dialog.Click(L"OK");
         });
-        EXPECT_EQ(m_params.GetOptions(), offer.options) << "nothing was ticked or unticked";
+        EXPECT_EQ(m_params.GetOptions(), offer.options) << "no box was checked or cleared";
     }
 }
 
-TEST_F(FileListDialog, GivesTheStateOfItsBoxesBackWhateverTheAnswer)
+TEST_F(FileListDialog, ReturnsTheStateOfItsBoxesWhateverTheAnswer)
 {
     AddFile(L"a");
-    constexpr std::uint32_t Offered = Ticks | KeepOption | OfferRemember;
+    constexpr std::uint32_t Offered = OrvixDialogOption::EntriesCanBeCleared | OrvixDialogOption::OfferKeepCheckedOut |
+                                      OrvixDialogOption::OfferRemember;
     for (const wchar_t* button : {L"OK", L"Cancel"})
     {
-        ShowFileList(Offered | OptionTicked, [button](const DialogWindow& dialog) {
-            EXPECT_TRUE(dialog.IsTicked(L"Keep checked out"));
-            EXPECT_FALSE(dialog.IsTicked(L"Remember my answer"));
+        ShowFileList(Offered | OrvixDialogOption::OptionChecked, [button](const DialogWindow& dialog) {
+            EXPECT_TRUE(dialog.IsChecked(L"Keep checked out"));
+            EXPECT_FALSE(dialog.IsChecked(L"Remember my answer"));
             dialog.PressAlt(L'k');
             dialog.PressAlt(L'r');
             dialog.Click(button);
         });
-        EXPECT_EQ(m_params.GetOptions(), Offered | Remember);
+        EXPECT_EQ(m_params.GetOptions(), Offered | OrvixDialogOption::RememberChecked);
     }
 }
 
-/// Writes down on which files it worked, and how.
+/// Records the files and the arguments of a check-in.
 class CheckInProvider final : public FakeProvider
 {
 public:
@@ -612,7 +618,7 @@ public:
         }
         comment = text;
         options = how;
-        return 0;
+        return OrvixProviderResult::Success;
     }
 };
 
@@ -623,12 +629,11 @@ TEST_F(FileListDialog, DecidesWhatAnOperationWorksOn)
     AddFile(L"c");
     constexpr std::uint32_t DialogPrompt = 100;
     constexpr std::uint32_t OptionPrompt = 200;
-    constexpr std::uint32_t Ask = 0x1;
-    m_services->RegisterPrompt(DialogPrompt, L"Check in?", Ask, 0, true);
-    m_services->RegisterPrompt(OptionPrompt, L"Keep checked out?", Ask, 0, true);
+    m_services->RegisterPrompt(DialogPrompt, L"Check in?", OrvixPromptAction::Ask, 0, true);
+    m_services->RegisterPrompt(OptionPrompt, L"Keep checked out?", OrvixPromptAction::Ask, 0, true);
     m_params.SetDialogPromptID(DialogPrompt);
     m_params.SetOptionPromptID(OptionPrompt);
-    m_params.SetOptions(KeepOption | OfferRemember);
+    m_params.SetOptions(OrvixDialogOption::OfferKeepCheckedOut | OrvixDialogOption::OfferRemember);
 
     CheckInProvider provider;
     std::int32_t result = 0;
@@ -641,19 +646,19 @@ TEST_F(FileListDialog, DecidesWhatAnOperationWorksOn)
             dialog.PressAlt(L'r');
             dialog.Click(L"OK");
         });
-        constexpr std::uint32_t CheckIn = 0x2;
-        result = m_services->RunFileListOperation(nullptr, &m_params, false, &provider, CheckIn, 0xFFFFFFFF);
+        result = m_services->RunFileListOperation(nullptr, &m_params, false, &provider, OrvixOperation::CheckIn,
+                                                  OrvixFileState::Controlled);
     }
-    EXPECT_EQ(result, 1);
+    EXPECT_EQ(result, OrvixOperationResult::Done);
     EXPECT_EQ(provider.files, (Texts{L"a", L"c"}));
     EXPECT_EQ(provider.comment, L"done");
-    EXPECT_EQ(provider.options, 1U) << "keep checked out";
-    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), 0x2U);
-    EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), 0x8U);
+    EXPECT_EQ(provider.options, OrvixProviderOption::KeepCheckedOut);
+    EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), OrvixPromptAction::Yes);
+    EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), OrvixPromptAction::OptionChecked);
 }
 
-/// Counts the changes of a row's state after which a list has something to draw. A list whose rows change one after the
-/// other has it after the last one alone, or else each change costs as much as a drawing.
+/// Counts the changes of a row's state after which the list has something to draw. When many rows change, the list must
+/// have something to draw after the last change only: otherwise it is drawn anew for each.
 class DrawnChanges
 {
 public:
@@ -701,7 +706,7 @@ TEST_F(FileListDialog, IsNotDrawnAnewForEachSelectedRowThatIsSortedOrFiltered)
     {
         AddFile(std::to_wstring(i).c_str());
     }
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         constexpr int AHandful = 5;
         dialog.SelectEveryRow(List);
         {
@@ -739,16 +744,16 @@ protected:
 
 TEST_F(LongFileList, IsVirtual)
 {
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         EXPECT_EQ(dialog.NumRows(List), Count);
         EXPECT_NE(GetWindowLongW(dialog.Control(List), GWL_STYLE) & LVS_OWNERDATA, 0);
         Cancel(dialog);
     });
 }
 
-TEST_F(LongFileList, MarksWhatIsTickedAmongFilteredAndSortedRows)
+TEST_F(LongFileList, ConfirmsWhatIsCheckedAmongFilteredAndSortedRows)
 {
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.Click(L"Select none");
         dialog.Focus(L"Filter:");
         dialog.Type(L"49999");
@@ -757,13 +762,13 @@ TEST_F(LongFileList, MarksWhatIsTickedAmongFilteredAndSortedRows)
         dialog.ClickHeading(List, 0);
         dialog.Click(L"OK");
     });
-    EXPECT_EQ(m_list.GetFileEntry(Count - 1)->GetFlagsOut() & 0x2, 0x2U);
-    EXPECT_EQ(m_list.GetFileEntry(0)->GetFlagsOut() & 0x2, 0U);
+    EXPECT_TRUE(IsConfirmed(Count - 1));
+    EXPECT_FALSE(IsConfirmed(0));
 }
 
 TEST_F(LongFileList, KeepsEveryRowSelectedWhenItIsSortedAndFiltered)
 {
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         dialog.SelectEveryRow(List);
         dialog.ClickHeading(List, 0);
         EXPECT_EQ(NumSelected(dialog), Count);
@@ -771,8 +776,8 @@ TEST_F(LongFileList, KeepsEveryRowSelectedWhenItIsSortedAndFiltered)
         EXPECT_EQ(NumSelected(dialog), Count);
         dialog.Focus(List);
         dialog.Press(VK_SPACE);
-        EXPECT_FALSE(dialog.IsRowTicked(List, 0));
-        EXPECT_FALSE(dialog.IsRowTicked(List, Count - 1));
+        EXPECT_FALSE(dialog.IsRowChecked(List, 0));
+        EXPECT_FALSE(dialog.IsRowChecked(List, Count - 1));
         SetWindowTextW(dialog.Control(L"Filter:"), L"49999");
         EXPECT_EQ(NumSelected(dialog), 1);
         Cancel(dialog);
@@ -781,7 +786,7 @@ TEST_F(LongFileList, KeepsEveryRowSelectedWhenItIsSortedAndFiltered)
 
 TEST_F(LongFileList, KeepsMostRowsSelectedWhenItIsSorted)
 {
-    ShowFileList(Ticks, [](const DialogWindow& dialog) {
+    ShowFileList([](const DialogWindow& dialog) {
         constexpr int Step = 100;
         dialog.SelectEveryRow(List);
         for (int row = 0; row < Count; row += Step)

@@ -1,5 +1,6 @@
 #include "DialogsTest.h"
 #include "Files.h"
+#include "OrvixPrompt.h"
 
 namespace
 {
@@ -10,18 +11,15 @@ constexpr const wchar_t* Answer = L"Answer:";
 class PromptEditorDialog : public DialogsTest
 {
 protected:
-    static constexpr std::uint32_t YesToAll = 0x2;
-    static constexpr std::uint32_t NoToAll = 0x4;
-    static constexpr std::uint32_t OnlyOk = 0x1;
-
     PromptEditorDialog()
     {
-        m_services->RegisterPrompt(1, L"Overwrite?", 0x2, YesToAll | NoToAll, true);
-        m_services->RegisterPrompt(2, L"Check out?", 0x1, 0, true);
-        m_services->RegisterPrompt(3, L"Tell me", 0x4, OnlyOk, true);
+        m_services->RegisterPrompt(1, L"Overwrite?", OrvixPromptAction::Yes,
+                                   OrvixPromptOption::OfferYesToAll | OrvixPromptOption::OfferNoToAll, true);
+        m_services->RegisterPrompt(2, L"Check out?", OrvixPromptAction::Ask, 0, true);
+        m_services->RegisterPrompt(3, L"Tell me", OrvixPromptAction::No, OrvixPromptOption::OnlyOK, true);
     }
 
-    /// Locks the first prompt, which only the file does.
+    /// Locks the first prompt. Only the file can do that.
     void LockFirst();
 };
 
@@ -38,8 +36,8 @@ void PromptEditorDialog::LockFirst()
 
 TEST_F(PromptEditorDialog, ShowsEveryPromptWithItsAnswerInWords)
 {
-    m_services->RegisterPrompt(4, L"a", 0x8, 0, true);
-    m_services->RegisterPrompt(5, L"b", 0x10, 0, true);
+    m_services->RegisterPrompt(4, L"a", OrvixPromptAction::YesToAll, 0, true);
+    m_services->RegisterPrompt(5, L"b", OrvixPromptAction::NoToAll, 0, true);
     m_services->RegisterPrompt(6, L"c", 0, 0, true);
     ShowEditor([](const DialogWindow& dialog) {
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"Overwrite?", L"Check out?", L"Tell me", L"a", L"b", L"c"}));
@@ -51,7 +49,7 @@ TEST_F(PromptEditorDialog, ShowsEveryPromptWithItsAnswerInWords)
 TEST_F(PromptEditorDialog, ShowsTheWholeTextOfTheSelectedPrompt)
 {
     const std::wstring lines = L"First\nsecond\r\n" + std::wstring(1000, L'x');
-    m_services->RegisterPrompt(4, lines.c_str(), 0x1, 0, true);
+    m_services->RegisterPrompt(4, lines.c_str(), OrvixPromptAction::Ask, 0, true);
     ShowEditor([](const DialogWindow& dialog) {
         constexpr const wchar_t* Whole = L"Whole text:";
         EXPECT_EQ(dialog.Text(Whole), L"Overwrite?");
@@ -61,7 +59,7 @@ TEST_F(PromptEditorDialog, ShowsTheWholeTextOfTheSelectedPrompt)
         dialog.PressAlt(L'w');
         EXPECT_EQ(dialog.Focused(), Whole);
         dialog.Type(L"more");
-        EXPECT_EQ(dialog.Text(Whole).size(), 1015U) << "it can be read and not changed";
+        EXPECT_EQ(dialog.Text(Whole).size(), 1015U) << "the field is read-only";
         SetWindowTextW(dialog.Control(L"Search:"), L"nowhere");
         EXPECT_EQ(dialog.Text(Whole), L"");
         dialog.Press(VK_ESCAPE);
@@ -77,10 +75,11 @@ TEST_F(PromptEditorDialog, StoresAChangedAnswer)
                   EXPECT_EQ(dialog.Cell(List, 0, 1), L"No to all");
                   dialog.Press(VK_RETURN);
               }),
-              1);
-    EXPECT_EQ(m_services->GetPromptAction(1), 0x10U);
-    EXPECT_EQ(m_services->GetPromptAction(2), 0x1U);
-    EXPECT_NE(PromptFile().find("<Action>16</Action>"), std::string::npos);
+              OrvixPromptEditorResult::Changed);
+    EXPECT_EQ(m_services->GetPromptAction(1), OrvixPromptAction::NoToAll);
+    EXPECT_EQ(m_services->GetPromptAction(2), OrvixPromptAction::Ask);
+    EXPECT_NE(PromptFile().find("<Action>" + std::to_string(OrvixPromptAction::NoToAll) + "</Action>"),
+              std::string::npos);
 }
 
 TEST_F(PromptEditorDialog, ChangesNothingWhenItIsCancelled)
@@ -90,8 +89,8 @@ TEST_F(PromptEditorDialog, ChangesNothingWhenItIsCancelled)
                   dialog.Choose(Answer, L"No");
                   dialog.Press(VK_ESCAPE);
               }),
-              0);
-    EXPECT_EQ(m_services->GetPromptAction(1), 0x2U);
+              OrvixPromptEditorResult::Unchanged);
+    EXPECT_EQ(m_services->GetPromptAction(1), OrvixPromptAction::Yes);
 }
 
 TEST_F(PromptEditorDialog, ReportsNoChangeWhereAnAnswerIsChangedBack)
@@ -102,14 +101,14 @@ TEST_F(PromptEditorDialog, ReportsNoChangeWhereAnAnswerIsChangedBack)
                   dialog.Choose(Answer, L"Yes");
                   dialog.Click(L"OK");
               }),
-              0);
-    EXPECT_EQ(m_services->GetPromptAction(1), 0x2U);
+              OrvixPromptEditorResult::Unchanged);
+    EXPECT_EQ(m_services->GetPromptAction(1), OrvixPromptAction::Yes);
 }
 
 TEST_F(PromptEditorDialog, ResetsAnAnswerToAsk)
 {
     EXPECT_EQ(ShowEditor([](const DialogWindow& dialog) {
-                  EXPECT_TRUE(dialog.IsEnabled(L"Reset to ask")) << "the first prompt is selected from the beginning";
+                  EXPECT_TRUE(dialog.IsEnabled(L"Reset to ask")) << "the first prompt is selected at the start";
                   dialog.SelectRow(List, 1);
                   EXPECT_FALSE(dialog.IsEnabled(L"Reset to ask")) << "it asks already";
                   dialog.SelectRow(List, 0);
@@ -118,18 +117,18 @@ TEST_F(PromptEditorDialog, ResetsAnAnswerToAsk)
                   EXPECT_EQ(dialog.Focused(), List);
                   dialog.Click(L"OK");
               }),
-              1);
-    EXPECT_EQ(m_services->GetPromptAction(1), 0x1U);
+              OrvixPromptEditorResult::Changed);
+    EXPECT_EQ(m_services->GetPromptAction(1), OrvixPromptAction::Ask);
 }
 
-TEST_F(PromptEditorDialog, IsHandledByTabAndArrowsAlone)
+TEST_F(PromptEditorDialog, IsOperatedByTabAndArrowsAlone)
 {
     ShowEditor([](const DialogWindow& dialog) {
         dialog.Press(VK_TAB);
         EXPECT_EQ(dialog.Focused(), List);
         EXPECT_EQ(dialog.Chosen(Answer), L"Yes");
         dialog.Press(VK_DOWN);
-        EXPECT_EQ(dialog.Chosen(Answer), L"Ask") << "the second one's";
+        EXPECT_EQ(dialog.Chosen(Answer), L"Ask") << "the answer of the second prompt";
         dialog.Press(VK_ESCAPE);
     });
 }
@@ -153,7 +152,7 @@ TEST_F(PromptEditorDialog, OffersTheAnswersThatThePromptsOptionsName)
         dialog.SelectRow(List, 1);
         EXPECT_EQ(dialog.Items(Answer), (Texts{L"Ask", L"Yes", L"No"}));
         dialog.SelectRow(List, 2);
-        EXPECT_EQ(dialog.Items(Answer), (Texts{L"Ask", L"Yes", L"No"})) << "No is its answer as it is";
+        EXPECT_EQ(dialog.Items(Answer), (Texts{L"Ask", L"Yes", L"No"})) << "No is its stored answer";
         dialog.Choose(Answer, L"Yes");
         dialog.SelectRow(List, 0);
         dialog.SelectRow(List, 2);
@@ -175,7 +174,7 @@ TEST_F(PromptEditorDialog, ShowsALockedAnswerAndLeavesItAlone)
                   EXPECT_TRUE(dialog.IsEnabled(Answer));
                   dialog.Click(L"OK");
               }),
-              0);
+              OrvixPromptEditorResult::Unchanged);
 }
 
 TEST_F(PromptEditorDialog, FindsPromptsByTextAndAnswerWhileTyping)
@@ -189,9 +188,9 @@ TEST_F(PromptEditorDialog, FindsPromptsByTextAndAnswerWhileTyping)
                   dialog.Choose(Answer, L"Yes");
                   dialog.Click(L"OK");
               }),
-              1);
-    EXPECT_EQ(m_services->GetPromptAction(1), 0x2U);
-    EXPECT_EQ(m_services->GetPromptAction(2), 0x2U);
+              OrvixPromptEditorResult::Changed);
+    EXPECT_EQ(m_services->GetPromptAction(1), OrvixPromptAction::Yes);
+    EXPECT_EQ(m_services->GetPromptAction(2), OrvixPromptAction::Yes);
 }
 
 } // namespace

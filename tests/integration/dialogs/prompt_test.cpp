@@ -1,27 +1,28 @@
 #include "DialogsTest.h"
+#include "OrvixPrompt.h"
 
 #include <bit>
 
 namespace
 {
 
-class PromptDialog : public DialogsTest
-{
-protected:
-    static constexpr std::uint32_t YesToAll = 0x2;
-    static constexpr std::uint32_t NoToAll = 0x4;
-    static constexpr std::uint32_t OnlyOk = 0x1;
-    static constexpr std::uint32_t DoNotAsk = 0x100;
-};
+using OrvixPromptOption::OfferNoToAll;
+using OrvixPromptOption::OfferStopAsking;
+using OrvixPromptOption::OfferYesToAll;
+using OrvixPromptOption::OnlyOK;
+
+using PromptDialog = DialogsTest;
 
 TEST_F(PromptDialog, GivesTheAnswerOfItsButtons)
 {
-    const std::pair<const wchar_t*, std::int32_t> answers[] = {
-        {L"Yes", 1}, {L"No", 0}, {L"Yes to all", 2}, {L"No to all", 3}};
+    const std::pair<const wchar_t*, std::int32_t> answers[] = {{L"Yes", OrvixPromptAnswer::Yes},
+                                                               {L"No", OrvixPromptAnswer::No},
+                                                               {L"Yes to all", OrvixPromptAnswer::YesToAll},
+                                                               {L"No to all", OrvixPromptAnswer::NoToAll}};
     for (const auto& [button, answer] : answers)
     {
         const auto click = [&](const DialogWindow& dialog) { dialog.Click(button); };
-        EXPECT_EQ(ShowPrompt(YesToAll | NoToAll, click), answer) << button;
+        EXPECT_EQ(ShowPrompt(OfferYesToAll | OfferNoToAll, click), answer) << button;
     }
 }
 
@@ -29,29 +30,29 @@ TEST_F(PromptDialog, IsAnsweredByKeys)
 {
     const auto press = [](WORD key) { return [key](const DialogWindow& dialog) { dialog.Press(key); }; };
     const auto alt = [](wchar_t key) { return [key](const DialogWindow& dialog) { dialog.PressAlt(key); }; };
-    constexpr std::uint32_t All = YesToAll | NoToAll;
-    EXPECT_EQ(ShowPrompt(All, press(VK_RETURN)), 1);
-    EXPECT_EQ(ShowPrompt(All, press(VK_ESCAPE)), 0);
-    EXPECT_EQ(ShowPrompt(OnlyOk, press(VK_ESCAPE)), 1);
-    EXPECT_EQ(ShowPrompt(All, alt(L'y')), 1);
-    EXPECT_EQ(ShowPrompt(All, alt(L'n')), 0);
-    EXPECT_EQ(ShowPrompt(All, alt(L'a')), 2);
-    EXPECT_EQ(ShowPrompt(All, alt(L'o')), 3);
+    constexpr std::uint32_t All = OfferYesToAll | OfferNoToAll;
+    EXPECT_EQ(ShowPrompt(All, press(VK_RETURN)), OrvixPromptAnswer::Yes);
+    EXPECT_EQ(ShowPrompt(All, press(VK_ESCAPE)), OrvixPromptAnswer::No);
+    EXPECT_EQ(ShowPrompt(OnlyOK, press(VK_ESCAPE)), OrvixPromptAnswer::Yes);
+    EXPECT_EQ(ShowPrompt(All, alt(L'y')), OrvixPromptAnswer::Yes);
+    EXPECT_EQ(ShowPrompt(All, alt(L'n')), OrvixPromptAnswer::No);
+    EXPECT_EQ(ShowPrompt(All, alt(L'a')), OrvixPromptAnswer::YesToAll);
+    EXPECT_EQ(ShowPrompt(All, alt(L'o')), OrvixPromptAnswer::NoToAll);
 }
 
 TEST_F(PromptDialog, AnswersNoWhenItIsClosed)
 {
-    EXPECT_EQ(ShowPrompt(0, [](const DialogWindow& dialog) { dialog.Close(); }), 0);
+    EXPECT_EQ(ShowPrompt(0, [](const DialogWindow& dialog) { dialog.Close(); }), OrvixPromptAnswer::No);
 }
 
 TEST_F(PromptDialog, OffersTheButtonsThatItsOptionsName)
 {
     const std::pair<std::uint32_t, Texts> offers[] = {
         {0, {L"Yes", L"No"}},
-        {YesToAll, {L"Yes", L"Yes to all", L"No"}},
-        {NoToAll, {L"Yes", L"No", L"No to all"}},
-        {YesToAll | NoToAll, {L"Yes", L"Yes to all", L"No", L"No to all"}},
-        {OnlyOk | YesToAll | NoToAll, {L"OK"}}};
+        {OfferYesToAll, {L"Yes", L"Yes to all", L"No"}},
+        {OfferNoToAll, {L"Yes", L"No", L"No to all"}},
+        {OfferYesToAll | OfferNoToAll, {L"Yes", L"Yes to all", L"No", L"No to all"}},
+        {OnlyOK | OfferYesToAll | OfferNoToAll, {L"OK"}}};
     for (const auto& [options, buttons] : offers)
     {
         ShowPrompt(options, [&, expected = buttons](const DialogWindow& dialog) {
@@ -66,37 +67,37 @@ TEST_F(PromptDialog, OffersTheButtonsThatItsOptionsName)
 
 TEST_F(PromptDialog, ReportsWhetherTheUserDoesNotWantToBeAskedAgain)
 {
-    for (const bool ticked : {false, true})
+    for (const bool checked : {false, true})
     {
-        bool dontAskAgain = !ticked;
+        bool dontAskAgain = !checked;
         const auto answer = ShowPrompt(
-            DoNotAsk,
-            [ticked](const DialogWindow& dialog) {
-                if (ticked)
+            OfferStopAsking,
+            [checked](const DialogWindow& dialog) {
+                if (checked)
                 {
                     dialog.PressAlt(L'd');
                 }
                 dialog.Click(L"No");
             },
-            NoPrompt, &dontAskAgain);
-        EXPECT_EQ(answer, 0);
-        EXPECT_EQ(dontAskAgain, ticked);
+            OrvixPromptID::None, &dontAskAgain);
+        EXPECT_EQ(answer, OrvixPromptAnswer::No);
+        EXPECT_EQ(dontAskAgain, checked);
     }
 }
 
 TEST_F(PromptDialog, LetsTheAnswerBeStored)
 {
-    m_services->RegisterPrompt(7, L"Open?", 0x1, 0, true);
+    m_services->RegisterPrompt(7, L"Open?", OrvixPromptAction::Ask, 0, true);
     const auto answer = ShowPrompt(
-        DoNotAsk | YesToAll,
+        OfferStopAsking | OfferYesToAll,
         [](const DialogWindow& dialog) {
             dialog.Click(L"Do not ask again");
             dialog.Click(L"Yes to all");
         },
         7);
-    EXPECT_EQ(answer, 2);
+    EXPECT_EQ(answer, OrvixPromptAnswer::YesToAll);
     Restart();
-    EXPECT_EQ(m_services->GetPromptAction(7), 0x8U);
+    EXPECT_EQ(m_services->GetPromptAction(7), OrvixPromptAction::YesToAll);
 }
 
 TEST_F(PromptDialog, ShowsAnIconAndTheOneThatItsOptionsName)
@@ -116,11 +117,11 @@ TEST_F(PromptDialog, ShowsAnIconAndTheOneThatItsOptionsName)
         });
         return std::bit_cast<HICON>(icon);
     };
-    EXPECT_EQ(iconOf(0x00), LoadIconW(nullptr, IDI_QUESTION));
-    EXPECT_EQ(iconOf(OnlyOk), LoadIconW(nullptr, IDI_INFORMATION));
-    EXPECT_EQ(iconOf(0x10), LoadIconW(nullptr, IDI_INFORMATION));
-    EXPECT_EQ(iconOf(0x20), LoadIconW(nullptr, IDI_WARNING));
-    EXPECT_EQ(iconOf(0x30), LoadIconW(nullptr, IDI_ERROR));
+    EXPECT_EQ(iconOf(0), LoadIconW(nullptr, IDI_QUESTION));
+    EXPECT_EQ(iconOf(OnlyOK), LoadIconW(nullptr, IDI_INFORMATION));
+    EXPECT_EQ(iconOf(OrvixPromptOption::InformationIcon), LoadIconW(nullptr, IDI_INFORMATION));
+    EXPECT_EQ(iconOf(OrvixPromptOption::WarningIcon), LoadIconW(nullptr, IDI_WARNING));
+    EXPECT_EQ(iconOf(OrvixPromptOption::ErrorIcon), LoadIconW(nullptr, IDI_ERROR));
 }
 
 TEST_F(PromptDialog, IsHighEnoughForItsMessage)
@@ -135,7 +136,7 @@ TEST_F(PromptDialog, IsHighEnoughForItsMessage)
                 EXPECT_LE(place.bottom, dialog.Place(L"Yes").top);
                 dialog.Press(VK_ESCAPE);
             },
-            NoPrompt, nullptr, message);
+            OrvixPromptID::None, nullptr, message);
         return height;
     };
     const LONG ten = heightOf(L"1\n2\n3\n4\n5\n6\n7\n8\n9\n10");

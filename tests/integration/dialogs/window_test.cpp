@@ -1,4 +1,6 @@
 #include "DialogsTest.h"
+#include "OrvixDialogOption.h"
+#include "OrvixPrompt.h"
 
 #include <commctrl.h>
 #include <uxtheme.h>
@@ -10,11 +12,15 @@
 namespace
 {
 
-/// What the dialogs have in common, tried on the one with the most in it.
+/// What the dialogs have in common, mostly tested on the file list, which has the most controls.
 class DialogWindows : public DialogsTest
 {
 protected:
-    static constexpr std::uint32_t Everything = 0x1 | 0x4 | 0x40;
+    static constexpr std::uint32_t AllAnswers =
+        OrvixPromptOption::OfferYesToAll | OrvixPromptOption::OfferNoToAll | OrvixPromptOption::OfferStopAsking;
+    static constexpr std::uint32_t Everything = OrvixDialogOption::EntriesCanBeCleared |
+                                                OrvixDialogOption::OfferKeepCheckedOut |
+                                                OrvixDialogOption::OfferRemember;
 
     DialogWindows() { AddFile(L"C:\\town\\bridge.model"); }
 
@@ -41,12 +47,12 @@ TEST_F(DialogWindows, NameEveryControlForScreenReaders)
         }
         dialog.Press(VK_ESCAPE);
     };
-    ShowPrompt(0x106, expectNames);
+    ShowPrompt(AllAnswers, expectNames);
     ShowFileList(Everything, expectNames);
     ShowEditor(expectNames);
 }
 
-TEST_F(DialogWindows, AreWalkedThroughByTab)
+TEST_F(DialogWindows, LetTabReachEveryControl)
 {
     ShowFileList(Everything, [](const DialogWindow& dialog) {
         const Texts stops = dialog.TabStops();
@@ -64,9 +70,9 @@ TEST_F(DialogWindows, AreWalkedThroughByTab)
     });
 }
 
-TEST_F(DialogWindows, OfTheStoredAnswersLetTheWholeTextBeReachedByTab)
+TEST_F(DialogWindows, OfTheStoredAnswersLetTabReachTheWholeText)
 {
-    m_services->RegisterPrompt(1, L"Open?", 0x2, 0, true);
+    m_services->RegisterPrompt(1, L"Open?", OrvixPromptAction::Yes, 0, true);
     ShowEditor([](const DialogWindow& dialog) {
         const Texts stops = dialog.TabStops();
         EXPECT_EQ(stops,
@@ -100,9 +106,11 @@ TEST_F(DialogWindows, GiveEveryControlAnAccessKeyOfItsOwn)
         EXPECT_EQ(std::adjacent_find(keys.begin(), keys.end()), keys.end()) << "twice";
         dialog.Press(VK_ESCAPE);
     };
-    ShowPrompt(0x106, expectKeys);
+    ShowPrompt(AllAnswers, expectKeys);
     ShowFileList(Everything, expectKeys);
-    ShowFileList(0x1 | 0x8 | 0x40, expectKeys);
+    ShowFileList(OrvixDialogOption::EntriesCanBeCleared | OrvixDialogOption::OfferGetLatest |
+                     OrvixDialogOption::OfferRemember,
+                 expectKeys);
     ShowEditor(expectKeys);
 }
 
@@ -180,7 +188,7 @@ TEST_F(DialogWindows, StayOnTheScreenWhateverSizeIsRemembered)
     }
 }
 
-TEST_F(DialogWindows, TakeASizeOfAnotherTypeForNone)
+TEST_F(DialogWindows, IgnoreASizeOfAnotherType)
 {
     SIZE usual{};
     const auto measure = [&usual](const DialogWindow& dialog) {
@@ -189,7 +197,7 @@ TEST_F(DialogWindows, TakeASizeOfAnotherTypeForNone)
     };
     ShowFileList(Everything, measure);
     const SIZE before = usual;
-    constexpr wchar_t AsManyBytes[] = L"\x7FF"; // as a number has
+    constexpr wchar_t AsManyBytes[] = L"\x7FF"; // as many bytes as a number
     for (const wchar_t* name : {L"FileListWidth", L"FileListHeight"})
     {
         RegSetKeyValueW(HKEY_CURRENT_USER, L"Software\\OrvixCore\\Dialogs", name, REG_SZ, AsManyBytes,
@@ -245,7 +253,7 @@ TEST_F(DialogWindows, FollowTheResolutionOfTheMonitor)
 TEST_F(DialogWindows, UseTheCommonControlsOfVersionSix)
 {
     ShowFileList(Everything, [](const DialogWindow& dialog) {
-        // Only these know the messages.
+        // Only version 6 knows these messages.
         SIZE size{};
         EXPECT_TRUE(SendMessageW(dialog.Control(L"OK"), BCM_GETIDEALSIZE, 0, reinterpret_cast<LPARAM>(&size)));
         EXPECT_TRUE(
@@ -254,7 +262,7 @@ TEST_F(DialogWindows, UseTheCommonControlsOfVersionSix)
     });
 }
 
-TEST_F(DialogWindows, TakeCheckBoxesOutOfAThemeThatHidesTheHostsColours)
+TEST_F(DialogWindows, DrawCheckBoxesWithoutAThemeThatHidesTheHostsColours)
 {
     if (!IsThemeActive())
     {
