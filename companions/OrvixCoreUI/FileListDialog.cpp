@@ -1,11 +1,13 @@
 #include "FileListDialog.h"
 
+#include "FileStateText.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
 #include "Settings.h"
 #include "Texts.h"
+#include "UpperCase.h"
 #include "resource.h"
 
 #include <string_view>
@@ -28,29 +30,11 @@ constexpr Layout::Rule FileListRules[] = {{IDC_MESSAGE, Layout::GrowX},
                                           {IDOK, Layout::MoveX | Layout::MoveY},
                                           {IDCANCEL, Layout::MoveX | Layout::MoveY}};
 
-/// A file's state from its FlagsOut.
+/// A file's state, as a cell shows it. The disk is not asked: with many files on a network share that takes long.
 std::wstring StateInWords(unsigned long flags)
 {
-    struct Word
-    {
-        unsigned long flag;
-        UINT text;
-    };
-    constexpr Word Words[] = {{0x1, IDS_UNCONTROLLED}, {0x4, IDS_CHECKED_OUT}, {0x8, IDS_CHECKED_OUT_BY_OTHER},
-                              {0x10, IDS_OUT_OF_DATE}, {0x20, IDS_DELETED},    {0x80, IDS_MODIFIED}};
-    std::wstring state;
-    for (const Word& word : Words)
-    {
-        if ((flags & word.flag) != 0)
-        {
-            state += (state.empty() ? L"" : L", ") + Text(word.text);
-        }
-    }
-    if (state.empty())
-    {
-        return Text((flags & 0x2) != 0 ? IDS_CHECKED_IN : IDS_UNKNOWN);
-    }
-    return state;
+    const std::wstring words = FileStateText::InWords(flags, true);
+    return UpperCase(words.substr(0, 1)) + words.substr(1);
 }
 
 /// Name, folder and state.

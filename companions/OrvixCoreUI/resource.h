@@ -39,15 +39,6 @@
 #define IDS_PROMPT 13
 #define IDS_ANSWER 14
 
-#define IDS_UNKNOWN 20
-#define IDS_UNCONTROLLED 21
-#define IDS_CHECKED_IN 22
-#define IDS_CHECKED_OUT 23
-#define IDS_CHECKED_OUT_BY_OTHER 24
-#define IDS_OUT_OF_DATE 25
-#define IDS_DELETED 26
-#define IDS_MODIFIED 27
-
 #define IDS_ASK 30
 #define IDS_YES 31
 #define IDS_NO 32

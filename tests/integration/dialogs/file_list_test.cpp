@@ -44,16 +44,16 @@ TEST_F(FileListDialog, ShowsTitleMessageAndEachFileWithFolderAndState)
     namespace State = OrvixFileState;
     const std::pair<unsigned long, const wchar_t*> states[] = {
         {0, L"Unknown"},
-        {State::NotControlled, L"Not under source control"},
+        {State::NotControlled, L"Not controlled"},
         {State::Controlled, L"Checked in"},
-        {State::Controlled | State::CheckedOut, L"Checked out by you"},
+        {State::Controlled | State::CheckedOut, L"Checked out"},
         {State::Controlled | State::CheckedOutByOther, L"Checked out by another user"},
-        {State::Controlled | State::OutOfDate, L"Out of date"},
-        {State::Controlled | State::Deleted, L"Deleted"},
-        {State::Controlled | State::Modified, L"Modified"},
+        {State::Controlled | State::OutOfDate, L"Checked in, out of date"},
+        {State::Controlled | State::Deleted, L"Checked in, deleted in the project"},
+        {State::Controlled | State::Modified, L"Checked in, modified"},
         {State::Controlled | State::CheckedOut | State::CheckedOutByOther | State::OutOfDate | State::Deleted |
              State::Modified | OrvixFilePermission::CheckIn | OrvixFilePermission::ShowHistory,
-         L"Checked out by you, Checked out by another user, Out of date, Deleted, Modified"}};
+         L"Checked out, also by another user, modified, out of date, deleted in the project"}};
     Texts words;
     for (const auto& [flags, text] : states)
     {
@@ -388,7 +388,7 @@ TEST_F(FileListDialog, FiltersByNameFolderAndStateWhileTyping)
         dialog.Press(VK_HOME);
         dialog.Type(L"x");
         EXPECT_EQ(dialog.NumRows(List), 0);
-        SetWindowTextW(dialog.Control(L"Filter:"), L"not under");
+        SetWindowTextW(dialog.Control(L"Filter:"), L"not con");
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"Church.model"}));
         Cancel(dialog);
     });
@@ -431,7 +431,7 @@ TEST_F(FileListDialog, SortsByTheClickedColumnAndReversesTheOrder)
         dialog.ClickHeading(List, 1);
         EXPECT_EQ(dialog.Column(List, 1), (Texts{L"x", L"y", L"z"}));
         dialog.ClickHeading(List, 2);
-        EXPECT_EQ(dialog.Column(List, 2), (Texts{L"Checked in", L"Checked in", L"Not under source control"}));
+        EXPECT_EQ(dialog.Column(List, 2), (Texts{L"Checked in", L"Checked in", L"Not controlled"}));
         dialog.ClickCheckBox(List, 0);
         dialog.Click(L"OK");
     });
