@@ -25,9 +25,9 @@ bool IsCheckBox(HWND control)
 
 LONG HeightOf(HWND window)
 {
-    RECT place{};
-    GetWindowRect(window, &place);
-    return place.bottom - place.top;
+    RECT rect{};
+    GetWindowRect(window, &rect);
+    return rect.bottom - rect.top;
 }
 
 /// A control's device context, with the control's font selected.
@@ -151,8 +151,8 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
         return TRUE;
     case WM_DPICHANGED: {
         m_layout.SetDpi(LOWORD(wParam));
-        const RECT& place = *std::bit_cast<const RECT*>(lParam);
-        SetWindowPos(m_window, nullptr, place.left, place.top, place.right - place.left, place.bottom - place.top,
+        const RECT& rect = *std::bit_cast<const RECT*>(lParam);
+        SetWindowPos(m_window, nullptr, rect.left, rect.top, rect.right - rect.left, rect.bottom - rect.top,
                      SWP_NOZORDER | SWP_NOACTIVATE);
         return TRUE;
     }
@@ -188,7 +188,7 @@ void Dialog::ColorCheckBoxes() const
     {
         if (IsCheckBox(control))
         {
-            SetWindowTheme(control, L" ", L" "); // a theme has its own colour for their texts
+            SetWindowTheme(control, L" ", L" "); // a theme would draw their texts in its own colour
         }
     }
 }
@@ -241,8 +241,8 @@ void Dialog::RememberSize() const
     {
         return;
     }
-    const RECT& place = placement.rcNormalPosition; // that of a maximised window as well
-    // Another message needs other room.
-    Settings::StoreWindowSize(m_name, {m_layout.FromPixels(place.right - place.left),
-                                       m_layout.FromPixels(place.bottom - place.top) - m_roomForMessage});
+    const RECT& rect = placement.rcNormalPosition; // also the one of a maximised window
+    // The next message may need less room or more.
+    Settings::StoreWindowSize(m_name, {m_layout.FromPixels(rect.right - rect.left),
+                                       m_layout.FromPixels(rect.bottom - rect.top) - m_roomForMessage});
 }

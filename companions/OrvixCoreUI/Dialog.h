@@ -10,8 +10,8 @@
 #include <span>
 #include <string>
 
-/// A modal dialog from a template of this library, which can be resized and never gets smaller than its template. Where
-/// it has a message (IDC_MESSAGE), it is as much higher as the message needs.
+/// A modal dialog from a template of this library. It can be resized, but not below the size of its template. When its
+/// message (IDC_MESSAGE) needs more room than the template has, the dialog is higher.
 class Dialog
 {
 public:
@@ -23,30 +23,31 @@ public:
     std::optional<std::int32_t> Run(HWND owner);
 
 protected:
-    /// `name` is the one under which the user's size of the dialog is remembered; null: its size is not.
+    /// `name` is the name under which the size of the dialog is remembered; null when it is not. The name outlives the
+    /// dialog, and so does `access`, which may be null.
     Dialog(int templateId, const wchar_t* name, IOrvixCoreUIClientAccess* access)
         : m_templateId(templateId), m_name(name), m_palette(access)
     {
     }
     ~Dialog() = default;
 
-    /// How the controls follow the dialog's size.
+    /// How the controls follow the size of the dialog. Valid as long as the dialog.
     virtual std::span<const Layout::Rule> Rules() const = 0;
 
     /// Fills the controls.
     virtual void OnInit() = 0;
 
-    /// A control, or a key that stands for one, was used.
+    /// A control was used, or the key that does the same.
     virtual void OnCommand(int control, int notification) = 0;
 
-    /// A control reports something; returns what the control is to get back.
+    /// A control sends a notification; the result is returned to the control.
     virtual LRESULT OnNotify(const NMHDR&) { return 0; }
 
-    /// The user asks for a control's own menu, at a point of the screen or, by the keyboard, at (-1, -1); returns
-    /// whether it has one.
+    /// The user asks for the context menu of a control, at a point of the screen; by keyboard the point is (-1, -1).
+    /// Returns whether the control has a menu.
     virtual bool OnContextMenu(HWND, POINT) { return false; }
 
-    /// The controls have followed a new size.
+    /// The dialog has a new size, and the controls have followed it.
     virtual void OnSize() {}
 
     /// Closes the dialog; `Run` returns `result`.
@@ -61,9 +62,10 @@ protected:
     void SetChecked(int control, bool checked) const;
     bool IsChecked(int control) const { return IsDlgButtonChecked(m_window, control) == BST_CHECKED; }
 
+    /// Moves the keyboard's focus to a control.
     void Focus(int control) const { SendMessageW(m_window, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(Item(control)), 1); }
 
-    /// Takes a control, and its access key, out of the dialog.
+    /// Hides a control and disables it, so that its access key has no effect.
     void Hide(int control) const;
 
 private:
@@ -73,11 +75,11 @@ private:
     void OnOpen();
     void ColorCheckBoxes() const;
 
-    /// Makes room for a message that needs more than the template has. Returns how much, in pixels.
+    /// Makes the message as high as it needs. Returns by how many pixels the dialog gets higher.
     LONG ShowWholeMessage();
     RECT WorkArea() const;
 
-    /// Gives the dialog a size in pixels, as far as the monitor allows, around the middle that it has.
+    /// Gives the dialog a size in pixels and keeps its centre, as far as the monitor allows.
     void Resize(LONG width, LONG height) const;
     void RememberSize() const;
 
@@ -85,7 +87,7 @@ private:
     const wchar_t* m_name;
     Palette m_palette;
     Layout m_layout;
-    LONG m_roomForMessage = 0; // by which the window is higher, at 96 dots per inch
+    LONG m_roomForMessage = 0; // how much higher the window is for its message, at 96 dots per inch
     HWND m_window = nullptr;
     std::optional<std::int32_t> m_result;
 };

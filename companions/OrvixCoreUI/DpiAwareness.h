@@ -2,14 +2,14 @@
 
 #include <windows.h>
 
-/// Lets the windows that the thread makes during its lifetime be drawn by this library for each monitor's own
-/// resolution, whatever the host does with its own.
+/// While it lives, the thread makes windows that this library draws for the resolution of each monitor, whatever the
+/// host does with its own windows.
 class DpiAwareness
 {
 public:
     DpiAwareness() : m_previous(SetThreadDpiAwarenessContext(DPI_AWARENESS_CONTEXT_PER_MONITOR_AWARE_V2))
     {
-        // The first releases of Windows 10 do not know the second version.
+        // The first releases of Windows 10 know only the first version.
         if (m_previous == nullptr)
         {
             m_previous = SetThreadDpiAwarenessContext(DPI_AWARENESS_CONTEXT_PER_MONITOR_AWARE);

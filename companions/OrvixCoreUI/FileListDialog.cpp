@@ -71,7 +71,7 @@ void FileListDialog::OnInit()
 {
     SetTitle(m_params.GetTitle());
     SetText(IDC_MESSAGE, m_params.GetMessageW());
-    SendDlgItemMessageW(Window(), IDC_COMMENT, EM_SETLIMITTEXT, 0, 0); // as long as it may be
+    SendDlgItemMessageW(Window(), IDC_COMMENT, EM_SETLIMITTEXT, 0, 0); // no limit
     SetText(IDC_COMMENT, m_params.GetComment());
     FillList();
     ShowRecentComments();
@@ -96,8 +96,8 @@ void FileListDialog::OnCommand(int control, int notification)
         m_files.CheckShown(control == IDC_SELECT_ALL);
         break;
     case IDC_RECENT:
-        // In the open list alone: in the closed one keys and the wheel pass over items that nobody chose. An open list
-        // begins without a choice, since some ways to close it confirm what is chosen.
+        // Only the open list counts: in the closed one, keys and the mouse wheel select items on the way to others. The
+        // list opens with nothing selected, since some ways to close it confirm the selected item.
         if (notification == CBN_DROPDOWN)
         {
             SendDlgItemMessageW(Window(), IDC_RECENT, CB_SETCURSEL, static_cast<WPARAM>(-1), 0);
@@ -192,7 +192,7 @@ void FileListDialog::TakeRecentComment() const
         return;
     }
     const std::wstring& comment = m_recentComments[static_cast<std::size_t>(chosen)];
-    // Ctrl+Z brings back what was there.
+    // EM_REPLACESEL lets Ctrl+Z restore the previous comment.
     SendDlgItemMessageW(Window(), IDC_COMMENT, EM_SETSEL, 0, -1);
     SendDlgItemMessageW(Window(), IDC_COMMENT, EM_REPLACESEL, TRUE, reinterpret_cast<LPARAM>(comment.c_str()));
 }

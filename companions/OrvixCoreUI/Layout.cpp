@@ -7,16 +7,16 @@
 namespace
 {
 
-RECT PlaceOf(HWND control, HWND dialog)
+RECT RectOf(HWND control, HWND dialog)
 {
-    RECT place{};
-    // Of a combo box, the place with its list: that is what MoveWindow sets.
-    if (SendMessageW(control, CB_GETDROPPEDCONTROLRECT, 0, reinterpret_cast<LPARAM>(&place)) == 0)
+    RECT rect{};
+    // The rectangle of a combo box includes its list, as in MoveWindow.
+    if (SendMessageW(control, CB_GETDROPPEDCONTROLRECT, 0, reinterpret_cast<LPARAM>(&rect)) == 0)
     {
-        GetWindowRect(control, &place);
+        GetWindowRect(control, &rect);
     }
-    MapWindowPoints(nullptr, dialog, reinterpret_cast<POINT*>(&place), 2);
-    return place;
+    MapWindowPoints(nullptr, dialog, reinterpret_cast<POINT*>(&rect), 2);
+    return rect;
 }
 
 unsigned FollowsOf(HWND control, std::span<const Layout::Rule> rules)
@@ -33,45 +33,45 @@ Layout::Layout(HWND dialog, std::span<const Rule> rules)
 {
     RECT area{};
     GetClientRect(dialog, &area);
-    m_inside = {area.right, area.bottom};
+    m_clientSize = {area.right, area.bottom};
     auto* const font = std::bit_cast<HFONT>(SendMessageW(dialog, WM_GETFONT, 0, 0));
-    GetObjectW(font, sizeof m_letters, &m_letters);
+    GetObjectW(font, sizeof m_fontDescription, &m_fontDescription);
     for (HWND control = GetWindow(dialog, GW_CHILD); control != nullptr; control = GetWindow(control, GW_HWNDNEXT))
     {
-        m_controls.push_back({control, PlaceOf(control, dialog), FollowsOf(control, rules)});
+        m_controls.push_back({control, RectOf(control, dialog), FollowsOf(control, rules)});
     }
 }
 
 void Layout::MakeRoom(HWND control, LONG more)
 {
-    const LONG below = PlaceOf(control, m_dialog).bottom;
+    const LONG below = RectOf(control, m_dialog).bottom;
     for (Control& other : m_controls)
     {
         if (other.window == control)
         {
-            other.place.bottom += more;
+            other.rect.bottom += more;
         }
-        else if (other.place.top >= below)
+        else if (other.rect.top >= below)
         {
-            OffsetRect(&other.place, 0, more);
+            OffsetRect(&other.rect, 0, more);
         }
     }
-    m_inside.cy += more;
+    m_clientSize.cy += more;
 }
 
 void Layout::Apply() const
 {
     RECT inside{};
     GetClientRect(m_dialog, &inside);
-    const int moreX = inside.right - Scaled(m_inside.cx);
-    const int moreY = inside.bottom - Scaled(m_inside.cy);
+    const int moreX = inside.right - Scaled(m_clientSize.cx);
+    const int moreY = inside.bottom - Scaled(m_clientSize.cy);
     for (const Control& control : m_controls)
     {
-        const RECT& place = control.place;
+        const RECT& rect = control.rect;
         const auto part = [&control](unsigned rule, int more) { return (control.follows & rule) != 0 ? more : 0; };
-        SetWindowPos(control.window, nullptr, Scaled(place.left) + part(MoveX, moreX),
-                     Scaled(place.top) + part(MoveY, moreY), Scaled(place.right - place.left) + part(GrowX, moreX),
-                     Scaled(place.bottom - place.top) + part(GrowY, moreY), SWP_NOZORDER | SWP_NOACTIVATE);
+        SetWindowPos(control.window, nullptr, Scaled(rect.left) + part(MoveX, moreX),
+                     Scaled(rect.top) + part(MoveY, moreY), Scaled(rect.right - rect.left) + part(GrowX, moreX),
+                     Scaled(rect.bottom - rect.top) + part(GrowY, moreY), SWP_NOZORDER | SWP_NOACTIVATE);
     }
     InvalidateRect(m_dialog, nullptr, TRUE);
 }
@@ -79,9 +79,9 @@ void Layout::Apply() const
 void Layout::SetDpi(UINT dpi)
 {
     m_dpi = dpi;
-    LOGFONTW letters = m_letters;
-    letters.lfHeight = Scaled(letters.lfHeight);
-    UniqueGdiObject<HFONT> font(CreateFontIndirectW(&letters));
+    LOGFONTW description = m_fontDescription;
+    description.lfHeight = Scaled(description.lfHeight);
+    UniqueGdiObject<HFONT> font(CreateFontIndirectW(&description));
     if (!font)
     {
         return;
@@ -95,7 +95,7 @@ void Layout::SetDpi(UINT dpi)
 
 POINT Layout::SmallestWindow() const
 {
-    RECT area{0, 0, Scaled(m_inside.cx), Scaled(m_inside.cy)};
+    RECT area{0, 0, Scaled(m_clientSize.cx), Scaled(m_clientSize.cy)};
     AdjustWindowRectExForDpi(&area, static_cast<DWORD>(GetWindowLongW(m_dialog, GWL_STYLE)), FALSE,
                              static_cast<DWORD>(GetWindowLongW(m_dialog, GWL_EXSTYLE)), m_dpi);
     return {area.right - area.left, area.bottom - area.top};

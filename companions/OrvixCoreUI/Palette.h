@@ -6,21 +6,21 @@
 
 class IOrvixCoreUIClientAccess;
 
-/// The host's colours for dialogs, read once, before a dialog opens.
+/// The host's colours for dialogs, read once, before a dialog opens. The brushes live as long as this object.
 class Palette
 {
 public:
-    /// `access` may be null: the system's colours.
+    /// Without `access` the colours are the system's.
     explicit Palette(IOrvixCoreUIClientAccess* access);
 
     COLORREF Window() const { return m_window; }
     COLORREF WindowText() const { return m_windowText; }
 
-    /// Whether texts have another colour than the system's.
+    /// Whether the colour of texts differs from the system's.
     bool HasOwnText() const { return m_faceText != GetSysColor(COLOR_BTNTEXT); }
 
-    /// Answers a WM_CTLCOLOR message: sets the colours of the device context and gives the brush for the
-    /// background; null for a message of another kind.
+    /// Handles a WM_CTLCOLOR message: sets the colours of the device context and returns the brush for the background.
+    /// Null for any other message.
     HBRUSH Apply(UINT message, HDC context) const;
 
 private:

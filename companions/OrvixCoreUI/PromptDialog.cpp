@@ -36,12 +36,12 @@ std::optional<std::int32_t> AnswerOf(int control)
     return found == std::end(Buttons) ? std::nullopt : std::optional(found->answer);
 }
 
-RECT PlaceOf(HWND control)
+RECT RectOf(HWND control)
 {
-    RECT place{};
-    GetWindowRect(control, &place);
-    MapWindowPoints(nullptr, GetParent(control), reinterpret_cast<POINT*>(&place), 2);
-    return place;
+    RECT rect{};
+    GetWindowRect(control, &rect);
+    MapWindowPoints(nullptr, GetParent(control), reinterpret_cast<POINT*>(&rect), 2);
+    return rect;
 }
 
 } // namespace
@@ -78,16 +78,16 @@ void PromptDialog::OnInit()
 /// Moves the buttons that are offered to the right and hides the others.
 void PromptDialog::ArrangeButtons() const
 {
-    RECT places[std::size(Buttons)];
-    std::transform(std::begin(Buttons), std::end(Buttons), places,
-                   [this](const Button& button) { return PlaceOf(Item(button.control)); });
-    const RECT* place = places;
+    RECT rects[std::size(Buttons)];
+    std::transform(std::begin(Buttons), std::end(Buttons), rects,
+                   [this](const Button& button) { return RectOf(Item(button.control)); });
+    const RECT* rect = rects;
     for (const Button& button : Buttons)
     {
         if (Offers(m_options, button.answer))
         {
-            SetWindowPos(Item(button.control), nullptr, place->left, place->top, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
-            ++place;
+            SetWindowPos(Item(button.control), nullptr, rect->left, rect->top, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
+            ++rect;
         }
         else
         {

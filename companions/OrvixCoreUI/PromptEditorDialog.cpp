@@ -191,7 +191,7 @@ void PromptEditorDialog::TakeAnswer()
 
 void PromptEditorDialog::SetAnswer(unsigned int row, std::size_t answer)
 {
-    // An action of several bits that reads as this answer already keeps them.
+    // An action with several bits that already means this answer stays as it is.
     if (AnswerIndex(m_actions[row]) != answer)
     {
         m_actions[row] = Answers[answer].action;

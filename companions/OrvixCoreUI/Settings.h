@@ -7,22 +7,24 @@
 #include <string>
 #include <vector>
 
-/// What the dialogs remember of the user from one session to the next, in the registry below
-/// HKEY_CURRENT_USER\Software\OrvixCore\Dialogs. What cannot be read is not there, what cannot be written is lost.
+/// What the dialogs remember about the user from one session to the next, in the registry key
+/// HKEY_CURRENT_USER\Software\OrvixCore\Dialogs. A value that cannot be read counts as missing; one that cannot be
+/// written is lost.
 namespace Settings
 {
 
-/// How many recent comments are kept.
+/// How many recent comments are stored.
 constexpr std::size_t MaxRecentComments = 20;
 
-/// The size of a dialog's window at 96 dots per inch.
+/// The size of the window of a dialog, in pixels at 96 dots per inch; nothing when none is stored. `dialog` is the name
+/// that the dialog has in the registry.
 std::optional<SIZE> WindowSize(const std::wstring& dialog);
 void StoreWindowSize(const std::wstring& dialog, SIZE size);
 
-/// The comments of confirmed dialogs, the latest first.
+/// The comments of confirmed dialogs, the latest first, at most `MaxRecentComments`.
 std::vector<std::wstring> RecentComments();
 
-/// Puts a comment first, where it is not empty.
+/// Makes a comment the first of the recent ones. An empty comment is ignored.
 void AddRecentComment(const std::wstring& comment);
 
 } // namespace Settings

@@ -16,8 +16,11 @@ namespace
 /// The state image of a row with a check box: number 1 clear, number 2 checked.
 constexpr UINT StateImageShift = 12;
 
-/// The control's -1: every place to set a state of, and the place before the first.
-constexpr auto AllPlaces = static_cast<std::size_t>(-1);
+/// To the control, -1 means every position when a state is set.
+constexpr auto AllPositions = static_cast<std::size_t>(-1);
+
+/// To the control, -1 means the position before the first when a state is searched.
+constexpr auto BeforeFirst = static_cast<std::size_t>(-1);
 
 struct MenuPolicy
 {
@@ -27,7 +30,7 @@ struct MenuPolicy
 };
 using UniqueMenu = UniqueHandle<MenuPolicy>;
 
-/// Lets a window change many times at the cost of one drawing.
+/// Lets a window change many times and be drawn once, at the end.
 class DrawnOnce
 {
 public:
@@ -102,15 +105,15 @@ std::size_t TableView::NumChecked() const
 
 void TableView::CheckShown(bool checked)
 {
-    std::vector<std::size_t> places(m_table.NumShown());
-    std::iota(places.begin(), places.end(), std::size_t{0});
-    Check(places, checked);
+    std::vector<std::size_t> positions(m_table.NumShown());
+    std::iota(positions.begin(), positions.end(), std::size_t{0});
+    Check(positions, checked);
 }
 
 std::optional<std::size_t> TableView::Selected() const
 {
-    const auto place = Next(AllPlaces, LVNI_SELECTED);
-    return place ? std::optional(m_table.RowAt(*place)) : std::nullopt;
+    const auto position = Next(BeforeFirst, LVNI_SELECTED);
+    return position ? std::optional(m_table.RowAt(*position)) : std::nullopt;
 }
 
 void TableView::FitColumns() const
@@ -159,7 +162,7 @@ LRESULT TableView::Handle(const NMHDR& notification)
     switch (notification.code)
     {
     case LVN_GETDISPINFOW:
-        GiveItem(const_cast<NMLVDISPINFOW*>(reinterpret_cast<const NMLVDISPINFOW*>(header))->item);
+        FillItem(const_cast<NMLVDISPINFOW*>(reinterpret_cast<const NMLVDISPINFOW*>(header))->item);
         return 0;
     case LVN_COLUMNCLICK:
         SortBy(static_cast<std::size_t>(reinterpret_cast<const NMLISTVIEW*>(header)->iSubItem));
@@ -192,14 +195,15 @@ std::wstring TableView::Heading(std::size_t column) const
     return text;
 }
 
-void TableView::GiveItem(LVITEMW& item) const
+/// Fills in what the control asks for.
+void TableView::FillItem(LVITEMW& item) const
 {
-    const auto place = static_cast<std::size_t>(item.iItem);
-    if (place >= m_table.NumShown())
+    const auto position = static_cast<std::size_t>(item.iItem);
+    if (position >= m_table.NumShown())
     {
         return;
     }
-    const std::size_t row = m_table.RowAt(place);
+    const std::size_t row = m_table.RowAt(position);
     if ((item.mask & LVIF_TEXT) != 0)
     {
         item.pszText = const_cast<wchar_t*>(m_table.Cell(row, static_cast<std::size_t>(item.iSubItem)).c_str());
@@ -235,32 +239,32 @@ void TableView::SortBy(std::size_t column)
 template <typename Rearrange>
 void TableView::KeepingSelection(const Rearrange& rearrange)
 {
-    // The control remembers places, and other rows come to stand there.
+    // The control keeps the states of positions, which get other rows now.
     std::vector<bool> selected(m_table.NumRows());
-    for (const std::size_t place : SelectedPlaces())
+    for (const std::size_t position : SelectedPositions())
     {
-        selected[m_table.RowAt(place)] = true;
+        selected[m_table.RowAt(position)] = true;
     }
-    const auto focusedPlace = Next(AllPlaces, LVNI_FOCUSED);
+    const auto focusedPosition = Next(BeforeFirst, LVNI_FOCUSED);
     const std::size_t noRow = m_table.NumRows();
-    const std::size_t focusedRow = focusedPlace ? m_table.RowAt(*focusedPlace) : noRow;
+    const std::size_t focusedRow = focusedPosition ? m_table.RowAt(*focusedPosition) : noRow;
     std::size_t focused = 0;
     bool anySelected = false;
     {
         const DrawnOnce all(m_window);
-        SetState(AllPlaces, LVIS_SELECTED, 0);
+        SetState(AllPositions, LVIS_SELECTED, 0);
         rearrange();
         SendMessageW(m_window, LVM_SETITEMCOUNT, m_table.NumShown(), 0);
-        for (std::size_t place = 0; place < m_table.NumShown(); ++place)
+        for (std::size_t position = 0; position < m_table.NumShown(); ++position)
         {
-            const std::size_t row = m_table.RowAt(place);
+            const std::size_t row = m_table.RowAt(position);
             if (row == focusedRow)
             {
-                focused = place;
+                focused = position;
             }
             if (selected[row])
             {
-                SetState(place, LVIS_SELECTED, LVIS_SELECTED);
+                SetState(position, LVIS_SELECTED, LVIS_SELECTED);
                 anySelected = true;
             }
         }
@@ -269,7 +273,7 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
     {
         return;
     }
-    // The keyboard goes on from here.
+    // Keyboard users go on from this row.
     SetState(focused, LVIS_FOCUSED, LVIS_FOCUSED);
     if (!anySelected)
     {
@@ -279,27 +283,27 @@ void TableView::KeepingSelection(const Rearrange& rearrange)
     SendMessageW(m_window, LVM_ENSUREVISIBLE, focused, FALSE);
 }
 
-void TableView::SetState(std::size_t place, UINT states, UINT value) const
+void TableView::SetState(std::size_t position, UINT states, UINT value) const
 {
     LVITEMW item{};
     item.stateMask = states;
     item.state = value;
-    Send(LVM_SETITEMSTATE, place, &item);
+    Send(LVM_SETITEMSTATE, position, &item);
 }
 
 void TableView::ToggleFocused()
 {
-    const auto focused = Next(AllPlaces, LVNI_FOCUSED);
+    const auto focused = Next(BeforeFirst, LVNI_FOCUSED);
     if (!focused)
     {
         return;
     }
-    std::vector<std::size_t> places = SelectedPlaces();
-    if (!std::binary_search(places.begin(), places.end(), *focused))
+    std::vector<std::size_t> positions = SelectedPositions();
+    if (!std::binary_search(positions.begin(), positions.end(), *focused))
     {
-        places = {*focused};
+        positions = {*focused};
     }
-    Check(places, !m_checked[m_table.RowAt(*focused)]);
+    Check(positions, !m_checked[m_table.RowAt(*focused)]);
 }
 
 void TableView::ToggleClicked(const NMITEMACTIVATE& click)
@@ -311,20 +315,21 @@ void TableView::ToggleClicked(const NMITEMACTIVATE& click)
     {
         return;
     }
-    const auto place = static_cast<std::size_t>(found);
-    Check({place}, !m_checked[m_table.RowAt(place)]);
+    const auto position = static_cast<std::size_t>(found);
+    Check({position}, !m_checked[m_table.RowAt(position)]);
 }
 
-/// The control does not know that anything changes. Screen readers are told of one row, or of the whole list.
-void TableView::Check(const std::vector<std::size_t>& places, bool checked)
+/// The control does not know what is checked, so it is told to draw. Screen readers are told of the row, or of the
+/// whole list when several rows change.
+void TableView::Check(const std::vector<std::size_t>& positions, bool checked)
 {
-    for (const std::size_t place : places)
+    for (const std::size_t position : positions)
     {
-        m_checked[m_table.RowAt(place)] = checked;
+        m_checked[m_table.RowAt(position)] = checked;
     }
     InvalidateRect(m_window, nullptr, FALSE);
     NotifyWinEvent(EVENT_OBJECT_STATECHANGE, m_window, OBJID_CLIENT,
-                   places.size() == 1 ? static_cast<LONG>(places.front()) + 1 : CHILDID_SELF);
+                   positions.size() == 1 ? static_cast<LONG>(positions.front()) + 1 : CHILDID_SELF);
 }
 
 LRESULT TableView::Find(const NMLVFINDITEMW& search) const
@@ -338,36 +343,36 @@ LRESULT TableView::Find(const NMLVFINDITEMW& search) const
     const auto first = static_cast<std::size_t>(std::max(search.iStart, 0));
     for (std::size_t i = 0; i < count; ++i)
     {
-        const std::size_t place = (first + i) % count;
-        const std::wstring& cell = m_table.Cell(m_table.RowAt(place), 0);
+        const std::size_t position = (first + i) % count;
+        const std::wstring& cell = m_table.Cell(m_table.RowAt(position), 0);
         if (cell.size() >= start.size() &&
             CompareStringOrdinal(cell.c_str(), static_cast<int>(start.size()), start.c_str(),
                                  static_cast<int>(start.size()), TRUE) == CSTR_EQUAL)
         {
-            return static_cast<LRESULT>(place);
+            return static_cast<LRESULT>(position);
         }
     }
     return -1;
 }
 
-std::vector<std::size_t> TableView::SelectedPlaces() const
+std::vector<std::size_t> TableView::SelectedPositions() const
 {
-    std::vector<std::size_t> places;
-    for (auto place = Next(AllPlaces, LVNI_SELECTED); place; place = Next(*place, LVNI_SELECTED))
+    std::vector<std::size_t> positions;
+    for (auto position = Next(BeforeFirst, LVNI_SELECTED); position; position = Next(*position, LVNI_SELECTED))
     {
-        places.push_back(*place);
+        positions.push_back(*position);
     }
-    return places;
+    return positions;
 }
 
 std::optional<std::size_t> TableView::Next(std::size_t after, UINT state) const
 {
-    const LRESULT place = SendMessageW(m_window, LVM_GETNEXTITEM, after, state);
-    if (place < 0 || static_cast<std::size_t>(place) >= m_table.NumShown())
+    const LRESULT position = SendMessageW(m_window, LVM_GETNEXTITEM, after, state);
+    if (position < 0 || static_cast<std::size_t>(position) >= m_table.NumShown())
     {
         return std::nullopt;
     }
-    return static_cast<std::size_t>(place);
+    return static_cast<std::size_t>(position);
 }
 
 LRESULT TableView::Send(UINT message, WPARAM wParam, const void* argument) const

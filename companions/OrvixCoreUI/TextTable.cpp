@@ -9,7 +9,7 @@
 namespace
 {
 
-/// The text as comparisons without regard to letter case see it.
+/// The text in lower case, for comparisons without regard to letter case.
 std::wstring Folded(std::wstring text)
 {
     CharLowerBuffW(text.data(), static_cast<DWORD>(text.size()));
@@ -36,7 +36,7 @@ void TextTable::SetCell(std::size_t row, std::size_t column, std::wstring text)
 void TextTable::Filter(const std::wstring& text)
 {
     m_filter = Folded(text);
-    Show();
+    ApplyFilter();
 }
 
 void TextTable::Sort(std::size_t column, bool ascending)
@@ -45,10 +45,10 @@ void TextTable::Sort(std::size_t column, bool ascending)
         const int order = m_rows[left].folded[column].compare(m_rows[right].folded[column]);
         return ascending ? order < 0 : order > 0;
     });
-    Show();
+    ApplyFilter();
 }
 
-void TextTable::Show()
+void TextTable::ApplyFilter()
 {
     m_shown.clear();
     std::copy_if(m_order.begin(), m_order.end(), std::back_inserter(m_shown), [this](std::size_t row) {

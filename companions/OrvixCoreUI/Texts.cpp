@@ -5,7 +5,7 @@
 
 std::wstring Text(UINT id)
 {
-    const wchar_t* text = nullptr; // not terminated
+    const wchar_t* text = nullptr; // points into the resource, without a terminator
     const int length = LoadStringW(ThisModule(), id, reinterpret_cast<wchar_t*>(&text), 0);
     return {text, static_cast<std::size_t>(length)};
 }
