@@ -1,9 +1,12 @@
 #include "ArchiveProvider.h"
 
+#include "ArchiveBarrier.h"
 #include "IOrvixClientAccess.h"
 #include "OrvixClientInfo.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
+#include "OrvixProviderOption.h"
 
 #include <algorithm>
 #include <span>
@@ -11,96 +14,53 @@
 namespace
 {
 
-constexpr int Success = 0;
-constexpr int Failed = -1;
-constexpr int NotOffered = -2;
-
-constexpr unsigned long KeepCheckedOut = 0x1;
-constexpr unsigned long WithGetLatest = 0x2;
-
-/// The exception barrier: what goes wrong unforeseen, out of memory above all, is a failed operation.
-template <typename Work>
-int Guarded(Work work) noexcept
-{
-    try
-    {
-        return work();
-    }
-    catch (...)
-    {
-        return Failed;
-    }
-}
+using OrvixProviderResult::Failure;
+using OrvixProviderResult::Success;
 
 std::wstring Text(const wchar_t* text)
 {
     return text != nullptr ? text : L"";
 }
 
-/// The bits of `IOrvixProvider::QueryStatus` for a file of an open project.
+bool KeepsCheckedOut(unsigned long options)
+{
+    return (options & OrvixProviderOption::KeepCheckedOut) != 0;
+}
+
+bool GetsLatest(unsigned long options)
+{
+    return (options & OrvixProviderOption::GetLatest) != 0;
+}
+
+/// The flags of `QueryStatus` for a file of an open project.
 unsigned long FlagsOf(const ArchiveStatus& status)
 {
     if (!status.controlled)
     {
-        return 0x1 | 0x100000;
+        return OrvixFileState::NotControlled | OrvixFilePermission::Add;
     }
-    unsigned long flags = 0x2 | 0x200000 | 0x400000;
-    if (status.checkedOut)
-    {
-        flags |= 0x4 | 0x10000 | 0x40000;
-    }
-    if (status.checkedOutByOther)
-    {
-        flags |= 0x8;
-    }
-    if (status.outOfDate)
-    {
-        flags |= 0x10;
-    }
-    if (status.modified)
-    {
-        flags |= 0x80;
-    }
-    if (!status.checkedOut && !status.checkedOutByOther && !status.outOfDate)
-    {
-        flags |= 0x20000;
-    }
-    if (status.checkedOut || status.modified)
-    {
-        flags |= 0x80000;
-    }
+    unsigned long flags =
+        OrvixFileState::Controlled | OrvixFilePermission::GetLatest | OrvixFilePermission::ShowHistory;
+    const auto setWhen = [&flags](bool condition, unsigned long bits) { flags |= condition ? bits : 0; };
+    setWhen(status.checkedOut,
+            OrvixFileState::CheckedOut | OrvixFilePermission::CheckIn | OrvixFilePermission::UndoCheckOut);
+    setWhen(status.checkedOutByOther, OrvixFileState::CheckedOutByOther);
+    setWhen(status.outOfDate, OrvixFileState::OutOfDate);
+    setWhen(status.modified, OrvixFileState::Modified);
+    setWhen(!status.checkedOut && !status.checkedOutByOther && !status.outOfDate, OrvixFilePermission::CheckOut);
+    setWhen(status.checkedOut || status.modified, OrvixFilePermission::Compare);
     return flags;
 }
 
 } // namespace
 
-const wchar_t* ArchiveProvider::GetName()
-{
-    return Name;
-}
-
-int ArchiveProvider::ReservedA()
-{
-    return Success;
-}
-
-bool ArchiveProvider::IsInitialized()
-{
-    return m_initialized;
-}
-
-bool ArchiveProvider::IsProjectOpen()
-{
-    return m_store.IsOpen();
-}
-
 int ArchiveProvider::Initialize(OrvixClientInfo* info)
 {
-    return Guarded([&] {
+    return Guarded(Failure, [&] {
         Uninitialize();
         if (info == nullptr)
         {
-            return Failed;
+            return Failure;
         }
         m_user = Text(info->GetUserNameW());
         if (m_user.empty())
@@ -119,14 +79,14 @@ int ArchiveProvider::Uninitialize()
     m_store.Close();
     m_clientAccess = nullptr;
     m_initialized = false;
-    return wasInitialized ? Success : Failed;
+    return wasInitialized ? Success : Failure;
 }
 
 int ArchiveProvider::OpenProject(const wchar_t* localPath, const wchar_t*)
 {
-    return Guarded([&] {
+    return Guarded(Failure, [&] {
         m_store.Close();
-        return m_initialized && localPath != nullptr ? Report(m_store.Open(localPath, m_user)) : Failed;
+        return m_initialized && localPath != nullptr ? Report(m_store.Open(localPath, m_user)) : Failure;
     });
 }
 
@@ -134,64 +94,49 @@ int ArchiveProvider::CloseProject()
 {
     const bool wasOpen = m_store.IsOpen();
     m_store.Close();
-    return wasOpen ? Success : Failed;
+    return wasOpen ? Success : Failure;
 }
 
-int ArchiveProvider::ReservedB()
-{
-    return Success;
-}
-
-int ArchiveProvider::ReservedC()
-{
-    return NotOffered;
-}
-
-/// Hands the paths of the active entries, of which there must be one, to `work`.
+/// Calls `work` with the paths of the active entries. Without an active entry the operation fails.
 template <typename Work>
 int ArchiveProvider::FileOperation(OrvixFileList* list, Work work)
 {
-    return Guarded([&] {
-        if (!list)
-        {
-            return Failed;
-        }
-        const unsigned int count = list->NumActiveEntries();
+    return Guarded(Failure, [&] {
+        const unsigned int count = list != nullptr ? list->NumActiveEntries() : 0;
         Paths paths;
         paths.reserve(count);
         for (unsigned int i = 0; i < count; ++i)
         {
             OrvixFileEntry* entry = list->GetActiveFileEntry(i);
-            const wchar_t* path = entry ? entry->GetFile() : nullptr;
-            if (!path)
+            const wchar_t* path = entry != nullptr ? entry->GetFile() : nullptr;
+            if (path == nullptr)
             {
-                return Failed;
+                return Failure;
             }
             paths.emplace_back(path);
         }
-        return paths.empty() ? Failed : work(paths);
+        return paths.empty() ? Failure : work(paths);
     });
 }
 
 int ArchiveProvider::CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
     return FileOperation(list, [&](const Paths& paths) {
-        return Report(m_store.CheckIn(paths, Text(comment), (options & KeepCheckedOut) != 0));
+        return Report(m_store.CheckIn(paths, Text(comment), KeepsCheckedOut(options)));
     });
 }
 
 int ArchiveProvider::CheckOut(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
-    return FileOperation(list, [&](const Paths& paths) {
-        return Report(m_store.CheckOut(paths, Text(comment), (options & WithGetLatest) != 0));
-    });
+    return FileOperation(
+        list, [&](const Paths& paths) { return Report(m_store.CheckOut(paths, Text(comment), GetsLatest(options))); });
 }
 
 int ArchiveProvider::UndoCheckOut(OrvixFileList* list, unsigned long options)
 {
     return FileOperation(list, [&](const Paths& paths) {
         const int undone = Report(m_store.UndoCheckOut(paths));
-        const int got = options & WithGetLatest ? Report(m_store.GetLatest(paths)) : Success;
+        const int got = GetsLatest(options) ? Report(m_store.GetLatest(paths)) : Success;
         return undone == Success ? got : undone;
     });
 }
@@ -201,23 +146,10 @@ int ArchiveProvider::GetLatest(OrvixFileList* list, unsigned long)
     return FileOperation(list, [&](const Paths& paths) { return Report(m_store.GetLatest(paths)); });
 }
 
-int ArchiveProvider::ReservedD(void*, unsigned long* first, unsigned long* second)
-{
-    *first = 0;
-    *second = 0;
-    return NotOffered;
-}
-
-int ArchiveProvider::ReservedE()
-{
-    return NotOffered;
-}
-
 int ArchiveProvider::Add(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
-    return FileOperation(list, [&](const Paths& paths) {
-        return Report(m_store.Add(paths, Text(comment), (options & KeepCheckedOut) != 0));
-    });
+    return FileOperation(
+        list, [&](const Paths& paths) { return Report(m_store.Add(paths, Text(comment), KeepsCheckedOut(options))); });
 }
 
 int ArchiveProvider::ShowHistory(OrvixFileList* list)
@@ -249,13 +181,13 @@ int ArchiveProvider::ShowProperties(OrvixFileList* list)
 int ArchiveProvider::QueryStatus(OrvixFileList* list, unsigned long)
 {
     return FileOperation(list, [&](const Paths& paths) {
-        std::vector<unsigned long> flags(paths.size(), 0x1);
+        std::vector<unsigned long> flags(paths.size(), OrvixFileState::NotControlled);
         if (IsProjectOpen())
         {
             std::vector<ArchiveStatus> statuses;
             if (Report(m_store.Status(paths, statuses)) != Success)
             {
-                return Failed;
+                return Failure;
             }
             std::transform(statuses.begin(), statuses.end(), flags.begin(), FlagsOf);
         }
@@ -267,44 +199,14 @@ int ArchiveProvider::QueryStatus(OrvixFileList* list, unsigned long)
     });
 }
 
-int ArchiveProvider::ReservedF()
-{
-    return NotOffered;
-}
-
-int ArchiveProvider::ReservedG()
-{
-    return NotOffered;
-}
-
-int ArchiveProvider::ShowOptions()
-{
-    return NotOffered;
-}
-
-int ArchiveProvider::RunProviderClient()
-{
-    return NotOffered;
-}
-
-int ArchiveProvider::ReservedH()
-{
-    return NotOffered;
-}
-
-bool ArchiveProvider::ReservedI()
-{
-    return true;
-}
-
-/// Shows what went wrong; the result of the operation.
+/// Shows the failures and returns the result of the operation.
 int ArchiveProvider::Report(const ArchiveFailures& failures)
 {
     for (const ArchiveFailure& failure : failures)
     {
         Output(ArchiveReport::Failure(failure));
     }
-    return failures.empty() ? Success : Failed;
+    return failures.empty() ? Success : Failure;
 }
 
 void ArchiveProvider::Output(const ArchiveReport::Lines& lines)

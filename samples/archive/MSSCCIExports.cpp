@@ -1,6 +1,7 @@
 // The 21 functions of MSSCCI; archive_msscci.def exports them under their plain names. Each is a barrier that no
 // exception passes, around one call of the session that its context leads to.
 
+#include "ArchiveBarrier.h"
 #include "ArchiveScc.h"
 
 #include <cstring>
@@ -17,24 +18,11 @@ std::unordered_map<LPVOID, std::shared_ptr<ArchiveScc>> sessions;
 /// A batch belongs to no session. It changes nothing here, but batches do not nest, and each is ended once.
 bool batchOpen = false;
 
-template <typename Work>
-SCCRTN Guarded(Work work) noexcept
-{
-    try
-    {
-        return work();
-    }
-    catch (...)
-    {
-        return SCC_E_NONSPECIFICERROR;
-    }
-}
-
 /// SCC_E_INITIALIZEFAILED when the context is none that SccInitialize gave and SccUninitialize did not take.
 template <typename Work>
 SCCRTN WithSession(LPVOID context, Work work) noexcept
 {
-    return Guarded([&] {
+    return Guarded(SCC_E_NONSPECIFICERROR, [&] {
         const auto found = sessions.find(context);
         if (found == sessions.end())
         {
@@ -55,7 +43,7 @@ LONG SccGetVersion()
 SCCRTN SccInitialize(LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabilities, LPSTR auxPathLabel,
                      LPLONG checkoutCommentLength, LPLONG commentLength)
 {
-    return Guarded([&] {
+    return Guarded(SCC_E_NONSPECIFICERROR, [&] {
         if (context == nullptr || sccName == nullptr || capabilities == nullptr || auxPathLabel == nullptr ||
             checkoutCommentLength == nullptr || commentLength == nullptr)
         {
@@ -76,7 +64,8 @@ SCCRTN SccInitialize(LPVOID* context, HWND, LPCSTR, LPSTR sccName, LPLONG capabi
 
 SCCRTN SccUninitialize(LPVOID context)
 {
-    return Guarded([&] { return sessions.erase(context) != 0 ? SCC_OK : SCC_E_INITIALIZEFAILED; });
+    return Guarded(SCC_E_NONSPECIFICERROR,
+                   [&] { return sessions.erase(context) != 0 ? SCC_OK : SCC_E_INITIALIZEFAILED; });
 }
 
 SCCRTN SccOpenProject(LPVOID context, HWND, LPSTR user, LPCSTR projectName, LPCSTR localPath, LPSTR auxPath, LPCSTR,
