@@ -8,6 +8,7 @@ enum class ArchiveError
 {
     NotOpen,           ///< no project is open
     InvalidPath,       ///< not a file that a project may hold
+    OwnFile,           ///< a file of the archive itself
     NoSuchFile,        ///< the file is not on disk
     NotControlled,     ///< the archive does not know the file
     AlreadyControlled, ///< the file was added before

@@ -19,6 +19,11 @@ constexpr wchar_t Outside[] = L"The file lies outside the project folder";
     throw ArchiveFailure{ArchiveError::InvalidPath, reason, {}};
 }
 
+[[noreturn]] void RefuseOwnFile()
+{
+    throw ArchiveFailure{ArchiveError::OwnFile, L"The file belongs to the archive itself", {}};
+}
+
 bool TakePrefix(std::wstring_view& text, std::wstring_view prefix)
 {
     if (!text.starts_with(prefix))
@@ -205,6 +210,11 @@ ArchiveTarget ArchivePaths::Resolve(const std::wstring& path)
     const std::wstring name = longForm.substr(separator + 1);
     target.facts = ArchiveFiles::Find(folder + L'\\' + name);
     target.path = folder + L'\\' + (target.facts ? target.facts->name : name);
+    target.relative = target.path.substr(m_project.size() + 1);
+    if (IsReserved(target.relative))
+    {
+        RefuseOwnFile();
+    }
     if (target.facts && target.facts->IsFolder())
     {
         Refuse(L"A folder is not a file");
@@ -214,11 +224,6 @@ ArchiveTarget ArchivePaths::Resolve(const std::wstring& path)
         Refuse(LinkReason);
     }
 
-    target.relative = target.path.substr(m_project.size() + 1);
-    if (IsReserved(target.relative))
-    {
-        Refuse(L"The name is reserved for the archive");
-    }
     std::replace(target.relative.begin(), target.relative.end(), L'\\', L'/');
     target.key = KeyOf(target.relative);
     return target;
@@ -263,13 +268,13 @@ const std::wstring& ArchivePaths::ResolveFolder(const std::wstring& path)
         ArchiveFiles::ThrowError(L"The file's folder cannot be opened", error);
     }
     const std::wstring foldedPlace = ArchiveText::Fold(place);
+    if (IsInside(foldedPlace, m_foldedArchive))
+    {
+        RefuseOwnFile();
+    }
     if (!IsInside(foldedPlace, m_foldedProject))
     {
         Refuse(Outside);
-    }
-    if (IsInside(foldedPlace, m_foldedArchive))
-    {
-        Refuse(L"The file lies in the archive");
     }
     return m_folders.emplace(path, place).first->second;
 }

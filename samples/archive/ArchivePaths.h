@@ -34,7 +34,8 @@ public:
     /// Both folders as `FindFolder` gives them.
     ArchivePaths(const std::wstring& projectFolder, const std::wstring& archiveFolder);
 
-    /// Throws `ArchiveError::InvalidPath` for a path that a project cannot hold, a folder's among them.
+    /// Throws `ArchiveError::OwnFile` for a file or folder of the archive itself, and `ArchiveError::InvalidPath` for
+    /// any other path that a project cannot hold, such as that of a folder.
     ArchiveTarget Resolve(const std::wstring& path);
 
     /// Where a folder, on disk or not, lies in the project: relative to it, with "/" behind every name; empty for the

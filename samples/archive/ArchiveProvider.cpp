@@ -37,7 +37,7 @@ unsigned long FlagsOf(const ArchiveStatus& status)
 {
     if (!status.controlled)
     {
-        return OrvixFileState::NotControlled | OrvixFilePermission::Add;
+        return OrvixFileState::NotControlled | (status.ownFile ? 0 : OrvixFilePermission::Add);
     }
     unsigned long flags =
         OrvixFileState::Controlled | OrvixFilePermission::GetLatest | OrvixFilePermission::ShowHistory;

@@ -38,6 +38,8 @@ public:
     int Add(OrvixFileList* list, const wchar_t* comment, unsigned long options) override;
     int ShowHistory(OrvixFileList* list) override;
     int ShowProperties(OrvixFileList* list) override;
+
+    /// The archive's own files are not controlled and, unlike others, cannot be added.
     int QueryStatus(OrvixFileList* list, unsigned long options) override;
 
 private:

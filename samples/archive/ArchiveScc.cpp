@@ -83,6 +83,7 @@ SCCRTN ResultOf(ArchiveError error)
     case ArchiveError::NotOpen:
         return SCC_E_PROJNOTOPEN;
     case ArchiveError::InvalidPath:
+    case ArchiveError::OwnFile:
         return SCC_E_INVALIDFILEPATH;
     case ArchiveError::NoSuchFile:
         return SCC_E_FILENOTEXIST;
@@ -106,12 +107,13 @@ SCCRTN ResultOf(ArchiveError error)
     return SCC_E_NONSPECIFICERROR;
 }
 
-/// A file is checked out by one user at most, and so always exclusively.
+/// A file is checked out by one user at most, and so always exclusively. The interface has no bit for a file that
+/// cannot be added: the archive's own files are not controlled, as new files are, and `SccAdd` refuses them.
 LONG StatusOf(const ArchiveStatus& status)
 {
     if (!status.controlled)
     {
-        return 0;
+        return SCC_STATUS_NOTCONTROLLED;
     }
     LONG bits = SCC_STATUS_CONTROLLED;
     if (status.checkedOut)

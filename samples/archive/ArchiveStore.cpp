@@ -126,6 +126,8 @@ public:
 
     void GetLatest(ArchiveTarget& target, const ArchiveRecord& record) const;
 
+    ArchiveStatus StatusOf(const ArchiveTarget& target) const;
+
     static Local Compare(const ArchiveTarget& target, const ArchiveRecord& record, Proof proof);
 
 private:
@@ -201,6 +203,33 @@ void ArchiveStore::Session::GetLatest(ArchiveTarget& target, const ArchiveRecord
         throw Failure(ArchiveError::Modified, L"Changed on disk without a check-out, so it is not overwritten");
     }
     Bring(target, record, true);
+}
+
+ArchiveStatus ArchiveStore::Session::StatusOf(const ArchiveTarget& target) const
+{
+    ArchiveStatus status;
+    status.missing = !target.facts;
+    const std::optional<ArchiveRecord> record = Find(target);
+    if (!record)
+    {
+        return status;
+    }
+    status.controlled = true;
+    status.checkedOut = IsMine(*record);
+    status.checkedOutByOther = IsOthers(*record);
+
+    Local local = Local::Other;
+    try
+    {
+        local = Compare(target, *record, Proof::SizeAndTime);
+    }
+    catch (const ArchiveFailure&)
+    {
+        // Another program has the file open, and the file's size or time has changed.
+    }
+    status.outOfDate = local == Local::Missing || (local == Local::Older && !status.checkedOut);
+    status.modified = local == Local::Other || (local == Local::Older && status.checkedOut);
+    return status;
 }
 
 ArchiveFailures ArchiveStore::Open(const std::wstring& projectFolder, const std::wstring& user)
@@ -399,43 +428,17 @@ ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::v
     }
 
     Session session(*m_project);
-    const auto statusOf = [&](const ArchiveTarget& target) {
-        ArchiveStatus status;
-        status.missing = !target.facts;
-        const std::optional<ArchiveRecord> record = session.Find(target);
-        if (!record)
-        {
-            return status;
-        }
-        status.controlled = true;
-        status.checkedOut = session.IsMine(*record);
-        status.checkedOutByOther = session.IsOthers(*record);
-
-        Local local = Local::Other;
-        try
-        {
-            local = Session::Compare(target, *record, Proof::SizeAndTime);
-        }
-        catch (const ArchiveFailure&)
-        {
-            // A program keeps the file for itself, and its size or time has changed.
-        }
-        status.outOfDate = local == Local::Missing || (local == Local::Older && !status.checkedOut);
-        status.modified = local == Local::Other || (local == Local::Older && status.checkedOut);
-        return status;
-    };
-
     ArchiveFailures failures;
     for (const std::wstring& file : files)
     {
         try
         {
-            statuses.push_back(statusOf(session.Resolve(file)));
+            statuses.push_back(session.StatusOf(session.Resolve(file)));
         }
         catch (ArchiveFailure& failure)
         {
-            statuses.emplace_back();
-            if (failure.error == ArchiveError::InvalidPath)
+            statuses.emplace_back().ownFile = failure.error == ArchiveError::OwnFile;
+            if (failure.error == ArchiveError::OwnFile || failure.error == ArchiveError::InvalidPath)
             {
                 continue;
             }

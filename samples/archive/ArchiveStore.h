@@ -14,6 +14,7 @@
 struct ArchiveStatus
 {
     bool missing = false; ///< not on disk
+    bool ownFile = false; ///< belongs to the archive itself, so it cannot be added
     bool controlled = false;
     bool checkedOut = false;        ///< by this user
     bool checkedOutByOther = false; ///< by another user
@@ -73,8 +74,8 @@ public:
     /// another user holds is left alone or refused: it may be the other's working copy.
     ArchiveFailures GetLatest(std::span<const std::wstring> files);
 
-    /// Gives every file's status, in the order of the files. A path that the project cannot hold is not controlled.
-    /// After a failure `statuses` is empty.
+    /// Gives the status of every file, in the order of the files. A path that the project cannot hold is not
+    /// controlled. After a failure `statuses` is empty.
     ArchiveFailures Status(std::span<const std::wstring> files, std::vector<ArchiveStatus>& statuses) const;
 
     /// Gives the records of the files, in order, without those that are reported as failures.

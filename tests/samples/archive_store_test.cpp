@@ -1069,17 +1069,41 @@ TEST_F(ArchiveStorePaths, OutsideTheProjectOrOfNoFileAreRefused)
                                      m_project.File(L"a?txt"),
                                      m_project.File(L"a\n.txt"),
                                      m_project.File(L"\xD800.txt"),
-                                     m_project.File(std::wstring(40000, L'x')),
-                                     m_project.Write(L".archive\\mine.txt", "x"),
-                                     m_project.File(L".ARCHIVE\\archive.txt"),
-                                     m_project.Write(L"folder\\.archive\\x.txt", "x"),
-                                     m_project.Write(L".archive.tmp", "x")})
+                                     m_project.File(std::wstring(40000, L'x'))})
     {
         ExpectFailure(m_anna.Add(Files{path}, L"", false), ArchiveError::InvalidPath, path);
         EXPECT_FALSE(StatusOf(m_anna, path).controlled);
+        EXPECT_FALSE(StatusOf(m_anna, path).ownFile);
     }
     EXPECT_TRUE(m_anna.Add(Files{file}, L"", false).empty());
+    EXPECT_FALSE(StatusOf(m_anna, file).ownFile);
     DeleteFileW(neighbour.c_str());
+}
+
+TEST_F(ArchiveStorePaths, OfTheArchiveItselfAreRefused)
+{
+    const auto expectOwn = [](ArchiveStore& store, const std::wstring& path) {
+        ExpectFailure(store.Add(Files{path}, L"", false), ArchiveError::OwnFile, path);
+        std::vector<ArchiveStatus> statuses;
+        EXPECT_TRUE(store.Status(Files{path}, statuses).empty());
+        ASSERT_EQ(statuses.size(), 1u);
+        EXPECT_TRUE(statuses[0].ownFile) << std::filesystem::path(path).string();
+        EXPECT_FALSE(statuses[0].controlled);
+    };
+    for (const std::wstring& path :
+         {m_project.File(L".archive"), m_project.File(L".Archive\\"), m_project.Write(L".archive\\mine.txt", "x"),
+          m_project.File(L".ARCHIVE\\archive.txt"), m_project.File(L".archive/missing.txt"),
+          m_project.Write(L"folder\\.archive\\x.txt", "x"), m_project.Write(L".archive.tmp", "x"),
+          m_project.File(L"folder\\.ARCHIVE.TMP")})
+    {
+        expectOwn(m_anna, path);
+    }
+
+    const ArchiveProject bens;
+    const std::wstring link = bens.Write(L".archive", "orvix-archive-link 1\n" + m_project.Path(L".archive").string());
+    ASSERT_TRUE(m_ben.Open(bens.Text(), L"ben").empty());
+    expectOwn(m_ben, link);
+    expectOwn(m_ben, m_project.File(L".archive\\archive.txt"));
 }
 
 TEST_F(ArchiveStorePaths, OfOneFileAreTheSameHoweverTheyAreWritten)
