@@ -2,6 +2,7 @@
 
 #include "Files.h"
 #include "TempFolder.h"
+#include "UniqueHandle.h"
 
 #include <windows.h>
 
@@ -19,7 +20,7 @@ inline void SetReadOnly(const std::filesystem::path& file, bool readOnly)
     SetFileAttributesW(file.c_str(), readOnly ? FILE_ATTRIBUTE_READONLY : FILE_ATTRIBUTE_NORMAL);
 }
 
-/// Gives a file the last-write time of an earlier moment, exactly; std::filesystem rounds.
+/// The last-write time that a file has now, to give it back later. It is exact, while std::filesystem rounds.
 class WriteTime
 {
 public:
@@ -30,19 +31,19 @@ public:
         m_time = data.ftLastWriteTime;
     }
 
+    /// Sets the time of a file; false when that fails.
     bool Restore(const std::filesystem::path& file) const
     {
-        const HANDLE handle = CreateFileW(file.c_str(), FILE_WRITE_ATTRIBUTES, 0, nullptr, OPEN_EXISTING, 0, nullptr);
-        const bool done = SetFileTime(handle, nullptr, nullptr, &m_time) != FALSE;
-        CloseHandle(handle);
-        return done;
+        const UniqueFile handle(
+            CreateFileW(file.c_str(), FILE_WRITE_ATTRIBUTES, 0, nullptr, OPEN_EXISTING, 0, nullptr));
+        return SetFileTime(handle.Get(), nullptr, nullptr, &m_time) != FALSE;
     }
 
 private:
     FILETIME m_time{};
 };
 
-/// A folder of a project with its files; deleted at the end with all the read-only files and long paths in it.
+/// The folder of a project. It is deleted at the end with its files, read-only ones and long paths included.
 class ArchiveProject
 {
 public:
@@ -71,7 +72,7 @@ public:
     /// The full path of a file, as a host gives it.
     std::wstring File(std::wstring_view file) const { return Text() + L'\\' + std::wstring(file); }
 
-    /// Writes a file as a user does: in place, and making its folders.
+    /// Writes a file in place, as an editor does, and makes its folders.
     std::wstring Write(std::wstring_view file, std::string_view bytes) const
     {
         std::filesystem::create_directories(Path(file).parent_path());
@@ -81,7 +82,7 @@ public:
 
     std::string Read(std::wstring_view file) const { return ReadBytes(Path(file)); }
 
-    /// Damages a file of the archive, or anything else that is read-only or not.
+    /// Overwrites a file, which may be read-only, such as one of the archive to damage it.
     void Overwrite(const std::filesystem::path& file, std::string_view bytes) const
     {
         SetReadOnly(file, false);

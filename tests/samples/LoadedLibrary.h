@@ -1,5 +1,7 @@
 #pragma once
 
+#include "UniqueHandle.h"
+
 #include <windows.h>
 
 #include <filesystem>
@@ -11,33 +13,22 @@ class LoadedLibrary
 {
 public:
     explicit LoadedLibrary(const std::filesystem::path& file) : m_module(LoadLibraryW(file.c_str())) {}
-    LoadedLibrary(const LoadedLibrary&) = delete;
-    LoadedLibrary& operator=(const LoadedLibrary&) = delete;
-    ~LoadedLibrary() { Unload(); }
 
-    void Unload()
-    {
-        if (m_module != nullptr)
-        {
-            FreeLibrary(m_module);
-        }
-        m_module = nullptr;
-    }
+    void Unload() { m_module.Reset(); }
+    HMODULE Module() const { return m_module.Get(); }
 
-    HMODULE Module() const { return m_module; }
-
-    /// An exported function; null when the library is not loaded or lacks it.
+    /// An exported function; null when the library is not loaded or does not export it.
     template <typename Function>
     Function* Export(const char* name) const
     {
-        return m_module ? reinterpret_cast<Function*>(reinterpret_cast<void*>(GetProcAddress(m_module, name)))
+        return m_module ? reinterpret_cast<Function*>(reinterpret_cast<void*>(GetProcAddress(Module(), name)))
                         : nullptr;
     }
 
-    /// The names in the export table, in order; an entry without a name stands as an empty one.
+    /// The names in the export table, in order; empty for an entry without a name.
     std::vector<std::string> ExportedNames() const
     {
-        const auto* base = reinterpret_cast<const char*>(m_module);
+        const auto* base = reinterpret_cast<const char*>(Module());
         const auto* dos = reinterpret_cast<const IMAGE_DOS_HEADER*>(base);
         const auto* headers = reinterpret_cast<const IMAGE_NT_HEADERS*>(base + dos->e_lfanew);
         const auto& directory = headers->OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_EXPORT];
@@ -53,5 +44,5 @@ public:
     }
 
 private:
-    HMODULE m_module;
+    UniqueModule m_module;
 };

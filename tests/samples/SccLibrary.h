@@ -3,7 +3,7 @@
 #include "LoadedLibrary.h"
 #include "MSSCCI.h"
 
-/// A loaded MSSCCI library with the 21 functions of the interface; null where it lacks one.
+/// A loaded MSSCCI library with the 21 functions of the interface; null for one that it does not export.
 struct SccLibrary
 {
     explicit SccLibrary(const std::filesystem::path& file) : library(file) {}

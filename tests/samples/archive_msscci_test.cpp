@@ -6,7 +6,10 @@
 #include "IOrvixProvider.h"
 #include "OrvixClientInfo.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
+#include "OrvixProviderResult.h"
+#include "UniqueHandle.h"
 
 #include <gtest/gtest.h>
 
@@ -36,7 +39,7 @@ std::string Ansi(const std::wstring& text)
     return bytes;
 }
 
-/// A buffer of the interface for a text, with memory behind it that nobody may write to.
+/// A text buffer of the interface, followed by memory that nobody may write to.
 template <std::size_t Size>
 class TextBuffer
 {
@@ -64,7 +67,14 @@ private:
     std::array<char, Size + 64> m_bytes;
 };
 
-// What the callback was given; a callback has nothing of its own.
+/// No status that a library writes.
+constexpr LONG Unwritten = 0x7777;
+
+/// The status of a file that its user has checked out, and as another user sees it.
+constexpr LONG Mine = SCC_STATUS_CONTROLLED | SCC_STATUS_CHECKEDOUT | SCC_STATUS_OUTBYUSER | SCC_STATUS_OUTEXCLUSIVE;
+constexpr LONG Others = SCC_STATUS_CONTROLLED | SCC_STATUS_OUTOTHER | SCC_STATUS_OUTEXCLUSIVE;
+
+// What the callback received. It is a plain function, so the test keeps this for it.
 Lines infos;
 Lines errors;
 bool wantsNoMore = false;
@@ -169,7 +179,7 @@ public:
     SCCRTN History(Names names) { return m_library.history(context, nullptr, names.Count(), names.Get(), 0, nullptr); }
     SCCRTN QueryInfo(Names names, std::vector<LONG>& status)
     {
-        status.assign(static_cast<std::size_t>(names.Count()), 0x7777);
+        status.assign(static_cast<std::size_t>(names.Count()), Unwritten);
         return m_library.queryInfo(context, names.Count(), names.Get(), status.data());
     }
 
@@ -235,7 +245,7 @@ protected:
         return file;
     }
 
-    /// Takes a file away from the working folder, read-only or not.
+    /// Deletes a file of the working folder, read-only or not.
     void Delete(std::wstring_view file)
     {
         SetReadOnly(m_project.Path(file), false);
@@ -295,10 +305,10 @@ TEST(ArchiveSccLibrary, ExportsThe21FunctionsAndNothingElse)
                      "SccGetVersion",   "SccHistory",    "SccInitialize", "SccOpenProject",       "SccPopulateList",
                      "SccProperties",   "SccQueryInfo",  "SccRunScc",     "SccSetOption",         "SccUncheckout",
                      "SccUninitialize"}));
-    EXPECT_EQ(library.getVersion(), 0x00010003);
+    EXPECT_EQ(library.getVersion(), 0x00010003) << "1.3";
 }
 
-TEST(ArchiveSccLibrary, SaysWhatItIsAndWhatItCan)
+TEST(ArchiveSccLibrary, ReturnsItsNameAndItsCapabilities)
 {
     const SccLibrary library(ARCHIVE_MSSCCI);
     LPVOID context = nullptr;
@@ -342,7 +352,7 @@ TEST(ArchiveSccLibrary, DoesNotStartWithoutAPlaceForEachResult)
     }
 }
 
-TEST_F(ArchiveSccSessions, AreNotTakenForWhatIsNone)
+TEST_F(ArchiveSccSessions, RefuseAContextThatIsNoSession)
 {
     LPVOID ended = nullptr;
     {
@@ -352,7 +362,7 @@ TEST_F(ArchiveSccSessions, AreNotTakenForWhatIsNone)
     int foreign = 0;
     Names names{m_project.Write(L"a.txt", "x")};
     TextBuffer<SCC_PRJPATH_SIZE> text;
-    LONG status = 0x7777;
+    LONG status = Unwritten;
     BOOL isNew = TRUE;
     LPCSTR* files = nullptr;
     LPCMDOPTS block = nullptr;
@@ -408,7 +418,7 @@ TEST_F(ArchiveSccSessions, FinishACallWhoseHostEndsThemFromTheCallback)
     library = &m_library;
     context = m_anna.context;
     later = &sessions;
-    // New sessions would lie where the ended one was, if it were gone already.
+    // If the ended session were freed at once, the new ones would overwrite its memory.
     const LPTEXTOUTPROC endAll = [](LPCSTR text, LONG kind) {
         if (library->uninitialize(context) == SCC_OK)
         {
@@ -532,7 +542,7 @@ TEST_F(ArchiveSccSessions, OpenAKnownProjectWhateverNamesTheHostHasForIt)
     EXPECT_EQ(m_anna.auxPath.Text(), ".archive");
 }
 
-TEST_F(ArchiveSccSessions, TakeALinkForAnArchive)
+TEST_F(ArchiveSccSessions, OpenAProjectWithALinkToAnArchive)
 {
     ASSERT_EQ(m_ben.Make(m_project.Text()), SCC_OK);
     const ArchiveProject other;
@@ -556,7 +566,7 @@ TEST_F(ArchiveSccSessions, OpenOneProjectAtATimeAndCloseItOnce)
     EXPECT_EQ(m_anna.Open(m_project.Text()), SCC_OK);
 }
 
-TEST_F(ArchiveSccSessions, SayWhyAFolderIsNotOpened)
+TEST_F(ArchiveSccSessions, GiveTheReasonWhyAFolderIsNotOpened)
 {
     EXPECT_EQ(m_anna.Open(m_project.File(L"missing")), SCC_E_ACCESSFAILURE);
     EXPECT_EQ(m_anna.Open(L"relative"), SCC_E_INVALIDFILEPATH);
@@ -566,7 +576,7 @@ TEST_F(ArchiveSccSessions, SayWhyAFolderIsNotOpened)
     EXPECT_TRUE(Shows(errors, "Not a full path"));
 }
 
-TEST_F(ArchiveSccSessions, AreNotOpenedOrChosenWithoutATextOfTheInterface)
+TEST_F(ArchiveSccSessions, FailWhenATextOfTheInterfaceIsNull)
 {
     ASSERT_EQ(m_ben.Make(m_project.Text()), SCC_OK);
     TextBuffer<SCC_PRJPATH_SIZE> text(Ansi(m_project.Text()));
@@ -587,7 +597,7 @@ TEST_F(ArchiveSccSessions, AreNotOpenedOrChosenWithoutATextOfTheInterface)
         SCC_E_NONSPECIFICERROR);
 }
 
-TEST_F(ArchiveSccSessions, BelongToTheWindowsUserWhenTheHostNamesNone)
+TEST_F(ArchiveSccSessions, UseTheWindowsUserWhenTheHostNamesNone)
 {
     wchar_t name[UNLEN + 1];
     DWORD size = static_cast<DWORD>(std::size(name));
@@ -602,7 +612,7 @@ TEST_F(ArchiveSccSessions, BelongToTheWindowsUserWhenTheHostNamesNone)
     EXPECT_TRUE(Shows(infos, "  " + Ansi(name) + "  added"));
 }
 
-TEST_F(ArchiveSccSessions, KeepAUserNameToThemselvesThatTheHostHasNoRoomFor)
+TEST_F(ArchiveSccSessions, DoNotReturnAUserNameThatDoesNotFit)
 {
     const ImportHook hook(m_library.library.Module(), "GetUserNameW", reinterpret_cast<void*>(&LongUserName));
     ASSERT_TRUE(hook.IsActive());
@@ -640,7 +650,7 @@ TEST_F(ArchiveSccSessions, WorkForAHostWithoutOutput)
 
 // Files
 
-TEST_F(ArchiveScc, TakesNoListThatIsEmptyOrHasGaps)
+TEST_F(ArchiveScc, RefusesAListThatIsEmptyOrHasANull)
 {
     const std::string file = Ansi(Added(L"a.txt", "x"));
     LPCSTR names[] = {file.c_str(), nullptr};
@@ -697,7 +707,8 @@ TEST_F(ArchiveScc, DoesNothingToFilesWithoutAProject)
 TEST_F(ArchiveScc, AddsEachFileByItsOwnOptionWord)
 {
     Names names{m_project.Write(L"a.txt", "a"), m_project.Write(L"b.txt", "b"), m_project.Write(L"c.txt", "c")};
-    LONG options[] = {0, SCC_KEEP_CHECKEDOUT, 0x2};
+    constexpr LONG BinaryFile = 0x2; // a file type; the archive ignores it
+    LONG options[] = {0, SCC_KEEP_CHECKEDOUT, BinaryFile};
 
     EXPECT_EQ(m_library.add(m_anna.context, nullptr, 3, names.Get(), nullptr, options, nullptr), SCC_OK);
 
@@ -734,7 +745,7 @@ TEST_F(ArchiveScc, UndoesACheckOut)
     EXPECT_EQ(m_anna.Status(file), SCC_STATUS_CONTROLLED);
 }
 
-TEST_F(ArchiveScc, TellsFailuresApartAndSaysWhy)
+TEST_F(ArchiveScc, HasAResultAndAMessageForEachKindOfFailure)
 {
     const std::wstring held = CheckedOut(L"held.txt", "x");
     const std::wstring added = Added(L"added.txt", "x");
@@ -758,15 +769,16 @@ TEST_F(ArchiveScc, TellsFailuresApartAndSaysWhy)
     EXPECT_TRUE(infos.empty());
 }
 
-TEST_F(ArchiveScc, SaysThatTheArchiveCannotBeReachedWhileAFileOfItIsKept)
+TEST_F(ArchiveScc, SaysThatAFileCannotBeReadWhileAnotherProgramHasItOpen)
 {
     const std::wstring file = m_project.Write(L"a.txt", "x");
-    const HANDLE writer = CreateFileW(file.c_str(), GENERIC_WRITE, FILE_SHARE_READ, nullptr, OPEN_EXISTING, 0, nullptr);
+    const UniqueFile writer(
+        CreateFileW(file.c_str(), GENERIC_WRITE, FILE_SHARE_READ, nullptr, OPEN_EXISTING, 0, nullptr));
+    ASSERT_TRUE(writer);
     EXPECT_EQ(m_anna.Add({file}), SCC_E_ACCESSFAILURE);
-    CloseHandle(writer);
 }
 
-TEST_F(ArchiveScc, GoesOnAfterAFileThatFailsAndAnswersWithItsResult)
+TEST_F(ArchiveScc, GoesOnAfterAFileThatFailsAndReturnsItsResult)
 {
     const std::wstring good = m_project.Write(L"good.txt", "x");
 
@@ -776,7 +788,20 @@ TEST_F(ArchiveScc, GoesOnAfterAFileThatFailsAndAnswersWithItsResult)
     EXPECT_EQ(errors.size(), 2u);
 }
 
-TEST_F(ArchiveScc, BringsFilesAndWholeFolders)
+TEST_F(ArchiveScc, RefusesToAddItsOwnFiles)
+{
+    const std::wstring own = m_project.File(L".archive\\archive.txt");
+    const std::wstring leftOver = m_project.Write(L".archive.tmp", "x");
+
+    EXPECT_EQ(m_anna.Status(own), SCC_STATUS_NOTCONTROLLED);
+    EXPECT_EQ(m_anna.Status(leftOver), SCC_STATUS_NOTCONTROLLED);
+    EXPECT_EQ(m_anna.Add({own, leftOver}), SCC_E_INVALIDFILEPATH);
+
+    EXPECT_EQ(errors, (Lines{Ansi(own) + ": The file belongs to the archive itself",
+                             Ansi(leftOver) + ": The file belongs to the archive itself"}));
+}
+
+TEST_F(ArchiveScc, GetsFilesAndWholeFolders)
 {
     for (const wchar_t* name : {L"a.txt", L"sub\\b.txt", L"sub\\deep\\c.txt", L"subway\\d.txt"})
     {
@@ -812,7 +837,7 @@ TEST_F(ArchiveScc, ChecksOutWholeFolders)
     EXPECT_EQ(m_anna.Status(deep) & SCC_STATUS_CHECKEDOUT, 0);
 }
 
-TEST_F(ArchiveScc, TakesAndGivesTextInTheAnsiCodePage)
+TEST_F(ArchiveScc, UsesTextInTheAnsiCodePage)
 {
     const std::wstring file = m_project.Write(L"Stück.txt", "x");
     ASSERT_EQ(m_anna.Add({file}, 0, Ansi(L"für später").c_str()), SCC_OK);
@@ -838,10 +863,11 @@ TEST_F(ArchiveScc, GivesEveryStateItsStatusBits)
 
     std::vector<LONG> status;
     ASSERT_EQ(m_anna.QueryInfo({held, changed, missing, plain, unknown, outside}, status), SCC_OK);
-    EXPECT_EQ(status, (std::vector<LONG>{0x100B, 0x180B, 0x21, 0x1, 0, 0}));
+    EXPECT_EQ(status, (std::vector<LONG>{Mine, Mine | SCC_STATUS_MODIFIED, SCC_STATUS_CONTROLLED | SCC_STATUS_OUTOFDATE,
+                                         SCC_STATUS_CONTROLLED, SCC_STATUS_NOTCONTROLLED, SCC_STATUS_NOTCONTROLLED}));
     EXPECT_EQ(status[0] & (SCC_STATUS_CHECKEDOUT | SCC_STATUS_OUTOTHER), SCC_STATUS_CHECKEDOUT);
     ASSERT_EQ(m_ben.QueryInfo({held, changed}, status), SCC_OK);
-    EXPECT_EQ(status, (std::vector<LONG>{0xD, 0x80D}));
+    EXPECT_EQ(status, (std::vector<LONG>{Others, Others | SCC_STATUS_MODIFIED}));
 }
 
 TEST_F(ArchiveScc, MarksEveryStatusAsUnknownWhenOneFails)
@@ -856,12 +882,13 @@ TEST_F(ArchiveScc, MarksEveryStatusAsUnknownWhenOneFails)
     EXPECT_TRUE(Shows(errors, Ansi(damaged)));
 }
 
-TEST_F(ArchiveScc, TakesFilesOffTheListThatACommandIsNotFor)
+TEST_F(ArchiveScc, RemovesFilesFromTheListThatACommandIsNotFor)
 {
     const std::string held = Ansi(CheckedOut(L"held.txt", "x"));
     const std::string plain = Ansi(Added(L"plain.txt", "x"));
     const std::string unknown = Ansi(m_project.Write(L"unknown.txt", "x"));
     using Removed = std::map<std::string, LONG>;
+    constexpr auto Remove = static_cast<SCCCOMMAND>(5); // which the archive does not offer
     const auto removedFor = [&](SCCCOMMAND command) {
         Names names{m_project.File(L"held.txt"), m_project.File(L"plain.txt"), m_project.File(L"unknown.txt")};
         std::vector<LONG> status(3);
@@ -869,18 +896,21 @@ TEST_F(ArchiveScc, TakesFilesOffTheListThatACommandIsNotFor)
         EXPECT_EQ(
             m_library.populateList(m_anna.context, command, 3, names.Get(), KeepGoing, &removed, status.data(), 0),
             SCC_OK);
-        EXPECT_EQ(status, (std::vector<LONG>{0x100B, 0x1, 0}));
+        EXPECT_EQ(status, (std::vector<LONG>{Mine, SCC_STATUS_CONTROLLED, SCC_STATUS_NOTCONTROLLED}));
         return removed;
     };
 
-    EXPECT_EQ(removedFor(SCC_COMMAND_GET), (Removed{{unknown, 0}}));
-    EXPECT_EQ(removedFor(SCC_COMMAND_HISTORY), (Removed{{unknown, 0}}));
-    EXPECT_EQ(removedFor(SCC_COMMAND_PROPERTIES), (Removed{{unknown, 0}}));
-    EXPECT_EQ(removedFor(SCC_COMMAND_CHECKOUT), (Removed{{unknown, 0}, {held, 0x100B}}));
-    EXPECT_EQ(removedFor(SCC_COMMAND_CHECKIN), (Removed{{unknown, 0}, {plain, 1}}));
-    EXPECT_EQ(removedFor(SCC_COMMAND_UNCHECKOUT), (Removed{{unknown, 0}, {plain, 1}}));
-    EXPECT_EQ(removedFor(SCC_COMMAND_ADD), (Removed{{held, 0x100B}, {plain, 1}}));
-    EXPECT_EQ(removedFor(static_cast<SCCCOMMAND>(5)), (Removed{{unknown, 0}, {held, 0x100B}, {plain, 1}}));
+    EXPECT_EQ(removedFor(SCC_COMMAND_GET), (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}}));
+    EXPECT_EQ(removedFor(SCC_COMMAND_HISTORY), (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}}));
+    EXPECT_EQ(removedFor(SCC_COMMAND_PROPERTIES), (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}}));
+    EXPECT_EQ(removedFor(SCC_COMMAND_CHECKOUT), (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}, {held, Mine}}));
+    EXPECT_EQ(removedFor(SCC_COMMAND_CHECKIN),
+              (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}, {plain, SCC_STATUS_CONTROLLED}}));
+    EXPECT_EQ(removedFor(SCC_COMMAND_UNCHECKOUT),
+              (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}, {plain, SCC_STATUS_CONTROLLED}}));
+    EXPECT_EQ(removedFor(SCC_COMMAND_ADD), (Removed{{held, Mine}, {plain, SCC_STATUS_CONTROLLED}}));
+    EXPECT_EQ(removedFor(Remove),
+              (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}, {held, Mine}, {plain, SCC_STATUS_CONTROLLED}}));
 }
 
 TEST_F(ArchiveScc, StopsListingWhenTheHostSaysSoAndListsNoFolders)
@@ -989,7 +1019,7 @@ TEST_F(ArchiveScc, EndsEachBatchOnceAndNestsNone)
 
 // Files from the archive
 
-TEST_F(ArchiveScc, BringsWhatTheWorkingFolderLacks)
+TEST_F(ArchiveScc, GetsTheFilesThatAreMissingInTheWorkingFolder)
 {
     Added(L"there.txt", "x");
     Added(L"sub\\a.txt", "a");
@@ -1015,7 +1045,7 @@ TEST_F(ArchiveScc, BringsWhatTheWorkingFolderLacks)
     EXPECT_EQ(names, nullptr);
 }
 
-TEST_F(ArchiveScc, BringsTheFilesOfTheFolderThatTheHostNames)
+TEST_F(ArchiveScc, GetsTheFilesOfTheFolderThatTheHostNames)
 {
     for (const wchar_t* name : {L"a.txt", L"sub\\b.txt", L"sub\\deep\\c.txt"})
     {
@@ -1041,7 +1071,7 @@ TEST_F(ArchiveScc, BringsTheFilesOfTheFolderThatTheHostNames)
     EXPECT_EQ(m_library.addFromScc(m_anna.context, nullptr, &count, nullptr), SCC_E_NONSPECIFICERROR);
 }
 
-TEST_F(ArchiveScc, BringsTheOthersWhenAFileCannotBeBrought)
+TEST_F(ArchiveScc, GetsTheOthersWhenAFileFails)
 {
     Added(L"lost.txt", "lost");
     for (const auto& entry : std::filesystem::recursive_directory_iterator(m_project.Path(L".archive\\contents")))
@@ -1075,7 +1105,7 @@ TEST_F(ArchiveScc, KnowsNoOtherOption)
 namespace
 {
 
-/// A host of the plug-in that keeps the lines it is shown.
+/// A host of the plug-in that records the lines of output.
 class PluginHost final : public IOrvixClientAccess
 {
 public:
@@ -1084,8 +1114,8 @@ public:
     {
         m_info.SetUserName(user);
         m_info.SetIOrvixClientAccess(this);
-        EXPECT_EQ(provider->Initialize(&m_info), 0);
-        EXPECT_EQ(provider->OpenProject(project.Text().c_str(), L""), 0);
+        EXPECT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
+        EXPECT_EQ(provider->OpenProject(project.Text().c_str(), L""), OrvixProviderResult::Success);
     }
     PluginHost(const PluginHost&) = delete;
     PluginHost& operator=(const PluginHost&) = delete;
@@ -1114,43 +1144,43 @@ TEST_F(ArchiveScc, SharesItsVersionsWithThePlugIn)
     const std::wstring file = Added(L"a.txt", "one");
     PluginHost carl(L"carl", m_project);
     OrvixFileList list;
-    list.CreateEntry(file.c_str(), nullptr, 1, 0);
-    list.BuildActiveList(1, false);
+    list.CreateEntry(file.c_str(), nullptr, OrvixFileSelection::Selected, 0);
+    list.BuildActiveList(OrvixFileSelection::Selected, false);
 
-    ASSERT_EQ(carl.provider->CheckOut(&list, L"carl's turn", 0), 0);
+    ASSERT_EQ(carl.provider->CheckOut(&list, L"carl's turn", 0), OrvixProviderResult::Success);
     EXPECT_EQ(m_anna.Status(file), SCC_STATUS_CONTROLLED | SCC_STATUS_OUTOTHER | SCC_STATUS_OUTEXCLUSIVE);
     EXPECT_EQ(m_anna.Checkout({file}), SCC_E_FILEOUTEXCLUSIVE);
     m_project.Write(L"a.txt", "two");
-    ASSERT_EQ(carl.provider->CheckIn(&list, L"by the plug-in", 0), 0);
+    ASSERT_EQ(carl.provider->CheckIn(&list, L"by the plug-in", 0), OrvixProviderResult::Success);
     ASSERT_EQ(m_anna.Checkout({file}), SCC_OK);
     ASSERT_EQ(m_anna.Checkin({file}, "by MSSCCI"), SCC_OK);
 
     ASSERT_EQ(m_anna.History({file}), SCC_OK);
     carl.lines.clear();
-    ASSERT_EQ(carl.provider->ShowHistory(&list), 0);
+    ASSERT_EQ(carl.provider->ShowHistory(&list), OrvixProviderResult::Success);
     EXPECT_EQ(carl.lines, infos);
     EXPECT_EQ(infos.size(), 4u);
 
     infos.clear();
     carl.lines.clear();
     ASSERT_EQ(m_library.properties(m_anna.context, nullptr, Ansi(file).c_str()), SCC_OK);
-    ASSERT_EQ(carl.provider->ShowProperties(&list), 0);
+    ASSERT_EQ(carl.provider->ShowProperties(&list), OrvixProviderResult::Success);
     EXPECT_EQ(carl.lines, infos);
     EXPECT_TRUE(Shows(infos, "by MSSCCI"));
 }
 
-TEST_F(ArchiveScc, DoesNotBringAFileWhoseNameTheAnsiCodePageLacks)
+TEST_F(ArchiveScc, DoesNotGetAFileWhoseNameIsNotInTheAnsiCodePage)
 {
     const std::wstring file = m_project.Write(L"\x65E5\x0439.txt", "x");
     if (GetACP() == CP_UTF8)
     {
-        GTEST_SKIP() << "this code page lacks no letter";
+        GTEST_SKIP() << "this code page has every character";
     }
     PluginHost carl(L"carl", m_project);
     OrvixFileList list;
-    list.CreateEntry(file.c_str(), nullptr, 1, 0);
-    list.BuildActiveList(1, false);
-    ASSERT_EQ(carl.provider->Add(&list, L"", 0), 0);
+    list.CreateEntry(file.c_str(), nullptr, OrvixFileSelection::Selected, 0);
+    list.BuildActiveList(OrvixFileSelection::Selected, false);
+    ASSERT_EQ(carl.provider->Add(&list, L"", 0), OrvixProviderResult::Success);
     Delete(L"\x65E5\x0439.txt");
     LONG count = 0;
     LPCSTR* names = nullptr;

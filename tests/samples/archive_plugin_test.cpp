@@ -6,7 +6,11 @@
 #include "IOrvixProvider.h"
 #include "OrvixClientInfo.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
+#include "OrvixProviderOption.h"
+#include "OrvixProviderResult.h"
+#include "OrvixVersion.h"
 
 #include <gtest/gtest.h>
 
@@ -20,7 +24,15 @@
 namespace
 {
 
-/// A loaded copy of the plug-in: what one host process has of it.
+using OrvixProviderResult::Failure;
+using OrvixProviderResult::NotOffered;
+using OrvixProviderResult::Success;
+
+namespace Option = OrvixProviderOption;
+namespace Permission = OrvixFilePermission;
+namespace State = OrvixFileState;
+
+/// A copy of the plug-in, as one host process has it loaded.
 struct Plugin
 {
     explicit Plugin(const std::filesystem::path& file) : library(file) {}
@@ -34,7 +46,7 @@ struct Plugin
     const wchar_t* (*name)() = library.Export<const wchar_t*()>("GetOrvixProviderName");
 };
 
-/// A host that keeps the lines it is shown.
+/// A host that records the lines of output.
 class Client final : public IOrvixClientAccess
 {
 public:
@@ -63,8 +75,6 @@ public:
     std::vector<std::wstring> lines;
 };
 
-constexpr unsigned long Selected = 0x1;
-
 /// A list of files, all of them active.
 class Files
 {
@@ -73,9 +83,9 @@ public:
     {
         for (const std::wstring& file : files)
         {
-            m_list.CreateEntry(file.c_str(), nullptr, Selected, 0);
+            m_list.CreateEntry(file.c_str(), nullptr, OrvixFileSelection::Selected, 0);
         }
-        m_list.BuildActiveList(Selected, false);
+        m_list.BuildActiveList(OrvixFileSelection::Selected, false);
     }
 
     OrvixFileList* Get() { return &m_list; }
@@ -103,13 +113,14 @@ public:
 
     int Open(const ArchiveProject& project)
     {
-        return Start() == 0 ? provider->OpenProject(project.Text().c_str(), L"") : -1;
+        const int started = Start();
+        return started == Success ? provider->OpenProject(project.Text().c_str(), L"") : started;
     }
 
     unsigned long Status(const std::wstring& file)
     {
         Files files{file};
-        EXPECT_EQ(provider->QueryStatus(files.Get(), 0), 0);
+        EXPECT_EQ(provider->QueryStatus(files.Get(), 0), Success);
         return files.Flags(0);
     }
 
@@ -121,7 +132,7 @@ private:
     OrvixClientInfo m_info;
 };
 
-/// Anna's and Ben's hosts on one project. Ben's process is played by a second copy of the plug-in.
+/// Anna's and Ben's hosts on one project. A second copy of the plug-in stands in for the one in Ben's process.
 class ArchivePlugin : public testing::Test
 {
 protected:
@@ -130,8 +141,8 @@ protected:
         std::filesystem::copy_file(ARCHIVE_PLUGIN, m_copy.Path() / L"zweite Kopie.dll");
         m_anna = std::make_unique<Host>(ARCHIVE_PLUGIN, L"anna");
         m_ben = std::make_unique<Host>(m_copy.Path() / L"zweite Kopie.dll", L"ben");
-        ASSERT_EQ(m_anna->Open(m_project), 0);
-        ASSERT_EQ(m_ben->Open(m_project), 0);
+        ASSERT_EQ(m_anna->Open(m_project), Success);
+        ASSERT_EQ(m_ben->Open(m_project), Success);
     }
 
     void TearDown() override
@@ -144,7 +155,7 @@ protected:
     {
         std::wstring file = m_project.Write(name, bytes);
         Files files{file};
-        EXPECT_EQ(m_anna->provider->Add(files.Get(), L"added", 0), 0);
+        EXPECT_EQ(m_anna->provider->Add(files.Get(), L"added", 0), Success);
         return file;
     }
 
@@ -152,7 +163,7 @@ protected:
     {
         std::wstring file = Added(name, bytes);
         Files files{file};
-        EXPECT_EQ(m_anna->provider->CheckOut(files.Get(), L"", 0), 0);
+        EXPECT_EQ(m_anna->provider->CheckOut(files.Get(), L"", 0), Success);
         return file;
     }
 
@@ -173,7 +184,7 @@ TEST(ArchivePluginContract, ExportsItsFourFunctionsAndNothingElse)
 
     EXPECT_EQ(plugin.library.ExportedNames(), (std::vector<std::string>{"GetIOrvixProvider", "GetOrvixProviderName",
                                                                         "GetOrvixVersion", "ReleaseIOrvixProvider"}));
-    EXPECT_EQ(plugin.version(), 200);
+    EXPECT_EQ(plugin.version(), ORVIX_PLUGIN_CONTRACT_VERSION);
     EXPECT_STREQ(plugin.name(), L"Archive");
 }
 
@@ -228,19 +239,19 @@ TEST_F(ArchivePlugin, AnswersReservedAndNotOfferedOperationsAsTheInterfaceSays)
     IOrvixProvider* provider = m_anna->provider;
     unsigned long first = 1;
     unsigned long second = 2;
-    EXPECT_EQ(provider->ReservedA(), 0);
-    EXPECT_EQ(provider->ReservedB(), 0);
-    EXPECT_EQ(provider->ReservedC(), -2);
-    EXPECT_EQ(provider->ReservedD(nullptr, &first, &second), -2);
+    EXPECT_EQ(provider->ReservedA(), Success);
+    EXPECT_EQ(provider->ReservedB(), Success);
+    EXPECT_EQ(provider->ReservedC(), NotOffered);
+    EXPECT_EQ(provider->ReservedD(nullptr, &first, &second), NotOffered);
     EXPECT_EQ(first, 0u);
     EXPECT_EQ(second, 0u);
-    EXPECT_EQ(provider->ReservedE(), -2);
-    EXPECT_EQ(provider->ReservedF(), -2);
-    EXPECT_EQ(provider->ReservedG(), -2);
-    EXPECT_EQ(provider->ReservedH(), -2);
+    EXPECT_EQ(provider->ReservedE(), NotOffered);
+    EXPECT_EQ(provider->ReservedF(), NotOffered);
+    EXPECT_EQ(provider->ReservedG(), NotOffered);
+    EXPECT_EQ(provider->ReservedH(), NotOffered);
     EXPECT_TRUE(provider->ReservedI());
-    EXPECT_EQ(provider->ShowOptions(), -2);
-    EXPECT_EQ(provider->RunProviderClient(), -2);
+    EXPECT_EQ(provider->ShowOptions(), NotOffered);
+    EXPECT_EQ(provider->RunProviderClient(), NotOffered);
 }
 
 // The session
@@ -250,23 +261,23 @@ TEST_F(ArchivePlugin, GoesThroughItsStates)
     IOrvixProvider* provider = m_anna->provider;
     EXPECT_TRUE(provider->IsInitialized());
     EXPECT_TRUE(provider->IsProjectOpen());
-    EXPECT_EQ(provider->CloseProject(), 0);
+    EXPECT_EQ(provider->CloseProject(), Success);
     EXPECT_FALSE(provider->IsProjectOpen());
-    EXPECT_EQ(provider->CloseProject(), -1);
-    EXPECT_EQ(provider->OpenProject(m_project.Text().c_str(), nullptr), 0);
-    EXPECT_EQ(provider->Uninitialize(), 0);
+    EXPECT_EQ(provider->CloseProject(), Failure);
+    EXPECT_EQ(provider->OpenProject(m_project.Text().c_str(), nullptr), Success);
+    EXPECT_EQ(provider->Uninitialize(), Success);
     EXPECT_FALSE(provider->IsInitialized());
     EXPECT_FALSE(provider->IsProjectOpen());
-    EXPECT_EQ(provider->Uninitialize(), -1);
-    EXPECT_EQ(provider->OpenProject(m_project.Text().c_str(), nullptr), -1);
-    EXPECT_EQ(provider->Initialize(nullptr), -1);
+    EXPECT_EQ(provider->Uninitialize(), Failure);
+    EXPECT_EQ(provider->OpenProject(m_project.Text().c_str(), nullptr), Failure);
+    EXPECT_EQ(provider->Initialize(nullptr), Failure);
     EXPECT_FALSE(provider->IsInitialized());
 }
 
 TEST_F(ArchivePlugin, SaysWhyAProjectCannotBeOpened)
 {
-    EXPECT_EQ(m_anna->provider->OpenProject(nullptr, L""), -1);
-    EXPECT_EQ(m_anna->provider->OpenProject(m_project.File(L"nowhere").c_str(), L""), -1);
+    EXPECT_EQ(m_anna->provider->OpenProject(nullptr, L""), Failure);
+    EXPECT_EQ(m_anna->provider->OpenProject(m_project.File(L"nowhere").c_str(), L""), Failure);
 
     EXPECT_FALSE(m_anna->provider->IsProjectOpen());
     EXPECT_EQ(m_anna->client.lines.size(), 1u);
@@ -280,12 +291,12 @@ TEST_F(ArchivePlugin, BeginsANewSessionWithASecondInitialize)
     info.SetUserName(L"clara");
     info.SetIOrvixClientAccess(&second);
 
-    ASSERT_EQ(m_anna->provider->Initialize(&info), 0);
+    ASSERT_EQ(m_anna->provider->Initialize(&info), Success);
 
     EXPECT_FALSE(m_anna->provider->IsProjectOpen());
-    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), 0);
-    EXPECT_EQ(m_anna->Status(file) & 0xC, 0x8u);
-    EXPECT_EQ(m_anna->Start(), 0);
+    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), Success);
+    EXPECT_EQ(m_anna->Status(file) & (State::CheckedOut | State::CheckedOutByOther), State::CheckedOutByOther);
+    EXPECT_EQ(m_anna->Start(), Success);
 }
 
 TEST_F(ArchivePlugin, TakesTheWindowsUserWhenTheClientNamesNone)
@@ -295,11 +306,11 @@ TEST_F(ArchivePlugin, TakesTheWindowsUserWhenTheClientNamesNone)
     ASSERT_TRUE(::GetUserNameW(user, &size));
     OrvixClientInfo info;
     info.SetIOrvixClientAccess(&m_anna->client);
-    ASSERT_EQ(m_anna->provider->Initialize(&info), 0);
-    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), 0);
+    ASSERT_EQ(m_anna->provider->Initialize(&info), Success);
+    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), Success);
     Files files{Added(L"a.txt", "one")};
 
-    EXPECT_EQ(m_anna->provider->ShowHistory(files.Get()), 0);
+    EXPECT_EQ(m_anna->provider->ShowHistory(files.Get()), Success);
 
     EXPECT_TRUE(m_anna->client.Shows(user));
 }
@@ -308,11 +319,11 @@ TEST_F(ArchivePlugin, WorksForAClientWithoutAnInterface)
 {
     OrvixClientInfo info;
     info.SetUserName(L"anna");
-    ASSERT_EQ(m_anna->provider->Initialize(&info), 0);
-    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), 0);
+    ASSERT_EQ(m_anna->provider->Initialize(&info), Success);
+    ASSERT_EQ(m_anna->provider->OpenProject(m_project.Text().c_str(), L""), Success);
     Files files{Added(L"a.txt", "one"), m_project.File(L"missing.txt")};
 
-    EXPECT_EQ(m_anna->provider->ShowHistory(files.Get()), -1);
+    EXPECT_EQ(m_anna->provider->ShowHistory(files.Get()), Failure);
 }
 
 // File operations
@@ -323,14 +334,14 @@ TEST_F(ArchivePlugin, FailsWithoutActiveEntriesInEveryFileOperation)
     Files none{};
     for (OrvixFileList* list : {none.Get(), static_cast<OrvixFileList*>(nullptr)})
     {
-        EXPECT_EQ(provider->Add(list, L"", 0), -1);
-        EXPECT_EQ(provider->CheckOut(list, L"", 0), -1);
-        EXPECT_EQ(provider->CheckIn(list, L"", 0), -1);
-        EXPECT_EQ(provider->UndoCheckOut(list, 0), -1);
-        EXPECT_EQ(provider->GetLatest(list, 0), -1);
-        EXPECT_EQ(provider->ShowHistory(list), -1);
-        EXPECT_EQ(provider->ShowProperties(list), -1);
-        EXPECT_EQ(provider->QueryStatus(list, 0), -1);
+        EXPECT_EQ(provider->Add(list, L"", 0), Failure);
+        EXPECT_EQ(provider->CheckOut(list, L"", 0), Failure);
+        EXPECT_EQ(provider->CheckIn(list, L"", 0), Failure);
+        EXPECT_EQ(provider->UndoCheckOut(list, 0), Failure);
+        EXPECT_EQ(provider->GetLatest(list, 0), Failure);
+        EXPECT_EQ(provider->ShowHistory(list), Failure);
+        EXPECT_EQ(provider->ShowProperties(list), Failure);
+        EXPECT_EQ(provider->QueryStatus(list, 0), Failure);
     }
 }
 
@@ -338,15 +349,15 @@ TEST_F(ArchivePlugin, FailsWithoutAnOpenProjectAndSaysSo)
 {
     Files files{m_project.Write(L"a.txt", "one")};
     IOrvixProvider* provider = m_anna->provider;
-    ASSERT_EQ(provider->CloseProject(), 0);
+    ASSERT_EQ(provider->CloseProject(), Success);
 
-    EXPECT_EQ(provider->Add(files.Get(), L"", 0), -1);
-    EXPECT_EQ(provider->CheckOut(files.Get(), L"", 0x2), -1);
-    EXPECT_EQ(provider->CheckIn(files.Get(), L"", 0), -1);
-    EXPECT_EQ(provider->UndoCheckOut(files.Get(), 0), -1);
-    EXPECT_EQ(provider->GetLatest(files.Get(), 0), -1);
-    EXPECT_EQ(provider->ShowHistory(files.Get()), -1);
-    EXPECT_EQ(provider->ShowProperties(files.Get()), -1);
+    EXPECT_EQ(provider->Add(files.Get(), L"", 0), Failure);
+    EXPECT_EQ(provider->CheckOut(files.Get(), L"", Option::GetLatest), Failure);
+    EXPECT_EQ(provider->CheckIn(files.Get(), L"", 0), Failure);
+    EXPECT_EQ(provider->UndoCheckOut(files.Get(), 0), Failure);
+    EXPECT_EQ(provider->GetLatest(files.Get(), 0), Failure);
+    EXPECT_EQ(provider->ShowHistory(files.Get()), Failure);
+    EXPECT_EQ(provider->ShowProperties(files.Get()), Failure);
     EXPECT_EQ(m_anna->client.lines, std::vector<std::wstring>(7, L"No project is open"));
 }
 
@@ -355,14 +366,14 @@ TEST_F(ArchivePlugin, WorksOnTheActiveEntriesOnly)
     const std::wstring active = m_project.Write(L"active.txt", "x");
     const std::wstring passive = m_project.Write(L"passive.txt", "x");
     OrvixFileList list;
-    list.CreateEntry(active.c_str(), nullptr, 0x1, 0);
-    list.CreateEntry(passive.c_str(), nullptr, 0x2, 0);
-    ASSERT_EQ(list.BuildActiveList(0x1, false), 1u);
+    list.CreateEntry(active.c_str(), nullptr, OrvixFileSelection::Selected, 0);
+    list.CreateEntry(passive.c_str(), nullptr, 0, 0);
+    ASSERT_EQ(list.BuildActiveList(OrvixFileSelection::Selected, false), 1u);
 
-    EXPECT_EQ(m_anna->provider->Add(&list, nullptr, 0), 0);
+    EXPECT_EQ(m_anna->provider->Add(&list, nullptr, 0), Success);
 
-    EXPECT_EQ(m_anna->Status(active) & 0x2, 0x2u);
-    EXPECT_EQ(m_anna->Status(passive) & 0x2, 0u);
+    EXPECT_NE(m_anna->Status(active) & State::Controlled, 0u);
+    EXPECT_EQ(m_anna->Status(passive) & State::Controlled, 0u);
 }
 
 TEST_F(ArchivePlugin, TellsTheReasonForEachFileThatFailsAndDoesTheOthers)
@@ -370,7 +381,7 @@ TEST_F(ArchivePlugin, TellsTheReasonForEachFileThatFailsAndDoesTheOthers)
     const std::wstring good = m_project.Write(L"good.txt", "x");
     Files files{m_project.File(L"missing.txt"), good, m_project.File(L"..\\x.txt")};
 
-    EXPECT_EQ(m_anna->provider->Add(files.Get(), L"", 0), -1);
+    EXPECT_EQ(m_anna->provider->Add(files.Get(), L"", 0), Failure);
 
     ASSERT_EQ(m_anna->client.lines.size(), 2u);
     EXPECT_EQ(m_anna->client.lines[0].find(m_project.File(L"missing.txt") + L": "), 0u);
@@ -378,19 +389,19 @@ TEST_F(ArchivePlugin, TellsTheReasonForEachFileThatFailsAndDoesTheOthers)
     EXPECT_TRUE(IsReadOnly(good));
 }
 
-TEST_F(ArchivePlugin, HonoursTheKeepCheckedOutBitOfAddAndCheckIn)
+TEST_F(ArchivePlugin, KeepsFilesCheckedOutAfterAddAndCheckInWhenAsked)
 {
     const std::wstring file = m_project.Write(L"a.txt", "one");
     Files files{file};
 
-    ASSERT_EQ(m_anna->provider->Add(files.Get(), L"", 0x1), 0);
+    ASSERT_EQ(m_anna->provider->Add(files.Get(), L"", Option::KeepCheckedOut), Success);
     EXPECT_FALSE(IsReadOnly(file));
-    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0x5), 0);
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", Option::KeepCheckedOut | Option::NoDialog), Success);
     EXPECT_FALSE(IsReadOnly(file));
-    EXPECT_EQ(m_anna->Status(file) & 0x4, 0x4u);
-    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0x4), 0);
+    EXPECT_NE(m_anna->Status(file) & State::CheckedOut, 0u);
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", Option::NoDialog), Success);
     EXPECT_TRUE(IsReadOnly(file));
-    EXPECT_EQ(m_anna->Status(file) & 0x4, 0u);
+    EXPECT_EQ(m_anna->Status(file) & State::CheckedOut, 0u);
 }
 
 TEST_F(ArchivePlugin, KeepsTwoHostsFromHoldingOneFile)
@@ -398,14 +409,14 @@ TEST_F(ArchivePlugin, KeepsTwoHostsFromHoldingOneFile)
     const std::wstring file = CheckedOut(L"a.txt", "one");
     Files files{file};
 
-    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), -1);
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), Failure);
     EXPECT_TRUE(m_ben->client.Shows(L"anna"));
-    EXPECT_EQ(m_ben->provider->CheckIn(files.Get(), L"", 0), -1);
-    EXPECT_EQ(m_ben->provider->UndoCheckOut(files.Get(), 0), -1);
+    EXPECT_EQ(m_ben->provider->CheckIn(files.Get(), L"", 0), Failure);
+    EXPECT_EQ(m_ben->provider->UndoCheckOut(files.Get(), 0), Failure);
 
     m_project.Write(L"a.txt", "two");
-    EXPECT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0), 0);
-    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), 0);
+    EXPECT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0), Success);
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), Success);
     EXPECT_EQ(m_project.Read(L"a.txt"), "two");
 }
 
@@ -414,11 +425,11 @@ TEST_F(ArchivePlugin, GetsTheLatestVersionBeforeACheckOutWhenAsked)
     const std::wstring file = CheckedOut(L"a.txt", "one");
     Files files{file};
     m_project.Write(L"a.txt", "two");
-    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0), 0);
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"", 0), Success);
     m_project.Overwrite(file, "one");
 
-    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), -1);
-    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0x2), 0);
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", 0), Failure);
+    EXPECT_EQ(m_ben->provider->CheckOut(files.Get(), L"", Option::GetLatest), Success);
 
     EXPECT_EQ(m_project.Read(L"a.txt"), "two");
 }
@@ -432,14 +443,15 @@ TEST_F(ArchivePlugin, UndoesACheckOutAndGetsTheLatestVersionAfterwardsWhenAsked)
     std::filesystem::remove(missing);
     Files files{held, missing};
 
-    EXPECT_EQ(m_anna->provider->UndoCheckOut(files.Get(), 0x2), -1) << "one file was not checked out";
+    EXPECT_EQ(m_anna->provider->UndoCheckOut(files.Get(), Option::GetLatest), Failure)
+        << "one file was not checked out";
 
     EXPECT_EQ(m_project.Read(L"held.txt"), "one");
     EXPECT_TRUE(IsReadOnly(held));
     EXPECT_EQ(m_project.Read(L"missing.txt"), "one");
 
     Files one{CheckedOut(L"other.txt", "one")};
-    EXPECT_EQ(m_anna->provider->UndoCheckOut(one.Get(), 0x2), 0);
+    EXPECT_EQ(m_anna->provider->UndoCheckOut(one.Get(), Option::GetLatest), Success);
 }
 
 TEST_F(ArchivePlugin, GetsTheLatestVersion)
@@ -449,7 +461,7 @@ TEST_F(ArchivePlugin, GetsTheLatestVersion)
     std::filesystem::remove(file);
     Files files{file};
 
-    EXPECT_EQ(m_ben->provider->GetLatest(files.Get(), 0), 0);
+    EXPECT_EQ(m_ben->provider->GetLatest(files.Get(), 0), Success);
 
     EXPECT_EQ(m_project.Read(L"Ünïcode 日本.txt"), "one");
     EXPECT_TRUE(IsReadOnly(file));
@@ -472,7 +484,7 @@ TEST_F(ArchivePlugin, GivesTheStatusBitsOfEveryState)
 
     const auto flags = [&](Host& host) {
         Files files{unknown, controlled, held, edited, changed, missing};
-        EXPECT_EQ(host.provider->QueryStatus(files.Get(), 0), 0);
+        EXPECT_EQ(host.provider->QueryStatus(files.Get(), 0), Success);
         std::vector<unsigned long> result;
         for (unsigned int i = 0; i < 6; ++i)
         {
@@ -480,33 +492,62 @@ TEST_F(ArchivePlugin, GivesTheStatusBitsOfEveryState)
         }
         return result;
     };
+    constexpr unsigned long Known = State::Controlled | Permission::GetLatest | Permission::ShowHistory;
+    constexpr unsigned long Mine = Known | State::CheckedOut | Permission::CheckIn | Permission::UndoCheckOut;
     EXPECT_EQ(flags(*m_anna), (std::vector<unsigned long>{
-                                  0x100001,
-                                  0x2 | 0x20000 | 0x200000 | 0x400000,
-                                  0x2 | 0x4 | 0x10000 | 0x40000 | 0x80000 | 0x200000 | 0x400000,
-                                  0x2 | 0x4 | 0x80 | 0x10000 | 0x40000 | 0x80000 | 0x200000 | 0x400000,
-                                  0x2 | 0x80 | 0x20000 | 0x80000 | 0x200000 | 0x400000,
-                                  0x2 | 0x10 | 0x200000 | 0x400000,
+                                  State::NotControlled | Permission::Add,
+                                  Known | Permission::CheckOut,
+                                  Mine | Permission::Compare,
+                                  Mine | State::Modified | Permission::Compare,
+                                  Known | State::Modified | Permission::CheckOut | Permission::Compare,
+                                  Known | State::OutOfDate,
                               }));
     EXPECT_EQ(flags(*m_ben), (std::vector<unsigned long>{
-                                 0x100001,
-                                 0x2 | 0x20000 | 0x200000 | 0x400000,
-                                 0x2 | 0x8 | 0x200000 | 0x400000,
-                                 0x2 | 0x8 | 0x80 | 0x80000 | 0x200000 | 0x400000,
-                                 0x2 | 0x80 | 0x20000 | 0x80000 | 0x200000 | 0x400000,
-                                 0x2 | 0x10 | 0x200000 | 0x400000,
+                                 State::NotControlled | Permission::Add,
+                                 Known | Permission::CheckOut,
+                                 Known | State::CheckedOutByOther,
+                                 Known | State::CheckedOutByOther | State::Modified | Permission::Compare,
+                                 Known | State::Modified | Permission::CheckOut | Permission::Compare,
+                                 Known | State::OutOfDate,
                              }));
+}
+
+TEST_F(ArchivePlugin, DoesNotOfferToAddItsOwnFilesAndRefusesThem)
+{
+    Files files{m_project.File(L".archive"), m_project.File(L".archive\\archive.txt"),
+                m_project.Write(L"sub\\.archive.tmp", "left over"), m_project.Write(L"new.txt", "x")};
+
+    ASSERT_EQ(m_anna->provider->QueryStatus(files.Get(), 0), Success);
+    EXPECT_EQ(files.Flags(0), State::NotControlled);
+    EXPECT_EQ(files.Flags(1), State::NotControlled);
+    EXPECT_EQ(files.Flags(2), State::NotControlled);
+    EXPECT_EQ(files.Flags(3), State::NotControlled | Permission::Add);
+
+    EXPECT_EQ(m_anna->provider->Add(files.Get(), L"", 0), Failure);
+    EXPECT_EQ(m_anna->client.lines.size(), 3u);
+    EXPECT_TRUE(m_anna->client.Shows(m_project.File(L".archive") + L": The file belongs to the archive itself"));
+    EXPECT_TRUE(m_anna->client.Shows(L"\\sub\\.archive.tmp: The file belongs to the archive itself"));
+}
+
+TEST_F(ArchivePlugin, DoesNotOfferToAddTheLinkToAnArchive)
+{
+    const ArchiveProject other;
+    const std::wstring link =
+        other.Write(L".archive", "orvix-archive-link 1\n" + m_project.Path(L".archive").string() + "\n");
+    ASSERT_EQ(m_ben->provider->OpenProject(other.Text().c_str(), L""), Success);
+
+    EXPECT_EQ(m_ben->Status(link), State::NotControlled);
 }
 
 TEST_F(ArchivePlugin, GivesEveryEntryTheUncontrolledBitWithoutAnOpenProject)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
-    ASSERT_EQ(m_anna->provider->CloseProject(), 0);
+    ASSERT_EQ(m_anna->provider->CloseProject(), Success);
 
-    EXPECT_EQ(m_anna->Status(file), 0x1u);
+    EXPECT_EQ(m_anna->Status(file), State::NotControlled);
     m_anna->provider->Uninitialize();
-    EXPECT_EQ(m_anna->Status(file), 0x1u);
-    EXPECT_EQ(m_anna->Start(), 0);
+    EXPECT_EQ(m_anna->Status(file), State::NotControlled);
+    EXPECT_EQ(m_anna->Start(), Success);
 }
 
 TEST_F(ArchivePlugin, ChangesNoEntryWhenTheStatusOfOneFails)
@@ -519,16 +560,17 @@ TEST_F(ArchivePlugin, ChangesNoEntryWhenTheStatusOfOneFails)
             m_project.Overwrite(entry.path(), "damaged");
         }
     }
+    constexpr unsigned long Before = State::Deleted;
     Files files{m_project.Write(L"good.txt", "x"), damaged};
     for (unsigned int i = 0; i < 2; ++i)
     {
-        files.Get()->GetActiveFileEntry(i)->SetFlagsOut(0xABC);
+        files.Get()->GetActiveFileEntry(i)->SetFlagsOut(Before);
     }
 
-    EXPECT_EQ(m_anna->provider->QueryStatus(files.Get(), 0), -1);
+    EXPECT_EQ(m_anna->provider->QueryStatus(files.Get(), 0), Failure);
 
-    EXPECT_EQ(files.Flags(0), 0xABCu);
-    EXPECT_EQ(files.Flags(1), 0xABCu);
+    EXPECT_EQ(files.Flags(0), Before);
+    EXPECT_EQ(files.Flags(1), Before);
     EXPECT_TRUE(m_anna->client.Shows(damaged));
 }
 
@@ -538,9 +580,9 @@ TEST_F(ArchivePlugin, ShowsTheHistoryLineByLineNewestFirst)
 {
     const std::wstring file = CheckedOut(L"sub\\a.txt", "one");
     Files files{file};
-    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"first line\r\nsecond line", 0), 0);
+    ASSERT_EQ(m_anna->provider->CheckIn(files.Get(), L"first line\r\nsecond line", 0), Success);
 
-    EXPECT_EQ(m_ben->provider->ShowHistory(files.Get()), 0);
+    EXPECT_EQ(m_ben->provider->ShowHistory(files.Get()), Success);
 
     const std::vector<std::wstring>& lines = m_ben->client.lines;
     ASSERT_EQ(lines.size(), 4u);
@@ -556,7 +598,7 @@ TEST_F(ArchivePlugin, ShowsThePropertiesOfTheFirstActiveFileOnly)
 {
     Files files{CheckedOut(L"first.txt", "one"), Added(L"second.txt", "one"), m_project.File(L"missing.txt")};
 
-    EXPECT_EQ(m_ben->provider->ShowProperties(files.Get()), 0);
+    EXPECT_EQ(m_ben->provider->ShowProperties(files.Get()), Success);
 
     EXPECT_TRUE(m_ben->client.Shows(L"first.txt"));
     EXPECT_TRUE(m_ben->client.Shows(L"anna"));
