@@ -441,12 +441,12 @@ SCCRTN ArchiveScc::GetCommandOptions(SCCCOMMAND command, LPCMDOPTS* block)
 
 SCCRTN ArchiveScc::AddFromScc(LPLONG count, LPCSTR** names)
 {
-    // The host may name the folder in the array that it was given before.
+    // The host may name the folder in the array that the last call returned, so the folder is copied first.
     const bool hasFolder =
         count != nullptr && names != nullptr && *count == 1 && *names != nullptr && **names != nullptr;
     const std::wstring folder = hasFolder ? Text(**names) : m_folder;
-    m_broughtFiles.clear();
-    m_broughtNames.clear();
+    m_addedFiles.clear();
+    m_addedNames.clear();
     if (count == nullptr)
     {
         return SCC_OK;
@@ -462,10 +462,22 @@ SCCRTN ArchiveScc::AddFromScc(LPLONG count, LPCSTR** names)
         return SCC_E_PROJNOTOPEN;
     }
 
-    Paths held;
-    ArchiveFailures failures = m_store.List(folder, true, held);
+    ArchiveFailures failures;
+    const Paths missing = FindMissing(folder, failures);
+    Append(failures, GetAndName(missing));
+    *count = static_cast<LONG>(m_addedNames.size());
+    *names = m_addedNames.empty() ? nullptr : m_addedNames.data();
+    return Report(failures);
+}
+
+/// The files of a folder that are in the archive and not on disk. A file whose name is not in the ANSI code page is a
+/// failure.
+ArchiveScc::Paths ArchiveScc::FindMissing(const std::wstring& folder, ArchiveFailures& failures) const
+{
+    Paths files;
+    Append(failures, m_store.List(folder, true, files));
     std::vector<ArchiveStatus> statuses;
-    Append(failures, m_store.Status(held, statuses));
+    Append(failures, m_store.Status(files, statuses));
     Paths missing;
     for (std::size_t i = 0; i < statuses.size(); ++i)
     {
@@ -473,35 +485,42 @@ SCCRTN ArchiveScc::AddFromScc(LPLONG count, LPCSTR** names)
         {
             continue;
         }
-        if (IsAnsi(held[i]))
+        if (IsAnsi(files[i]))
         {
-            missing.push_back(held[i]);
+            missing.push_back(files[i]);
         }
         else
         {
-            failures.push_back({ArchiveError::InvalidPath, L"The ANSI code page lacks a letter of the name", held[i]});
+            failures.push_back(
+                {ArchiveError::InvalidPath, L"The name has a character that is not in the ANSI code page", files[i]});
         }
     }
+    return missing;
+}
 
-    const ArchiveFailures notBrought = m_store.GetLatest(missing);
+/// Gets files and stores the names of those that did not fail, for `AddFromScc`.
+ArchiveFailures ArchiveScc::GetAndName(const Paths& files)
+{
+    ArchiveFailures failures = m_store.GetLatest(files);
     std::unordered_set<std::wstring> failed;
-    for (const ArchiveFailure& failure : notBrought)
+    for (const ArchiveFailure& failure : failures)
     {
         failed.insert(failure.file);
     }
-    for (const std::wstring& file : missing)
+    if (failed.contains(L"")) // the whole command
     {
-        if (!failed.contains(file) && !failed.contains(L""))
+        return failures;
+    }
+    for (const std::wstring& file : files)
+    {
+        if (!failed.contains(file))
         {
-            m_broughtFiles.push_back(ArchiveText::ToAnsi(file));
+            m_addedFiles.push_back(ArchiveText::ToAnsi(file));
         }
     }
-    std::transform(m_broughtFiles.begin(), m_broughtFiles.end(), std::back_inserter(m_broughtNames),
+    std::transform(m_addedFiles.begin(), m_addedFiles.end(), std::back_inserter(m_addedNames),
                    [](const std::string& file) { return file.c_str(); });
-    Append(failures, notBrought);
-    *count = static_cast<LONG>(m_broughtNames.size());
-    *names = m_broughtNames.empty() ? nullptr : m_broughtNames.data();
-    return Report(failures);
+    return failures;
 }
 
 SCCRTN ArchiveScc::SetOption(LONG option)

@@ -81,6 +81,8 @@ private:
     template <typename Work>
     SCCRTN FileOperation(LONG count, LPCSTR* names, Work work);
     ArchiveFailures Expand(Paths& paths, LONG options) const;
+    Paths FindMissing(const std::wstring& folder, ArchiveFailures& failures) const;
+    ArchiveFailures GetAndName(const Paths& files);
     SCCRTN Report(const ArchiveFailures& failures) const;
     bool Output(const ArchiveReport::Lines& lines, LONG kind) const;
 
@@ -91,7 +93,7 @@ private:
     std::wstring m_refusedFolder; ///< by the last `OpenProject`, as no project
     std::wstring m_newFolder;     ///< chosen by `GetProjPath` to become a project
 
-    // What AddFromScc handed out.
-    std::vector<std::string> m_broughtFiles;
-    std::vector<LPCSTR> m_broughtNames;
+    // The array that `AddFromScc` returned, and the texts that it points to.
+    std::vector<std::string> m_addedFiles;
+    std::vector<LPCSTR> m_addedNames;
 };
