@@ -3,7 +3,7 @@
 #include <string>
 #include <vector>
 
-/// Why a command of the archive could not be carried out.
+/// Why a command of the archive failed.
 enum class ArchiveError
 {
     NotOpen,           ///< no project is open
@@ -12,16 +12,16 @@ enum class ArchiveError
     NoSuchFile,        ///< the file is not on disk
     NotControlled,     ///< the archive does not know the file
     AlreadyControlled, ///< the file was added before
-    CheckedOutByOther, ///< another user holds the file
-    NotCheckedOut,     ///< the user does not hold the file
+    CheckedOutByOther, ///< another user has the file checked out
+    NotCheckedOut,     ///< the user does not have the file checked out
     OutOfDate,         ///< the file on disk is missing or an older version
     Modified,          ///< changed on disk without a check-out; it would be overwritten
-    Damaged,           ///< something in the archive is not as it was written
+    Damaged,           ///< a file of the archive is not as it was written
     Access,            ///< Windows refused an operation on a file
-    Busy,              ///< another program kept the archive locked
+    Busy,              ///< another program has the archive locked
 };
 
-/// One thing that went wrong.
+/// One failure of a command.
 struct ArchiveFailure
 {
     ArchiveError error;

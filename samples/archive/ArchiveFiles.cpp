@@ -16,7 +16,7 @@ std::uint64_t LastWrite(HANDLE file)
     FILETIME time;
     if (!GetFileTime(file, nullptr, nullptr, &time))
     {
-        ArchiveFiles::ThrowLastError(L"A file's time cannot be read");
+        ArchiveFiles::ThrowLastError(L"The time of a file cannot be read");
     }
     return Join(time.dwHighDateTime, time.dwLowDateTime);
 }
@@ -28,14 +28,14 @@ struct SearchCloser
 };
 using UniqueSearch = std::unique_ptr<HANDLE, SearchCloser>;
 
-/// Begins to list what a pattern names; null when that failed, with the reason in `GetLastError`.
+/// Starts a search for files. Null on failure; `GetLastError` then gives the reason.
 UniqueSearch BeginSearch(const std::wstring& pattern, WIN32_FIND_DATAW& data)
 {
     const HANDLE search = FindFirstFileW(pattern.c_str(), &data);
     return UniqueSearch(search == INVALID_HANDLE_VALUE ? nullptr : search);
 }
 
-ArchiveFiles::Facts FactsOf(const WIN32_FIND_DATAW& data)
+ArchiveFiles::Entry EntryOf(const WIN32_FIND_DATAW& data)
 {
     const bool isLink = (data.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
                         (data.dwReserved0 == IO_REPARSE_TAG_SYMLINK || data.dwReserved0 == IO_REPARSE_TAG_MOUNT_POINT);
@@ -62,7 +62,7 @@ void Flush(HANDLE file)
 {
     if (!FlushFileBuffers(file))
     {
-        ArchiveFiles::ThrowLastError(L"A file cannot be written through to the disk");
+        ArchiveFiles::ThrowLastError(L"A file cannot be flushed to the disk");
     }
 }
 
@@ -76,10 +76,10 @@ ArchiveFiles::UniqueHandle Create(const std::wstring& path)
     return file;
 }
 
-/// Repeats what fails because another program has the file open: programs that look at every new file, virus
-/// scanners for one, hold it for a moment. False with the last error set when it goes on failing.
+/// Calls `attempt` again when it fails because another program has the file open. A virus scanner, for example, opens
+/// every new file for a moment. False, with the last error set, when it still fails after a fifth of a second.
 template <typename Attempt>
-bool Patiently(Attempt attempt)
+bool WithRetries(Attempt attempt)
 {
     for (int pauses = 20; !attempt(); --pauses)
     {
@@ -93,7 +93,7 @@ bool Patiently(Attempt attempt)
     return true;
 }
 
-/// Hands the rest of a file to `take`, block by block.
+/// Calls `take` with each block of an open file.
 template <typename Take>
 void ReadBlocks(HANDLE file, Take take)
 {
@@ -137,12 +137,12 @@ bool ArchiveFiles::IsMissing(DWORD error)
     return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND;
 }
 
-std::optional<ArchiveFiles::Facts> ArchiveFiles::Find(const std::wstring& path)
+std::optional<ArchiveFiles::Entry> ArchiveFiles::Find(const std::wstring& path)
 {
     WIN32_FIND_DATAW data;
     if (BeginSearch(path, data))
     {
-        return FactsOf(data);
+        return EntryOf(data);
     }
     if (IsMissing(GetLastError()))
     {
@@ -151,9 +151,9 @@ std::optional<ArchiveFiles::Facts> ArchiveFiles::Find(const std::wstring& path)
     ThrowLastError(L"A file cannot be found");
 }
 
-std::vector<ArchiveFiles::Facts> ArchiveFiles::List(const std::wstring& folder)
+std::vector<ArchiveFiles::Entry> ArchiveFiles::List(const std::wstring& folder)
 {
-    std::vector<Facts> entries;
+    std::vector<Entry> entries;
     WIN32_FIND_DATAW data;
     const UniqueSearch search = BeginSearch(folder + L"\\*", data);
     for (bool more = search != nullptr; more; more = FindNextFileW(search.get(), &data) != FALSE)
@@ -161,7 +161,7 @@ std::vector<ArchiveFiles::Facts> ArchiveFiles::List(const std::wstring& folder)
         const std::wstring_view name = data.cFileName;
         if (name != L"." && name != L"..")
         {
-            entries.push_back(FactsOf(data));
+            entries.push_back(EntryOf(data));
         }
     }
     if (GetLastError() != ERROR_NO_MORE_FILES)
@@ -178,7 +178,7 @@ std::optional<std::string> ArchiveFiles::ReadText(const std::wstring& path, std:
         file = Open(path, GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, OPEN_EXISTING);
         return file != nullptr;
     };
-    if (!Patiently(open))
+    if (!WithRetries(open))
     {
         if (IsMissing(GetLastError()))
         {
@@ -235,7 +235,7 @@ ArchiveFiles::Contents ArchiveFiles::Copy(HANDLE source, const std::wstring& tar
     const FILETIME time{static_cast<DWORD>(stamp), static_cast<DWORD>(stamp >> 32)};
     if (!SetFileTime(file.get(), nullptr, nullptr, &time))
     {
-        ThrowLastError(L"A file's time cannot be set");
+        ThrowLastError(L"The time of a file cannot be set");
     }
     Flush(file.get());
     return contents;
@@ -253,7 +253,7 @@ void ArchiveFiles::Replace(const std::wstring& from, const std::wstring& to)
     const auto move = [&] {
         return MoveFileExW(from.c_str(), to.c_str(), MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != FALSE;
     };
-    if (!Patiently(move))
+    if (!WithRetries(move))
     {
         const DWORD error = GetLastError();
         if (wasReadOnly)

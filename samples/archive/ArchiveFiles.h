@@ -11,8 +11,8 @@
 #include <string_view>
 #include <vector>
 
-/// What the archive does to files. Paths are full ones with the prefix "\\?\". Everything throws
-/// `ArchiveFailure` (mostly `ArchiveError::Access`) when Windows refuses.
+/// The operations on files that the archive needs. Paths are full and have the prefix "\\?\". A function that fails
+/// throws `ArchiveFailure`, with `ArchiveError::Access` unless it says otherwise.
 namespace ArchiveFiles
 {
 
@@ -23,7 +23,7 @@ struct HandleCloser
 };
 using UniqueHandle = std::unique_ptr<HANDLE, HandleCloser>;
 
-/// Opens or creates a file; null when that failed, with the reason in `GetLastError`.
+/// Opens or creates a file. Null on failure; `GetLastError` then gives the reason.
 UniqueHandle Open(const std::wstring& path, DWORD access, DWORD share, DWORD disposition, DWORD flags = 0) noexcept;
 
 /// Throws `ArchiveFailure` with `what` and the system's message for the error.
@@ -33,7 +33,7 @@ UniqueHandle Open(const std::wstring& path, DWORD access, DWORD share, DWORD dis
 [[noreturn]] void ThrowLastError(const std::wstring& what);
 
 /// A directory entry.
-struct Facts
+struct Entry
 {
     std::wstring name; ///< long name in the letter case of the disk
     DWORD attributes;
@@ -46,22 +46,23 @@ struct Facts
 };
 
 /// The entry at a path; nothing when there is none.
-std::optional<Facts> Find(const std::wstring& path);
+std::optional<Entry> Find(const std::wstring& path);
 
 /// The entries of a folder, in no order.
-std::vector<Facts> List(const std::wstring& folder);
+std::vector<Entry> List(const std::wstring& folder);
 
-/// True when the last error says that a file or its folder does not exist.
+/// True when an error code of Windows says that a file or its folder does not exist.
 bool IsMissing(DWORD error);
 
-/// The bytes of a file; nothing when there is no such file. A file above `limit` bytes is damaged.
+/// The bytes of a file; nothing when there is no such file. Throws `ArchiveError::Damaged` for more than `limit`
+/// bytes.
 std::optional<std::string> ReadText(const std::wstring& path, std::size_t limit);
 
-/// Replaces a file by new bytes through `temporary`, which lies on the same volume: whatever happens, the
-/// file is whole, the old one or the new one.
+/// Replaces a file by one with new bytes. They are written to `temporary`, on the same volume, which is then renamed:
+/// at any moment the file is the whole old one or the whole new one.
 void WriteText(const std::wstring& path, const std::wstring& temporary, std::string_view bytes);
 
-/// Deletes the file at the end of the scope, if it is still there.
+/// Deletes a file at the end of the scope, if it still exists.
 class TemporaryFile
 {
 public:
@@ -76,7 +77,7 @@ private:
     std::wstring m_path;
 };
 
-/// What is known of the bytes of a file.
+/// The digest of the bytes of a file, their number, and the time of the file.
 struct Contents
 {
     std::string sha256;
@@ -84,19 +85,19 @@ struct Contents
     std::uint64_t lastWrite;
 };
 
-/// Reads a file to its end.
+/// Reads an open file to its end.
 Contents Read(HANDLE file);
 
-/// Copies a file to a new or emptied one, writes it through to the disk and gives the copy `lastWrite`, or
-/// the source's time. Returns what was read.
+/// Copies an open file to `target`, which is made or overwritten, and flushes it to the disk. The copy gets the time
+/// `lastWrite`, or that of the source. Returns what was read.
 Contents Copy(HANDLE source, const std::wstring& target, std::optional<std::uint64_t> lastWrite = std::nullopt);
 
-/// Renames a file over another, which may be read-only.
+/// Renames a file to `to`. A file of that name, read-only or not, is replaced.
 void Replace(const std::wstring& from, const std::wstring& to);
 
 void SetReadOnly(const std::wstring& path, bool readOnly);
 
-/// Makes a folder unless it is there.
+/// Makes a folder unless it exists.
 void MakeFolder(const std::wstring& path);
 
 } // namespace ArchiveFiles

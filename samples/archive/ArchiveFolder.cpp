@@ -19,7 +19,7 @@ constexpr wchar_t Versions[] = L"contents";
     throw ArchiveFailure{ArchiveError::Damaged, reason, {}};
 }
 
-/// The archive folder that a link file names.
+/// The path of the archive folder in a link file.
 std::wstring ReadLink(const std::wstring& file)
 {
     const std::string text = ArchiveFiles::ReadText(file, MaxLinkSize).value_or("");
@@ -38,8 +38,8 @@ std::wstring ReadLink(const std::wstring& file)
     return *target;
 }
 
-/// Where a project has its archive, or a link to it.
-std::wstring ArchivePlace(const std::wstring& projectFolder)
+/// The path of a project's archive, or of the link to it.
+std::wstring ArchivePathIn(const std::wstring& projectFolder)
 {
     return projectFolder + L'\\' + std::wstring(ArchivePaths::ArchiveName);
 }
@@ -48,18 +48,18 @@ std::wstring ArchivePlace(const std::wstring& projectFolder)
 
 bool ArchiveFolder::Exists(const std::wstring& projectFolder)
 {
-    return ArchiveFiles::Find(ArchivePlace(projectFolder)).has_value();
+    return ArchiveFiles::Find(ArchivePathIn(projectFolder)).has_value();
 }
 
 ArchiveFolder::ArchiveFolder(const std::wstring& projectFolder, std::chrono::milliseconds lockWait)
 {
-    const std::wstring path = ArchivePlace(projectFolder);
-    const std::optional<ArchiveFiles::Facts> facts = ArchiveFiles::Find(path);
-    if (!facts)
+    const std::wstring path = ArchivePathIn(projectFolder);
+    const std::optional<ArchiveFiles::Entry> entry = ArchiveFiles::Find(path);
+    if (!entry)
     {
         ArchiveFiles::MakeFolder(path);
     }
-    m_path = ArchivePaths::FindFolder(facts && !facts->IsFolder() ? ReadLink(path) : path);
+    m_path = ArchivePaths::FindFolder(entry && !entry->IsFolder() ? ReadLink(path) : path);
     if (!HasFormat())
     {
         Prepare(lockWait);
@@ -71,7 +71,7 @@ bool ArchiveFolder::HasFormat() const
     const std::optional<std::string> format = ArchiveFiles::ReadText(FormatFile(), MaxLinkSize);
     if (format && format != Format)
     {
-        ThrowDamaged(L"The archive has a format that is not known here");
+        ThrowDamaged(L"The format of the archive is not known");
     }
     return format.has_value();
 }
@@ -81,14 +81,14 @@ void ArchiveFolder::Prepare(std::chrono::milliseconds lockWait) const
     const ArchiveLock lock(LockFile(), lockWait);
     if (HasFormat())
     {
-        return; // somebody else was faster
+        return; // another program has made it in the meantime
     }
     ArchiveFiles::MakeFolder(m_path + L'\\' + Versions);
     ArchiveFiles::MakeFolder(m_path + L'\\' + Records);
     ArchiveFiles::WriteText(FormatFile(), TemporaryFile(), Format);
 }
 
-std::wstring ArchiveFolder::Place(const wchar_t* kind, const std::string& name) const
+std::wstring ArchiveFolder::PathOf(const wchar_t* kind, const std::string& name) const
 {
     const std::wstring wide(name.begin(), name.end());
     return m_path + L'\\' + kind + L'\\' + wide.substr(0, 2) + L'\\' + wide;
@@ -101,7 +101,7 @@ std::optional<ArchiveRecord> ArchiveFolder::Load(const ArchiveTarget& target) co
 
 std::optional<ArchiveRecord> ArchiveFolder::Load(const std::string& key) const
 {
-    const std::optional<std::string> text = ArchiveFiles::ReadText(Place(Records, key), MaxRecordSize);
+    const std::optional<std::string> text = ArchiveFiles::ReadText(PathOf(Records, key), MaxRecordSize);
     if (!text)
     {
         return std::nullopt;
@@ -118,17 +118,17 @@ std::vector<std::wstring> ArchiveFolder::List(ArchiveFailures& failures) const
 {
     std::vector<std::wstring> paths;
     const std::wstring records = m_path + L'\\' + Records;
-    for (const ArchiveFiles::Facts& group : ArchiveFiles::List(records))
+    for (const ArchiveFiles::Entry& group : ArchiveFiles::List(records))
     {
         if (!group.IsFolder())
         {
             continue;
         }
-        for (const ArchiveFiles::Facts& file : ArchiveFiles::List(records + L'\\' + group.name))
+        for (const ArchiveFiles::Entry& file : ArchiveFiles::List(records + L'\\' + group.name))
         {
             try
             {
-                // What does not lie where its name belongs is no record.
+                // Another file in this folder has no record under its name.
                 if (const std::optional<ArchiveRecord> record = Load(ArchiveText::ToUtf8(file.name)))
                 {
                     paths.push_back(record->path);
@@ -151,7 +151,7 @@ void ArchiveFolder::Save(const ArchiveTarget& target, const ArchiveRecord& recor
     {
         throw ArchiveFailure{ArchiveError::Access, L"The file's record in the archive would become too large", {}};
     }
-    const std::wstring path = Place(Records, target.key);
+    const std::wstring path = PathOf(Records, target.key);
     ArchiveFiles::MakeFolder(path.substr(0, path.rfind(L'\\')));
     ArchiveFiles::WriteText(path, TemporaryFile(), text);
 }
@@ -169,8 +169,8 @@ ArchiveFiles::Contents ArchiveFolder::Store(HANDLE source) const
         ThrowDamaged(L"The stored contents are not what was written");
     }
 
-    // Equal contents are kept once; a damaged copy is replaced by the good one.
-    const std::wstring path = Place(Versions, contents.sha256);
+    // Equal contents are stored once. If the copy in the archive is damaged, the new one replaces it.
+    const std::wstring path = PathOf(Versions, contents.sha256);
     if (!isWhole(path))
     {
         ArchiveFiles::MakeFolder(path.substr(0, path.rfind(L'\\')));
@@ -182,7 +182,7 @@ ArchiveFiles::Contents ArchiveFolder::Store(HANDLE source) const
 void ArchiveFolder::Fetch(const ArchiveVersion& version, const std::wstring& copy) const
 {
     const ArchiveFiles::UniqueHandle source =
-        ArchiveFiles::Open(Place(Versions, version.sha256), GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING);
+        ArchiveFiles::Open(PathOf(Versions, version.sha256), GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING);
     if (!source)
     {
         if (ArchiveFiles::IsMissing(GetLastError()))

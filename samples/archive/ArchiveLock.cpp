@@ -11,7 +11,7 @@ ArchiveLock::ArchiveLock(const std::wstring& lockFile, std::chrono::milliseconds
         }
         if (std::chrono::steady_clock::now() >= end)
         {
-            throw ArchiveFailure{ArchiveError::Busy, L"Another program is working on the archive", {}};
+            throw ArchiveFailure{ArchiveError::Busy, L"Another program is using the archive", {}};
         }
         Sleep(5);
     }

@@ -5,12 +5,12 @@
 #include <chrono>
 #include <string>
 
-/// Keeps every other program from changing an archive, from construction to destruction. The system takes the
-/// lock away from a program that ends, so it never stays behind.
+/// While it exists, no other program changes the archive. The system releases the lock of a program that ends, in
+/// whatever way it ends.
 class ArchiveLock
 {
 public:
-    /// Throws `ArchiveError::Busy` when the lock is held by somebody else for longer than `wait`.
+    /// Waits until no other program has the lock. Throws `ArchiveError::Busy` after `wait`.
     ArchiveLock(const std::wstring& lockFile, std::chrono::milliseconds wait);
 
 private:

@@ -11,8 +11,8 @@ namespace
 constexpr std::size_t MaxPathLength = 32767;
 constexpr std::wstring_view LongPrefix = L"\\\\?\\";
 constexpr std::wstring_view LongSharePrefix = L"\\\\?\\UNC\\";
-constexpr wchar_t LinkReason[] = L"Links are not taken";
-constexpr wchar_t Outside[] = L"The file lies outside the project folder";
+constexpr wchar_t LinkReason[] = L"Links are not supported";
+constexpr wchar_t Outside[] = L"The file is outside the project folder";
 
 [[noreturn]] void Refuse(const wchar_t* reason)
 {
@@ -38,23 +38,23 @@ void CheckName(std::wstring_view name)
 {
     if (name == L"..")
     {
-        Refuse(L"Paths with \"..\" are not taken");
+        Refuse(L"Paths with \"..\" are not allowed");
     }
     const bool hasBadCharacter = std::any_of(name.begin(), name.end(), [](wchar_t character) {
         return character < L' ' || wcschr(L"<>:\"|?*", character) != nullptr;
     });
     if (hasBadCharacter || name.back() == L'.' || name.back() == L' ')
     {
-        Refuse(L"Not a file name that can be used");
+        Refuse(L"Not a valid file name");
     }
 }
 
-/// The form of a full path in which Windows neither limits the length nor changes a name.
+/// A full path with the prefix "\\?\": Windows then neither limits its length nor changes its names.
 std::wstring LongForm(const std::wstring& given)
 {
     if (given.size() > MaxPathLength || !ArchiveText::IsValid(given))
     {
-        Refuse(L"Not a path that can be used");
+        Refuse(L"Not a valid path");
     }
     std::wstring path = given;
     std::replace(path.begin(), path.end(), L'/', L'\\');
@@ -92,13 +92,13 @@ std::wstring LongForm(const std::wstring& given)
     return result;
 }
 
-/// The system's own name of an existing folder, without a separator at its end; empty on failure, with the
-/// reason in `error`.
+/// The system's own path of an existing folder, without a separator at the end. Empty on failure; `error` is the
+/// reason.
 std::wstring FinalPath(const std::wstring& folder, DWORD& error)
 {
     std::wstring path(MAX_PATH, L'\0');
     DWORD length = 0;
-    // The separator lets the root of a drive be opened too.
+    // With the separator at its end the root of a drive can be opened, too.
     const ArchiveFiles::UniqueHandle handle =
         ArchiveFiles::Open(folder + L'\\', FILE_READ_ATTRIBUTES, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
                            OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS);
@@ -116,14 +116,14 @@ std::wstring FinalPath(const std::wstring& folder, DWORD& error)
     return path;
 }
 
-/// Where a folder lies, or would lie, with links and short names on the way resolved; empty on failure, with the
-/// reason in `error`. The nearest folder above decides that is there and whose name the system can tell, which some
-/// cannot for a long one; below it links are refused.
-std::wstring FindPlace(const std::wstring& path, DWORD& error)
+/// The path of a folder, which need not exist, with links and short names resolved. Empty on failure; `error` is the
+/// reason. The system resolves the longest part that it can: some systems cannot resolve a long path. Links in the
+/// rest are refused.
+std::wstring ResolvePath(const std::wstring& path, DWORD& error)
 {
     std::size_t end = path.size();
-    std::wstring place;
-    while ((place = FinalPath(path.substr(0, end), error)).empty())
+    std::wstring resolved;
+    while ((resolved = FinalPath(path.substr(0, end), error)).empty())
     {
         end = path.rfind(L'\\', end - 1);
         if (end < LongPrefix.size())
@@ -136,14 +136,14 @@ std::wstring FindPlace(const std::wstring& path, DWORD& error)
         const std::size_t begin = end + 1;
         end = std::min(path.find(L'\\', begin), path.size());
         const std::wstring name = path.substr(begin, end - begin);
-        const std::optional<ArchiveFiles::Facts> facts = ArchiveFiles::Find(place + L'\\' + name);
-        if (facts && facts->isLink)
+        const std::optional<ArchiveFiles::Entry> entry = ArchiveFiles::Find(resolved + L'\\' + name);
+        if (entry && entry->isLink)
         {
             Refuse(LinkReason);
         }
-        place.append(1, L'\\').append(facts ? facts->name : name);
+        resolved.append(1, L'\\').append(entry ? entry->name : name);
     }
-    return place;
+    return resolved;
 }
 
 bool IsInside(const std::wstring& foldedPath, const std::wstring& foldedFolder)
@@ -164,12 +164,12 @@ std::wstring ArchivePaths::FindFolder(const std::wstring& path)
 {
     const std::wstring longForm = LongForm(path);
     DWORD error = GetFileAttributesW((longForm + L'\\').c_str()) == INVALID_FILE_ATTRIBUTES ? GetLastError() : 0;
-    std::wstring place = error == 0 ? FindPlace(longForm, error) : L"";
-    if (place.empty())
+    std::wstring resolved = error == 0 ? ResolvePath(longForm, error) : L"";
+    if (resolved.empty())
     {
         ArchiveFiles::ThrowError(L"The folder cannot be opened", error);
     }
-    return place;
+    return resolved;
 }
 
 std::wstring ArchivePaths::ShortForm(const std::wstring& path)
@@ -208,18 +208,18 @@ ArchiveTarget ArchivePaths::Resolve(const std::wstring& path)
 
     ArchiveTarget target;
     const std::wstring name = longForm.substr(separator + 1);
-    target.facts = ArchiveFiles::Find(folder + L'\\' + name);
-    target.path = folder + L'\\' + (target.facts ? target.facts->name : name);
+    target.entry = ArchiveFiles::Find(folder + L'\\' + name);
+    target.path = folder + L'\\' + (target.entry ? target.entry->name : name);
     target.relative = target.path.substr(m_project.size() + 1);
     if (IsReserved(target.relative))
     {
         RefuseOwnFile();
     }
-    if (target.facts && target.facts->IsFolder())
+    if (target.entry && target.entry->IsFolder())
     {
         Refuse(L"A folder is not a file");
     }
-    if (target.facts && target.facts->isLink)
+    if (target.entry && target.entry->isLink)
     {
         Refuse(LinkReason);
     }
@@ -262,19 +262,19 @@ const std::wstring& ArchivePaths::ResolveFolder(const std::wstring& path)
     }
 
     DWORD error = 0;
-    const std::wstring place = FindPlace(path, error);
-    if (place.empty() && IsInside(ArchiveText::Fold(path), m_foldedProject))
+    const std::wstring resolved = ResolvePath(path, error);
+    if (resolved.empty() && IsInside(ArchiveText::Fold(path), m_foldedProject))
     {
         ArchiveFiles::ThrowError(L"The file's folder cannot be opened", error);
     }
-    const std::wstring foldedPlace = ArchiveText::Fold(place);
-    if (IsInside(foldedPlace, m_foldedArchive))
+    const std::wstring foldedPath = ArchiveText::Fold(resolved);
+    if (IsInside(foldedPath, m_foldedArchive))
     {
         RefuseOwnFile();
     }
-    if (!IsInside(foldedPlace, m_foldedProject))
+    if (!IsInside(foldedPath, m_foldedProject))
     {
         Refuse(Outside);
     }
-    return m_folders.emplace(path, place).first->second;
+    return m_folders.emplace(path, resolved).first->second;
 }

@@ -12,7 +12,7 @@ constexpr std::string_view LastLine = "end";
 
 using Fields = std::vector<std::string_view>;
 
-/// Takes the next line off the text; nothing when no line end is left.
+/// Removes the first line from the text and returns it. Nothing when there is no line end.
 std::optional<std::string_view> TakeLine(std::string_view& text)
 {
     const std::size_t end = text.find('\n');

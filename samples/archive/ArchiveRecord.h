@@ -17,7 +17,7 @@ struct ArchiveVersion
     std::wstring comment;
 };
 
-/// Who holds a file.
+/// A check-out of a file.
 struct ArchiveCheckOut
 {
     std::string time; ///< ISO 8601 in UTC
@@ -25,7 +25,7 @@ struct ArchiveCheckOut
     std::wstring comment;
 };
 
-/// Everything that the archive knows of one file. Its text form is described in docs/archive-format.md.
+/// The record of one file. docs/archive-format.md describes its text form.
 struct ArchiveRecord
 {
     /// Relative to the project folder, with "/" between the names.
@@ -33,12 +33,12 @@ struct ArchiveRecord
 
     std::optional<ArchiveCheckOut> checkOut;
 
-    /// Oldest first and never empty in a stored record; version n stands at index n - 1.
+    /// Oldest first, version n at index n - 1. A stored record has at least one.
     std::vector<ArchiveVersion> versions;
 
     const ArchiveVersion& Latest() const { return versions.back(); }
 
-    /// Reads the text form; nothing when it is not exactly as `Format` writes it.
+    /// Reads the text form. Nothing when the text is not exactly in the form that `Format` writes.
     static std::optional<ArchiveRecord> Parse(std::string_view text);
 
     std::string Format() const;

@@ -9,7 +9,7 @@
 namespace
 {
 
-/// Adds a text line by line, without empty ones after the first.
+/// Adds the lines of a text. Empty lines after the first are left out.
 void Append(ArchiveReport::Lines& lines, const std::wstring& text)
 {
     for (std::size_t begin = 0; begin <= text.size();)

@@ -6,23 +6,23 @@
 #include <string>
 #include <vector>
 
-/// What the front ends of the archive tell people, and whom they take them for.
+/// The texts that both fronts of the archive show, and the default user.
 namespace ArchiveReport
 {
 
-/// Text for an output that takes one line at a time: without line ends, a text's lines after its first indented.
+/// The lines of an output. When a text has several lines, those after the first are indented.
 using Lines = std::vector<std::wstring>;
 
-/// "file: reason", or the reason alone when no file failed.
+/// "file: reason", or only the reason when the failure concerns no file.
 Lines Failure(const ArchiveFailure& failure);
 
 /// All versions of a file, newest first.
 Lines History(const ArchiveRecord& record);
 
-/// The latest version of a file, and who holds the file.
+/// The latest version of a file, and who has it checked out.
 Lines Properties(const ArchiveRecord& record);
 
-/// The user of the Windows session; empty when Windows does not tell.
+/// The user of the Windows session; empty when Windows gives none.
 std::wstring WindowsUser();
 
 } // namespace ArchiveReport

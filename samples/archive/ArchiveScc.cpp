@@ -17,7 +17,7 @@ std::wstring Text(LPCSTR text)
     return text != nullptr ? ArchiveText::FromAnsi(text) : L"";
 }
 
-/// The text in a buffer of the host, which may lack a terminator.
+/// The text in a buffer of the host. The terminator may be missing.
 std::wstring TextIn(LPCSTR buffer, std::size_t size)
 {
     return ArchiveText::FromAnsi({buffer, strnlen(buffer, size)});
@@ -34,7 +34,7 @@ void Put(LPSTR buffer, const std::string& bytes)
     std::memcpy(buffer, bytes.c_str(), bytes.size() + 1);
 }
 
-/// Writes a text, cut between two characters to what the buffer holds.
+/// Writes a text. If it does not fit into the buffer, characters at its end are left out.
 void PutCut(LPSTR buffer, std::size_t size, std::wstring_view text)
 {
     std::string bytes = ArchiveText::ToAnsi(text);
@@ -46,14 +46,15 @@ void PutCut(LPSTR buffer, std::size_t size, std::wstring_view text)
     Put(buffer, bytes);
 }
 
-/// Writes a text that means something else when it is cut: an empty one when it cannot be given exactly.
+/// Writes a text that must not change. If it does not fit, or is not in the ANSI code page, an empty one is written.
 void PutWhole(LPSTR buffer, std::size_t size, const std::wstring& text)
 {
     const std::string bytes = ArchiveText::ToAnsi(text);
     Put(buffer, bytes.size() < size && IsAnsi(text) ? bytes : "");
 }
 
-/// The user whom the host names, or the user of the Windows session, who is told to the host.
+/// The user that the host names. Otherwise the user of the Windows session, whose name is written to the host's
+/// buffer.
 std::wstring UserOf(LPSTR user)
 {
     std::wstring name = TextIn(user, SCC_USER_SIZE);
@@ -135,7 +136,7 @@ LONG StatusOf(const ArchiveStatus& status)
     return bits;
 }
 
-/// Whether a command is for files of this status; those that the archive does not have are for none.
+/// Whether a command is for files of this status. A command that the archive does not have is for none.
 bool IsFor(SCCCOMMAND command, LONG status)
 {
     switch (command)
@@ -185,10 +186,10 @@ SCCRTN ArchiveScc::OpenProject(LPSTR user, LPCSTR projectName, LPCSTR localPath,
         return Report(failures);
     }
     const bool wasChosen = m_folder == m_newFolder;
-    if (!isProject && !(wasChosen && (flags & SCC_OP_CREATEIFNEW)))
+    if (!isProject && !(wasChosen && (flags & SCC_OP_CREATEIFNEW) != 0))
     {
         m_refusedFolder = m_folder;
-        return wasChosen || (flags & SCC_OP_SILENTOPEN) ? SCC_E_UNKNOWNPROJECT : SCC_E_PROJSYNTAXERR;
+        return wasChosen || (flags & SCC_OP_SILENTOPEN) != 0 ? SCC_E_UNKNOWNPROJECT : SCC_E_PROJSYNTAXERR;
     }
     const SCCRTN result = Report(m_store.Open(m_folder, m_user));
     if (result == SCC_OK)
@@ -215,8 +216,8 @@ SCCRTN ArchiveScc::GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, L
     {
         return BadArgument;
     }
-    // The host's local path may be that of an earlier project.
-    const bool wasRefused = (allowChangePath != 0) && !m_refusedFolder.empty();
+    // The local path of the host may belong to an earlier project.
+    const bool wasRefused = allowChangePath != 0 && !m_refusedFolder.empty();
     const std::wstring folder = wasRefused ? m_refusedFolder : TextIn(localPath, MAX_PATH);
     if (folder.empty())
     {
@@ -246,11 +247,11 @@ SCCRTN ArchiveScc::GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, L
     return SCC_OK;
 }
 
-/// Hands the paths of the files, of which there must be one, to `work`.
+/// Calls `work` with the paths of the files. There must be at least one.
 template <typename Work>
 SCCRTN ArchiveScc::FileOperation(LONG count, LPCSTR* names, Work work)
 {
-    if (count <= 0 || !names)
+    if (count <= 0 || names == nullptr)
     {
         return BadArgument;
     }
@@ -268,11 +269,11 @@ SCCRTN ArchiveScc::FileOperation(LONG count, LPCSTR* names, Work work)
     return work(paths);
 }
 
-/// Puts the files that the archive holds in the place of their folders, when the names are folders.
+/// When the paths are folders, replaces them by the paths of the controlled files in them.
 ArchiveFailures ArchiveScc::Expand(Paths& paths, LONG options) const
 {
     ArchiveFailures failures;
-    if (!(options & SCC_GET_ALL))
+    if ((options & SCC_GET_ALL) == 0)
     {
         return failures;
     }
@@ -395,7 +396,7 @@ SCCRTN ArchiveScc::PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, P
     {
         return BadArgument;
     }
-    if (options & SCC_PL_DIR)
+    if ((options & SCC_PL_DIR) != 0)
     {
         return SCC_E_OPNOTSUPPORTED;
     }
@@ -528,7 +529,7 @@ SCCRTN ArchiveScc::SetOption(LONG option)
     return option == SCC_OPT_SHARESUBPROJ ? SCC_I_SHARESUBPROJOK : SCC_E_OPNOTSUPPORTED;
 }
 
-/// Shows what went wrong; the result of the operation.
+/// Shows the failures and returns the result of the operation.
 SCCRTN ArchiveScc::Report(const ArchiveFailures& failures) const
 {
     for (const ArchiveFailure& failure : failures)

@@ -8,14 +8,15 @@
 #include <string>
 #include <vector>
 
-/// The archive as an MSSCCI library: one session of a host, to which the context pointer leads. Each operation is the
-/// exported function of its name. It translates names, option words and results, and shows everything that it has to
-/// say through the callback of `OpenProject`, which is kept until `CloseProject`.
+/// The archive as an MSSCCI library: one session of a host, which the context pointer identifies. Each operation
+/// implements the exported function of its name. It translates names, option words and results, and shows its messages
+/// through the callback of `OpenProject`, which it uses until `CloseProject`.
 ///
-/// A null in place of something that an operation needs, or a list without files, is SCC_E_NONSPECIFICERROR, and
-/// nothing is done. A file operation does what it can; the result is that of the first file that failed.
+/// When an argument that an operation needs is null, or a list has no files, the operation does nothing and returns
+/// SCC_E_NONSPECIFICERROR. A file operation goes on after a file that fails; its result is that of the first such
+/// file.
 ///
-/// Where the interface leaves the choice:
+/// Where the interface leaves a choice:
 /// - There are no dialogs. A check-in or an add without a comment stores an empty one.
 /// - A new project is made by the second `OpenProject` with SCC_OP_CREATEIFNEW, after `GetProjPath` has chosen it.
 /// - `Checkout` takes the file as it is on disk; a host that wants the latest version gets it first.
@@ -30,17 +31,19 @@ public:
         SCC_CAP_ADDFROMSCC | SCC_CAP_COMMENTCHECKOUT | SCC_CAP_COMMENTCHECKIN | SCC_CAP_COMMENTADD | SCC_CAP_TEXTOUT |
         SCC_CAP_BATCH | SCC_CAP_HISTORY_MULTFILE | SCC_CAP_POPULATELIST;
 
-    /// How long a comment a host should let people write. The archive keeps longer ones too.
+    /// The length of comments, in bytes, that hosts are told to offer. The archive stores longer ones as well.
     static constexpr LONG CommentLength = 4096;
 
-    /// Opens the archive of the folder. A user whose name fits is told to a host that gives none. The project name is
-    /// not read, and neither is the auxiliary path, which becomes what `GetProjPath` makes it.
+    /// Opens the archive of the folder. When the host names no user, it gets the name of the Windows user, if that
+    /// fits into its buffer. The project name and the auxiliary path are not read; the auxiliary path is written as by
+    /// `GetProjPath`.
     SCCRTN OpenProject(LPSTR user, LPCSTR projectName, LPCSTR localPath, LPSTR auxPath, LPTEXTOUTPROC output,
                        LONG flags);
     SCCRTN CloseProject();
 
-    /// Chooses the folder that `OpenProject` refused last, if the path may be changed, or else the local path. The
-    /// project is named after its folder; the auxiliary path is the archive's place in it. Both are for people only.
+    /// Chooses the folder that `OpenProject` refused last, if the path may be changed, otherwise the local path. The
+    /// project name becomes the name of the folder, and the auxiliary path the name of the archive in it. Both are
+    /// only shown.
     SCCRTN GetProjPath(LPSTR user, LPSTR projectName, LPSTR localPath, LPSTR auxPath, BOOL allowChangePath,
                        LPBOOL isNew);
 
@@ -57,8 +60,8 @@ public:
     /// All or nothing: after a failure every status is SCC_STATUS_INVALID.
     SCCRTN QueryInfo(LONG count, LPCSTR* names, LPLONG status);
 
-    /// As `QueryInfo`, and then has the host take the files off its list that the command is not for. Ends with
-    /// SCC_I_OPERATIONCANCELED when the host answers FALSE. Folders are not taken.
+    /// Calls `QueryInfo`, then tells the host to remove the files from its list that the command is not for. Ends with
+    /// SCC_I_OPERATIONCANCELED when the host returns FALSE. Names of folders are not supported.
     SCCRTN PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback, LPVOID callerData,
                         LPLONG status, LONG options);
 
@@ -68,11 +71,12 @@ public:
     /// The options show the archive's folder and the user; there is nothing to change.
     SCCRTN GetCommandOptions(SCCCOMMAND command, LPCMDOPTS* block);
 
-    /// Brings what the archive holds and the project's folder, or the folder named, lacks. The array is valid until
-    /// the next call and names the files that were brought, also when others failed.
+    /// Gets the files of the archive that are missing on the disk, in the project folder or in the folder that the
+    /// host names. The array is valid until the next call. It names the files that were written, also when others
+    /// failed.
     SCCRTN AddFromScc(LPLONG count, LPCSTR** names);
 
-    /// Only SCC_OPT_SHARESUBPROJ is known.
+    /// Only SCC_OPT_SHARESUBPROJ is supported.
     SCCRTN SetOption(LONG option);
 
 private:
@@ -90,8 +94,8 @@ private:
     LPTEXTOUTPROC m_output = nullptr;
     std::wstring m_user;
     std::wstring m_folder;
-    std::wstring m_refusedFolder; ///< by the last `OpenProject`, as no project
-    std::wstring m_newFolder;     ///< chosen by `GetProjPath` to become a project
+    std::wstring m_refusedFolder; ///< the last `OpenProject` refused it, since it is no project
+    std::wstring m_newFolder;     ///< `GetProjPath` chose it for a new project
 
     // The array that `AddFromScc` returned, and the texts that it points to.
     std::vector<std::string> m_addedFiles;

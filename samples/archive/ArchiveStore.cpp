@@ -10,7 +10,7 @@
 namespace
 {
 
-/// How the contents on disk stand to a record.
+/// Which version of a record the file on disk has.
 enum class Local
 {
     Missing,
@@ -19,8 +19,8 @@ enum class Local
     Other,
 };
 
-/// Whether an equal size and time are proof enough of equal contents.
-enum class Proof
+/// How a file is compared: an equal size and time are enough, or the contents are read.
+enum class Comparison
 {
     SizeAndTime,
     Contents,
@@ -31,6 +31,21 @@ ArchiveFailure Failure(ArchiveError error, const std::wstring& reason)
     return {error, reason, {}};
 }
 
+ArchiveFailure NoProject()
+{
+    return Failure(ArchiveError::NotOpen, L"No project is open");
+}
+
+ArchiveFiles::UniqueHandle OpenToRead(const std::wstring& path, DWORD share)
+{
+    ArchiveFiles::UniqueHandle file = ArchiveFiles::Open(path, GENERIC_READ, share, OPEN_EXISTING);
+    if (!file)
+    {
+        ArchiveFiles::ThrowLastError(L"The file cannot be opened");
+    }
+    return file;
+}
+
 bool IsSameUser(const std::wstring& one, const std::wstring& other)
 {
     return ArchiveText::Fold(one) == ArchiveText::Fold(other);
@@ -38,7 +53,7 @@ bool IsSameUser(const std::wstring& one, const std::wstring& other)
 
 } // namespace
 
-/// One command: the project and the paths that were resolved so far.
+/// One command: the project, and the paths that were resolved so far.
 class ArchiveStore::Session
 {
 public:
@@ -54,7 +69,7 @@ public:
         {
             return *record;
         }
-        throw Failure(ArchiveError::NotControlled, L"Not under control");
+        throw Failure(ArchiveError::NotControlled, L"Not controlled");
     }
 
     void Save(const ArchiveTarget& target, const ArchiveRecord& record) const
@@ -91,27 +106,22 @@ public:
         return {ArchiveText::Now(), m_project.user, comment};
     }
 
-    /// Keeps the contents on disk as a new version.
+    /// Stores the contents on disk as a new version.
     ArchiveVersion StoreVersion(const ArchiveTarget& target, const std::wstring& comment) const
     {
-        if (!target.facts)
+        if (!target.entry)
         {
-            throw Failure(ArchiveError::NoSuchFile, L"There is no such file");
+            throw Failure(ArchiveError::NoSuchFile, L"No such file");
         }
-        const ArchiveFiles::UniqueHandle file =
-            ArchiveFiles::Open(target.path, GENERIC_READ, FILE_SHARE_READ, OPEN_EXISTING);
-        if (!file)
-        {
-            ArchiveFiles::ThrowLastError(L"The file cannot be opened");
-        }
+        const ArchiveFiles::UniqueHandle file = OpenToRead(target.path, FILE_SHARE_READ);
         const ArchiveFiles::Contents contents = m_project.archive.Store(file.get());
         return {ArchiveText::Now(), m_project.user, contents.sha256, contents.size, contents.lastWrite, comment};
     }
 
-    /// Puts the latest version in the place of what is on disk.
-    void Bring(ArchiveTarget& target, const ArchiveRecord& record, bool readOnly) const
+    /// Replaces the file on disk by the latest version.
+    void WriteLatest(ArchiveTarget& target, const ArchiveRecord& record, bool readOnly) const
     {
-        if (!target.facts)
+        if (!target.entry)
         {
             m_paths.MakeFolders(target);
         }
@@ -121,27 +131,27 @@ public:
         m_project.archive.Fetch(record.Latest(), copy.Path());
         ArchiveFiles::Replace(copy.Path(), target.path);
         ArchiveFiles::SetReadOnly(target.path, readOnly);
-        target.facts = ArchiveFiles::Find(target.path);
+        target.entry = ArchiveFiles::Find(target.path);
     }
 
     void GetLatest(ArchiveTarget& target, const ArchiveRecord& record) const;
 
     ArchiveStatus StatusOf(const ArchiveTarget& target) const;
 
-    static Local Compare(const ArchiveTarget& target, const ArchiveRecord& record, Proof proof);
+    static Local Compare(const ArchiveTarget& target, const ArchiveRecord& record, Comparison comparison);
 
 private:
     const Project& m_project;
     ArchivePaths m_paths;
 };
 
-Local ArchiveStore::Session::Compare(const ArchiveTarget& target, const ArchiveRecord& record, Proof proof)
+Local ArchiveStore::Session::Compare(const ArchiveTarget& target, const ArchiveRecord& record, Comparison comparison)
 {
-    if (!target.facts)
+    if (!target.entry)
     {
         return Local::Missing;
     }
-    const ArchiveFiles::Facts& facts = *target.facts;
+    const ArchiveFiles::Entry& entry = *target.entry;
 
     const auto findNewest = [&](auto isEqual) {
         const auto found = std::find_if(record.versions.rbegin(), record.versions.rend(), isEqual);
@@ -151,10 +161,10 @@ Local ArchiveStore::Session::Compare(const ArchiveTarget& target, const ArchiveR
         }
         return found == record.versions.rbegin() ? Local::Latest : Local::Older;
     };
-    const auto hasSize = [&](const ArchiveVersion& version) { return version.size == facts.size; };
+    const auto hasSize = [&](const ArchiveVersion& version) { return version.size == entry.size; };
     const Local byTime = findNewest(
-        [&](const ArchiveVersion& version) { return hasSize(version) && version.lastWrite == facts.lastWrite; });
-    if (proof == Proof::SizeAndTime && byTime != Local::Other)
+        [&](const ArchiveVersion& version) { return hasSize(version) && version.lastWrite == entry.lastWrite; });
+    if (comparison == Comparison::SizeAndTime && byTime != Local::Other)
     {
         return byTime;
     }
@@ -163,29 +173,25 @@ Local ArchiveStore::Session::Compare(const ArchiveTarget& target, const ArchiveR
         return Local::Other;
     }
 
-    const ArchiveFiles::UniqueHandle file = ArchiveFiles::Open(
-        target.path, GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, OPEN_EXISTING);
-    if (!file)
-    {
-        ArchiveFiles::ThrowLastError(L"The file cannot be opened");
-    }
+    const ArchiveFiles::UniqueHandle file =
+        OpenToRead(target.path, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE);
     const std::string sha256 = ArchiveFiles::Read(file.get()).sha256;
     return findNewest([&](const ArchiveVersion& version) { return version.sha256 == sha256; });
 }
 
 void ArchiveStore::Session::GetLatest(ArchiveTarget& target, const ArchiveRecord& record) const
 {
-    Local local = Compare(target, record, Proof::SizeAndTime);
+    Local local = Compare(target, record, Comparison::SizeAndTime);
     if (local == Local::Missing)
     {
-        return Bring(target, record, !IsMine(record));
+        return WriteLatest(target, record, !IsMine(record));
     }
     if (IsMine(record))
     {
         return;
     }
 
-    const bool mayBeOthersCopy = IsOthers(record) && !target.facts->IsReadOnly();
+    const bool mayBeOthersCopy = IsOthers(record) && !target.entry->IsReadOnly();
     if (local == Local::Latest)
     {
         if (!mayBeOthersCopy)
@@ -196,19 +202,19 @@ void ArchiveStore::Session::GetLatest(ArchiveTarget& target, const ArchiveRecord
     }
     if (local == Local::Older)
     {
-        local = Compare(target, record, Proof::Contents);
+        local = Compare(target, record, Comparison::Contents);
     }
     if (local == Local::Other || mayBeOthersCopy)
     {
         throw Failure(ArchiveError::Modified, L"Changed on disk without a check-out, so it is not overwritten");
     }
-    Bring(target, record, true);
+    WriteLatest(target, record, true);
 }
 
 ArchiveStatus ArchiveStore::Session::StatusOf(const ArchiveTarget& target) const
 {
     ArchiveStatus status;
-    status.missing = !target.facts;
+    status.missing = !target.entry;
     const std::optional<ArchiveRecord> record = Find(target);
     if (!record)
     {
@@ -221,7 +227,7 @@ ArchiveStatus ArchiveStore::Session::StatusOf(const ArchiveTarget& target) const
     Local local = Local::Other;
     try
     {
-        local = Compare(target, *record, Proof::SizeAndTime);
+        local = Compare(target, *record, Comparison::SizeAndTime);
     }
     catch (const ArchiveFailure&)
     {
@@ -239,7 +245,7 @@ ArchiveFailures ArchiveStore::Open(const std::wstring& projectFolder, const std:
     {
         if (user.empty() || !ArchiveText::IsValid(user))
         {
-            throw Failure(ArchiveError::Access, L"The user has no name that can be used");
+            throw Failure(ArchiveError::Access, L"The name of the user is not valid");
         }
         const std::wstring folder = ArchivePaths::FindFolder(projectFolder);
         if (ArchivePaths::IsReserved(folder))
@@ -282,7 +288,7 @@ ArchiveFailures ArchiveStore::ForEachFile(std::span<const std::wstring> files, b
     {
         if (!m_project)
         {
-            throw Failure(ArchiveError::NotOpen, L"No project is open");
+            throw NoProject();
         }
         std::optional<ArchiveLock> lock;
         if (withLock)
@@ -321,7 +327,7 @@ ArchiveFailures ArchiveStore::Add(std::span<const std::wstring> files, const std
     return ForEachFile(files, true, [&](Session& session, ArchiveTarget& target) {
         if (session.Find(target))
         {
-            throw Failure(ArchiveError::AlreadyControlled, L"Already under control");
+            throw Failure(ArchiveError::AlreadyControlled, L"Already controlled");
         }
         ArchiveRecord record;
         record.path = target.relative;
@@ -356,7 +362,7 @@ ArchiveFailures ArchiveStore::CheckOut(std::span<const std::wstring> files, cons
         }
 
         const bool isMine = session.IsMine(record);
-        const Local local = Session::Compare(target, record, Proof::SizeAndTime);
+        const Local local = Session::Compare(target, record, Comparison::SizeAndTime);
         if (local == Local::Missing || (local == Local::Older && !isMine))
         {
             throw outOfDate;
@@ -392,14 +398,14 @@ ArchiveFailures ArchiveStore::UndoCheckOut(std::span<const std::wstring> files)
         ArchiveRecord record = session.Load(target);
         session.RequireMine(record);
 
-        // Nobody else can have stored a version since, so the latest is the one checked out.
-        if (Session::Compare(target, record, Proof::Contents) == Local::Latest)
+        // Only the user with the check-out can store a version, so the latest is the one that was checked out.
+        if (Session::Compare(target, record, Comparison::Contents) == Local::Latest)
         {
             ArchiveFiles::SetReadOnly(target.path, true);
         }
         else
         {
-            session.Bring(target, record, true);
+            session.WriteLatest(target, record, true);
         }
         record.checkOut.reset();
         session.Save(target, record);
@@ -424,7 +430,7 @@ ArchiveFailures ArchiveStore::Status(std::span<const std::wstring> files, std::v
     statuses.clear();
     if (!m_project)
     {
-        return {Failure(ArchiveError::NotOpen, L"No project is open")};
+        return {NoProject()};
     }
 
     Session session(*m_project);
@@ -459,7 +465,7 @@ ArchiveFailures ArchiveStore::List(const std::wstring& folder, bool withSubfolde
     files.clear();
     if (!m_project)
     {
-        return {Failure(ArchiveError::NotOpen, L"No project is open")};
+        return {NoProject()};
     }
 
     ArchiveFailures failures;

@@ -9,8 +9,8 @@
 namespace
 {
 
-/// The one provider of this module: a host asks for it again and again and expects the same session. It is
-/// deleted by as many releases as requests, or when the module is unloaded, since hosts need not release it.
+/// The only provider of this module. A host may ask for it several times and expects the same session each time. It is
+/// deleted by the last release, or when the module is unloaded, since a host need not release it.
 std::unique_ptr<ArchiveProvider> theProvider;
 int requests = 0;
 
@@ -26,7 +26,7 @@ extern "C" const wchar_t* GetOrvixProviderName()
     return ArchiveProvider::Name;
 }
 
-/// Null when the host's heap is exhausted.
+/// Null when the host's heap is exhausted: the provider's operator new does not throw.
 extern "C" IOrvixProvider* GetIOrvixProvider()
 {
     if (!theProvider)

@@ -1,5 +1,5 @@
-// The 21 functions of MSSCCI; archive_msscci.def exports them under their plain names. Each is a barrier that no
-// exception passes, around one call of the session that its context leads to.
+// The 21 functions of MSSCCI; archive_msscci.def exports them under their plain names. Each calls one operation of the
+// session that its context identifies, inside the exception barrier.
 
 #include "ArchiveBarrier.h"
 #include "ArchiveScc.h"
@@ -12,13 +12,13 @@
 namespace
 {
 
-/// The sessions by their contexts. A call keeps its session, even if the host ends it from a callback.
+/// The sessions by their contexts. A call shares the ownership of its session, since a callback may end it.
 std::unordered_map<LPVOID, std::shared_ptr<ArchiveScc>> sessions;
 
-/// A batch belongs to no session. It changes nothing here, but batches do not nest, and each is ended once.
+/// Whether a batch is open. It belongs to no session and changes nothing here, but batches do not nest.
 bool batchOpen = false;
 
-/// SCC_E_INITIALIZEFAILED when the context is none that SccInitialize gave and SccUninitialize did not take.
+/// Calls `work` with the session of a context. SCC_E_INITIALIZEFAILED when no session has this context.
 template <typename Work>
 SCCRTN WithSession(LPVOID context, Work work) noexcept
 {

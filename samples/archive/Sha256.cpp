@@ -46,7 +46,7 @@ Sha256::~Sha256()
 
 void Sha256::Add(const void* bytes, std::size_t size)
 {
-    // CNG takes the bytes as not const, but only reads them.
+    // The argument is not const, but CNG only reads the bytes.
     Check(BCryptHashData(m_hash, static_cast<UCHAR*>(const_cast<void*>(bytes)), static_cast<ULONG>(size), 0));
 }
 

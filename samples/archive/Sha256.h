@@ -14,7 +14,7 @@ public:
 
     void Add(const void* bytes, std::size_t size);
 
-    /// The digest of everything added, as 64 lower-case hexadecimal digits. Ends the object's use.
+    /// The digest of everything added, as 64 lower-case hexadecimal digits. The object is not used after that.
     std::string Finish();
 
 private:
