@@ -13,8 +13,9 @@
 namespace
 {
 
-/// The state image of a row with a check box: number 1 clear, number 2 checked.
-constexpr UINT StateImageShift = 12;
+/// The state images of a row with a check box.
+constexpr UINT ClearImage = 1;
+constexpr UINT CheckedImage = 2;
 
 /// To the control, -1 means every position when a state is set.
 constexpr auto AllPositions = static_cast<std::size_t>(-1);
@@ -210,7 +211,7 @@ void TableView::FillItem(LVITEMW& item) const
     }
     if ((item.mask & LVIF_STATE) != 0 && m_checkBoxes)
     {
-        item.state = (m_checked[row] ? 2U : 1U) << StateImageShift;
+        item.state = INDEXTOSTATEIMAGEMASK(m_checked[row] ? CheckedImage : ClearImage);
     }
 }
 

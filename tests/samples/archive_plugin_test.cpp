@@ -188,7 +188,7 @@ TEST(ArchivePluginContract, ExportsItsFourFunctionsAndNothingElse)
     EXPECT_STREQ(plugin.name(), L"Archive");
 }
 
-TEST(ArchivePluginContract, HandsOutOneProviderUntilEveryRequestIsReleased)
+TEST(ArchivePluginContract, ReturnsOneProviderUntilEveryRequestIsReleased)
 {
     const Plugin plugin(ARCHIVE_PLUGIN);
     ASSERT_TRUE(plugin.IsLoaded());
@@ -234,7 +234,7 @@ TEST(ArchivePluginContract, GivesNoProviderWhenTheHostsHeapIsExhausted)
     plugin.release(provider);
 }
 
-TEST_F(ArchivePlugin, AnswersReservedAndNotOfferedOperationsAsTheInterfaceSays)
+TEST_F(ArchivePlugin, ReturnsTheDocumentedResultsOfReservedAndNotOfferedOperations)
 {
     IOrvixProvider* provider = m_anna->provider;
     unsigned long first = 1;
@@ -274,7 +274,7 @@ TEST_F(ArchivePlugin, GoesThroughItsStates)
     EXPECT_FALSE(provider->IsInitialized());
 }
 
-TEST_F(ArchivePlugin, SaysWhyAProjectCannotBeOpened)
+TEST_F(ArchivePlugin, ShowsTheReasonWhyAProjectCannotBeOpened)
 {
     EXPECT_EQ(m_anna->provider->OpenProject(nullptr, L""), Failure);
     EXPECT_EQ(m_anna->provider->OpenProject(m_project.File(L"nowhere").c_str(), L""), Failure);
@@ -283,7 +283,7 @@ TEST_F(ArchivePlugin, SaysWhyAProjectCannotBeOpened)
     EXPECT_EQ(m_anna->client.lines.size(), 1u);
 }
 
-TEST_F(ArchivePlugin, BeginsANewSessionWithASecondInitialize)
+TEST_F(ArchivePlugin, StartsANewSessionWithASecondInitialize)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     Client second;
@@ -299,7 +299,7 @@ TEST_F(ArchivePlugin, BeginsANewSessionWithASecondInitialize)
     EXPECT_EQ(m_anna->Start(), Success);
 }
 
-TEST_F(ArchivePlugin, TakesTheWindowsUserWhenTheClientNamesNone)
+TEST_F(ArchivePlugin, UsesTheWindowsUserWhenTheClientNamesNone)
 {
     wchar_t user[257] = L"";
     DWORD size = 257;
@@ -345,7 +345,7 @@ TEST_F(ArchivePlugin, FailsWithoutActiveEntriesInEveryFileOperation)
     }
 }
 
-TEST_F(ArchivePlugin, FailsWithoutAnOpenProjectAndSaysSo)
+TEST_F(ArchivePlugin, FailsWithAMessageWithoutAnOpenProject)
 {
     Files files{m_project.Write(L"a.txt", "one")};
     IOrvixProvider* provider = m_anna->provider;
@@ -376,7 +376,7 @@ TEST_F(ArchivePlugin, WorksOnTheActiveEntriesOnly)
     EXPECT_EQ(m_anna->Status(passive) & State::Controlled, 0u);
 }
 
-TEST_F(ArchivePlugin, TellsTheReasonForEachFileThatFailsAndDoesTheOthers)
+TEST_F(ArchivePlugin, ShowsTheReasonForEachFileThatFailsAndDoesTheOthers)
 {
     const std::wstring good = m_project.Write(L"good.txt", "x");
     Files files{m_project.File(L"missing.txt"), good, m_project.File(L"..\\x.txt")};
@@ -404,7 +404,7 @@ TEST_F(ArchivePlugin, KeepsFilesCheckedOutAfterAddAndCheckInWhenAsked)
     EXPECT_EQ(m_anna->Status(file) & State::CheckedOut, 0u);
 }
 
-TEST_F(ArchivePlugin, KeepsTwoHostsFromHoldingOneFile)
+TEST_F(ArchivePlugin, LetsOnlyOneHostCheckAFileOut)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     Files files{file};
@@ -469,7 +469,7 @@ TEST_F(ArchivePlugin, GetsTheLatestVersion)
 
 // Status
 
-TEST_F(ArchivePlugin, GivesTheStatusBitsOfEveryState)
+TEST_F(ArchivePlugin, SetsTheFlagsOfEveryState)
 {
     const std::wstring unknown = m_project.Write(L"unknown.txt", "x");
     const std::wstring controlled = Added(L"controlled.txt", "one");
@@ -539,7 +539,7 @@ TEST_F(ArchivePlugin, DoesNotOfferToAddTheLinkToAnArchive)
     EXPECT_EQ(m_ben->Status(link), State::NotControlled);
 }
 
-TEST_F(ArchivePlugin, GivesEveryEntryTheUncontrolledBitWithoutAnOpenProject)
+TEST_F(ArchivePlugin, SetsEveryEntryToNotControlledWithoutAnOpenProject)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     ASSERT_EQ(m_anna->provider->CloseProject(), Success);

@@ -79,7 +79,7 @@ TEST(ArchiveRecord, IsRefusedWhenItIsCutAnywhere)
     }
 }
 
-TEST(ArchiveRecord, IsRefusedWhenAFieldIsNotWhatItMustBe)
+TEST(ArchiveRecord, IsRefusedWhenAFieldIsNotValid)
 {
     const std::string text = Sample().Format();
     ASSERT_TRUE(ArchiveRecord::Parse(text));
@@ -115,7 +115,7 @@ TEST(ArchiveRecord, WithoutAVersionIsRefused)
     EXPECT_FALSE(ArchiveRecord::Parse("archive-record 1\npath\ta\nend\n"));
 }
 
-TEST(ArchiveRecord, IsRefusedInBoundedTimeWhateverItHolds)
+TEST(ArchiveRecord, IsRefusedInBoundedTimeWhateverItContains)
 {
     EXPECT_FALSE(ArchiveRecord::Parse(std::string(10 << 20, '\t')));
     EXPECT_FALSE(ArchiveRecord::Parse(std::string(10 << 20, '\n')));

@@ -84,7 +84,7 @@ protected:
         return files;
     }
 
-    /// The one record in the archive.
+    /// The path of the only record in the archive.
     std::filesystem::path RecordPath()
     {
         for (const auto& [path, bytes] : Snapshot())
@@ -160,7 +160,7 @@ TEST_F(ArchiveStoreOpen, RefusesAnArchiveOfAnotherFormat)
     EXPECT_EQ(m_project.Read(L".archive\\archive.txt"), "orvix-archive 2\n");
 }
 
-TEST_F(ArchiveStoreOpen, FinishesAnArchiveWhoseMakingWasInterrupted)
+TEST_F(ArchiveStoreOpen, CompletesAnArchiveThatIsUnfinished)
 {
     std::filesystem::remove(m_project.Path(L".archive\\archive.txt"));
     std::filesystem::remove(m_project.Path(L".archive\\files"));
@@ -193,7 +193,7 @@ TEST_F(ArchiveStoreOpen, RefusesALinkThatCannotBeRead)
     }
 }
 
-TEST_F(ArchiveStoreOpen, KnowsAProjectByItsArchiveWithoutOpeningOrMakingIt)
+TEST_F(ArchiveStoreOpen, FindsAnArchiveWithoutOpeningOrMakingIt)
 {
     const ArchiveProject other;
     bool isProject = false;
@@ -210,7 +210,7 @@ TEST_F(ArchiveStoreOpen, KnowsAProjectByItsArchiveWithoutOpeningOrMakingIt)
     EXPECT_FALSE(isProject);
 }
 
-TEST_F(ArchiveStoreOpen, TellsWhereTheArchiveIsAsPeopleWriteIt)
+TEST_F(ArchiveStoreOpen, ShowsThePathOfTheArchiveWithoutAPrefix)
 {
     EXPECT_TRUE(std::filesystem::equivalent(m_anna.ArchivePath(), m_project.Path(L".archive")));
     EXPECT_EQ(m_anna.ArchivePath().find(L'?'), std::wstring::npos);
@@ -218,7 +218,7 @@ TEST_F(ArchiveStoreOpen, TellsWhereTheArchiveIsAsPeopleWriteIt)
     EXPECT_EQ(ArchivePaths::ShortForm(L"\\\\?\\UNC\\server\\share"), L"\\\\server\\share");
 }
 
-TEST_F(ArchiveStoreOpen, OfNothingLetsEveryCommandFail)
+TEST_F(ArchiveStoreOpen, IsRequiredByEveryCommand)
 {
     ArchiveStore closed;
     const Files files{m_project.Write(L"a.txt", "one")};
@@ -266,7 +266,7 @@ TEST_F(ArchiveStoreAdd, KeepsTheFileCheckedOutWhenAsked)
     EXPECT_TRUE(StatusOf(m_anna, file).checkedOut);
 }
 
-TEST_F(ArchiveStoreAdd, RefusesAFileThatIsControlledAlready)
+TEST_F(ArchiveStoreAdd, RefusesAFileThatIsAlreadyControlled)
 {
     const std::wstring file = Added(L"a.txt", "one");
 
@@ -285,7 +285,7 @@ TEST_F(ArchiveStoreAdd, GoesOnAfterAFileThatFails)
     EXPECT_FALSE(StatusOf(m_anna, missing).controlled);
 }
 
-TEST_F(ArchiveStoreAdd, WorksOnceOnAFileThatIsGivenTwice)
+TEST_F(ArchiveStoreAdd, HandlesAFileThatIsGivenTwiceOnce)
 {
     const std::wstring file = m_project.Write(L"a.txt", "one");
 
@@ -343,7 +343,7 @@ TEST_F(ArchiveStoreCheckOut, MakesTheFileWritableAndRecordsTheUser)
     EXPECT_EQ(record.checkOut->time.size(), 20u);
 }
 
-TEST_F(ArchiveStoreCheckOut, IsRefusedWhileAnotherUserHoldsTheFile)
+TEST_F(ArchiveStoreCheckOut, IsRefusedWhileAnotherUserHasTheFileCheckedOut)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
 
@@ -354,7 +354,7 @@ TEST_F(ArchiveStoreCheckOut, IsRefusedWhileAnotherUserHoldsTheFile)
     EXPECT_EQ(RecordOf(file).checkOut->user, L"anna");
 }
 
-TEST_F(ArchiveStoreCheckOut, IsOpenToAnotherUserAfterCheckInAndUndo)
+TEST_F(ArchiveStoreCheckOut, IsPossibleForAnotherUserAfterCheckInAndUndo)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     ASSERT_TRUE(m_anna.CheckIn(Files{file}, L"", false).empty());
@@ -364,7 +364,7 @@ TEST_F(ArchiveStoreCheckOut, IsOpenToAnotherUserAfterCheckInAndUndo)
     EXPECT_TRUE(m_anna.CheckOut(Files{file}, L"", false).empty());
 }
 
-TEST_F(ArchiveStoreCheckOut, OfAFileHeldAlreadySucceedsAndMakesItWritable)
+TEST_F(ArchiveStoreCheckOut, OfACheckedOutFileSucceedsAndMakesItWritable)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     m_project.Write(L"a.txt", "edited");
@@ -377,7 +377,7 @@ TEST_F(ArchiveStoreCheckOut, OfAFileHeldAlreadySucceedsAndMakesItWritable)
     EXPECT_EQ(RecordOf(file).checkOut->comment, L"mine");
 }
 
-TEST_F(ArchiveStoreCheckOut, RefusesAnOlderVersionUnlessTheLatestIsBroughtFirst)
+TEST_F(ArchiveStoreCheckOut, RefusesAnOlderVersionUnlessItGetsTheLatestFirst)
 {
     const std::wstring file = WithTwoVersions(L"a.txt");
     m_project.Overwrite(file, "one");
@@ -390,7 +390,7 @@ TEST_F(ArchiveStoreCheckOut, RefusesAnOlderVersionUnlessTheLatestIsBroughtFirst)
     EXPECT_FALSE(IsReadOnly(file));
 }
 
-TEST_F(ArchiveStoreCheckOut, RefusesAMissingFileUnlessTheLatestIsBroughtFirst)
+TEST_F(ArchiveStoreCheckOut, RefusesAMissingFileUnlessItGetsTheLatestFirst)
 {
     const std::wstring file = WithTwoVersions(L"a.txt");
     SetReadOnly(file, false);
@@ -477,7 +477,7 @@ TEST_F(ArchiveStoreCheckIn, KeepsTheFileCheckedOutWhenAsked)
     ExpectFailure(m_ben.CheckOut(Files{file}, L"", false), ArchiveError::CheckedOutByOther, file);
 }
 
-TEST_F(ArchiveStoreCheckIn, RefusesWhatTheUserDoesNotHold)
+TEST_F(ArchiveStoreCheckIn, RefusesAFileThatTheUserHasNotCheckedOut)
 {
     const std::wstring free = Added(L"free.txt", "one");
     const std::wstring held = CheckedOut(L"held.txt", "one");
@@ -487,7 +487,7 @@ TEST_F(ArchiveStoreCheckIn, RefusesWhatTheUserDoesNotHold)
     EXPECT_EQ(RecordOf(held).versions.size(), 1u);
 }
 
-TEST_F(ArchiveStoreCheckIn, RefusesAFileThatIsNoLongerThere)
+TEST_F(ArchiveStoreCheckIn, RefusesAFileThatNoLongerExists)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     std::filesystem::remove(file);
@@ -496,7 +496,7 @@ TEST_F(ArchiveStoreCheckIn, RefusesAFileThatIsNoLongerThere)
     EXPECT_TRUE(RecordOf(file).checkOut);
 }
 
-TEST_F(ArchiveStoreCheckIn, OfUnchangedContentsStoresAVersionAllTheSame)
+TEST_F(ArchiveStoreCheckIn, OfUnchangedContentsStoresAVersionToo)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
 
@@ -523,20 +523,20 @@ TEST_F(ArchiveStoreUndo, RestoresTheVersionThatWasCheckedOut)
     EXPECT_FALSE(StatusOf(m_anna, file).modified);
 }
 
-TEST_F(ArchiveStoreUndo, IsNotDeceivedByAChangeThatKeepsSizeAndTime)
+TEST_F(ArchiveStoreUndo, FindsAChangeThatKeepsSizeAndTime)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     const WriteTime time(file);
     m_project.Write(L"a.txt", "eno");
     ASSERT_TRUE(time.Restore(file));
-    ASSERT_FALSE(StatusOf(m_anna, file).modified) << "the quick check is deceived";
+    ASSERT_FALSE(StatusOf(m_anna, file).modified) << "size and time say otherwise";
 
     ASSERT_TRUE(m_anna.UndoCheckOut(Files{file}).empty());
 
     EXPECT_EQ(m_project.Read(L"a.txt"), "one");
 }
 
-TEST_F(ArchiveStoreUndo, BringsAFileBackThatWasDeleted)
+TEST_F(ArchiveStoreUndo, RestoresAFileThatWasDeleted)
 {
     const std::wstring file = CheckedOut(L"sub\\a.txt", "one");
     std::filesystem::remove_all(m_project.Path(L"sub"));
@@ -547,7 +547,7 @@ TEST_F(ArchiveStoreUndo, BringsAFileBackThatWasDeleted)
     EXPECT_TRUE(IsReadOnly(file));
 }
 
-TEST_F(ArchiveStoreUndo, RefusesWhatTheUserDoesNotHold)
+TEST_F(ArchiveStoreUndo, RefusesAFileThatTheUserHasNotCheckedOut)
 {
     const std::wstring free = Added(L"free.txt", "one");
     const std::wstring held = CheckedOut(L"held.txt", "one");
@@ -560,7 +560,7 @@ TEST_F(ArchiveStoreUndo, RefusesWhatTheUserDoesNotHold)
 
 // Getting
 
-TEST_F(ArchiveStoreGet, BringsAMissingFileWithItsFoldersReadOnly)
+TEST_F(ArchiveStoreGet, WritesAMissingFileWithItsFoldersReadOnly)
 {
     const std::wstring file = Added(L"x\\y\\a.txt", "one");
     SetReadOnly(file, false);
@@ -615,7 +615,7 @@ TEST_F(ArchiveStoreGet, NeverOverwritesAChangeThatHasSizeAndTimeOfAnOlderVersion
     ASSERT_TRUE(m_anna.CheckIn(Files{file}, L"", false).empty());
     m_project.Overwrite(file, "eno");
     ASSERT_TRUE(time.Restore(file));
-    ASSERT_TRUE(StatusOf(m_anna, file).outOfDate) << "the quick check is deceived";
+    ASSERT_TRUE(StatusOf(m_anna, file).outOfDate) << "size and time say otherwise";
 
     ExpectFailure(m_anna.GetLatest(Files{file}), ArchiveError::Modified, file);
 
@@ -633,7 +633,7 @@ TEST_F(ArchiveStoreGet, LeavesACheckedOutFileAlone)
     EXPECT_FALSE(IsReadOnly(file));
 }
 
-TEST_F(ArchiveStoreGet, BringsAMissingCheckedOutFileWritable)
+TEST_F(ArchiveStoreGet, WritesAMissingCheckedOutFileWritable)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     std::filesystem::remove(file);
@@ -644,7 +644,7 @@ TEST_F(ArchiveStoreGet, BringsAMissingCheckedOutFileWritable)
     EXPECT_FALSE(IsReadOnly(file));
 }
 
-TEST_F(ArchiveStoreGet, DoesNotTakeAFileInASharedFolderAwayFromItsHolder)
+TEST_F(ArchiveStoreGet, LeavesAFileAloneThatAnotherUserOfTheFolderHasCheckedOut)
 {
     const std::wstring untouched = CheckedOut(L"untouched.txt", "one");
     const std::wstring edited = CheckedOut(L"edited.txt", "one");
@@ -693,7 +693,7 @@ TEST_F(ArchiveStoreStatus, TellsEveryStateApart)
     EXPECT_EQ(bits(m_ben), (std::vector<std::string>{"", "c", "co", "cox", "cd", "cx", "cd", "", ""}));
 }
 
-TEST_F(ArchiveStoreStatus, SaysThatAnOlderVersionInACheckedOutFileIsAChange)
+TEST_F(ArchiveStoreStatus, IsModifiedForAnOlderVersionInACheckedOutFile)
 {
     const std::wstring file = WithTwoVersions(L"a.txt");
     ASSERT_TRUE(m_anna.CheckOut(Files{file}, L"", false).empty());
@@ -703,7 +703,7 @@ TEST_F(ArchiveStoreStatus, SaysThatAnOlderVersionInACheckedOutFileIsAChange)
     EXPECT_FALSE(StatusOf(m_anna, file).outOfDate);
 }
 
-TEST_F(ArchiveStoreStatus, TakesAFileThatIsOnlyTouchedForUnchanged)
+TEST_F(ArchiveStoreStatus, IsUnchangedForAFileWithANewTimeOnly)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     std::filesystem::last_write_time(file, std::filesystem::last_write_time(file) + std::chrono::hours(1));
@@ -711,7 +711,7 @@ TEST_F(ArchiveStoreStatus, TakesAFileThatIsOnlyTouchedForUnchanged)
     EXPECT_FALSE(StatusOf(m_anna, file).modified);
 }
 
-TEST_F(ArchiveStoreStatus, FailsForADamagedRecordAndGivesNoStatusAtAll)
+TEST_F(ArchiveStoreStatus, FailsAsAWholeForADamagedRecord)
 {
     const std::wstring file = Added(L"a.txt", "one");
     m_project.Overwrite(RecordPath(), "archive-record 1\n");
@@ -723,7 +723,7 @@ TEST_F(ArchiveStoreStatus, FailsForADamagedRecordAndGivesNoStatusAtAll)
     EXPECT_TRUE(statuses.empty());
 }
 
-TEST_F(ArchiveStoreStatus, TellsWhatIsNotOnDisk)
+TEST_F(ArchiveStoreStatus, IsMissingForAFileThatIsNotOnDisk)
 {
     const std::wstring file = Added(L"a.txt", "one");
     EXPECT_FALSE(StatusOf(m_anna, file).missing);
@@ -736,7 +736,7 @@ TEST_F(ArchiveStoreStatus, TellsWhatIsNotOnDisk)
 
 // Listing
 
-TEST_F(ArchiveStoreList, GivesTheFilesOfAFolderInOrderWhetherTheyAreOnDiskOrNot)
+TEST_F(ArchiveStoreList, SortsTheFilesOfAFolderOnDiskOrNot)
 {
     const std::wstring b = Added(L"b.txt", "one");
     const std::wstring a = Added(L"a.txt", "one");
@@ -795,7 +795,7 @@ TEST_F(ArchiveStoreList, ReportsADamagedRecordAndGivesTheOthers)
     EXPECT_EQ(files, (Files{good}));
 }
 
-TEST_F(ArchiveStoreList, DoesNotTakeARecordUnderAnotherFilesName)
+TEST_F(ArchiveStoreList, RefusesARecordUnderTheNameOfAnotherFile)
 {
     Added(L"a.txt", "one");
     const std::filesystem::path record = RecordPath();
@@ -832,7 +832,7 @@ TEST_F(ArchiveStoreSafety, AnInterruptedWriteLeavesTheOldVersionIntact)
     EXPECT_FALSE(std::filesystem::exists(m_project.Path(L".archive.tmp")));
 }
 
-TEST_F(ArchiveStoreSafety, ContentsWithoutARecordFromAnInterruptedCheckInDoNotDisturb)
+TEST_F(ArchiveStoreSafety, ContentsWithoutARecordFromAnInterruptedCheckInAreIgnored)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     const auto record = ReadBytes(RecordPath());
@@ -859,7 +859,7 @@ TEST_F(ArchiveStoreSafety, ADamagedVersionIsFoundAndNeverOverwritesTheUsersFile)
     EXPECT_FALSE(std::filesystem::exists(m_project.Path(L".archive.tmp")));
 }
 
-TEST_F(ArchiveStoreSafety, ADamagedOrLostVersionIsNotBrought)
+TEST_F(ArchiveStoreSafety, ADamagedOrLostVersionIsNotWrittenToTheDisk)
 {
     const std::wstring file = WithTwoVersions(L"a.txt");
     const std::filesystem::path contents = ContentsPath(RecordOf(file).Latest());
@@ -879,7 +879,7 @@ TEST_F(ArchiveStoreSafety, ADamagedOrLostVersionIsNotBrought)
     EXPECT_TRUE(IsReadOnly(file));
 }
 
-TEST_F(ArchiveStoreSafety, StoringTheSameContentsAgainMendsADamagedCopy)
+TEST_F(ArchiveStoreSafety, StoringTheSameContentsAgainRepairsADamagedCopy)
 {
     const std::wstring file = Added(L"a.txt", "one");
     m_project.Overwrite(ContentsPath(RecordOf(file).Latest()), "damaged");
@@ -950,7 +950,7 @@ TEST_F(ArchiveStoreUsers, AreTheSameWhenTheirNamesDifferInLetterCaseOnly)
     EXPECT_TRUE(same.CheckIn(Files{file}, L"", false).empty());
 }
 
-TEST_F(ArchiveStoreUsers, AreFreedOfAForgottenCheckOutByDeletingItsLine)
+TEST_F(ArchiveStoreUsers, LoseAForgottenCheckOutWhenItsLineIsDeleted)
 {
     const std::wstring file = CheckedOut(L"a.txt", "one");
     std::string record = ReadBytes(RecordPath());
@@ -962,7 +962,7 @@ TEST_F(ArchiveStoreUsers, AreFreedOfAForgottenCheckOutByDeletingItsLine)
     EXPECT_TRUE(m_ben.CheckOut(Files{file}, L"", false).empty());
 }
 
-TEST_F(ArchiveStoreUsers, WaitForEachOtherButNotForEver)
+TEST_F(ArchiveStoreUsers, WaitForEachOtherForALimitedTime)
 {
     const Files files{m_project.Write(L"a.txt", "one")};
     ArchiveFiles::UniqueHandle lock =
@@ -1015,7 +1015,7 @@ TEST_F(ArchiveStoreUsers, LoseNoVersionWhenTheyWorkAtTheSameTime)
     EXPECT_EQ(comments.size(), 1u + 2 * Rounds);
 }
 
-TEST_F(ArchiveStoreUsers, ShareOneArchiveFromFoldersOfTheirOwnThroughALink)
+TEST_F(ArchiveStoreUsers, ShareOneArchiveThroughALink)
 {
     const std::wstring file = CheckedOut(L"sub\\a.txt", "one");
     const ArchiveProject bens;
@@ -1106,7 +1106,7 @@ TEST_F(ArchiveStorePaths, OfTheArchiveItselfAreRefused)
     expectOwn(m_ben, m_project.File(L".archive\\archive.txt"));
 }
 
-TEST_F(ArchiveStorePaths, OfOneFileAreTheSameHoweverTheyAreWritten)
+TEST_F(ArchiveStorePaths, OfOneFileAreEqualInEverySpelling)
 {
     const std::wstring file = Added(L"Sub\\Größe.txt", "one");
     std::wstring slashes = file;
@@ -1120,7 +1120,7 @@ TEST_F(ArchiveStorePaths, OfOneFileAreTheSameHoweverTheyAreWritten)
     EXPECT_EQ(RecordOf(m_project.File(L"SUB\\GRÖßE.TXT")).path, L"Sub/Größe.txt");
 }
 
-TEST_F(ArchiveStorePaths, MayHoldAnyLetters)
+TEST_F(ArchiveStorePaths, MayHaveAnyCharacters)
 {
     const std::wstring file = WithTwoVersions(L"Ünïcode 日本 \xD83C\xDFB5\\señal.txt");
     m_project.Overwrite(file, "one");
@@ -1130,7 +1130,7 @@ TEST_F(ArchiveStorePaths, MayHoldAnyLetters)
     EXPECT_EQ(m_project.Read(L"Ünïcode 日本 \xD83C\xDFB5\\señal.txt"), "two");
 }
 
-TEST_F(ArchiveStorePaths, MayBeLongerThanWindowsOnceAllowed)
+TEST_F(ArchiveStorePaths, MayBeLongerThanMaxPath)
 {
     const std::size_t base = m_project.Text().size() + 1;
     for (const std::size_t length : {259u, 260u, 261u, 1000u})
@@ -1169,7 +1169,7 @@ TEST_F(ArchiveStorePaths, MayBeLongerThanWindowsOnceAllowed)
     }
 }
 
-TEST_F(ArchiveStorePaths, ThatLeadOutThroughALinkAreRefused)
+TEST_F(ArchiveStorePaths, OutsideTheProjectThroughALinkAreRefused)
 {
     const ArchiveProject other;
     other.Write(L"a.txt", "x");
@@ -1177,7 +1177,7 @@ TEST_F(ArchiveStorePaths, ThatLeadOutThroughALinkAreRefused)
     std::filesystem::create_directory_symlink(other.Path(L""), m_project.Path(L"link"), error);
     if (error || !std::filesystem::exists(m_project.Path(L"link\\a.txt")))
     {
-        GTEST_SKIP() << "no links here";
+        GTEST_SKIP() << "links cannot be made here";
     }
     const std::wstring file = m_project.File(L"link\\a.txt");
 

@@ -11,7 +11,7 @@
 namespace
 {
 
-/// Of a key message: a first press, with Alt.
+/// The lParam of a key message: the first press of a key, with Alt.
 constexpr LPARAM AltIsDown = 0x20000001;
 
 std::wstring TextOf(HWND window)
@@ -33,7 +33,7 @@ bool IsCheckBox(HWND window)
     return IsOfClass(window, L"Button") && (GetWindowLongW(window, GWL_STYLE) & BS_TYPEMASK) == BS_AUTOCHECKBOX;
 }
 
-/// What a screen reader says.
+/// The name that a screen reader says.
 std::wstring NameOf(HWND control)
 {
     const HWND label = GetWindow(control, GW_HWNDPREV);
@@ -63,7 +63,7 @@ std::vector<HWND> VisibleControls(HWND dialog)
     return controls;
 }
 
-/// The first with the name that is no label of the next.
+/// The first control with a name. A label counts only when no other control has the name.
 HWND Find(HWND dialog, const std::wstring& name)
 {
     HWND label = nullptr;
@@ -270,7 +270,7 @@ std::vector<std::wstring> DialogWindow::Column(const std::wstring& list, int col
 bool DialogWindow::IsRowChecked(const std::wstring& list, int row) const
 {
     const LRESULT state = SendMessageW(Control(list), LVM_GETITEMSTATE, static_cast<WPARAM>(row), LVIS_STATEIMAGEMASK);
-    return state >> 12 == 2;
+    return state == INDEXTOSTATEIMAGEMASK(2);
 }
 
 bool DialogWindow::IsRowInView(const std::wstring& list, int row) const
@@ -299,7 +299,7 @@ void DialogWindow::SelectRow(const std::wstring& list, int row) const
     {
         Press(VK_DOWN);
     }
-    // Home and Down leave a list alone whose focus is there already.
+    // If the row has the focus already, the keys do not select it.
     SetRowState(list, row, LVIS_SELECTED | LVIS_FOCUSED, true);
 }
 

@@ -5,23 +5,23 @@
 #include <string>
 #include <vector>
 
-/// A dialog of this process as its user handles it: by keyboard and mouse messages. Controls are named by what a person
-/// sees, and a screen reader says: a button by its text, any other control by the label before it, both without the
-/// mark of the access key. What is not there throws std::runtime_error.
+/// A dialog of this process, operated as a user does, by keyboard and mouse messages. The name of a control is what a
+/// screen reader says: the text of a button, the label before any other control, without the mark of the access key.
+/// Throws std::runtime_error when there is no such control.
 class DialogWindow
 {
 public:
-    /// `settle` returns when the dialog has handled every message posted before.
+    /// `settle` returns when the dialog has handled every message that was posted before.
     DialogWindow(HWND window, void (*settle)(HWND)) : m_window(window), m_settle(settle) {}
 
     HWND Handle() const { return m_window; }
     bool IsOpen() const { return IsWindow(m_window) != FALSE; }
 
-    /// Keys go to the control that has the focus.
+    /// Presses a key. Keys go to the control with the focus.
     void Press(WORD key) const;
     void Type(const std::wstring& text) const;
     void PressAlt(wchar_t accessKey) const;
-    /// Opens the drop-down list that has the focus.
+    /// Opens the drop-down list with the focus.
     void PressAltDown() const;
     std::wstring Focused() const;
     void Focus(const std::wstring& name) const;
@@ -29,7 +29,7 @@ public:
     /// Clicks a button.
     void Click(const std::wstring& name) const;
 
-    /// Clicks the cross in the corner.
+    /// Clicks the close button of the title bar.
     void Close() const;
 
     /// A visible control, by name.
@@ -38,7 +38,7 @@ public:
     bool IsEnabled(const std::wstring& name) const { return IsWindowEnabled(Control(name)) != FALSE; }
     bool IsChecked(const std::wstring& name) const;
 
-    /// The visible buttons, check boxes left out, from left to right.
+    /// The visible buttons except check boxes, from left to right.
     std::vector<std::wstring> Buttons() const;
 
     /// The visible controls that take the focus, in tab order; one without a name is "".
@@ -46,28 +46,29 @@ public:
 
     std::wstring Text(const std::wstring& name) const;
 
-    /// Opens a drop-down list by the keyboard and chooses an item; its items, and the one that it shows.
+    /// Opens a drop-down list by keyboard and chooses an item.
     void Choose(const std::wstring& name, const std::wstring& item) const;
     std::vector<std::wstring> Items(const std::wstring& name) const;
     std::wstring Chosen(const std::wstring& name) const;
 
-    /// The place of a control inside the dialog.
+    /// The rectangle of a control, relative to the inside of the dialog.
     RECT Place(const std::wstring& name) const;
 
-    /// The rows of a list, as they are shown.
+    /// The rows of a list, in the order in which they are shown.
     int NumRows(const std::wstring& list) const;
     std::wstring Cell(const std::wstring& list, int row, int column) const;
     std::vector<std::wstring> Column(const std::wstring& list, int column) const;
     bool IsRowChecked(const std::wstring& list, int row) const;
     bool IsRowInView(const std::wstring& list, int row) const;
+    /// For each row, whether it is checked.
     std::vector<bool> CheckedRows(const std::wstring& list) const;
     void SelectRow(const std::wstring& list, int row) const;
     void SelectEveryRow(const std::wstring& list) const;
     void UnselectRow(const std::wstring& list, int row) const;
-    /// Moves the focus to a row and leaves the selection, as Ctrl and an arrow key do.
+    /// Moves the focus to a row without selecting it, as Ctrl and an arrow key do.
     void FocusRow(const std::wstring& list, int row) const;
     void ClickHeading(const std::wstring& list, int column) const;
-    /// Opens a control's menu by the keyboard and chooses the item with this number, from 1.
+    /// Opens the context menu of a control by keyboard and chooses an item; the first is 1.
     void ChooseFromMenu(const std::wstring& name, int item) const;
     void ClickCheckBox(const std::wstring& list, int row) const;
 

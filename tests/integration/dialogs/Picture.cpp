@@ -6,7 +6,7 @@
 #include <objidl.h>
 #include <propidl.h>
 
-// The headers of GDI+ use these two, as macros of Windows or from here.
+// The headers of GDI+ use min and max without a namespace.
 namespace Gdiplus
 {
 
@@ -19,7 +19,7 @@ using std::min; // NOLINT(misc-unused-using-decls)
 namespace
 {
 
-/// GDI+ for as long as it lives.
+/// Starts GDI+ and shuts it down at the end.
 class Session
 {
 public:

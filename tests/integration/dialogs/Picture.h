@@ -4,5 +4,5 @@
 
 #include <filesystem>
 
-/// Saves what a window shows on the screen as a PNG file; throws std::runtime_error where that fails.
+/// Saves the picture of a window on the screen as a PNG file. Throws std::runtime_error when that fails.
 void SavePicture(HWND window, const std::filesystem::path& file);

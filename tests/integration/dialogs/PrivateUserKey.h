@@ -6,7 +6,7 @@
 
 #include <string>
 
-/// Lets this process see an empty HKEY_CURRENT_USER of its own for the object's lifetime.
+/// While it exists, HKEY_CURRENT_USER is an empty key for this process.
 class PrivateUserKey
 {
 public:

@@ -17,7 +17,7 @@ using Clock = std::chrono::steady_clock;
 constexpr std::chrono::seconds Patience{20};
 constexpr UINT MarkMessage = WM_APP;
 
-/// A window of the dialog's thread that says when the messages posted before have had their turn.
+/// A window of the dialog's thread. Its message arrives when the messages that were posted before are handled.
 struct MarkWindow
 {
     HWND window = nullptr;
@@ -51,7 +51,7 @@ void MakeMarkWindow()
 
 void Settle(HWND dialog)
 {
-    // The second time for the messages that the first ones posted in their turn, a key's character say.
+    // Twice, since handling a message may post another one, such as the character of a key.
     for (int i = 0; i < 2 && IsWindow(dialog); ++i)
     {
         ResetEvent(Mark().reached.Get());
@@ -98,7 +98,7 @@ std::optional<DialogWindow> Await(DWORD thread, const std::wstring& title)
 void Handle(DWORD thread, const std::wstring& title, const std::function<void(const DialogWindow&)>& handle)
 {
     const auto dialog = Await(thread, title);
-    ASSERT_TRUE(dialog) << "no dialog came up";
+    ASSERT_TRUE(dialog) << "no dialog appears";
     try
     {
         handle(*dialog);
@@ -109,7 +109,7 @@ void Handle(DWORD thread, const std::wstring& title, const std::function<void(co
     }
     if (dialog->IsOpen())
     {
-        ADD_FAILURE() << "the dialog stays open";
+        ADD_FAILURE() << "the dialog is still open";
         PostMessageW(dialog->Handle(), WM_COMMAND, IDCANCEL, 0);
     }
 }

@@ -6,9 +6,9 @@
 #include <string>
 #include <thread>
 
-/// Somebody at the screen, on a thread of their own: waits for the dialog with a title, which the constructing thread
-/// is about to show, and handles it. A dialog that does not come, one that stays open, and an exception of the handling
-/// fail the test; the dialog is closed then. The destructor waits for the end.
+/// A user at the screen, on a thread of its own. It waits for the dialog with a title, which the constructing thread
+/// shows next, and calls `handle` with it. The test fails when no dialog appears, when the dialog is still open after
+/// `handle`, and when `handle` throws; the dialog is then closed. The destructor waits for the thread.
 class User
 {
 public:

@@ -122,7 +122,7 @@ TEST_F(FileListDialog, IsHighEnoughForItsMessage)
     EXPECT_EQ(ten.list, one.list);
     EXPECT_EQ(twenty.list, one.list);
     EXPECT_EQ(heightsWith(lines(1)).window, one.window) << "the room for a message is not remembered";
-    EXPECT_EQ(heightsWith(lines(500)).list, one.list) << "and a message has no more than the monitor";
+    EXPECT_EQ(heightsWith(lines(500)).list, one.list) << "a message gets no more room than the monitor has";
 }
 
 TEST_F(FileListDialog, KeepsItsHeightAfterAMessageForWhichTheMonitorHasNoRoom)
@@ -232,7 +232,7 @@ TEST_F(FileListDialog, ClearsTheSelectedRowsTogether)
         dialog.SelectEveryRow(List);
         dialog.FocusRow(List, 1);
         dialog.Press(VK_SPACE);
-        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false, false, false})) << "as the one with the focus";
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false, false, false})) << "as the row with the focus";
         Cancel(dialog);
     });
 }
@@ -258,7 +258,7 @@ public:
     StateChanges& operator=(const StateChanges&) = delete;
     ~StateChanges() { UnhookWinEvent(m_hook); }
 
-    /// The children of a window's client area that changed since the last call.
+    /// The children of a window's client area whose changes were reported since the last call.
     static std::vector<LONG> Of(HWND window)
     {
         std::vector<LONG> children;
@@ -310,7 +310,7 @@ TEST_F(FileListDialog, TellsScreenReadersOfChangedCheckBoxes)
     });
 }
 
-TEST_F(FileListDialog, LetsTheKeyboardGoOnFromTheSameRowAfterSortingAndFiltering)
+TEST_F(FileListDialog, KeepsTheFocusOnTheRowAfterSortingAndFiltering)
 {
     AddFile(L"b");
     AddFile(L"a");
@@ -453,7 +453,7 @@ TEST_F(FileListDialog, IsSortedByKeysThroughItsMenu)
     });
 }
 
-TEST_F(FileListDialog, TakesTheCommentAndOffersItAgain)
+TEST_F(FileListDialog, StoresTheCommentAndOffersItAgain)
 {
     AddFile(L"a");
     for (const wchar_t* comment : {L"first", L"second", L"first"})
@@ -513,7 +513,7 @@ TEST_F(FileListDialog, LeavesTheTypedCommentAloneUntilARecentOneIsChosenInTheOpe
     EXPECT_STREQ(m_params.GetComment(), L"typed");
 }
 
-TEST_F(FileListDialog, TakesARecentCommentOfAnyLength)
+TEST_F(FileListDialog, StoresARecentCommentOfAnyLength)
 {
     AddFile(L"a");
     std::wstring longComment;
@@ -541,7 +541,7 @@ TEST_F(FileListDialog, IgnoresRecentCommentsThatCannotBeRead)
         EXPECT_FALSE(dialog.IsEnabled(L"Recent comments:"));
         Cancel(dialog);
     });
-    // No null at the end.
+    // Without a terminator.
     RegSetKeyValueW(HKEY_CURRENT_USER, Key, L"RecentComments", REG_MULTI_SZ, L"abc", 6);
     ShowFileList([](const DialogWindow& dialog) {
         EXPECT_EQ(dialog.Items(L"Recent comments:"), (Texts{L"abc"}));
@@ -657,8 +657,8 @@ TEST_F(FileListDialog, DecidesWhatAnOperationWorksOn)
     EXPECT_EQ(m_services->GetPromptAction(OptionPrompt), OrvixPromptAction::OptionChecked);
 }
 
-/// Counts the changes of a row's state after which the list has something to draw. When many rows change, the list must
-/// have something to draw after the last change only: otherwise it is drawn anew for each.
+/// Counts the changes of a row's state after which the list has something to draw. When many rows change, that is to
+/// be so only after the last change: otherwise the list is drawn again for each row.
 class DrawnChanges
 {
 public:
@@ -674,7 +674,7 @@ public:
     ~DrawnChanges()
     {
         Install(m_procedure);
-        SendMessageW(m_list, WM_NULL, 0, 0); // the window's thread has left Watch
+        SendMessageW(m_list, WM_NULL, 0, 0); // afterwards the window's thread is not in Watch
     }
 
     int Number() const { return m_number; }
@@ -700,7 +700,7 @@ private:
     std::atomic<int> m_number = 0;
 };
 
-TEST_F(FileListDialog, IsNotDrawnAnewForEachSelectedRowThatIsSortedOrFiltered)
+TEST_F(FileListDialog, IsDrawnOnceWhenManySelectedRowsAreSortedOrFiltered)
 {
     for (int i = 0; i < 1000; ++i)
     {
