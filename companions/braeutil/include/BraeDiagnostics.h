@@ -4,22 +4,22 @@
 
 struct HINSTANCE__;
 
-/// What only the development build of braeutil offers: a look at its heap and a way to exhaust it.
-/// For tests; not thread-safe.
+/// What only the development build of braeutil has: numbers about its heap, and a way to make it fail. For tests. Not
+/// thread-safe; no function throws.
 namespace BraeDiagnostics
 {
 
-/// Blocks allocated by `BraeHeapOperators` and not freed yet.
+/// How many blocks are allocated by `BraeHeapOperators` and not freed yet.
 BRAE_API long LiveBlocks() noexcept;
 
-/// How often a block was handed to `BraeHeapOperators` that it did not allocate or had freed already.
+/// How often `BraeHeapOperators` was to free a block that it did not allocate or that was freed already.
 BRAE_API long ForeignFrees() noexcept;
 
-/// Makes an allocation fail: the next one for 1, the one after it for 2 and so on; with `forGood` all that
-/// follow it as well. 0 ends the failing.
+/// Makes an allocation of `BraeHeapOperators` fail: the next one when `countdown` is 1, the one after it when it is 2,
+/// and so on. With `forGood` all allocations after that fail as well. 0 ends the failures.
 BRAE_API void FailAllocation(long countdown, bool forGood) noexcept;
 
-/// The module last given to `BraeSDK::Util::UseLanguagePackLocale`; null before.
+/// The module that was last given to `BraeSDK::Util::UseLanguagePackLocale`; null before.
 BRAE_API HINSTANCE__* LanguagePackModule() noexcept;
 
 } // namespace BraeDiagnostics

@@ -1,6 +1,6 @@
 #pragma once
 
-/// Marks what braeutil.dll exports. The utility library defines BRAEUTIL_BUILD; everybody else imports.
+/// Marks what braeutil exports. BRAEUTIL_BUILD is defined only while braeutil itself is built.
 #if defined(BRAEUTIL_BUILD)
 #define BRAE_API __declspec(dllexport)
 #else

@@ -4,17 +4,20 @@
 
 #include <cstddef>
 
-/// Base class whose objects, and arrays of objects, live on the host's heap whichever module makes or
-/// deletes them. The operators give null when the heap is exhausted; null is deleted harmlessly.
+/// Base class whose objects, and arrays of objects, live on the host's heap, whichever module makes or deletes them.
+/// No function throws.
 class BRAE_API BraeHeapOperators
 {
 public:
-    /// Storage of `size` bytes for an object; null when the heap is exhausted.
+    /// A block of `size` bytes for an object; null when the heap is exhausted, so that `new` gives null as well.
     static void* operator new(std::size_t size) noexcept;
-    /// Storage of `size` bytes for an array; null when the heap is exhausted.
+
+    /// The same for an array.
     static void* operator new[](std::size_t size) noexcept;
-    /// Frees the storage of an object; null does nothing.
+
+    /// Frees the block of an object. Null is ignored.
     static void operator delete(void* block) noexcept;
-    /// Frees the storage of an array; null does nothing.
+
+    /// Frees the block of an array. Null is ignored.
     static void operator delete[](void* block) noexcept;
 };

@@ -9,7 +9,7 @@
 namespace
 {
 
-/// Stands before every block; 16 bytes, so that the block keeps the heap's alignment.
+/// Precedes every block. It has 16 bytes, so that the block has the alignment of the heap.
 struct BlockHeader
 {
     std::uint64_t mark;
