@@ -20,7 +20,7 @@ inline void SetReadOnly(const std::filesystem::path& file, bool readOnly)
     SetFileAttributesW(file.c_str(), readOnly ? FILE_ATTRIBUTE_READONLY : FILE_ATTRIBUTE_NORMAL);
 }
 
-/// The last-write time that a file has now, to give it back later. It is exact, while std::filesystem rounds.
+/// The last-write time that a file has now, so that it can be set again later. It is exact; std::filesystem rounds.
 class WriteTime
 {
 public:
