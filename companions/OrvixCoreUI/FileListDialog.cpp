@@ -33,8 +33,9 @@ constexpr Layout::Rule FileListRules[] = {{IDC_MESSAGE, Layout::GrowX},
 /// A file's state, as a cell shows it. The disk is not asked: with many files on a network share that takes long.
 std::wstring StateInWords(unsigned long flags)
 {
-    const std::wstring words = FileStateText::InWords(flags, true);
-    return UpperCase(words.substr(0, 1)) + words.substr(1);
+    std::wstring words = FileStateText::InWords(flags, true);
+    words.front() = UpperCase(words.substr(0, 1)).front();
+    return words;
 }
 
 /// Name, folder and state.
