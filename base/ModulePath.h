@@ -4,10 +4,11 @@
 
 #include <string>
 
-/// The full path of a loaded module; of the program for null.
+/// Full path of a loaded module; of the program for null. Empty when the module is not loaded.
 inline std::wstring ModulePath(HMODULE module)
 {
-    std::wstring path(32768, L'\0'); // the longest path of Windows
+    constexpr std::size_t LongestPath = 32768; // characters, with the terminator
+    std::wstring path(LongestPath, L'\0');
     path.resize(GetModuleFileNameW(module, path.data(), static_cast<DWORD>(path.size())));
     return path;
 }

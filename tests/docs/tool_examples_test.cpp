@@ -1,6 +1,6 @@
 // What the guides show of orvix is what it takes and prints.
 
-#include "CommandLine.h"
+#include "CommandLineParser.h"
 #include "Guides.h"
 #include "Text.h"
 #include "ToolError.h"
@@ -64,12 +64,12 @@ std::vector<Call> Calls()
 }
 
 /// The line as the tool understands it. Throws `ToolError` as the tool does.
-std::optional<CommandLine> Parse(const Call& call)
+std::optional<Invocation> Parse(const Call& call)
 {
     int count = 0;
     const std::unique_ptr<LPWSTR, decltype(&LocalFree)> arguments(CommandLineToArgvW(call.line.c_str(), &count),
                                                                   LocalFree);
-    return CommandLine::Parse(count, arguments.get());
+    return ParseCommandLine(count, arguments.get());
 }
 
 /// Whether both have the same members in the same order, and values of the same kinds. Null means any value. Each
@@ -173,13 +173,14 @@ TEST_F(ShownJson, BelowACallHasTheKeysThatItPrints)
 {
     for (const Call& call : Calls())
     {
-        const std::optional<CommandLine> commandLine = Parse(call);
-        if (!commandLine || !commandLine->json || call.output.empty())
+        const std::optional<Invocation> invocation = Parse(call);
+        if (!invocation || !invocation->commandLine.json || call.output.empty())
         {
             continue;
         }
+        const std::wstring& command = invocation->commandLine.command;
         const Json shown = Json::parse(call.output, nullptr, false);
-        ASSERT_TRUE(Printed().contains(commandLine->command)) << call.place;
-        EXPECT_TRUE(HasShapeOf(Printed().at(commandLine->command), shown)) << call.place << '\n' << call.output;
+        ASSERT_TRUE(Printed().contains(command)) << call.place;
+        EXPECT_TRUE(HasShapeOf(Printed().at(command), shown)) << call.place << '\n' << call.output;
     }
 }

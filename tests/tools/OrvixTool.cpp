@@ -25,7 +25,7 @@ UniqueFile NewFile(const std::filesystem::path& path)
     return file;
 }
 
-/// One argument as the C run-time takes it apart again.
+/// An argument as the C run-time reads it from a command line.
 std::wstring Quoted(const std::wstring& argument)
 {
     std::wstring quoted = L"\"";

@@ -2,7 +2,6 @@
 
 #include "UniqueHandle.h"
 
-#include <memory>
 #include <regex>
 #include <stdexcept>
 #include <vector>
@@ -13,29 +12,26 @@ namespace
 constexpr DWORD Milliseconds = 60'000;
 constexpr DWORD PipeSize = 1 << 20; // the console is read when the program has ended
 
-struct CloseConsole
+struct PseudoConsolePolicy
 {
-    using pointer = HPCON;
-    void operator()(HPCON console) const { ClosePseudoConsole(console); }
+    using Handle = HPCON;
+    static Handle None() noexcept { return nullptr; }
+    static void Close(Handle handle) noexcept { ClosePseudoConsole(handle); }
 };
-using UniqueConsole = std::unique_ptr<HPCON, CloseConsole>;
+using UniquePseudoConsole = UniqueHandle<PseudoConsolePolicy>;
 
 struct Pipe
 {
     Pipe()
     {
-        HANDLE readEnd = nullptr;
-        HANDLE writeEnd = nullptr;
-        if (!CreatePipe(&readEnd, &writeEnd, nullptr, PipeSize))
+        if (!CreatePipe(reader.Out(), writer.Out(), nullptr, PipeSize))
         {
             throw std::runtime_error("no pipe");
         }
-        reader.Reset(readEnd);
-        writer.Reset(writeEnd);
     }
 
-    UniqueKernelHandle reader;
-    UniqueKernelHandle writer;
+    UniqueFile reader;
+    UniqueFile writer;
 };
 
 /// A process that is started with a console for its own.
@@ -97,14 +93,13 @@ PseudoConsole::Result PseudoConsole::Run(std::wstring commandLine)
     Pipe input;
     Pipe output;
     {
-        HPCON opened = nullptr;
-        if (FAILED(CreatePseudoConsole({Columns, 100}, input.reader.Get(), output.writer.Get(), 0, &opened)))
+        UniquePseudoConsole console;
+        if (FAILED(CreatePseudoConsole({Columns, 100}, input.reader.Get(), output.writer.Get(), 0, console.Out())))
         {
             throw std::runtime_error("no pseudo console");
         }
-        const UniqueConsole console(opened);
-        output.writer.Reset(); // the console has its own
-        result.code = RunIn(console.get(), commandLine);
+        output.writer.Reset(); // the console has a handle of its own
+        result.code = RunIn(console.Get(), commandLine);
     }
     result.output = ReadAll(output.reader.Get());
     result.text = WithoutSequences(result.output);

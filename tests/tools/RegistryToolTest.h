@@ -2,6 +2,7 @@
 
 #include "RegistryKey.h"
 #include "ToolTest.h"
+#include "UniqueHandle.h"
 
 #include <sddl.h>
 
@@ -9,7 +10,7 @@
 class RegistryToolTest : public ToolTest
 {
 protected:
-    static constexpr const wchar_t* OwnPlace = L"Software\\OrvixCore\\MSSCCI\\";
+    static constexpr const wchar_t* OwnKeys = L"Software\\OrvixCore\\MSSCCI\\";
 
     OrvixTool::Result Register(const std::filesystem::path& library, const std::wstring& name)
     {
@@ -23,7 +24,7 @@ protected:
     /// The path that is registered for a name.
     static std::optional<std::wstring> Path(const std::wstring& name)
     {
-        return TemporaryRegistryKey::Text(OwnPlace + name, L"SCCServerPath");
+        return TemporaryRegistryKey::Text(OwnKeys + name, L"SCCServerPath");
     }
 
     // What everybody may do with a key.
@@ -31,17 +32,15 @@ protected:
     static constexpr const wchar_t* ReadAndDelete = L"D:P(A;;KRSD;;;WD)";
     static constexpr const wchar_t* Nothing = L"D:P(A;;WD;;;WD)";
 
-    /// Sets what everybody may do with a key. A key that cannot be read and deleted would outlive its test.
+    /// Sets what everybody may do with a key. A key that nobody can read and delete would outlive its test.
     static void SetAccess(const std::wstring& path, const wchar_t* access)
     {
-        PSECURITY_DESCRIPTOR descriptor = nullptr;
-        HKEY key = nullptr;
+        UniqueLocalMemory descriptor;
+        UniqueRegistryKey key;
         ASSERT_TRUE(
-            ConvertStringSecurityDescriptorToSecurityDescriptorW(access, SDDL_REVISION_1, &descriptor, nullptr));
-        EXPECT_EQ(RegOpenKeyExW(HKEY_LOCAL_MACHINE, path.c_str(), 0, WRITE_DAC, &key), ERROR_SUCCESS);
-        EXPECT_EQ(RegSetKeySecurity(key, DACL_SECURITY_INFORMATION, descriptor), ERROR_SUCCESS);
-        RegCloseKey(key);
-        LocalFree(descriptor);
+            ConvertStringSecurityDescriptorToSecurityDescriptorW(access, SDDL_REVISION_1, descriptor.Out(), nullptr));
+        EXPECT_EQ(RegOpenKeyExW(HKEY_LOCAL_MACHINE, path.c_str(), 0, WRITE_DAC, key.Out()), ERROR_SUCCESS);
+        EXPECT_EQ(RegSetKeySecurity(key.Get(), DACL_SECURITY_INFORMATION, descriptor.Get()), ERROR_SUCCESS);
     }
 
     TemporaryRegistryKey& List() { return m_list; }

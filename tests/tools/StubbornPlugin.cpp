@@ -1,8 +1,9 @@
-// A provider that answers success to everything and changes nothing: what a host must not believe.
+// A provider that reports success for every operation on files and changes nothing, so that a host must not trust it.
 
-#include "FakeProvider.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
+#include "OrvixProviderBase.h"
 #include "OrvixVersion.h"
 
 #include <cstdint>
@@ -11,16 +12,27 @@
 namespace
 {
 
-class StubbornProvider final : public FakeProvider
+using OrvixProviderResult::Failure;
+using OrvixProviderResult::Success;
+
+constexpr const wchar_t* Name = L"Stubborn";
+
+class StubbornProvider final : public OrvixProviderBase
 {
 public:
-    StubbornProvider() : FakeProvider(L"Stubborn") {}
+    const wchar_t* GetName() override { return Name; }
+    bool IsInitialized() override { return false; }
+    bool IsProjectOpen() override { return false; }
+    int Initialize(OrvixClientInfo*) override { return Success; }
+    int Uninitialize() override { return Success; }
+    int OpenProject(const wchar_t*, const wchar_t*) override { return Success; }
+    int CloseProject() override { return Success; }
+    int Add(OrvixFileList*, const wchar_t*, unsigned long) override { return Success; }
+    int ShowOptions() override { return Failure; }
+    int RunProviderClient() override { return Failure; }
 
-    int Initialize(OrvixClientInfo*) override { return 0; }
-    int OpenProject(const wchar_t*, const wchar_t*) override { return 0; }
-    int Add(OrvixFileList*, const wchar_t*, unsigned long) override { return 0; }
-
-    /// Every file may be added; the state of one that is called "riddle" is not told.
+    /// No file is controlled. Each may be added, except one with "reserved" in its path. The query fails for a file
+    /// with "riddle" in its path.
     int QueryStatus(OrvixFileList* list, unsigned long) override
     {
         for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
@@ -28,11 +40,12 @@ public:
             OrvixFileEntry* entry = list->GetActiveFileEntry(i);
             if (std::wcsstr(entry->GetFile(), L"riddle") != nullptr)
             {
-                return -1;
+                return Failure;
             }
-            entry->SetFlagsOut(0x1 | 0x100000);
+            const bool reserved = std::wcsstr(entry->GetFile(), L"reserved") != nullptr;
+            entry->SetFlagsOut(OrvixFileState::NotControlled | (reserved ? 0 : OrvixFilePermission::Add));
         }
-        return 0;
+        return Success;
     }
 };
 
@@ -56,6 +69,6 @@ __declspec(dllexport) void ReleaseIOrvixProvider(IOrvixProvider*)
 
 __declspec(dllexport) const wchar_t* GetOrvixProviderName()
 {
-    return L"Stubborn";
+    return Name;
 }
 } // extern "C"

@@ -20,7 +20,7 @@ protected:
     static constexpr unsigned long Success = 0;
     static constexpr unsigned long Failed = 1;
     static constexpr unsigned long BadUsage = 2;
-    static constexpr unsigned long NoProject = 3;
+    static constexpr unsigned long NotFound = 3;
 
     void SetUp() override { std::filesystem::create_directories(Project()); }
 

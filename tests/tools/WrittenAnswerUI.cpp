@@ -1,10 +1,13 @@
-// An OrvixCoreUI.dll whose file-list dialog is answered by the environment variable ORVIX_TEST_ANSWER, which holds some
-// of these words: "yes" confirms, "untick" unticks the first file, "keep" ticks the option, "remember" remembers.
+// An OrvixCoreUI.dll whose file-list dialog is answered by the environment variable ORVIX_TEST_ANSWER. It holds some of
+// these words: "yes" confirms, "clear" clears the first file, "keep" checks the option, "remember" stores the answers.
 
 #include "IOrvixCoreUI.h"
+#include "OrvixDialogOption.h"
 #include "OrvixFileEntry.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixPrompt.h"
 
 #include <windows.h>
 
@@ -17,8 +20,8 @@ class WrittenAnswerUI final : public IOrvixCoreUI
 {
 public:
     void SetClientAccess(IOrvixCoreUIClientAccess*) override {}
-    std::int32_t ShowPrompt(void*, void*, void*, std::uint32_t, bool*) override { return 0; }
-    std::int32_t EditPrompts(void*, void*, OrvixPromptTable*) override { return 0; }
+    std::int32_t ShowPrompt(void*, void*, void*, std::uint32_t, bool*) override { return OrvixPromptAnswer::No; }
+    std::int32_t EditPrompts(void*, void*, OrvixPromptTable*) override { return OrvixPromptEditorResult::Unchanged; }
 
     std::int32_t ShowFileListDialog(void*, OrvixFileListDialogParams* params) override
     {
@@ -31,11 +34,13 @@ public:
         for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
         {
             OrvixFileEntry* entry = list->GetActiveFileEntry(i);
-            const bool ticked = i > 0 || !says(L"untick");
-            entry->SetFlagsOut(ticked ? entry->GetFlagsOut() | 0x2UL : entry->GetFlagsOut() & ~0x2UL);
+            const bool isChecked = i > 0 || !says(L"clear");
+            entry->SetFlagsOut(isChecked ? entry->GetFlagsOut() | OrvixFileSelection::Confirmed
+                                         : entry->GetFlagsOut() & ~OrvixFileSelection::Confirmed);
         }
-        params->SetOptions(params->GetOptions() | (says(L"keep") ? 0x10U : 0U) | (says(L"remember") ? 0x80U : 0U));
-        return says(L"yes") ? 1 : 0;
+        params->SetOptions(params->GetOptions() | (says(L"keep") ? OrvixDialogOption::OptionChecked : 0U) |
+                           (says(L"remember") ? OrvixDialogOption::RememberChecked : 0U));
+        return says(L"yes") ? OrvixDialogResult::Confirmed : OrvixDialogResult::Cancelled;
     }
 };
 

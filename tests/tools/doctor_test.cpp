@@ -762,7 +762,8 @@ TEST_F(DoctorOnSettings, SayWhichElementSwitchesAProviderOff)
     for (const auto& [location, element] : {std::pair{"good.dll", "1 (\"depot\")"}, {"value", "2 (\"Record\")"}})
     {
         const Json candidate = Candidate(report, location);
-        EXPECT_EQ(CodesOf(candidate), Codes{"switched-off"}) << "deliberate, and nothing of the library is looked at";
+        EXPECT_EQ(CodesOf(candidate), Codes{"switched-off"})
+            << "a note: the administrator wants it, and the library is not examined";
         EXPECT_EQ(TextOf(candidate, "switched-off"),
                   std::string("provider element ") + element + " of OrvixProviders.xml switches it off");
     }
@@ -855,7 +856,7 @@ TEST_F(DoctorOnSettings, SayWhyAWholeFileCountsAsEmpty)
     EXPECT_EQ(CodesOf(Place(Report(), "settings file")), Codes{"!malformed"});
     WriteBytes(file, "<?xml version=\"1.0\"?><Providers><a><Name>x</Name></a></Providers>");
     EXPECT_EQ(TextOf(Place(Report(), "settings file"), "no-root"),
-              "the root element is \"Providers\", not \"OrvixProviders\", so nothing of it is read");
+              "the root element is \"Providers\", not \"OrvixProviders\", so nothing in the file is read");
     WriteBytes(file, "<?xml version=\"1.0\"?><!DOCTYPE OrvixProviders [<!ENTITY e 'x'>]>"
                      "<OrvixProviders><a><Name>&e;</Name></a></OrvixProviders>");
     EXPECT_EQ(CodesOf(Place(Report(), "settings file")), Codes{"!entities"});

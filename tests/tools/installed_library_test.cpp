@@ -56,7 +56,7 @@ TEST_F(InstalledLibrary, NeedsNoPluginFolder)
     const auto result = RunInstalled({L"providers", L"--plugins", L"nowhere"});
     EXPECT_EQ(result.code, Success);
     EXPECT_EQ(result.output, "Index  Provider\n0      Talking\n");
-    EXPECT_EQ(Run({L"providers", L"--plugins", L"nowhere", L"--sources", L"plugins,msscci"}).code, NoProject);
+    EXPECT_EQ(Run({L"providers", L"--plugins", L"nowhere", L"--sources", L"plugins,msscci"}).code, NotFound);
 }
 
 TEST_F(InstalledLibrary, OpensAndClosesAProject)
@@ -96,6 +96,6 @@ TEST_F(InstalledLibrary, ThatIsGoneIsListedButDoesNotStart)
     std::filesystem::remove(copy);
     EXPECT_THAT(Providers().output, HasSubstr("Talking"));
     const auto result = RunInstalled({L"open"});
-    EXPECT_EQ(result.code, NoProject);
+    EXPECT_EQ(result.code, NotFound);
     EXPECT_EQ(result.errors, "orvix: the provider does not start: Talking\n");
 }

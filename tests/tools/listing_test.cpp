@@ -1,4 +1,4 @@
-// orvix filters, and the JSON of every command that lists something.
+// orvix filters, and the JSON output of every command that lists something.
 
 #include "ToolTest.h"
 
@@ -136,7 +136,7 @@ TEST_F(ListingTool, FiltersOfABrokenFileFailsAndNamesTheFile)
 
 TEST_F(ListingTool, FiltersOfNobodyIsAnError)
 {
-    EXPECT_EQ(Run({L"filters", L"a.tmp", L"--provider", L"Nobody"}).code, NoProject);
+    EXPECT_EQ(Run({L"filters", L"a.tmp", L"--provider", L"Nobody"}).code, NotFound);
     EXPECT_EQ(Run({L"filters"}).code, BadUsage);
 }
 
@@ -150,20 +150,21 @@ TEST_F(ListingTool, ProvidersAsJson)
 TEST_F(ListingTool, StatusAsJson)
 {
     Write(L"a.txt", "x");
-    EXPECT_EQ(Json({L"status", L"a.txt", L"nowhere.txt"}, Failed),
-              json({{"files",
-                     {{{"state", "not controlled"}, {"file", "a.txt"}},
-                      {{"state", "no such file"}, {"file", "nowhere.txt"}}}},
-                    {"summary",
-                     {{"files", 2},
-                      {"notTicked", 0},
-                      {"refused", 1},
-                      {"cancelled", 0},
-                      {"failed", 0},
-                      {"leftOutForState", 0},
-                      {"leftOutByFilters", 0},
-                      {"hiddenFolders", 0}}},
-                    {"lines", json::array()}}));
+    EXPECT_EQ(
+        Json({L"status", L"a.txt", L"nowhere.txt"}, Failed),
+        json({{"files",
+               {{{"state", {"not-controlled"}}, {"stateText", "not controlled"}, {"file", "a.txt"}},
+                {{"state", {"not-controlled", "missing"}}, {"stateText", "no such file"}, {"file", "nowhere.txt"}}}},
+              {"summary",
+               {{"files", 2},
+                {"notTicked", 0},
+                {"refused", 1},
+                {"cancelled", 0},
+                {"failed", 0},
+                {"leftOutForState", 0},
+                {"leftOutByFilters", 0},
+                {"hiddenFolders", 0}}},
+              {"lines", json::array()}}));
 }
 
 TEST_F(ListingTool, AnOperationAsJson)
@@ -171,11 +172,22 @@ TEST_F(ListingTool, AnOperationAsJson)
     Write(L"\u00E4.txt", "x");
     std::filesystem::create_directories(File(L".git"));
     const json added = Json({L"add", L"."});
-    EXPECT_EQ(added["files"], json::array({{{"result", "done"}, {"state", "checked in"}, {"file", "\u00E4.txt"}}}));
+    EXPECT_EQ(
+        added["files"],
+        json::array(
+            {{{"result", "done"}, {"state", {"checked-in"}}, {"stateText", "checked in"}, {"file", "\u00E4.txt"}}}));
     EXPECT_EQ(added["summary"]["files"], 1);
     EXPECT_EQ(added["summary"]["done"], 1);
     EXPECT_EQ(added["summary"]["hiddenFolders"], 1);
     EXPECT_EQ(Json({L"add", L"\u00E4.txt"}, Failed)["files"][0]["result"], "refused");
+}
+
+TEST_F(ListingTool, ANamedFileThatAFilterExcludesHasAStateOfItsOwnInJson)
+{
+    Filters(Filter("Archive", "<Name>scratch</Name><FileType>tmp</FileType>"));
+    const json excluded = Json({L"status", L"a.tmp"}, Failed)["files"][0];
+    EXPECT_EQ(excluded["state"], json::array({"excluded"}));
+    EXPECT_EQ(excluded["stateText"], "excluded by filter scratch");
 }
 
 TEST_F(ListingTool, NotificationsAreLinesOfTheJson)
@@ -199,7 +211,7 @@ TEST_F(ListingTool, HistoryIsLinesOfTheJson)
 TEST_F(ListingTool, AnErrorPrintsNoJson)
 {
     const auto result = Run({L"status", L"a.txt", L"--provider", L"Nobody", L"--json"});
-    EXPECT_EQ(result.code, NoProject);
+    EXPECT_EQ(result.code, NotFound);
     EXPECT_EQ(result.output, "");
 }
 

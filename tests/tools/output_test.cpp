@@ -1,10 +1,15 @@
-// How the tool lays out its results, without a process.
+// What the tool prints, tested without a process.
 
 #include "JsonOutput.h"
+#include "NotificationText.h"
+#include "OrvixNotificationID.h"
+#include "OrvixPrompt.h"
 #include "PromptAnswer.h"
 #include "TextOutput.h"
 
 #include <gmock/gmock.h>
+
+#include <nlohmann/json.hpp>
 
 #include <sstream>
 
@@ -120,10 +125,10 @@ TEST(TextOutput, ProgressIsOneLineThatTheNextOutputTakesAway)
     output.Progress(L"12345");
     EXPECT_EQ(stream.str(), "\r12345    \r");
     stream.str("");
-    output.Say(L"hello");
+    output.Print(L"hello");
     EXPECT_EQ(stream.str(), "\r         \rhello\n");
     stream.str("");
-    output.Say(L"again");
+    output.Print(L"again");
     EXPECT_EQ(stream.str(), "again\n");
     output.Progress(L"longer than the terminal");
     EXPECT_THAT(stream.str(), HasSubstr("\rlong\xE2\x80\xA6inal\r"));
@@ -141,8 +146,21 @@ TEST(TextOutput, WithoutATerminalThereIsNoProgress)
     std::ostringstream stream;
     TextOutput output(stream, {});
     output.Progress(L"12345");
-    output.Say(L"hello");
+    output.Print(L"hello");
     EXPECT_EQ(stream.str(), "hello\n");
+}
+
+TEST(JsonOutput, AStateIsAnArrayOfWordsWithATextBesideIt)
+{
+    Listing listing = Files({});
+    listing.rows = {{{Listing::State{{"checked-out", "modified"}, L"checked out, modified"}}, {std::wstring(L"a")}}};
+    std::ostringstream stream;
+    JsonOutput(stream).Show(listing);
+    EXPECT_EQ(nlohmann::json::parse(stream.str())["files"],
+              nlohmann::json::parse(
+                  R"([{"state": ["checked-out", "modified"], "stateText": "checked out, modified", "file": "a"}])"));
+    EXPECT_EQ(Shown(listing), "State                  File\n"
+                              "checked out, modified  a\n");
 }
 
 TEST(JsonOutput, TextsStayWholeAndBecomeUnicode)
@@ -150,7 +168,7 @@ TEST(JsonOutput, TextsStayWholeAndBecomeUnicode)
     std::ostringstream stream;
     JsonOutput output(stream);
     output.Progress(L"12345");
-    output.Say(L"first\nsecond");
+    output.Print(L"first\nsecond");
     output.Show(Files({L"a\"b\\\u00E4\x1b\xD800"}));
     EXPECT_THAT(stream.str(), HasSubstr("\"a\\\"b\\\\\u00E4\\u001b\xEF\xBF\xBD\""));
     EXPECT_THAT(stream.str(), HasSubstr("\"first\\nsecond\""));
@@ -158,12 +176,13 @@ TEST(JsonOutput, TextsStayWholeAndBecomeUnicode)
 
 TEST(PromptAnswer, AnActionReadsAsTheLibraryTakesIt)
 {
-    EXPECT_EQ(PromptAnswer::InWords(0x1), L"ask");
-    EXPECT_EQ(PromptAnswer::InWords(0x1 | 0x2), L"ask");
-    EXPECT_EQ(PromptAnswer::InWords(0x2 | 0x4 | 0x8), L"yes");
-    EXPECT_EQ(PromptAnswer::InWords(0x4), L"no");
-    EXPECT_EQ(PromptAnswer::InWords(0x8 | 0x10), L"yes-to-all");
-    EXPECT_EQ(PromptAnswer::InWords(0x10), L"no-to-all");
+    namespace Action = OrvixPromptAction;
+    EXPECT_EQ(PromptAnswer::InWords(Action::Ask), L"ask");
+    EXPECT_EQ(PromptAnswer::InWords(Action::Ask | Action::Yes), L"ask");
+    EXPECT_EQ(PromptAnswer::InWords(Action::Yes | Action::No | Action::YesToAll), L"yes");
+    EXPECT_EQ(PromptAnswer::InWords(Action::No), L"no");
+    EXPECT_EQ(PromptAnswer::InWords(Action::YesToAll | Action::NoToAll), L"yes-to-all");
+    EXPECT_EQ(PromptAnswer::InWords(Action::NoToAll), L"no-to-all");
     EXPECT_EQ(PromptAnswer::InWords(0), L"no");
 }
 
@@ -180,18 +199,51 @@ TEST(PromptAnswer, WordsAndActionsGoBothWays)
 
 TEST(PromptAnswer, OptionsNameTheAnswersThatTheyOffer)
 {
+    namespace Option = OrvixPromptOption;
     EXPECT_EQ(PromptAnswer::OptionsInWords(0), L"yes, no");
-    EXPECT_EQ(PromptAnswer::OptionsInWords(0x1), L"yes");
-    EXPECT_EQ(PromptAnswer::OptionsInWords(0x1 | 0x2 | 0x4), L"yes");
-    EXPECT_EQ(PromptAnswer::OptionsInWords(0x2), L"yes, no, yes-to-all");
-    EXPECT_EQ(PromptAnswer::OptionsInWords(0x4), L"yes, no, no-to-all");
-    EXPECT_EQ(PromptAnswer::OptionsInWords(0x100), L"yes, no, can stop asking");
+    EXPECT_EQ(PromptAnswer::OptionsInWords(Option::OnlyOK), L"yes");
+    EXPECT_EQ(PromptAnswer::OptionsInWords(Option::OnlyOK | Option::OfferYesToAll | Option::OfferNoToAll), L"yes");
+    EXPECT_EQ(PromptAnswer::OptionsInWords(Option::OfferYesToAll), L"yes, no, yes-to-all");
+    EXPECT_EQ(PromptAnswer::OptionsInWords(Option::OfferNoToAll), L"yes, no, no-to-all");
+    EXPECT_EQ(PromptAnswer::OptionsInWords(Option::OfferStopAsking), L"yes, no, can stop asking");
 }
 
 TEST(PromptAnswer, AskingIsOfferedByEveryOptions)
 {
     for (std::uint32_t options = 0; options < 8; ++options)
     {
-        EXPECT_TRUE(PromptAnswer::IsOffered(options, 0x1));
+        EXPECT_TRUE(PromptAnswer::IsOffered(options, OrvixPromptAction::Ask));
+    }
+}
+
+TEST(NotificationText, HasWordsForEveryNotificationOfTheLibrary)
+{
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::BeforeCheckIn), "before check-in");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::AfterCheckIn), "after check-in");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::BeforeCheckOut), "before check-out");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::AfterCheckOut), "after check-out");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::BeforeUndoCheckOut), "before undo check-out");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::AfterUndoCheckOut), "after undo check-out");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::BeforeAdd), "before add");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::AfterAdd), "after add");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::BeforeGetLatest), "before get latest");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::AfterGetLatest), "after get latest");
+    EXPECT_STREQ(NotificationText::InWords(OrvixNotificationID::FilesConfirmed), "files confirmed");
+    EXPECT_STREQ(NotificationText::InWords(1000), "unknown");
+}
+
+TEST(NotificationText, KnowsWhichNotificationsComeBeforeAnOperation)
+{
+    for (const std::uint32_t id : {OrvixNotificationID::BeforeCheckIn, OrvixNotificationID::BeforeCheckOut,
+                                   OrvixNotificationID::BeforeUndoCheckOut, OrvixNotificationID::BeforeAdd,
+                                   OrvixNotificationID::BeforeGetLatest})
+    {
+        EXPECT_TRUE(NotificationText::IsBeforeOperation(id)) << id;
+    }
+    for (const std::uint32_t id : {OrvixNotificationID::AfterCheckIn, OrvixNotificationID::AfterCheckOut,
+                                   OrvixNotificationID::AfterUndoCheckOut, OrvixNotificationID::AfterAdd,
+                                   OrvixNotificationID::AfterGetLatest, OrvixNotificationID::FilesConfirmed, 1000U})
+    {
+        EXPECT_FALSE(NotificationText::IsBeforeOperation(id)) << id;
     }
 }

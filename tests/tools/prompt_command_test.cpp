@@ -102,7 +102,7 @@ TEST_F(PromptsTool, ListOfAFolderWithoutAFileIsEmpty)
 
 TEST_F(PromptsTool, AFolderThatIsNotThereIsNotMade)
 {
-    EXPECT_EQ(Prompts({L"list"}).code, NoProject);
+    EXPECT_EQ(Prompts({L"list"}).code, NotFound);
     EXPECT_FALSE(std::filesystem::exists(Config()));
 }
 
@@ -125,7 +125,7 @@ TEST_F(PromptsTool, TheLibraryReadsWhatSetStored)
     Write(L"a.txt", "x");
     ASSERT_EQ(Run({L"add", L"a.txt"}).code, Success);
     ASSERT_EQ(Run({L"checkout", L"a.txt"}).code, Success);
-    ASSERT_EQ(Prompts({L"set", L"1330796549", L"no"}).code, NoProject);
+    ASSERT_EQ(Prompts({L"set", L"1330796549", L"no"}).code, NotFound);
     ASSERT_EQ(Run({L"undo", L"a.txt"}).code, Success);
     ASSERT_EQ(Prompts({L"set", L"1330796549", L"no"}).code, Success);
     ASSERT_EQ(Prompts({L"lock", L"1330796549"}).code, Success);
@@ -205,7 +205,7 @@ TEST_F(PromptsTool, TheAnswerToKeepFilesCheckedOutCanBeSet)
 TEST_F(PromptsTool, WhatIsNoPromptOrNoAnswerIsRefused)
 {
     Store(FileOf(Row("7", "1")));
-    ExpectRefusal({L"set", L"8", L"yes"}, NoProject, "no such prompt: 8");
+    ExpectRefusal({L"set", L"8", L"yes"}, NotFound, "no such prompt: 8");
     ExpectRefusal({L"set", L"7", L"maybe"}, BadUsage, "maybe");
     for (const wchar_t* id : {L"", L"seven", L"7x", L"4294967296", L"99999999999", L"0x7"})
     {

@@ -40,7 +40,7 @@ TEST_F(ProviderCommand, OpenFailsWhenTheProviderSaysYesButHasNoProjectOpen)
 TEST_F(ProviderCommand, OpenOfAFolderThatIsNowhereSaysSo)
 {
     const auto result = Run({L"open", L"--project", L"nowhere"});
-    EXPECT_EQ(result.code, NoProject);
+    EXPECT_EQ(result.code, NotFound);
     EXPECT_THAT(result.errors, HasSubstr("orvix: no such project folder: "));
 }
 

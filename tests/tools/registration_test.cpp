@@ -29,7 +29,7 @@ TEST_F(Registration, IsSeenAmongTheProvidersUntilItIsTakenOut)
     const auto unregistered = Unregister(L"Talking");
     EXPECT_EQ(unregistered.code, Success);
     EXPECT_EQ(unregistered.output, "unregistered Talking\n");
-    EXPECT_EQ(Providers().code, NoProject);
+    EXPECT_EQ(Providers().code, NotFound);
     EXPECT_EQ(Providers().errors, "orvix: no provider in the registry's list of MSSCCI libraries\n");
 }
 
@@ -144,10 +144,10 @@ TEST_F(Registration, RefusesWhatIsNo64BitMSSCCILibrary)
     for (const auto& [path, message] : bad)
     {
         const auto result = Register(path, L"Talking");
-        EXPECT_EQ(result.code, NoProject) << path;
+        EXPECT_EQ(result.code, NotFound) << path;
         EXPECT_THAT(result.errors, HasSubstr(std::string("orvix: ") + message)) << path;
     }
-    EXPECT_EQ(Providers().code, NoProject);
+    EXPECT_EQ(Providers().code, NotFound);
     EXPECT_EQ(Path(L"Talking"), std::nullopt);
 }
 
@@ -155,7 +155,7 @@ TEST_F(Registration, OfAnUnknownNameCannotBeTakenOut)
 {
     ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
     const auto result = Unregister(L"Talk");
-    EXPECT_EQ(result.code, NoProject);
+    EXPECT_EQ(result.code, NotFound);
     EXPECT_EQ(result.errors, "orvix: no such registration: Talk\n");
     EXPECT_EQ(Providers().code, Success);
 }
@@ -188,7 +188,7 @@ TEST_F(Registration, NeverOverwritesAValueOfTheListThatBelongsToAnotherProgram)
 
 TEST_F(Registration, ThatAnInterruptedRunHasLeftOutOfTheListCanBeCompletedOrTakenOut)
 {
-    TemporaryRegistryKey half(std::wstring(OwnPlace) + L"Talking");
+    TemporaryRegistryKey half(std::wstring(OwnKeys) + L"Talking");
     half.SetString(L"SCCServerName", L"Talking");
     ASSERT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Success);
     EXPECT_EQ(Providers().output, "Index  Provider\n0      Talking\n");

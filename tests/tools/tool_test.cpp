@@ -1,4 +1,4 @@
-// orvix.exe from the outside: a process on a project of its own, with the archive plug-in.
+// orvix.exe as a process on a project of its own, with the archive plug-in.
 
 #include "OrvixVersion.h"
 #include "ToolTest.h"
@@ -66,7 +66,7 @@ bool IsReadOnly(const std::filesystem::path& path)
     return (GetFileAttributesW(path.c_str()) & FILE_ATTRIBUTE_READONLY) != 0;
 }
 
-// IDs of the tool's prompts, as they stand in the prompt file.
+// IDs of the tool's prompts, as the prompt file holds them.
 constexpr const char* CheckInPrompt = "1330796546";
 constexpr const char* KeepPrompt = "1330796547";
 constexpr const char* CheckOutPrompt = "1330796548";
@@ -155,7 +155,7 @@ TEST_F(Tool, CheckOutMakesAFileWritable)
     EXPECT_FALSE(IsReadOnly(File(L"a.txt")));
 }
 
-TEST_F(Tool, CheckInStoresAVersionWithItsCommentAndGivesTheFileBack)
+TEST_F(Tool, CheckInStoresAVersionWithItsCommentAndMakesTheFileReadOnly)
 {
     Take(L"a.txt");
     Write(L"a.txt", "one\ntwo\n");
@@ -345,6 +345,26 @@ TEST_F(Tool, HiddenFoldersAreSkippedAndCountedUnlessTheyAreNamed)
     EXPECT_THAT(Run({L"add", L".git"}).output, HasSubstr("done    checked in  .git\\config\n"));
 }
 
+TEST_F(Tool, AddOfAFolderLeavesOutWhatTheProviderDoesNotAllowToBeAdded)
+{
+    Write(L"a reserved name", "x");
+    const auto found = Run({L"--plugins", ORVIX_STUBBORN_PLUGINS, L"add", L"."});
+    EXPECT_EQ(found.code, Success);
+    EXPECT_EQ(found.output, "0 files, 1 left out for their state\n");
+    const auto named = Run({L"--plugins", ORVIX_STUBBORN_PLUGINS, L"add", L"a reserved name"});
+    EXPECT_EQ(named.code, Failed);
+    EXPECT_THAT(named.output, HasSubstr("refused  not controlled  a reserved name\n"));
+}
+
+TEST_F(Tool, AFileWhoseNameStartsWithADotIsAFileLikeAnyOther)
+{
+    Write(L".archive", "no archive of this provider");
+    Write(L".gitignore", "x");
+    const auto result = Run({L"--plugins", ORVIX_STUBBORN_PLUGINS, L"status", L"."});
+    EXPECT_EQ(result.code, Success);
+    EXPECT_THAT(result.output, AllOf(HasSubstr("  .archive\n"), HasSubstr("  .gitignore\n"), HasSubstr("2 files\n")));
+}
+
 TEST_F(Tool, TheProvidersFiltersLeaveFilesOutOfAFolderAndRefuseNamedOnes)
 {
     std::filesystem::create_directories(Config());
@@ -475,11 +495,11 @@ TEST_F(Tool, TheDialogCancelsAnOperation)
     EXPECT_THAT(result.output, HasSubstr("cancelled  checked in  a.txt\n"));
 }
 
-TEST_F(Tool, AFileThatIsUntickedInTheDialogIsNotAFailure)
+TEST_F(Tool, AFileThatIsClearedInTheDialogIsNotAFailure)
 {
     Control(L"a.txt");
     Control(L"b.txt");
-    AnswerDialogs(L"yes untick");
+    AnswerDialogs(L"yes clear");
     const auto result = RunAttended({L"checkout", L"."});
     EXPECT_EQ(result.code, Success);
     EXPECT_THAT(result.output,
@@ -496,7 +516,7 @@ TEST_F(Tool, TheDialogsOptionKeepsTheFilesCheckedOut)
     EXPECT_THAT(result.output, HasSubstr("done    checked out  a.txt\n"));
 }
 
-TEST_F(Tool, KeepOnTheCommandLineTicksTheDialogsOption)
+TEST_F(Tool, KeepOnTheCommandLineChecksTheDialogsOption)
 {
     Take(L"a.txt");
     AnswerDialogs(L"yes");
@@ -531,7 +551,7 @@ TEST_F(Tool, ChoosesAProviderByNameInAnyCaseOrByIndex)
     for (const wchar_t* unknown : {L"1", L"Arch", L"-1", L"00"})
     {
         const auto result = Run({L"status", L"a.txt", std::wstring(L"--provider=") + unknown});
-        EXPECT_EQ(result.code, NoProject);
+        EXPECT_EQ(result.code, NotFound);
         EXPECT_THAT(result.errors, HasSubstr("orvix: no such provider: "));
     }
 }
@@ -540,19 +560,19 @@ TEST_F(Tool, SaysWhatIsMissingWhenThereIsNoProviderProjectOrFolder)
 {
     Write(L"a.txt", "x");
     const auto noPlugins = Run({L"providers", L"--plugins", L"nowhere"});
-    EXPECT_EQ(noPlugins.code, NoProject);
+    EXPECT_EQ(noPlugins.code, NotFound);
     EXPECT_THAT(noPlugins.errors, HasSubstr("orvix: no such plug-in folder: "));
 
     const auto noProvider = Run({L"providers", L"--plugins", L"."});
-    EXPECT_EQ(noProvider.code, NoProject);
+    EXPECT_EQ(noProvider.code, NotFound);
     EXPECT_THAT(noProvider.errors, HasSubstr("orvix: no provider in "));
 
     const auto noProject = Run({L"status", L"a.txt", L"--project", L"nowhere"});
-    EXPECT_EQ(noProject.code, NoProject);
+    EXPECT_EQ(noProject.code, NotFound);
     EXPECT_THAT(noProject.errors, HasSubstr("orvix: no such project folder: "));
 
     const auto noConfig = RunExactly({L"providers", L"--config", L"a.txt"});
-    EXPECT_EQ(noConfig.code, NoProject);
+    EXPECT_EQ(noConfig.code, NotFound);
     EXPECT_THAT(noConfig.errors, HasSubstr("orvix: cannot make the configuration folder: "));
 }
 
@@ -562,7 +582,7 @@ TEST_F(Tool, AProviderThatDoesNotStartIsNamed)
     std::filesystem::create_directories(folder);
     std::filesystem::copy_file(std::filesystem::path(ORVIX_FAKE_PLUGINS) / L"good.dll", folder / L"good.dll");
     const auto result = Run({L"--plugins", folder.wstring(), L"status", L"a.txt"});
-    EXPECT_EQ(result.code, NoProject);
+    EXPECT_EQ(result.code, NotFound);
     EXPECT_THAT(result.errors, HasSubstr("orvix: the provider does not start: Fake Depot"));
 }
 

@@ -165,30 +165,30 @@ TEST_P(ValidateDefectivePlugin, FailsTheRulesThatItBreaksAndNoOthers)
 INSTANTIATE_TEST_SUITE_P(
     All, ValidateDefectivePlugin,
     testing::Values(
-        Defects{{L"version", "version", "GetOrvixVersion gives 201"},
-                {L"name", "name", "GetOrvixProviderName gives no name"},
-                {L"objects", "objects", "GetIOrvixProvider gives null"},
+        Defects{{L"version", "version", "GetOrvixVersion returns 201"},
+                {L"name", "name", "GetOrvixProviderName returns no name"},
+                {L"objects", "objects", "GetIOrvixProvider returns null"},
                 {L"state", "state", "IsProjectOpen is true after CloseProject"},
-                {L"reserved", "reserved", "ReservedC gives 0"},
-                {L"results", "results", "UndoCheckOut with options 0x00000001 gives 7"},
-                {L"bad-input", "bad-input", "what?.txt\" gives 3"},
-                {L"empty-list", "empty-list", "GetLatest gives 0"},
-                {L"status-bits", "status-bits", "QueryStatus sets bits that mean nothing: 0x00000046"},
+                {L"reserved", "reserved", "ReservedC returns 0"},
+                {L"results", "results", "UndoCheckOut with options 0x00000001 returns 7"},
+                {L"bad-input", "bad-input", "what?.txt\" returns 3"},
+                {L"empty-list", "empty-list", "GetLatest returns 0"},
+                {L"status-bits", "status-bits", "QueryStatus sets undocumented bits: 0x00000046"},
                 {L"status-failure", "status-failure", "QueryStatus fails and changes FlagsOut"},
                 {L"status-closed", "status-closed", "QueryStatus writes 0x00100001 before OpenProject"},
                 {L"list-untouched", "list-untouched", "CheckIn changes more of the list than FlagsOut"},
                 {L"handles", "handles", "10 sessions leave 10 handles open"},
-                {L"dialogs", "dialogs", "ShowOptions gives 9"}},
-        Defects{{L"name-that-turns", "name", "gives another name when it is asked again"},
+                {L"dialogs", "dialogs", "ShowOptions returns 9"}},
+        Defects{{L"name-that-turns", "name", "returns another name on a later call"},
                 {L"reserved-pointers", "reserved", "ReservedD does not store 0 through both pointers"},
                 {L"status-left-out", "status-bits", "QueryStatus does not write an entry's FlagsOut"},
-                {L"option-bit", "results", "CheckOut with options 0x00000004 gives -1, and 0 with 0x00000000"},
-                {L"sessions", "sessions", "Initialize gives -1 in session 3"}},
-        Defects{{L"reserved-false", "reserved", "ReservedI gives false"},
+                {L"option-bit", "results", "CheckOut with options 0x00000004 returns -1, and 0 with 0x00000000"},
+                {L"sessions", "sessions", "Initialize returns -1 in session 3"}},
+        Defects{{L"reserved-false", "reserved", "ReservedI returns false"},
                 {L"status-contradiction", "status-bits", "QueryStatus says controlled and not controlled: 0x00000003"},
                 {L"reload", "reload", "it does not load: "}},
-        Defects{{L"starts", "starts", "Initialize gives -1"}},
-        Defects{{L"exception", "reserved", "ReservedC lets an exception out"}},
+        Defects{{L"starts", "starts", "Initialize returns -1"}},
+        Defects{{L"exception", "reserved", "ReservedC throws an exception"}},
         Defects{{L"crash", "reserved", "ReservedE crashes the process with exception 0xC0000005"}},
         Defects{{L"exit", "reserved", "ReservedG ends the process with exit code 7"}}));
 
@@ -200,24 +200,24 @@ TEST_P(ValidateDefectiveLibrary, FailsTheRulesThatItBreaksAndNoOthers)
 INSTANTIATE_TEST_SUITE_P(
     All, ValidateDefectiveLibrary,
     testing::Values(
-        Defects{{L"version", "version", "SccGetVersion gives 0x00030001"},
+        Defects{{L"version", "version", "SccGetVersion returns 0x00030001"},
                 {L"capabilities", "capabilities", "the bits 0x02000080 promise SccPopulateList"},
                 {L"texts", "texts", "the library's name is written beyond its 32 bytes"},
                 {L"input-names", "input-texts", "SccCheckin writes to the file names"},
-                {L"codes", "codes", "SccGet gives 42"},
+                {L"codes", "codes", "SccGet returns 42"},
                 {L"null-arguments", "null-arguments", "SccQueryInfo crashes the process with exception 0xC0000005"},
                 {L"info-bits", "info-bits", "SccQueryInfo sets unknown bits: 0x00004003"},
-                {L"text-output", "text-output", "a line carries a line end"},
+                {L"text-output", "text-output", "a line contains a line end"},
                 {L"handles", "handles", "10 sessions leave 10 handles open"}},
         Defects{{L"no-terminator", "texts", "the label of the auxiliary path has no terminator in its 32 bytes"},
                 {L"input-texts", "input-texts", "SccOpenProject writes to the project name or the local path"},
-                {L"codes-kept", "codes", "SccAdd gives 42"},
-                {L"info-left-out", "info-bits", "SccQueryInfo leaves a file's word as it was"},
-                {L"text-without-kind", "text-output", "the kind 99 means nothing"}},
-        Defects{{L"codes-given-back", "codes", "SccCheckin gives 42"},
+                {L"codes-kept", "codes", "SccAdd returns 42"},
+                {L"info-left-out", "info-bits", "SccQueryInfo does not write the word of a file"},
+                {L"text-without-kind", "text-output", "the kind 99 is unknown"}},
+        Defects{{L"codes-given-back", "codes", "SccCheckin returns 42"},
                 {L"info-overrun", "info-bits", "SccQueryInfo writes more words than there are files"},
                 {L"text-null", "text-output", "a line of kind 1 has no text"}},
-        Defects{{L"starts", "starts", "Initialize gives -1"}}));
+        Defects{{L"starts", "starts", "Initialize returns -1"}}));
 
 TEST_F(Validate, GivesEveryOperationAllOptionsThatHostsDo)
 {
@@ -244,14 +244,14 @@ TEST_F(Validate, NamesTheMissingExportOfAPlugin)
     {
         const auto result = ValidatePlugin(Plugins / (std::wstring(L"defective_without_") + name + L".dll"), Failed);
         EXPECT_THAT(With("fail", result),
-                    ElementsAre(Pair("exports", "it lacks " + std::filesystem::path(name).string())));
+                    ElementsAre(Pair("exports", "it does not export " + std::filesystem::path(name).string())));
     }
 }
 
 TEST_F(Validate, FailsALibraryForAFunctionThatIsNeededAndRemarksOneThatIsNot)
 {
     const auto result = ValidateLibrary(Libraries / L"defective_scc_without_SccCheckin.dll", Failed);
-    EXPECT_THAT(With("fail", result), ElementsAre(Pair("exports", "it lacks SccCheckin")));
+    EXPECT_THAT(With("fail", result), ElementsAre(Pair("exports", "it does not export SccCheckin")));
     const auto passed = With("pass", ValidateLibrary(Libraries / L"defective_scc.dll", Success));
     ASSERT_TRUE(passed.contains("exports"));
     EXPECT_THAT(passed.at("exports"), AllOf(StartsWith("without SccGetProjPath "), HasSubstr(" SccRunScc ")));
@@ -326,12 +326,11 @@ TEST_F(Validate, LeavesNothingOnTheDiskAndInTheRegistry)
     ValidateLibrary(ORVIX_ARCHIVE_MSSCCI, Success);
     EXPECT_TRUE(std::filesystem::is_empty(temp));
     EXPECT_TRUE(std::filesystem::is_empty(Project()));
-    HKEY key = nullptr;
-    ASSERT_EQ(RegOpenKeyExW(HKEY_CURRENT_USER, L"Software\\OrvixCore", 0, KEY_READ, &key), ERROR_SUCCESS);
+    UniqueRegistryKey key;
+    ASSERT_EQ(RegOpenKeyExW(HKEY_CURRENT_USER, L"Software\\OrvixCore", 0, KEY_READ, key.Out()), ERROR_SUCCESS);
     DWORD keys = 1;
-    RegQueryInfoKeyW(key, nullptr, nullptr, nullptr, &keys, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr,
+    RegQueryInfoKeyW(key.Get(), nullptr, nullptr, nullptr, &keys, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr,
                      nullptr);
-    RegCloseKey(key);
     EXPECT_EQ(keys, 0u);
 }
 
@@ -389,7 +388,7 @@ TEST_F(Validate, PrintsAJsonDocumentWithTheSameResults)
         std::find_if(rules.begin(), rules.end(), [](const auto& rule) { return rule["name"] == "reserved"; });
     ASSERT_NE(found, rules.end());
     EXPECT_EQ((*found)["result"], "fail");
-    EXPECT_EQ((*found)["reason"], "ReservedC gives 0");
+    EXPECT_EQ((*found)["reason"], "ReservedC returns 0");
     EXPECT_THAT((*found)["demand"].get<std::string>(), HasSubstr("reserved operations"));
     EXPECT_EQ(document["kind"], "plugin");
 }
@@ -398,7 +397,7 @@ TEST_F(Validate, OfAFileThatIsNotThereEndsWithThree)
 {
     for (const wchar_t* path : {L"nowhere.dll", L"."})
     {
-        const auto result = ValidatePlugin(path, NoProject);
+        const auto result = ValidatePlugin(path, NotFound);
         EXPECT_THAT(result.errors, StartsWith("orvix: no such library: "));
         EXPECT_EQ(result.output, "");
     }

@@ -2,32 +2,19 @@
 
 #include "FilePath.h"
 #include "Text.h"
+#include "UniqueHandle.h"
 
 #include <windows.h>
 
 #include <algorithm>
-#include <cwchar>
 #include <iostream>
-#include <memory>
 
 namespace
 {
 
 constexpr std::size_t FilesBetweenProgress = 256;
 
-constexpr DWORD UnwantedFolder = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM | FILE_ATTRIBUTE_REPARSE_POINT;
-
-/// The archive of a project, the file that links to it, or what an interrupted provider left: no part of the project.
-bool IsOfArchive(const std::wstring& name)
-{
-    return _wcsicmp(name.c_str(), L".archive") == 0 || _wcsicmp(name.c_str(), L".archive.tmp") == 0;
-}
-
-struct CloseSearch
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE search) const { FindClose(search); }
-};
+constexpr DWORD SkippedAttributes = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM | FILE_ATTRIBUTE_REPARSE_POINT;
 
 } // namespace
 
@@ -61,7 +48,7 @@ bool FileCollector::ReportUnreadableFolders() const
 
 void FileCollector::AddFile(std::wstring path, bool named)
 {
-    if (m_seen.insert(PathKey(path)).second)
+    if (m_keys.insert(PathKey(path)).second)
     {
         m_files.push_back({std::move(path), named});
         if (m_files.size() % FilesBetweenProgress == 0)
@@ -74,57 +61,57 @@ void FileCollector::AddFile(std::wstring path, bool named)
 void FileCollector::AddFolder(const std::wstring& folder)
 {
     const std::wstring prefix = folder.back() == L'\\' ? folder : folder + L'\\';
-    WIN32_FIND_DATAW found;
-    const HANDLE search =
-        FindFirstFileExW((prefix + L"*").c_str(), FindExInfoBasic, &found, FindExSearchNameMatch, nullptr, 0);
-    if (search == INVALID_HANDLE_VALUE)
+    Content content = Read(folder, prefix);
+    std::sort(content.files.begin(), content.files.end());
+    for (const std::wstring& name : content.files)
     {
-        // The root of a drive lists no "." and may be empty.
+        AddFile(prefix + name, false);
+    }
+    std::sort(content.folders.begin(), content.folders.end());
+    for (const std::wstring& name : content.folders)
+    {
+        AddFolder(prefix + name);
+    }
+}
+
+FileCollector::Content FileCollector::Read(const std::wstring& folder, const std::wstring& prefix)
+{
+    Content content;
+    WIN32_FIND_DATAW found;
+    const UniqueFind search(
+        FindFirstFileExW((prefix + L"*").c_str(), FindExInfoBasic, &found, FindExSearchNameMatch, nullptr, 0));
+    if (!search)
+    {
+        // The root of a drive has no "." and may be empty.
         if (GetLastError() != ERROR_FILE_NOT_FOUND)
         {
             m_unreadableFolders.push_back(folder);
         }
-        return;
+        return content;
     }
-
-    std::vector<std::wstring> files;
-    std::vector<std::wstring> folders;
+    do
     {
-        const std::unique_ptr<HANDLE, CloseSearch> closing(search);
-        do
+        const std::wstring name = found.cFileName;
+        if (name == L"." || name == L"..")
         {
-            const std::wstring name = found.cFileName;
-            if (name == L"." || name == L".." || IsOfArchive(name))
-            {
-                continue;
-            }
-            if ((found.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) == 0)
-            {
-                files.push_back(name);
-            }
-            else if (name.front() == L'.' || (found.dwFileAttributes & UnwantedFolder) != 0)
-            {
-                ++m_skippedFolders;
-            }
-            else
-            {
-                folders.push_back(name);
-            }
-        } while (FindNextFileW(search, &found) != 0);
-        if (GetLastError() != ERROR_NO_MORE_FILES)
-        {
-            m_unreadableFolders.push_back(folder);
+            continue;
         }
-    }
-
-    std::sort(files.begin(), files.end());
-    for (const std::wstring& name : files)
+        if ((found.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) == 0)
+        {
+            content.files.push_back(name);
+        }
+        else if (name.front() == L'.' || (found.dwFileAttributes & SkippedAttributes) != 0)
+        {
+            ++m_skippedFolders;
+        }
+        else
+        {
+            content.folders.push_back(name);
+        }
+    } while (FindNextFileW(search.Get(), &found) != 0);
+    if (GetLastError() != ERROR_NO_MORE_FILES)
     {
-        AddFile(prefix + name, false);
+        m_unreadableFolders.push_back(folder);
     }
-    std::sort(folders.begin(), folders.end());
-    for (const std::wstring& name : folders)
-    {
-        AddFolder(prefix + name);
-    }
+    return content;
 }

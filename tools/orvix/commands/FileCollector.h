@@ -6,11 +6,10 @@
 #include <unordered_set>
 #include <vector>
 
-/// Finds the files of a command: those that the user names, and those below the folders that the user names.
+/// Finds the files of a command: those that the user names, and those in and below the folders that the user names.
 ///
-/// Below a folder, folders that are hidden or system, or whose name starts with a dot (.git), are skipped and
-/// counted, links to folders are not followed, and what is named ".archive" (the sample provider's archive, or the
-/// link to it) is left out. A file that is met twice is taken once.
+/// Below a folder, folders that are hidden or system, or whose name starts with a dot (.git), are skipped and counted,
+/// as are links to folders. A file that is found twice is taken once.
 class FileCollector
 {
 public:
@@ -20,27 +19,38 @@ public:
         bool named; ///< named by the user, not found in a folder
     };
 
-    /// `output` is told about the progress and must outlive this object.
+    /// `output` shows the progress and must outlive this object.
     explicit FileCollector(Output& output) : m_output(output) {}
 
-    /// Takes what the user named, which need not exist. Throws `ToolError` when the text is no path.
+    /// Adds a file or the files of a folder. What the user named need not exist. Throws `ToolError` when the text is
+    /// not a path.
     void Add(const std::wstring& named);
 
     const std::vector<File>& Files() const { return m_files; }
 
-    /// How many folders were skipped.
+    /// The number of skipped folders.
     Listing::Count SkippedFolders() const;
 
-    /// Says on the error output which folders could not be read; false when there is none.
+    /// Prints on the error output which folders could not be read. False when there are none.
     bool ReportUnreadableFolders() const;
 
 private:
+    /// What is in a folder, as names.
+    struct Content
+    {
+        std::vector<std::wstring> files;
+        std::vector<std::wstring> folders;
+    };
+
     void AddFile(std::wstring path, bool named);
     void AddFolder(const std::wstring& folder);
+
+    /// `prefix` is the folder's path with a separator at its end.
+    Content Read(const std::wstring& folder, const std::wstring& prefix);
 
     Output& m_output;
     std::vector<File> m_files;
     unsigned int m_skippedFolders = 0;
     std::vector<std::wstring> m_unreadableFolders;
-    std::unordered_set<std::wstring> m_seen;
+    std::unordered_set<std::wstring> m_keys; // of the files found so far, see `PathKey`
 };

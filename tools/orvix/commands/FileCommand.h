@@ -1,63 +1,81 @@
 #pragma once
 
 #include "FileCollector.h"
-#include "OperationRule.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
-#include "Output.h"
 #include "ProjectSession.h"
 #include "ToolError.h"
 
 #include <array>
-#include <optional>
 
-/// One command on files, from the names on the command line to the table of what became of them.
+/// A command on files: collects them, runs and shows a table of the results. A derived class says what runs.
 class FileCommand
 {
 public:
-    /// Collects the files and leaves out those that the provider's filters exclude. The arguments must outlive
-    /// this object.
-    FileCommand(ProjectSession& project, OrvixClientInfo& client, const CommandLine& commandLine, Output& output);
+    FileCommand(const FileCommand&) = delete;
+    FileCommand& operator=(const FileCommand&) = delete;
+    virtual ~FileCommand() = default;
 
-    /// Carries the command out and shows the result. `ExitCode::Failed` when a folder could not be read, or
-    /// a file was refused, cancelled or did not reach the expected state.
+    /// Runs the command and shows the result. `ExitCode::Failed` when a folder could not be read, and when a file was
+    /// refused or cancelled or did not reach the expected state. Throws `ToolError`.
     ExitCode Run();
 
-private:
-    enum Outcome : std::size_t
+protected:
+    /// What happened to a file.
+    enum Result : std::size_t
     {
         Done,
-        Unticked,
+        Cleared, ///< by the user in the dialog
         Refused,
         Cancelled,
         Failed,
-        NumOutcomes,
+        NumResults,
     };
 
-    void ShowStatus();
-    void ShowHistory();
-    void Change(const OperationRule& rule);
+    enum class ResultColumn
+    {
+        Shown,
+        Hidden
+    };
 
-    /// What became of each entry as far as the list tells after the operation; nothing for a file that was
-    /// only met in a folder and that the command does not mean.
-    std::vector<std::optional<Outcome>> OutcomesOfRun(const OperationRule& rule, bool ran);
+    /// Collects the files, without those that the provider's filters exclude. The arguments must outlive this object.
+    FileCommand(ProjectSession& project, const CommandLine& commandLine, Output& output, ResultColumn resultColumn);
 
-    /// Makes every entry active and brings its state. Throws `ToolError` when the provider fails.
+    /// Runs on the entries of the list, of which there is at least one, and reports each result.
+    virtual void RunOnFiles() = 0;
+
+    /// Makes every entry active and asks the provider for its state. Throws `ToolError` when the provider fails.
     void QueryStatus();
 
     bool IsNamed(OrvixFileEntry& entry) const;
-    void Report(Outcome outcome, OrvixFileEntry& entry);
-    void Report(Outcome outcome, const std::wstring& state, const std::wstring& path);
+
+    /// Adds a row to the table.
+    void Report(Result result, OrvixFileEntry& entry);
+
+    /// Counts files without a row.
+    void Count(Result result, unsigned int number) { m_counts[result] += number; }
+
+    /// Counts a file that was found in a folder and that the command does not concern.
+    void CountOtherState() { ++m_otherState; }
+
+    ProjectSession& Project() { return m_project; }
+    const CommandLine& Arguments() const { return m_commandLine; }
+    Output& Results() { return m_output; }
+    OrvixFileList& List() { return m_list; }
+
+private:
+    void AddFile(std::size_t index);
+    void Report(Result result, const Listing::State& state, const std::wstring& path);
     std::vector<Listing::Count> Summary() const;
 
     ProjectSession& m_project;
-    OrvixClientInfo& m_client;
     const CommandLine& m_commandLine;
     Output& m_output;
     FileCollector m_collector;
     OrvixFileList m_list;
     Listing m_listing;
-    std::array<unsigned int, NumOutcomes> m_counts{};
+    bool m_showsResults;
+    std::array<unsigned int, NumResults> m_counts{};
     unsigned int m_excluded = 0;
     unsigned int m_otherState = 0;
 };

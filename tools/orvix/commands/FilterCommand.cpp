@@ -1,9 +1,18 @@
 #include "FilterCommand.h"
 
+#include "CommandOutput.h"
 #include "FilePath.h"
 #include "OrvixProviderConfig.h"
 
 #include <numeric>
+
+ExitCode ShowFilters(const CommandLine& commandLine)
+{
+    return WithOutput(commandLine, [&](CommandOutput& output) {
+        HostSession host(commandLine, output.Results());
+        return FilterCommand(host, commandLine, output.Results()).Run();
+    });
+}
 
 FilterCommand::FilterCommand(HostSession& host, const CommandLine& commandLine, Output& output)
     : m_host(host), m_commandLine(commandLine), m_output(output)
@@ -39,7 +48,7 @@ ExitCode FilterCommand::Run()
         bool excluded = false;
         for (const std::uint32_t provider : providers)
         {
-            listing.rows.push_back(Verdict(file.path, provider, excluded));
+            listing.rows.push_back(MakeRow(file.path, provider, excluded));
         }
         numExcluded += excluded ? 1 : 0;
     }
@@ -59,7 +68,7 @@ std::vector<std::uint32_t> FilterCommand::Providers()
     return providers;
 }
 
-std::vector<Listing::Cell> FilterCommand::Verdict(const std::wstring& path, std::uint32_t provider, bool& excluded)
+std::vector<Listing::Cell> FilterCommand::MakeRow(const std::wstring& path, std::uint32_t provider, bool& excluded)
 {
     const std::wstring name = m_host.Services().GetProviderName(provider);
     std::wstring filter;
@@ -70,7 +79,7 @@ std::vector<Listing::Cell> FilterCommand::Verdict(const std::wstring& path, std:
     excluded = true;
     const OrvixProviderConfig* config = m_config.FindConfig(name.c_str());
     const Exclusion reason = config != nullptr ? config->FindExclusion(path.c_str()).reason : Exclusion::None;
-    Listing::Cell by; // empty when the file was changed after the services object has read it
+    Listing::Cell by; // empty when somebody changed the file after the services object read it
     if (reason != Exclusion::None)
     {
         by.value = reason == Exclusion::ByFolder ? L"folder" : L"type";

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "Listener.h"
+#include "IOrvixNotifyCallback.h"
 #include "Output.h"
 
 /// Prints every notification.
-class NotificationPrinter final : public Listener
+class NotificationPrinter final : public IOrvixNotifyCallback
 {
 public:
     /// `output` must outlive this object.

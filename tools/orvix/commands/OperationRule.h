@@ -1,40 +1,104 @@
 #pragma once
 
+#include "OrvixFileFlags.h"
+#include "OrvixOperation.h"
 #include "OrvixPrompt.h"
 
 #include <cstdint>
-#include <string>
 
-/// One command that runs through `IOrvixServices::RunFileListOperation`: what it asks for, and how to see
-/// from the files' states (bits of `OrvixFileState`) that it came about.
+/// One command that runs through `IOrvixServices::RunFileListOperation`: what it asks, which files it concerns, and
+/// which state a file must reach. States are bits of `OrvixFileState` and `OrvixFilePermission`.
 struct OperationRule
 {
-    const wchar_t* command = nullptr;
-    const wchar_t* title = nullptr;
-    const wchar_t* question = nullptr;
-    std::uint32_t operation = 0; ///< bit of the operation
-    std::uint32_t allowedBy = 0; ///< state that allows it
+    const wchar_t* title = nullptr;    ///< of the dialog
+    const wchar_t* question = nullptr; ///< of the dialog
+    std::uint32_t operation = 0;       ///< bit of `OrvixOperation`
+    std::uint32_t allowedBy = 0;       ///< bit of `OrvixFilePermission`
 
-    unsigned long concerns = 0;     ///< state that makes the command concern a file found in a folder, ...
-    unsigned long concernsNone = 0; ///< ... and states in which it does not
+    // Which files in a named folder the command concerns: those in the first state and in none of the others.
+    unsigned long concerns = 0;
+    unsigned long concernsNone = 0;
 
-    unsigned long leadsTo = 0;    ///< state of a file afterwards
-    unsigned long ends = 0;       ///< states that it must have lost, ...
-    unsigned long endsUnheld = 0; ///< ... and those that only a file checked out by this user may keep
+    // The state of a file after the command: in the first state and in none of the others.
+    unsigned long leadsTo = 0;
+    unsigned long ends = 0;
+    unsigned long endsUnlessCheckedOut = 0; ///< a file that this user has checked out may keep these
 
-    std::uint32_t dialogPrompt = 0; ///< ID of the stored answer to the file-list dialog
-    std::uint32_t keepPrompt =
-        OrvixPromptID::None; ///< ID of the stored answer to "keep checked out", where that is offered
+    std::uint32_t dialogPrompt = 0;                 ///< ID of the stored answer to the file-list dialog
+    std::uint32_t keepPrompt = OrvixPromptID::None; ///< ID of the stored answer to "keep checked out", if offered
 
     bool CanKeep() const { return keepPrompt != OrvixPromptID::None; }
 
-    /// Whether a file that was found in a folder is meant by the command.
+    /// Whether the command concerns a file in this state that was found in a folder.
     bool Concerns(unsigned long flags) const { return (flags & concerns) != 0 && (flags & concernsNone) == 0; }
 
-    /// Whether a file in this state shows that the command was carried out on it. `kept`: it was to stay
-    /// checked out.
+    /// Whether a file in this state shows that the command was done. `kept`: it was to stay checked out.
     bool IsReached(unsigned long flags, bool kept) const;
-
-    /// The rule of a command; null when it is none of these.
-    static const OperationRule* Find(const std::wstring& command);
 };
+
+/// The rules of the commands.
+namespace OperationRules
+{
+
+/// Prompt IDs of this tool, different from those of other hosts that share the configuration folder.
+inline constexpr std::uint32_t FirstPrompt = 0x4F525800;
+
+inline constexpr OperationRule Add = {
+    .title = L"Add",
+    .question = L"Add these files?",
+    .operation = OrvixOperation::Add,
+    .allowedBy = OrvixFilePermission::Add,
+    .concerns = OrvixFilePermission::Add, // a provider does not allow it for files of its own
+    .leadsTo = OrvixFileState::Controlled,
+    .ends = OrvixFileState::CheckedOut | OrvixFileState::Modified,
+    .dialogPrompt = FirstPrompt,
+    .keepPrompt = FirstPrompt + 1,
+};
+
+inline constexpr OperationRule CheckIn = {
+    .title = L"Check in",
+    .question = L"Check these files in?",
+    .operation = OrvixOperation::CheckIn,
+    .allowedBy = OrvixFilePermission::CheckIn,
+    .concerns = OrvixFileState::CheckedOut,
+    .leadsTo = OrvixFileState::Controlled,
+    .ends = OrvixFileState::CheckedOut | OrvixFileState::Modified,
+    .dialogPrompt = FirstPrompt + 2,
+    .keepPrompt = FirstPrompt + 3,
+};
+
+inline constexpr OperationRule CheckOut = {
+    .title = L"Check out",
+    .question = L"Check these files out?",
+    .operation = OrvixOperation::CheckOut,
+    .allowedBy = OrvixFilePermission::CheckOut,
+    .concerns = OrvixFileState::Controlled,
+    .concernsNone = OrvixFileState::CheckedOut,
+    .leadsTo = OrvixFileState::CheckedOut,
+    .dialogPrompt = FirstPrompt + 4,
+};
+
+inline constexpr OperationRule UndoCheckOut = {
+    .title = L"Undo check-out",
+    .question = L"Give these files back unchanged?",
+    .operation = OrvixOperation::UndoCheckOut,
+    .allowedBy = OrvixFilePermission::UndoCheckOut,
+    .concerns = OrvixFileState::CheckedOut,
+    .leadsTo = OrvixFileState::Controlled,
+    .ends = OrvixFileState::CheckedOut | OrvixFileState::Modified,
+    .dialogPrompt = FirstPrompt + 5,
+};
+
+inline constexpr OperationRule GetLatest = {
+    .title = L"Get latest version",
+    .question = L"Get the latest versions of these files?",
+    .operation = OrvixOperation::GetLatest,
+    .allowedBy = OrvixFilePermission::GetLatest,
+    .concerns = OrvixFileState::Controlled,
+    .leadsTo = OrvixFileState::Controlled,
+    .ends = OrvixFileState::OutOfDate,
+    .endsUnlessCheckedOut = OrvixFileState::Modified,
+    .dialogPrompt = FirstPrompt + 6,
+};
+
+} // namespace OperationRules

@@ -20,8 +20,8 @@ constexpr struct
     {OrvixPromptAction::NoToAll, L"no-to-all"},
 };
 
-/// The one bit that counts in a stored action.
-std::uint32_t Meaning(std::uint32_t action)
+/// The one bit of a stored action that counts.
+std::uint32_t DecidingBit(std::uint32_t action)
 {
     return (action & OrvixPromptAction::Ask) != 0 ? OrvixPromptAction::Ask
                                                   : OrvixPromptAction::FromAnswer(OrvixPromptAction::ToAnswer(action));
@@ -32,7 +32,7 @@ std::uint32_t Meaning(std::uint32_t action)
 std::wstring PromptAnswer::InWords(std::uint32_t action)
 {
     return std::find_if(std::begin(Answers), std::end(Answers),
-                        [meaning = Meaning(action)](const auto& answer) { return answer.action == meaning; })
+                        [bit = DecidingBit(action)](const auto& answer) { return answer.action == bit; })
         ->words;
 }
 
@@ -45,7 +45,7 @@ std::optional<std::uint32_t> PromptAnswer::Action(const std::wstring& words)
 
 bool PromptAnswer::IsOffered(std::uint32_t options, std::uint32_t action)
 {
-    switch (Meaning(action))
+    switch (DecidingBit(action))
     {
     case OrvixPromptAction::No:
         return (options & OrvixPromptOption::OnlyOK) == 0;

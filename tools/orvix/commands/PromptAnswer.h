@@ -4,21 +4,21 @@
 #include <optional>
 #include <string>
 
-/// The words of `orvix prompts` for what a prompt table stores in bits.
+/// The words of `orvix prompts` for the bits that a prompt table stores.
 namespace PromptAnswer
 {
 
-/// What a stored action stands for: "ask", "yes", "no", "yes-to-all" or "no-to-all".
+/// The word for a stored action (bits of `OrvixPromptAction`): "ask", "yes", "no", "yes-to-all" or "no-to-all".
 std::wstring InWords(std::uint32_t action);
 
-/// The action that stores an answer given in these words; nothing when they name none.
+/// The action that stores the answer of this word; empty when there is no such word.
 std::optional<std::uint32_t> Action(const std::wstring& words);
 
-/// Whether the options that go with a prompt (bits of `IOrvixServices::ShowPrompt`) offer what an action stands for, as
-/// docs/ui-contract.md says. Asking always is offered.
+/// Whether a prompt with these options (bits of `OrvixPromptOption`) offers the answer of an action. Asking is always
+/// offered.
 bool IsOffered(std::uint32_t options, std::uint32_t action);
 
-/// What the options offer.
+/// The words for the answers that the options offer.
 std::wstring OptionsInWords(std::uint32_t options);
 
 } // namespace PromptAnswer

@@ -17,10 +17,10 @@ using InstalledProviders::ServerName;
 using InstalledProviders::ServerPath;
 using InstalledProviders::Step;
 
-constexpr wchar_t OwnPlace[] = L"Software\\OrvixCore\\MSSCCI\\";
+constexpr wchar_t OwnKeys[] = L"Software\\OrvixCore\\MSSCCI\\";
 constexpr std::size_t MaxName = 255; // characters in the name of a key
 
-// A text that fills the library's buffer with its terminator would end the process of every host.
+// A longer text fills the library's buffer, which ends the process of every host.
 constexpr std::size_t MaxPath = InstalledProviders::MaxText - 2;
 
 void Check(LSTATUS status)
@@ -41,7 +41,7 @@ bool EqualNames(const std::wstring& left, const std::wstring& right)
     return PathKey(left) == PathKey(right);
 }
 
-/// A text that the library could read; nothing otherwise.
+/// A text of a provider's key; empty when the library would not read it.
 std::optional<std::wstring> ReadText(const std::wstring& keyPath, const wchar_t* valueName)
 {
     const UniqueRegistryKey key = InstalledProviders::OpenProvider(keyPath);
@@ -57,7 +57,7 @@ LSTATUS WriteText(const wchar_t* keyPath, const wchar_t* valueName, const std::w
                            static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t)));
 }
 
-/// Throws `ToolError` unless a host can use the library. None of its code runs.
+/// Throws `ToolError` when no host could use the library. None of the library's code runs.
 void CheckLibrary(const std::wstring& path)
 {
     if (path.size() > MaxPath)
@@ -67,23 +67,23 @@ void CheckLibrary(const std::wstring& path)
     }
     if (!PathExists(path) || IsFolder(path))
     {
-        throw ToolError(ExitCode::NoProject, L"no such library: " + path);
+        throw ToolError(ExitCode::NotFound, L"no such library: " + path);
     }
-    SetThreadErrorMode(SEM_FAILCRITICALERRORS, nullptr); // no message box about a damaged file
+    SetThreadErrorMode(SEM_FAILCRITICALERRORS, nullptr); // no message box for a damaged file
     const UniqueModule module(LoadLibraryExW(path.c_str(), nullptr, DONT_RESOLVE_DLL_REFERENCES));
     if (!module)
     {
-        throw ToolError(ExitCode::NoProject, L"not a 64-bit library: " + path);
+        throw ToolError(ExitCode::NotFound, L"not a 64-bit library: " + path);
     }
     if (GetProcAddress(module.Get(), SccFunctions::GetVersion.name) == nullptr)
     {
-        throw ToolError(ExitCode::NoProject, L"no MSSCCI library, it has no SccGetVersion: " + path);
+        throw ToolError(ExitCode::NotFound, L"no MSSCCI library, it has no SccGetVersion: " + path);
     }
 }
 
 } // namespace
 
-Registration::Registration(const std::wstring& name) : m_name(name), m_keyPath(OwnPlace + name)
+Registration::Registration(const std::wstring& name) : m_name(name), m_keyPath(OwnKeys + name)
 {
     const auto isForbidden = [](wchar_t c) { return c == L'\\' || c < 0x20 || (c >= 0x7F && c < 0xA0); };
     if (name.empty() || name.size() > MaxName || std::any_of(name.begin(), name.end(), isForbidden))
@@ -99,40 +99,50 @@ std::optional<std::wstring> Registration::Set(const std::wstring& library)
     const std::vector<Entry> list = ReadList();
     RefuseForeign(list);
     const bool isListed = std::any_of(list.begin(), list.end(), [this](const Entry& entry) { return IsOwn(entry); });
-    const std::optional<std::wstring> previousName = ReadText(m_keyPath, ServerName);
-    std::optional<std::wstring> previousPath = ReadText(m_keyPath, ServerPath);
+    const Previous previous{ReadText(m_keyPath, ServerName), ReadText(m_keyPath, ServerPath)};
     try
     {
-        Check(WriteText(m_keyPath.c_str(), ServerName, m_name));
-        Check(WriteText(m_keyPath.c_str(), ServerPath, library));
-        if (!isListed)
-        {
-            Check(WriteText(ListPath, m_name.c_str(), m_keyPath));
-        }
+        Write(library, isListed);
     }
     catch (const ToolError&)
     {
-        if (previousName)
-        {
-            WriteText(m_keyPath.c_str(), ServerName, *previousName);
-        }
-        if (previousPath)
-        {
-            WriteText(m_keyPath.c_str(), ServerPath, *previousPath);
-        }
-        if (!isListed && !previousName && !previousPath)
-        {
-            RegDeleteTreeW(HKEY_LOCAL_MACHINE, m_keyPath.c_str());
-        }
+        Restore(previous, isListed);
         throw;
     }
-    return previousPath;
+    return previous.path;
+}
+
+void Registration::Write(const std::wstring& library, bool isListed)
+{
+    Check(WriteText(m_keyPath.c_str(), ServerName, m_name));
+    Check(WriteText(m_keyPath.c_str(), ServerPath, library));
+    if (!isListed)
+    {
+        Check(WriteText(ListPath, m_name.c_str(), m_keyPath));
+    }
+}
+
+void Registration::Restore(const Previous& previous, bool isListed)
+{
+    if (previous.name)
+    {
+        WriteText(m_keyPath.c_str(), ServerName, *previous.name);
+    }
+    if (previous.path)
+    {
+        WriteText(m_keyPath.c_str(), ServerPath, *previous.path);
+    }
+    if (!isListed && !previous.name && !previous.path)
+    {
+        RegDeleteTreeW(HKEY_LOCAL_MACHINE, m_keyPath.c_str());
+    }
 }
 
 void Registration::Remove()
 {
     const std::vector<Entry> list = ReadList();
-    bool known = static_cast<bool>(InstalledProviders::OpenProvider(m_keyPath)); // also when an interrupted run has left it
+    // An interrupted run may have left the key without a value in the list.
+    bool known = static_cast<bool>(InstalledProviders::OpenProvider(m_keyPath));
     for (const Entry& entry : list)
     {
         if (IsOwn(entry))
@@ -144,7 +154,7 @@ void Registration::Remove()
     if (!known)
     {
         RefuseForeign(list);
-        throw ToolError(ExitCode::NoProject, L"no such registration: " + m_name);
+        throw ToolError(ExitCode::NotFound, L"no such registration: " + m_name);
     }
     const LSTATUS status = RegDeleteTreeW(HKEY_LOCAL_MACHINE, m_keyPath.c_str());
     Check(status == ERROR_FILE_NOT_FOUND ? ERROR_SUCCESS : status);
@@ -168,7 +178,7 @@ std::vector<Registration::Entry> Registration::ReadList()
             return list;
         }
         DWORD size = static_cast<DWORD>(name.size());
-        // A name that is too long for this is too long for the library, too.
+        // The library does not read a value with a longer name either.
         if (RegEnumValueW(key.Get(), index, name.data(), &size, nullptr, nullptr, nullptr, nullptr) == ERROR_SUCCESS)
         {
             list.push_back({name.data(), keyPath});

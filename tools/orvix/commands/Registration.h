@@ -5,34 +5,46 @@
 #include <vector>
 
 /// The registration of one MSSCCI library in the registry of this machine: a value in the list of installed libraries,
-/// and a key of its own below Software\OrvixCore\MSSCCI. What other programs have registered is never changed.
+/// and a key of its own below Software\OrvixCore\MSSCCI. What other programs registered is never changed.
 ///
-/// Names are compared without regard to case. Every operation throws `ToolError`: with `ExitCode::Failed` when the
-/// registry refuses, for want of administrator rights above all.
+/// Names are compared without regard to letter case. Every operation throws `ToolError`: with `ExitCode::Failed` when
+/// the registry refuses, most often because administrator rights are missing.
 class Registration
 {
 public:
-    /// Throws `ToolError` with `ExitCode::BadUsage` when nothing can have this name.
+    /// Throws `ToolError` with `ExitCode::BadUsage` when this is not a valid name.
     explicit Registration(const std::wstring& name);
 
-    /// Registers the library of this full path and returns the path that it replaces, if any. When it fails, what was
-    /// registered is as before. Throws `ToolError`: `ExitCode::NoProject` when there is no such library,
-    /// `ExitCode::Failed` when the name belongs to another program.
+    /// Registers the library of this full path. Returns the path that it replaces, if any. Throws `ToolError` and
+    /// leaves the registry as it was: with `ExitCode::NotFound` when there is no such library, with `ExitCode::Failed`
+    /// when the name belongs to another program.
     std::optional<std::wstring> Set(const std::wstring& library);
 
-    /// Takes the registration out. Throws `ToolError`: `ExitCode::NoProject` when there is none,
+    /// Removes the registration. Throws `ToolError`: with `ExitCode::NotFound` when there is none, with
     /// `ExitCode::Failed` when it belongs to another program.
     void Remove();
 
 private:
-    /// A value of the list.
+    /// A value of the list of installed libraries.
     struct Entry
     {
         std::wstring valueName;
-        std::wstring keyPath; ///< of the provider's own key; empty when it is no text
+        std::wstring keyPath; ///< of the provider's own key; empty when the value is not a text
+    };
+
+    /// What was registered under the own key.
+    struct Previous
+    {
+        std::optional<std::wstring> name;
+        std::optional<std::wstring> path;
     };
 
     static std::vector<Entry> ReadList();
+
+    void Write(const std::wstring& library, bool isListed);
+
+    /// Restores what was registered before a failed `Write`.
+    void Restore(const Previous& previous, bool isListed);
 
     bool IsOwn(const Entry& entry) const;
 

@@ -2,11 +2,12 @@
 
 #include "IOrvixServices.h"
 
-/// Replaces the stored answer of a prompt and puts it back at the end, so that what one run was told on its
-/// command line never becomes the user's stored answer. A locked answer stays as it is.
+/// Replaces the stored answer of a prompt and restores it at the end, so that an answer of the command line never
+/// becomes the user's stored answer. A locked answer stays as it is.
 class TemporaryAnswer
 {
 public:
+    /// `action`: bits of `OrvixPromptAction`. `services` must outlive this object.
     TemporaryAnswer(IOrvixServices& services, std::uint32_t prompt, std::uint32_t action)
         : m_services(services), m_prompt(prompt), m_previous(services.GetPromptAction(prompt))
     {

@@ -1,8 +1,10 @@
 #include "VetoRule.h"
 
 #include "FilePath.h"
+#include "NotificationText.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
+#include "OrvixNotificationID.h"
 #include "OrvixNotifyParams.h"
 
 #include <windows.h>
@@ -22,22 +24,20 @@ VetoRule::VetoRule(std::vector<std::wstring> patterns, std::wstring projectFolde
 
 std::uint32_t VetoRule::Notify(OrvixNotifyParams* params, std::int64_t)
 {
-    // Before notifications have the odd identifiers 13 to 21; a cancelled one needs no second veto.
-    const bool before = params->GetID() >= 13 && params->GetID() <= 21 && params->GetID() % 2 == 1;
     OrvixFileList* list = params->GetOrvixFileList();
-    if (!before || params->IsCancelled() || list == nullptr)
+    if (!NotificationText::IsBeforeOperation(params->GetID()) || params->IsCancelled() || list == nullptr)
     {
-        return 0;
+        return OrvixListenerAnswer::Accept;
     }
     for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
     {
         OrvixFileEntry* entry = list->GetActiveFileEntry(i);
         if (Forbids(entry->GetFile()))
         {
-            return 1;
+            return OrvixListenerAnswer::Veto;
         }
     }
-    return 0;
+    return OrvixListenerAnswer::Accept;
 }
 
 bool VetoRule::Forbids(const wchar_t* path)

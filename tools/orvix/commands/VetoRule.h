@@ -1,21 +1,21 @@
 #pragma once
 
-#include "Listener.h"
+#include "IOrvixNotifyCallback.h"
 
 #include <string>
 #include <vector>
 
-/// Vetoes an operation before it runs when one of its files matches a pattern.
-class VetoRule final : public Listener
+/// Vetoes an operation before it runs when the path of one of its files matches a pattern.
+class VetoRule final : public IOrvixNotifyCallback
 {
 public:
-    /// Patterns with "*" and "?", compared without regard to case: with a backslash or slash against the path
-    /// below `projectFolder`, otherwise against the file's name alone.
+    /// `patterns` may hold "*" and "?"; letter case does not count. A pattern with a backslash or slash is compared
+    /// with the path below `projectFolder`, any other with the name of the file.
     VetoRule(std::vector<std::wstring> patterns, std::wstring projectFolder);
 
     std::uint32_t Notify(OrvixNotifyParams* params, std::int64_t userData) override;
 
-    /// The file that caused a veto and the pattern that it matches; empty as long as there was none.
+    /// The file that caused a veto and the pattern that it matches; empty while there was no veto.
     const std::wstring& Reason() const { return m_reason; }
 
 private:

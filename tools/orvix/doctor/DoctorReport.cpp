@@ -9,39 +9,52 @@
 namespace
 {
 
-using Json = nlohmann::ordered_json; // in the order in which the guide names the members
+using Json = nlohmann::ordered_json; // the guide shows the members in this order
 
-std::size_t CountProblems(const DoctorReport::Place& place)
+std::size_t CountProblems(const DoctorReport::Subject& subject)
 {
-    return static_cast<std::size_t>(std::count_if(place.findings.begin(), place.findings.end(),
+    return static_cast<std::size_t>(std::count_if(subject.findings.begin(), subject.findings.end(),
                                                   [](const auto& finding) { return finding.isProblem; }));
 }
 
-void PrintFindings(std::ostream& stream, const DoctorReport::Place& place, const OutputStyle& style)
+void PrintFindings(std::ostream& stream, const DoctorReport::Subject& subject, const OutputStyle& style)
 {
-    for (const DoctorReport::Finding& finding : place.findings)
+    for (const DoctorReport::Finding& finding : subject.findings)
     {
-        const std::string severity = finding.isProblem ? style.Painted("problem", Listing::Tone::Bad)
-                                                       : style.Painted("note", Listing::Tone::Quiet);
+        const std::string severity = finding.isProblem ? style.Coloured("problem", Listing::Tone::Bad)
+                                                       : style.Coloured("note", Listing::Tone::Quiet);
         style.PrintLine(stream, "  " + severity + ": " + Printable(finding.text) + " [" + finding.code + "]");
     }
 }
 
-Json ToJson(const DoctorReport::Place& place)
+void PrintCandidate(std::ostream& stream, const DoctorReport::Candidate& candidate, const OutputStyle& style)
+{
+    const std::string name = candidate.name ? '"' + Printable(*candidate.name) + '"' : "";
+    style.PrintLine(stream, candidate.kind + ": " + Printable(candidate.location));
+    style.PrintLine(stream, candidate.listed ? "  " + style.Coloured("listed", Listing::Tone::Good) + " as " + name
+                                             : "  not listed" + (name.empty() ? "" : " (" + name + ")"));
+    if (candidate.contractVersion)
+    {
+        style.PrintLine(stream, "  contract version " + std::to_string(*candidate.contractVersion));
+    }
+    PrintFindings(stream, candidate, style);
+}
+
+Json ToJson(const DoctorReport::Subject& subject)
 {
     Json findings = Json::array();
-    for (const DoctorReport::Finding& finding : place.findings)
+    for (const DoctorReport::Finding& finding : subject.findings)
     {
         findings.push_back({{"code", finding.code},
                             {"severity", finding.isProblem ? "problem" : "note"},
                             {"text", Utf8(finding.text)}});
     }
-    return {{"kind", place.kind}, {"location", Utf8(place.location)}, {"findings", std::move(findings)}};
+    return {{"kind", subject.kind}, {"location", Utf8(subject.location)}, {"findings", std::move(findings)}};
 }
 
 Json ToJson(const DoctorReport::Candidate& candidate)
 {
-    Json json = ToJson(static_cast<const DoctorReport::Place&>(candidate));
+    Json json = ToJson(static_cast<const DoctorReport::Subject&>(candidate));
     json["name"] = candidate.name ? Json(Utf8(*candidate.name)) : Json();
     json["listed"] = candidate.listed;
     json["contractVersion"] = candidate.contractVersion ? Json(*candidate.contractVersion) : Json();
@@ -64,9 +77,9 @@ std::size_t DoctorReport::NumListed() const
 std::size_t DoctorReport::NumProblems() const
 {
     std::size_t count = 0;
-    for (const Place& place : places)
+    for (const Subject& subject : locations)
     {
-        count += CountProblems(place);
+        count += CountProblems(subject);
     }
     for (const Candidate& candidate : candidates)
     {
@@ -77,22 +90,14 @@ std::size_t DoctorReport::NumProblems() const
 
 void DoctorReport::PrintText(std::ostream& stream, const OutputStyle& style) const
 {
-    for (const Place& place : places)
+    for (const Subject& subject : locations)
     {
-        style.PrintLine(stream, place.kind + ": " + Printable(place.location));
-        PrintFindings(stream, place, style);
+        style.PrintLine(stream, subject.kind + ": " + Printable(subject.location));
+        PrintFindings(stream, subject, style);
     }
     for (const Candidate& candidate : candidates)
     {
-        const std::string name = candidate.name ? '"' + Printable(*candidate.name) + '"' : "";
-        style.PrintLine(stream, candidate.kind + ": " + Printable(candidate.location));
-        style.PrintLine(stream, candidate.listed ? "  " + style.Painted("listed", Listing::Tone::Good) + " as " + name
-                                                 : "  not listed" + (name.empty() ? "" : " (" + name + ")"));
-        if (candidate.contractVersion)
-        {
-            style.PrintLine(stream, "  contract version " + std::to_string(*candidate.contractVersion));
-        }
-        PrintFindings(stream, candidate, style);
+        PrintCandidate(stream, candidate, style);
     }
     style.PrintLine(stream, Counted(candidates.size(), "candidate") + ", " + std::to_string(NumListed()) + " listed, " +
                                 Counted(NumProblems(), "problem"));
@@ -101,9 +106,9 @@ void DoctorReport::PrintText(std::ostream& stream, const OutputStyle& style) con
 void DoctorReport::PrintJson(std::ostream& stream) const
 {
     Json report = {{"places", Json::array()}, {"candidates", Json::array()}};
-    for (const Place& place : places)
+    for (const Subject& subject : locations)
     {
-        report["places"].push_back(ToJson(place));
+        report["places"].push_back(ToJson(subject));
     }
     for (const Candidate& candidate : candidates)
     {

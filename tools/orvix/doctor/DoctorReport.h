@@ -9,21 +9,21 @@
 #include <string>
 #include <vector>
 
-/// What `orvix doctor` has found; docs/doctor.md says what each code means.
+/// The findings of `orvix doctor`. docs/doctor.md says what each code means.
 struct DoctorReport
 {
     struct Finding
     {
-        bool isProblem = false; ///< else a note: what is so on purpose, or does no harm
+        bool isProblem = false; ///< else a note: an explanation, or something harmless
         std::string code;       ///< stable, for scripts
         std::wstring text;
     };
 
-    /// A place that the library looks at.
-    struct Place
+    /// Something that was examined.
+    struct Subject
     {
         std::string kind;
-        std::wstring location;
+        std::wstring location; ///< path of a file, folder or key; for a value of the registry list its name
         std::vector<Finding> findings;
 
         void AddProblem(const char* code, std::wstring text) { findings.push_back({true, code, std::move(text)}); }
@@ -31,20 +31,20 @@ struct DoctorReport
     };
 
     /// Something that may be a provider.
-    struct Candidate : Place
+    struct Candidate : Subject
     {
-        std::optional<std::wstring> name; ///< of the provider, as far as it is known
+        std::optional<std::wstring> name; ///< of the provider, if it is known
         bool listed = false;
         std::optional<std::int32_t> contractVersion; ///< of a plug-in that could be asked
     };
 
-    std::vector<Place> places;
+    std::vector<Subject> locations; ///< where the library reads: files, a folder, a key of the registry
     std::vector<Candidate> candidates;
 
     std::size_t NumListed() const;
     std::size_t NumProblems() const;
 
-    /// Prints everything for people, with the summary as the last line.
+    /// Prints everything for people. The last line is the summary.
     void PrintText(std::ostream& stream, const OutputStyle& style) const;
 
     /// Prints everything as one JSON object.

@@ -2,6 +2,7 @@
 
 #include "FilePath.h"
 #include "IsolatedLoad.h"
+#include "ModulePath.h"
 #include "Text.h"
 
 #include <windows.h>
@@ -17,18 +18,18 @@ namespace
 constexpr std::size_t MaxName = 260;
 constexpr std::size_t MaxImports = 1000;
 
-/// A program file that is read piece by piece.
+/// Reads parts of a program file.
 class ImageReader
 {
 public:
     explicit ImageReader(const std::wstring& path) : m_stream(std::filesystem::path(path), std::ios::binary) {}
 
-    template <typename Piece>
-    bool Read(std::uint64_t offset, Piece& piece)
+    template <typename Part>
+    bool Read(std::uint64_t offset, Part& part)
     {
         m_stream.clear();
         m_stream.seekg(static_cast<std::streamoff>(offset));
-        return static_cast<bool>(m_stream.read(reinterpret_cast<char*>(&piece), sizeof piece));
+        return static_cast<bool>(m_stream.read(reinterpret_cast<char*>(&part), sizeof part));
     }
 
     bool ReadSections(std::uint64_t offset, unsigned int count)
@@ -44,7 +45,7 @@ public:
         return true;
     }
 
-    /// Where in the file an address of the loaded image lies; nothing when it lies in none of its sections.
+    /// The offset in the file of an address of the loaded image; empty when no section holds the address.
     std::optional<std::uint64_t> OffsetOf(DWORD address) const
     {
         for (const IMAGE_SECTION_HEADER& section : m_sections)
@@ -87,13 +88,15 @@ std::vector<std::string> ReadImports(ImageReader& reader, DWORD address)
     return names;
 }
 
-bool IsOfWindows(const std::wstring& path)
+bool IsInWindowsFolder(const std::wstring& path)
 {
     std::wstring folder(MAX_PATH, L'\0');
     folder.resize(GetWindowsDirectoryW(folder.data(), static_cast<UINT>(folder.size())));
     return PathBelow(folder, path) != path;
 }
 
+/// Adds what is missing for the library of this path, and follows each library that is there. `seen` holds the keys of
+/// the names examined so far.
 void AddMissing(const std::wstring& path, const std::wstring& shownAs, const UniqueActivationContext& context,
                 std::set<std::wstring>& seen, std::vector<LibraryImage::Missing>& missing)
 {
@@ -114,7 +117,7 @@ void AddMissing(const std::wstring& path, const std::wstring& shownAs, const Uni
         {
             missing.push_back({name, shownAs, GetLastError()});
         }
-        else if (const std::wstring found = ModulePath(module.Get()); !IsOfWindows(found))
+        else if (const std::wstring found = ModulePath(module.Get()); !IsInWindowsFolder(found))
         {
             AddMissing(found, name, context, seen, missing);
         }
@@ -132,16 +135,16 @@ std::optional<LibraryImage> LibraryImage::Read(const std::wstring& path)
         return std::nullopt;
     }
     const auto offset = static_cast<std::uint64_t>(start.e_lfanew);
-    IMAGE_NT_HEADERS64 headers = {};
     struct
     {
         DWORD signature;
         IMAGE_FILE_HEADER file;
-    } beginning = {}; // as long for every kind of process
+    } beginning = {}; // the same for every machine
     if (!reader.Read(offset, beginning) || beginning.signature != IMAGE_NT_SIGNATURE)
     {
         return std::nullopt;
     }
+    IMAGE_NT_HEADERS64 headers = {};
     LibraryImage image;
     image.machine = beginning.file.Machine;
     if (image.IsFor64Bit() && reader.Read(offset, headers) &&

@@ -7,15 +7,16 @@
 #include <string>
 #include <vector>
 
-/// What the headers of a library file say. The file is read, never loaded, and nothing in it is trusted.
+/// The headers of a library file. The file is read, never loaded, and nothing in it is trusted.
 struct LibraryImage
 {
-    /// Nothing when the file cannot be read or is no program file of Windows.
+    /// Reads the file of this path. Empty when it cannot be read or is not a Windows program file.
     static std::optional<LibraryImage> Read(const std::wstring& path);
 
-    bool IsFor64Bit() const; ///< whether it is made for this kind of process
+    /// Whether a 64-bit (x64) process can load it.
+    bool IsFor64Bit() const;
 
-    std::uint16_t machine = 0;        ///< as the file says, one of IMAGE_FILE_MACHINE_...
+    std::uint16_t machine = 0;        ///< one of IMAGE_FILE_MACHINE_...
     std::vector<std::string> imports; ///< names of the libraries that it needs when it is loaded, in the file's order
 
     /// A library that another one needs.
@@ -23,11 +24,11 @@ struct LibraryImage
     {
         std::wstring name;
         std::wstring neededBy;
-        unsigned long error; ///< of the system
+        unsigned long error; ///< the system's, when it is loaded
     };
 
     /// The libraries that are missing for the library of this path, among those that it needs and those that these
-    /// need; Windows' own are not looked into. The system searches for them as it does for a library that is being
-    /// loaded in this context; none of their code runs.
+    /// need. What Windows' own libraries need is not examined. The system searches for them as it does when it loads a
+    /// library in this context; none of their code runs.
     static std::vector<Missing> FindMissing(const std::wstring& path, const UniqueActivationContext& context);
 };

@@ -10,19 +10,19 @@
 namespace
 {
 
-// The service's streaming reader, as its published headers give it. It tells the position of a fault on every system;
-// the document object model does so on some alone.
+// The service's streaming reader, from its published headers. It reports the position of a fault on every system; the
+// document object model does so on some of them only.
 constexpr CLSID ClassReader = {0x079AA557, 0x4A18, 0x424A, {0x8E, 0xEE, 0xE3, 0x9F, 0x0A, 0x8D, 0x41, 0xB9}};
 constexpr IID InterfaceReader = {0xA4F96ED0, 0xF829, 0x476E, {0x81, 0xC0, 0xCD, 0xC7, 0xBD, 0x2A, 0x08, 0x02}};
 constexpr IID InterfaceContentHandler = {0x1545CDFA, 0x9E4E, 0x4497, {0xA8, 0xA4, 0x2B, 0xF7, 0xD0, 0x11, 0x2C, 0x44}};
 constexpr IID InterfaceErrorHandler = {0xA60511C4, 0xCCF5, 0x479E, {0x98, 0xA3, 0xDC, 0x8D, 0xC5, 0x45, 0xB7, 0xD0}};
 
-/// Keeps the first fault that a reader meets, and ends the reading behind so many characters of text. Lives on the
-/// stack: nobody else owns it.
+/// Stores the first fault that a reader finds, and ends the reading after a number of characters. It lives on the
+/// stack, so its references are not counted.
 class FirstFault final : public ISAXErrorHandler, public ISAXContentHandler
 {
 public:
-    explicit FirstFault(std::uintmax_t maxText) : m_room(maxText) {}
+    explicit FirstFault(std::uintmax_t maxText) : m_remaining(maxText) {}
     FirstFault(const FirstFault&) = delete;
     FirstFault& operator=(const FirstFault&) = delete;
     ~FirstFault() = default;
@@ -52,7 +52,7 @@ public:
     }
     HRESULT STDMETHODCALLTYPE fatalError(ISAXLocator* locator, const wchar_t* message, HRESULT code) override
     {
-        if (!m_fault && code != Ended)
+        if (!m_fault && code != ReadingEnded)
         {
             m_fault.emplace();
             locator->getLineNumber(&m_fault->line);
@@ -96,21 +96,21 @@ public:
     HRESULT STDMETHODCALLTYPE skippedEntity(const wchar_t*, int) override { return S_OK; }
 
 private:
-    static constexpr HRESULT Ended = E_ABORT;
+    static constexpr HRESULT ReadingEnded = E_ABORT;
 
     HRESULT Count(int length)
     {
-        m_isFull = m_isFull || static_cast<std::uintmax_t>(length) > m_room;
-        m_room -= m_isFull ? 0 : static_cast<std::uintmax_t>(length);
-        return m_isFull ? Ended : S_OK;
+        m_isFull = m_isFull || static_cast<std::uintmax_t>(length) > m_remaining;
+        m_remaining -= m_isFull ? 0 : static_cast<std::uintmax_t>(length);
+        return m_isFull ? ReadingEnded : S_OK;
     }
 
     std::optional<XmlFault> m_fault;
-    std::uintmax_t m_room; // characters that may still come
+    std::uintmax_t m_remaining; // characters that may still be read
     bool m_isFull = false;
 };
 
-/// COM on this thread, for a scope.
+/// Initialises COM on this thread for a scope.
 class ComScope
 {
 public:

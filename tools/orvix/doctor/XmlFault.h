@@ -4,11 +4,11 @@
 #include <optional>
 #include <string>
 
-/// Where an XML file is not well-formed, and why, as the system's XML service says.
+/// A place where an XML file is not well-formed, and the reason, from the system's XML service.
 struct XmlFault
 {
-    /// The first fault of a file; nothing when the service names none, and when more than `maxText` characters of texts
-    /// and attribute values stand before it, with entities replaced. COM is initialised for the call.
+    /// The first fault of a file. Empty when the service reports none, and when more than `maxText` characters of texts
+    /// and attribute values, with entities replaced, come before it. COM is initialised for the call.
     static std::optional<XmlFault> Find(const std::wstring& path, std::uintmax_t maxText);
 
     int line = 0;

@@ -2,8 +2,8 @@
 
 #include <windows.h>
 
-/// Makes the console show UTF-8, and gives it its own code page back at the end. Without a console nothing
-/// happens: pipes and files get plain UTF-8.
+/// Makes the console show UTF-8, and restores its code page at the end. Without a console nothing happens: pipes and
+/// files get plain UTF-8.
 class ConsoleCodePage
 {
 public:

@@ -9,6 +9,7 @@ namespace
 
 using Json = nlohmann::ordered_json;
 
+/// The value of a cell's own field.
 Json ValueOf(const Listing::Cell& cell)
 {
     struct
@@ -17,13 +18,29 @@ Json ValueOf(const Listing::Cell& cell)
         Json operator()(std::int64_t number) const { return number; }
         Json operator()(bool yes) const { return yes; }
         Json operator()(const std::wstring& text) const { return Utf8(text); }
+        Json operator()(const Listing::State& state) const { return state.words; }
     } const asJson;
     return std::visit(asJson, cell.value);
 }
 
+Json ObjectOf(const std::vector<Listing::Cell>& row, const std::vector<Listing::Column>& columns)
+{
+    Json object = Json::object();
+    for (std::size_t column = 0; column < row.size(); ++column)
+    {
+        const std::string key = columns[column].key;
+        object[key] = ValueOf(row[column]);
+        if (const auto* state = std::get_if<Listing::State>(&row[column].value))
+        {
+            object[key + "Text"] = Utf8(state->text);
+        }
+    }
+    return object;
+}
+
 } // namespace
 
-void JsonOutput::Say(std::wstring_view text)
+void JsonOutput::Print(std::wstring_view text)
 {
     m_lines.push_back(Utf8(text));
 }
@@ -33,12 +50,7 @@ void JsonOutput::Show(const Listing& listing)
     Json rows = Json::array();
     for (const std::vector<Listing::Cell>& row : listing.rows)
     {
-        Json object = Json::object();
-        for (std::size_t column = 0; column < row.size(); ++column)
-        {
-            object[listing.columns[column].key] = ValueOf(row[column]);
-        }
-        rows.push_back(std::move(object));
+        rows.push_back(ObjectOf(row, listing.columns));
     }
     Json summary = Json::object();
     for (const Listing::Count& count : listing.summary)

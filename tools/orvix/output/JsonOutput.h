@@ -6,14 +6,15 @@
 #include <string>
 #include <vector>
 
-/// Results for programs: one JSON object, in UTF-8, as docs/orvix.md describes it.
+/// Prints results for programs: one JSON object in UTF-8, which docs/orvix.md describes.
 class JsonOutput final : public Output
 {
 public:
+    /// `stream` must outlive this object.
     explicit JsonOutput(std::ostream& stream) : m_stream(stream) {}
 
-    /// Kept for the object's "lines".
-    void Say(std::wstring_view text) override;
+    /// Stores the text for the object's "lines".
+    void Print(std::wstring_view text) override;
     void Progress(std::wstring_view) override {}
 
     /// Prints the object.

@@ -4,7 +4,7 @@
 
 #include <string_view>
 
-/// Where a command's results go.
+/// Prints the result of a command.
 class Output
 {
 public:
@@ -13,12 +13,12 @@ public:
     Output& operator=(const Output&) = delete;
     virtual ~Output() = default;
 
-    /// What somebody says while the command runs: the provider, or a listener. May have several lines.
-    virtual void Say(std::wstring_view text) = 0;
+    /// Prints text of the provider or of a listener while the command runs. It may have several lines.
+    virtual void Print(std::wstring_view text) = 0;
 
-    /// What the command is at, for a person who waits. It disappears with the next thing to print; empty: now.
+    /// Shows a person who waits what the command does now. The next output replaces it; an empty text removes it.
     virtual void Progress(std::wstring_view text) = 0;
 
-    /// The result of the command, once and at the end.
+    /// Prints the result of the command. Called once, at the end.
     virtual void Show(const Listing& listing) = 0;
 };

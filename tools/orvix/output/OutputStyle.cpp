@@ -22,7 +22,7 @@ const char* Sequence(Listing::Tone tone)
 
 } // namespace
 
-std::string OutputStyle::Painted(const std::string& text, Listing::Tone tone) const
+std::string OutputStyle::Coloured(const std::string& text, Listing::Tone tone) const
 {
     return colour && tone != Listing::Tone::Plain ? Sequence(tone) + text + "\x1b[0m" : text;
 }
@@ -32,6 +32,6 @@ void OutputStyle::PrintLine(std::ostream& stream, const std::string& line) const
     stream << line << '\n';
     if (width)
     {
-        stream.flush(); // in whole lines: a letter whose bytes are written apart is lost on a terminal
+        stream.flush(); // line by line: a terminal loses a character whose bytes arrive in two writes
     }
 }

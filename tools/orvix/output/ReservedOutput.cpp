@@ -11,7 +11,8 @@
 namespace
 {
 
-constexpr int StandardOutput = 1; // descriptors
+// File descriptors of the C library.
+constexpr int StandardOutput = 1;
 constexpr int StandardError = 2;
 
 constexpr std::size_t MaxPiece = 0x10000; // bytes written at once
@@ -22,7 +23,7 @@ ReservedOutput::ReservedOutput() : m_output(_dup(StandardOutput))
 {
     std::fflush(stdout);
     _dup2(StandardError, StandardOutput);
-    // Other C libraries take the handle for theirs.
+    // Every C library in the process uses this handle for its own standard output.
     SetStdHandle(STD_OUTPUT_HANDLE, GetStdHandle(STD_ERROR_HANDLE));
 }
 

@@ -3,8 +3,8 @@
 #include <ostream>
 #include <sstream>
 
-/// The standard output, reserved for one document: what anybody else in the process prints there, from the beginning of
-/// this object to the end of the process, goes to the error output.
+/// The standard output, reserved for one document. What anything else in the process prints there goes to the error
+/// output, from the construction of this object to the end of the process.
 class ReservedOutput
 {
 public:
@@ -13,10 +13,10 @@ public:
     ReservedOutput& operator=(const ReservedOutput&) = delete;
     ~ReservedOutput();
 
-    /// Where the document is written, in UTF-8.
+    /// The stream for the document, which is UTF-8.
     std::ostream& Stream() { return m_document; }
 
-    /// Prints the document; called once. False when it cannot be written.
+    /// Prints the document. Called once. False when it cannot be written.
     bool Print();
 
 private:

@@ -10,7 +10,8 @@ namespace
 {
 
 constexpr std::size_t LineBuffer = 0x10000; // bytes, more than a line has
-}
+
+} // namespace
 
 Terminal::Terminal()
     : m_output(GetStdHandle(STD_OUTPUT_HANDLE)), m_isTerminal(GetConsoleMode(m_output, &m_previousMode) != 0),
@@ -19,7 +20,7 @@ Terminal::Terminal()
 {
     if (m_isTerminal)
     {
-        // The C library would take UTF-8 for single bytes, and write them one by one.
+        // In text mode the C library writes UTF-8 one byte at a time.
         _setmode(_fileno(stdout), _O_BINARY);
         std::setvbuf(stdout, nullptr, _IOFBF, LineBuffer);
     }

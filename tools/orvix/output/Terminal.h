@@ -4,7 +4,7 @@
 
 #include <windows.h>
 
-/// The terminal behind the standard output, if there is one; made to obey escape sequences for the life of this object.
+/// The terminal that shows the standard output, if there is one. It obeys escape sequences while this object lives.
 class Terminal
 {
 public:
@@ -13,11 +13,11 @@ public:
     Terminal& operator=(const Terminal&) = delete;
     ~Terminal();
 
-    /// How the standard output is laid out now. `noColor`: the user wants no colours.
+    /// The style for the standard output now. `noColor`: the user wants no colours.
     OutputStyle Style(bool noColor) const;
 
 private:
-    HANDLE m_output;
+    HANDLE m_output; // not owned
     DWORD m_previousMode = 0;
     bool m_isTerminal;
     bool m_obeysSequences;

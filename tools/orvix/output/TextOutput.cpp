@@ -22,7 +22,7 @@ void PrintSummary(std::ostream& stream, const std::vector<Listing::Count>& count
 
 } // namespace
 
-void TextOutput::Say(std::wstring_view text)
+void TextOutput::Print(std::wstring_view text)
 {
     Progress({});
     m_stream << PrintableLines(text) << '\n' << std::flush;

@@ -5,18 +5,19 @@
 
 #include <ostream>
 
-/// Results for people: lines as they come, then a table with a summary below.
+/// Prints results for people: texts when they arrive, then a table with a summary below it.
 class TextOutput final : public Output
 {
 public:
+    /// `stream` must outlive this object.
     TextOutput(std::ostream& stream, OutputStyle style) : m_stream(stream), m_style(style) {}
     TextOutput(const TextOutput&) = delete;
     TextOutput& operator=(const TextOutput&) = delete;
     ~TextOutput() override { TextOutput::Progress({}); }
 
-    void Say(std::wstring_view text) override;
+    void Print(std::wstring_view text) override;
 
-    /// Shown on a terminal only.
+    /// Shows the text on a terminal only.
     void Progress(std::wstring_view text) override;
 
     void Show(const Listing& listing) override;

@@ -14,7 +14,7 @@ constexpr std::size_t Gap = 2;       // columns between two cells
 constexpr std::size_t Narrowest = 8; // columns that a cell keeps on the narrowest terminal
 constexpr wchar_t Ellipsis = L'\x2026';
 
-/// The text with a blank in place of each line end.
+/// The text with a blank instead of each line end.
 std::wstring OnOneLine(std::wstring text)
 {
     for (std::size_t end = 0; (end = text.find_first_of(L"\r\n", end)) != std::wstring::npos;)
@@ -32,11 +32,13 @@ std::wstring TextOf(const Listing::Cell& cell)
         std::wstring operator()(std::int64_t number) const { return std::to_wstring(number); }
         std::wstring operator()(bool yes) const { return yes ? L"yes" : L"no"; }
         std::wstring operator()(const std::wstring& text) const { return OnOneLine(text); }
+        std::wstring operator()(const Listing::State& state) const { return OnOneLine(state.text); }
     } const inWords;
     return std::visit(inWords, cell.value);
 }
 
-/// Columns of one UTF-16 unit. Both halves of a pair count as one each: most of what pairs stand for is wide.
+/// Columns of one UTF-16 unit. Each half of a surrogate pair counts as one, since most characters above U+FFFF are
+/// wide.
 std::size_t ColumnsOfUnit(wchar_t unit)
 {
     WORD type = 0;
@@ -81,7 +83,7 @@ void TextTable::Print(std::ostream& stream, const OutputStyle& style) const
         for (std::size_t column = 0; column < row.size(); ++column)
         {
             const std::wstring text = Shortened(row[column].text, widths[column]);
-            line += style.Painted(Printable(text), row[column].tone);
+            line += style.Coloured(Printable(text), row[column].tone);
             if (column + 1 < row.size())
             {
                 line.append(widths[column] + Gap - ColumnsOf(text), ' ');
@@ -131,7 +133,7 @@ std::wstring TextTable::Shortened(std::wstring_view text, std::size_t columns)
     {
         return L"";
     }
-    // The end gets the odd column: it tells more of a path than the beginning.
+    // An odd column goes to the end, which says more about a path than its beginning.
     std::wstring_view head = text;
     while (!head.empty() && ColumnsOf(head) > (columns - 1) / 2)
     {

@@ -6,7 +6,7 @@ void ClientAccess::OutputText(const wchar_t* text, int)
 {
     if (text != nullptr)
     {
-        m_output.Say(text);
+        m_output.Print(text);
     }
 }
 

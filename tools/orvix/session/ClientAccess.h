@@ -7,7 +7,7 @@
 class ClientAccess final : public IOrvixClientAccess
 {
 public:
-    /// `output` must outlive this object.
+    /// `unattended`: nobody answers dialogs. `output` prints the text of providers and must outlive this object.
     ClientAccess(bool unattended, Output& output) : m_unattended(unattended), m_output(output) {}
 
     void OutputText(const wchar_t* text, int kind) override;

@@ -1,6 +1,7 @@
 #include "HostSession.h"
 
 #include "FilePath.h"
+#include "ModulePath.h"
 #include "OrvixProviderSource.h"
 #include "ToolError.h"
 
@@ -25,7 +26,7 @@ std::wstring DefaultConfig()
     const wchar_t* applicationData = _wgetenv(L"APPDATA");
     if (applicationData == nullptr || *applicationData == L'\0')
     {
-        throw ToolError(ExitCode::NoProject, L"%APPDATA% is not set; name a folder with --config");
+        throw ToolError(ExitCode::NotFound, L"%APPDATA% is not set; name a folder with --config");
     }
     return std::wstring(applicationData) + L"\\OrvixCore";
 }
@@ -44,39 +45,60 @@ HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_acc
 {
     if ((commandLine.sources & OrvixProviderSource::Plugins) != 0)
     {
-        const std::wstring plugins = PluginFolder(commandLine);
-        if (!IsFolder(plugins))
-        {
-            throw ToolError(ExitCode::NoProject, L"no such plug-in folder: " + plugins);
-        }
-        m_client.SetProviderPluginPath((plugins + L'\\').c_str());
-        m_searched = plugins;
+        UsePlugins(commandLine);
     }
     if ((commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
     {
         m_searched += m_searched.empty() ? L"" : L" or ";
         m_searched += L"the registry's list of MSSCCI libraries";
     }
-    const std::wstring config = ConfigFolder(commandLine);
-    std::error_code error;
-    std::filesystem::create_directories(config, error);
-    if (!IsFolder(config))
-    {
-        throw ToolError(ExitCode::NoProject, L"cannot make the configuration folder: " + config);
-    }
-
+    UseConfiguration(commandLine);
     m_client.SetClientName(L"orvix");
     m_client.SetUserName((commandLine.user.empty() ? WindowsUser() : commandLine.user).c_str());
-    m_client.SetConfigFilePath(config.c_str());
     m_client.SetParentWindow(GetConsoleWindow());
     m_client.SetIOrvixClientAccess(&m_access);
 
-    m_services.reset(GetIOrvixServices());
+    m_services = MakeOrvixServices();
     if (!m_services)
     {
         throw std::bad_alloc();
     }
     m_services->Initialize(&m_client, commandLine.sources);
+}
+
+HostSession::~HostSession()
+{
+    try
+    {
+        m_services->Shutdown();
+    }
+    catch (const _com_error&)
+    {
+        std::cerr << "orvix: the stored answers cannot be saved: out of memory\n";
+    }
+}
+
+void HostSession::UsePlugins(const CommandLine& commandLine)
+{
+    const std::wstring folder = PluginFolder(commandLine);
+    if (!IsFolder(folder))
+    {
+        throw ToolError(ExitCode::NotFound, L"no such plug-in folder: " + folder);
+    }
+    m_client.SetProviderPluginPath((folder + L'\\').c_str());
+    m_searched = folder;
+}
+
+void HostSession::UseConfiguration(const CommandLine& commandLine)
+{
+    const std::wstring folder = ConfigFolder(commandLine);
+    std::error_code ignored;
+    std::filesystem::create_directories(folder, ignored);
+    if (!IsFolder(folder))
+    {
+        throw ToolError(ExitCode::NotFound, L"cannot make the configuration folder: " + folder);
+    }
+    m_client.SetConfigFilePath(folder.c_str());
 }
 
 std::wstring HostSession::PluginFolder(const CommandLine& commandLine)
@@ -94,7 +116,7 @@ std::uint32_t HostSession::FindProvider(const std::wstring& nameOrIndex)
     const std::uint32_t count = m_services->GetProviderCount();
     if (count == 0)
     {
-        throw ToolError(ExitCode::NoProject, L"no provider in " + m_searched);
+        throw ToolError(ExitCode::NotFound, L"no provider in " + m_searched);
     }
     for (std::uint32_t index = 0; index < count; ++index)
     {
@@ -104,18 +126,5 @@ std::uint32_t HostSession::FindProvider(const std::wstring& nameOrIndex)
             return index;
         }
     }
-    throw ToolError(ExitCode::NoProject, L"no such provider: " + nameOrIndex + L" (see orvix providers)");
-}
-
-void HostSession::Release::operator()(IOrvixServices* services) const
-{
-    try
-    {
-        services->Shutdown();
-    }
-    catch (const _com_error&)
-    {
-        std::cerr << "orvix: the stored answers cannot be saved: out of memory\n";
-    }
-    ReleaseIOrvixServices(services);
+    throw ToolError(ExitCode::NotFound, L"no such provider: " + nameOrIndex + L" (see orvix providers)");
 }

@@ -2,42 +2,43 @@
 
 #include "ClientAccess.h"
 #include "CommandLine.h"
-#include "IOrvixServices.h"
 #include "OrvixClientInfo.h"
+#include "OrvixServicesPointer.h"
 
-#include <memory>
 #include <string>
 
-/// The services object of one run, initialised with what the command line says; shut down (which saves the
-/// stored answers) and released at the end.
+/// The services object of one run, initialised from the command line. At the end it is shut down, which saves the
+/// stored answers, and released.
 class HostSession
 {
 public:
-    /// Makes the configuration folder when it is missing. Throws `ToolError` with `ExitCode::NoProject` when
-    /// that fails or the plug-in folder, if wanted, does not exist. The providers' text goes to `output`, which must
-    /// outlive this object.
+    /// Makes the configuration folder when it is missing. `output` prints the text of providers and must outlive this
+    /// object. Throws `ToolError` with `ExitCode::NotFound` when the folder cannot be made, and when plug-ins are
+    /// wanted and their folder does not exist.
     HostSession(const CommandLine& commandLine, Output& output);
+    HostSession(const HostSession&) = delete;
+    HostSession& operator=(const HostSession&) = delete;
+    ~HostSession();
 
     /// The full path of the folder that a run with this command line uses, whether it exists or not. Throws `ToolError`
-    /// with `ExitCode::NoProject` when none is named and there is no default.
+    /// with `ExitCode::NotFound` when none is named and there is no default.
     static std::wstring PluginFolder(const CommandLine& commandLine);
     static std::wstring ConfigFolder(const CommandLine& commandLine);
 
+    // Both are valid as long as this object.
     IOrvixServices& Services() { return *m_services; }
     OrvixClientInfo& Client() { return m_client; }
 
-    /// Index of the provider named by name (in any letter case) or index; the first for an empty text.
-    /// Throws `ToolError` with `ExitCode::NoProject`.
+    /// Index of the provider with this name (in any letter case) or index; the first provider for an empty text. Throws
+    /// `ToolError` with `ExitCode::NotFound`.
     std::uint32_t FindProvider(const std::wstring& nameOrIndex);
 
 private:
-    struct Release
-    {
-        void operator()(IOrvixServices* services) const;
-    };
+    void UsePlugins(const CommandLine& commandLine);
+    void UseConfiguration(const CommandLine& commandLine);
 
     ClientAccess m_access;
     OrvixClientInfo m_client;
-    std::wstring m_searched; // where providers were looked for, in words
-    std::unique_ptr<IOrvixServices, Release> m_services;
+    std::wstring m_searched; // where providers were searched, for messages
+    OrvixServicesPointer m_services;
 };

@@ -5,26 +5,32 @@
 
 #include <string>
 
-/// A provider with a project open; closed at the end.
+/// A provider with an open project. At the end the project is closed.
 class ProjectSession
 {
 public:
-    /// Throws `ToolError` with `ExitCode::NoProject` when there is no such provider or project, or the
-    /// provider refuses. `host` must outlive this object.
+    /// `host` must outlive this object. Throws `ToolError` with `ExitCode::NotFound` when there is no such provider or
+    /// project folder, and when the provider does not start or does not open the project.
     ProjectSession(HostSession& host, const CommandLine& commandLine);
     ProjectSession(const ProjectSession&) = delete;
     ProjectSession& operator=(const ProjectSession&) = delete;
     ~ProjectSession();
 
-    IOrvixServices& Services() { return m_services; }
+    OrvixClientInfo& Client() { return m_host.Client(); }
+    IOrvixServices& Services() { return m_host.Services(); }
     IOrvixProvider& Provider() { return *m_provider; }
     std::uint32_t ProviderIndex() const { return m_index; }
-    std::wstring ProviderName() { return m_services.GetProviderName(m_index); }
+    std::wstring ProviderName() { return Services().GetProviderName(m_index); }
+
+    /// Full path of the project's folder.
     const std::wstring& Folder() const { return m_folder; }
 
+    /// Whether the administrator's filters exclude a file from the provider. `filter` receives the name of the filter.
+    bool IsExcluded(const std::wstring& path, std::wstring& filter);
+
 private:
-    IOrvixServices& m_services;
+    HostSession& m_host;
     std::uint32_t m_index;
-    IOrvixProvider* m_provider;
+    IOrvixProvider* m_provider; // owned by the services object
     std::wstring m_folder;
 };

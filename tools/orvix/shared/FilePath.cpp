@@ -56,10 +56,3 @@ bool IsFolder(const std::wstring& path)
     const DWORD attributes = GetFileAttributesW(path.c_str());
     return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
 }
-
-std::wstring ModulePath(HMODULE module)
-{
-    std::wstring path(32768, L'\0'); // the longest path that there is
-    path.resize(GetModuleFileNameW(module, path.data(), static_cast<DWORD>(path.size())));
-    return path;
-}

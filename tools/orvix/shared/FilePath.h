@@ -1,26 +1,22 @@
 #pragma once
 
-#include <windows.h>
-
 #include <string>
 
-/// The absolute path of what the user typed, without a separator at its end (but for a root).
+/// The absolute path of what the user typed, without a separator at its end unless it is a root. Throws `ToolError`
+/// with `ExitCode::BadUsage` when the text is not a path.
 std::wstring FullPath(const std::wstring& path);
 
-/// The path as seen from a folder: its part below the folder, the whole path when it lies elsewhere.
+/// The part of a path below a folder; the whole path when it is not below the folder. Letter case does not count.
 std::wstring PathBelow(const std::wstring& folder, const std::wstring& path);
 
-/// The path in a form in which the names of one file are equal.
+/// The path in upper case, so that paths can be compared without regard to letter case.
 std::wstring PathKey(const std::wstring& path);
 
-/// A full path in the form in which its length has no limit.
+/// A full path with the prefix that removes the limit on its length.
 std::wstring LongPath(const std::wstring& full);
 
-/// Whether a file or folder is there.
+/// Whether a file or a folder has this path.
 bool PathExists(const std::wstring& path);
 
-/// The full path of a loaded module; of this program for null.
-std::wstring ModulePath(HMODULE module);
-
-/// Whether a folder is there.
+/// Whether a folder has this path.
 bool IsFolder(const std::wstring& path);

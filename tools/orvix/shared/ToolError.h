@@ -4,13 +4,13 @@
 
 #include <stdexcept>
 
-/// What the process tells its caller; documented in docs/orvix.md.
+/// The exit code of the process; documented in docs/orvix.md.
 enum class ExitCode
 {
     Success = 0,
-    Failed = 1,
-    BadUsage = 2,
-    NoProject = 3,
+    Failed = 1,   ///< something failed, was refused or is wrong
+    BadUsage = 2, ///< the command line is wrong
+    NotFound = 3, ///< no such provider, project, folder, library, registration or prompt
 };
 
 /// Ends the run with a message on the error output and an exit code.

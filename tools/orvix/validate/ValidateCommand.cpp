@@ -18,23 +18,39 @@ namespace
 
 using Verdict = ValidationResult::Verdict;
 
-const char* InWords(Verdict verdict)
+/// In the order of the verdicts.
+constexpr struct
 {
-    return verdict == Verdict::Pass ? "pass" : verdict == Verdict::Fail ? "fail" : "skip";
+    const char* words;
+    Listing::Tone tone;
+} VerdictTexts[] = {
+    {"pass", Listing::Tone::Good},
+    {"fail", Listing::Tone::Bad},
+    {"skip", Listing::Tone::Quiet},
+};
+
+const auto& TextOf(const ValidationResult& result)
+{
+    return VerdictTexts[static_cast<std::size_t>(result.verdict)];
 }
 
-Listing::Tone ToneOf(Verdict verdict)
-{
-    return verdict == Verdict::Pass   ? Listing::Tone::Good
-           : verdict == Verdict::Fail ? Listing::Tone::Bad
-                                      : Listing::Tone::Quiet;
-}
-
-/// One after the other as they come: a rule may take its time.
-class Lines
+/// How many rules have each verdict.
+class VerdictCounts
 {
 public:
-    explicit Lines(const OutputStyle& style) : m_style(style), m_output(std::cout, style) {}
+    void Add(Verdict verdict) { ++m_counts.at(static_cast<std::size_t>(verdict)); }
+    int Get(Verdict verdict) const { return m_counts.at(static_cast<std::size_t>(verdict)); }
+    int Total() const { return Get(Verdict::Pass) + Get(Verdict::Fail) + Get(Verdict::Skip); }
+
+private:
+    std::array<int, std::size(VerdictTexts)> m_counts{};
+};
+
+/// Prints each result when it arrives: a rule may take long.
+class TextReport
+{
+public:
+    explicit TextReport(const OutputStyle& style) : m_style(style), m_output(std::cout, style) {}
 
     void Begin(const ValidationRule& rule, std::size_t number, std::size_t count)
     {
@@ -45,26 +61,26 @@ public:
     void Add(const ValidationRule& rule, const ValidationResult& result)
     {
         m_output.Progress({});
-        std::cout << m_style.Painted(InWords(result.verdict), ToneOf(result.verdict)) << "  " << std::left
-                  << std::setw(16) << rule.name << (result.reason.empty() ? rule.demand : result.reason) << std::endl;
+        std::cout << m_style.Coloured(TextOf(result).words, TextOf(result).tone) << "  " << std::left << std::setw(16)
+                  << rule.name << (result.reason.empty() ? rule.requirement : result.reason) << std::endl;
     }
 
-    void End(int passed, int failed, int skipped)
+    void End(const VerdictCounts& counts)
     {
-        std::cout << passed + failed + skipped << " rules, " << passed << " passed, " << failed << " failed, "
-                  << skipped << " skipped\n";
+        std::cout << counts.Total() << " rules, " << counts.Get(Verdict::Pass) << " passed, "
+                  << counts.Get(Verdict::Fail) << " failed, " << counts.Get(Verdict::Skip) << " skipped\n";
     }
 
 private:
     OutputStyle m_style;
-    TextOutput m_output; ///< of the progress
+    TextOutput m_output; // of the progress
 };
 
-/// One document at the end.
-class Document
+/// Prints one JSON document at the end.
+class JsonReport
 {
 public:
-    Document(const std::wstring& library, bool isMSSCCI)
+    JsonReport(const std::wstring& library, bool isMSSCCI)
         : m_document{{"library", Utf8(library)}, {"kind", isMSSCCI ? "msscci" : "plugin"}}
     {
         m_document["rules"] = nlohmann::ordered_json::array();
@@ -75,16 +91,16 @@ public:
     void Add(const ValidationRule& rule, const ValidationResult& result)
     {
         m_document["rules"].push_back({{"name", rule.name},
-                                       {"demand", rule.demand},
-                                       {"result", InWords(result.verdict)},
+                                       {"demand", rule.requirement},
+                                       {"result", TextOf(result).words},
                                        {"reason", result.reason}});
     }
 
-    void End(int passed, int failed, int skipped)
+    void End(const VerdictCounts& counts)
     {
-        m_document["passed"] = passed;
-        m_document["failed"] = failed;
-        m_document["skipped"] = skipped;
+        m_document["passed"] = counts.Get(Verdict::Pass);
+        m_document["failed"] = counts.Get(Verdict::Fail);
+        m_document["skipped"] = counts.Get(Verdict::Skip);
         std::cout << m_document.dump(2) << '\n';
     }
 
@@ -92,30 +108,8 @@ private:
     nlohmann::ordered_json m_document;
 };
 
-} // namespace
-
-ExitCode ValidateCommand::Run()
+std::vector<const ValidationRule*> RulesOf(unsigned int kind)
 {
-    const std::wstring library = FullPath(m_commandLine.paths.front());
-    if (!PathExists(library) || IsFolder(library))
-    {
-        throw ToolError(ExitCode::NoProject, L"no such library: " + library);
-    }
-    if (m_commandLine.json)
-    {
-        Document document(library, m_commandLine.msscci);
-        return Run(library, document);
-    }
-    const Terminal terminal;
-    Lines lines(terminal.Style(m_commandLine.noColor));
-    return Run(library, lines);
-}
-
-template <typename Report>
-ExitCode ValidateCommand::Run(const std::wstring& library, Report& report)
-{
-    const unsigned int kind = m_commandLine.msscci ? ValidationRule::MSSCCI : ValidationRule::Plugin;
-    const ValidationProcess process(library, m_commandLine.msscci, std::chrono::seconds(m_commandLine.timeout));
     std::vector<const ValidationRule*> rules;
     for (const ValidationRule& rule : ValidationRule::All())
     {
@@ -124,18 +118,46 @@ ExitCode ValidateCommand::Run(const std::wstring& library, Report& report)
             rules.push_back(&rule);
         }
     }
-    std::array<int, 3> counts{};
+    return rules;
+}
+
+template <typename Report>
+ExitCode CheckRules(const CommandLine& commandLine, const std::wstring& library, Report& report)
+{
+    const ValidationProcess process(library, commandLine.msscci, std::chrono::seconds(commandLine.timeout));
+    const std::vector<const ValidationRule*> rules =
+        RulesOf(commandLine.msscci ? ValidationRule::MSSCCI : ValidationRule::Plugin);
+    VerdictCounts counts;
     for (std::size_t i = 0; i < rules.size(); ++i)
     {
         const ValidationRule& rule = *rules[i];
         report.Begin(rule, i + 1, rules.size());
         const ValidationResult result =
-            rule.showsDialogs && !m_commandLine.dialogs
+            rule.showsDialogs && !commandLine.dialogs
                 ? ValidationResult{Verdict::Skip, "it may show windows: checked with --dialogs"}
                 : process.Check(rule);
-        ++counts.at(static_cast<std::size_t>(result.verdict));
+        counts.Add(result.verdict);
         report.Add(rule, result);
     }
-    report.End(counts[0], counts[1], counts[2]);
-    return counts[1] == 0 ? ExitCode::Success : ExitCode::Failed;
+    report.End(counts);
+    return counts.Get(Verdict::Fail) == 0 ? ExitCode::Success : ExitCode::Failed;
+}
+
+} // namespace
+
+ExitCode RunValidate(const CommandLine& commandLine)
+{
+    const std::wstring library = FullPath(commandLine.paths.front());
+    if (!PathExists(library) || IsFolder(library))
+    {
+        throw ToolError(ExitCode::NotFound, L"no such library: " + library);
+    }
+    if (commandLine.json)
+    {
+        JsonReport report(library, commandLine.msscci);
+        return CheckRules(commandLine, library, report);
+    }
+    const Terminal terminal;
+    TextReport report(terminal.Style(commandLine.noColor));
+    return CheckRules(commandLine, library, report);
 }

@@ -3,31 +3,29 @@
 #include "IsolatedLoad.h"
 #include "ValidationSubject.h"
 
-/// The library under validation, loaded as OrvixCore loads it, and freed at the end.
+/// The library under validation, loaded as OrvixCore loads it, and unloaded at the end.
 class ValidationLibrary
 {
 public:
-    /// Throws `RuleSkipped` with the system's reason when it does not load.
+    /// `subject` must outlive this object. Throws `RuleSkipped` with the system's reason when the library does not
+    /// load.
     explicit ValidationLibrary(ValidationSubject& subject);
     ValidationLibrary(const ValidationLibrary&) = delete;
     ValidationLibrary& operator=(const ValidationLibrary&) = delete;
     ~ValidationLibrary();
 
-    /// An exported function; null when the library lacks it.
-    template <typename Function>
-    Function* Find(const char* name) const
-    {
-        return reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(m_module.Get(), name)));
-    }
+    /// Whether the library exports a function.
+    bool Has(const char* name) const { return GetProcAddress(m_module.Get(), name) != nullptr; }
 
-    /// An exported function that a rule needs. Throws `RuleSkipped` when the library lacks it.
+    /// An exported function. Throws `RuleSkipped` when the library does not export it.
     template <typename Function>
     Function* Need(const char* name) const
     {
-        Function* const function = Find<Function>(name);
+        auto* const function =
+            reinterpret_cast<Function*>(reinterpret_cast<void (*)()>(GetProcAddress(m_module.Get(), name)));
         if (function == nullptr)
         {
-            throw RuleSkipped(std::string("it lacks ") + name);
+            throw RuleSkipped(std::string("it does not export ") + name);
         }
         return function;
     }

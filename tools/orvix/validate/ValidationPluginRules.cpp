@@ -11,6 +11,11 @@ namespace
 
 constexpr int Requests = 3;
 
+[[noreturn]] void Break(const char* function, const std::string& how)
+{
+    throw RuleBroken(function + (' ' + how));
+}
+
 } // namespace
 
 void PluginRules::Exports(ValidationSubject& subject)
@@ -19,11 +24,11 @@ void PluginRules::Exports(ValidationSubject& subject)
     std::string missing;
     for (const char* name : PluginCandidate::Exports)
     {
-        missing += library.Find<void()>(name) == nullptr ? std::string(" ") + name : "";
+        missing += library.Has(name) ? "" : std::string(" ") + name;
     }
     if (!missing.empty())
     {
-        throw RuleBroken("it lacks" + missing);
+        throw RuleBroken("it does not export" + missing);
     }
 }
 
@@ -34,7 +39,7 @@ void PluginRules::Version(ValidationSubject& subject)
         subject.Call(PluginCandidate::GetVersion, library.Need<std::int32_t()>(PluginCandidate::GetVersion));
     if (version != ORVIX_PLUGIN_CONTRACT_VERSION)
     {
-        throw RuleBroken("GetOrvixVersion gives " + std::to_string(version));
+        Break(PluginCandidate::GetVersion, "returns " + std::to_string(version));
     }
 }
 
@@ -48,11 +53,11 @@ void PluginRules::Name(ValidationSubject& subject)
         const wchar_t* const name = subject.Call(PluginCandidate::GetName, getName);
         if (name == nullptr || *name == L'\0')
         {
-            throw RuleBroken("GetOrvixProviderName gives no name");
+            Break(PluginCandidate::GetName, "returns no name");
         }
         if (request != 0 && name != first)
         {
-            throw RuleBroken("GetOrvixProviderName gives another name when it is asked again");
+            Break(PluginCandidate::GetName, "returns another name on a later call");
         }
         first = name;
     }
@@ -69,12 +74,12 @@ void PluginRules::Objects(ValidationSubject& subject)
         provider = subject.Call(PluginCandidate::GetProvider, get);
         if (provider == nullptr)
         {
-            throw RuleBroken("GetIOrvixProvider gives null");
+            Break(PluginCandidate::GetProvider, "returns null");
         }
         const wchar_t* const name = subject.Call("GetName", [provider] { return provider->GetName(); });
         if (name == nullptr)
         {
-            throw RuleBroken("GetName gives null");
+            Break("GetName", "returns null");
         }
     }
     for (IOrvixProvider* provider : providers)

@@ -2,14 +2,15 @@
 
 #include "FilePath.h"
 #include "LibraryModule.h"
+#include "ModulePath.h"
 #include "ToolError.h"
+#include "UniqueHandle.h"
 #include "ValidationScratch.h"
 #include "ValidationSubject.h"
 
 #include <windows.h>
 
 #include <array>
-#include <memory>
 #include <sstream>
 #include <string_view>
 
@@ -19,21 +20,15 @@ namespace
 using Verdict = ValidationResult::Verdict;
 
 constexpr wchar_t ChildArgument[] = L"--validate-rule"; // RULE KIND LIBRARY SCRATCH PIPE
-constexpr int ChildArguments = 7;
+constexpr int NumChildArguments = 7;
 constexpr wchar_t PluginKind[] = L"plugin";
 constexpr wchar_t MSSCCIKind[] = L"msscci";
 
-constexpr DWORD PipeSize = 65536;
-constexpr DWORD PollMilliseconds = 50; // between two readings of the pipe
+constexpr DWORD PipeSize = 65536;      // bytes
+constexpr DWORD PollMilliseconds = 50; // between two reads of the pipe
 
-struct CloseHandleOf
-{
-    using pointer = HANDLE;
-    void operator()(HANDLE handle) const { CloseHandle(handle); }
-};
-using UniqueHandle = std::unique_ptr<HANDLE, CloseHandleOf>;
-
-[[noreturn]] void RefuseToStart(const wchar_t* what, DWORD error = GetLastError())
+/// Throws `ToolError` with the system's error.
+[[noreturn]] void FailToStart(const wchar_t* what, DWORD error = GetLastError())
 {
     throw ToolError(ExitCode::Failed, L"no rule can be checked, " + std::wstring(what) + L" cannot be made: " +
                                           SystemMessage(error, ModulePath(nullptr)));
@@ -41,77 +36,75 @@ using UniqueHandle = std::unique_ptr<HANDLE, CloseHandleOf>;
 
 struct Pipe
 {
-    UniqueHandle read;
-    UniqueHandle write; ///< inheritable
+    UniqueFile reader;
+    UniqueFile writer; ///< inheritable
 };
 
 Pipe NewPipe()
 {
     SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
-    HANDLE read = nullptr;
-    HANDLE write = nullptr;
-    if (!CreatePipe(&read, &write, &inheritable, PipeSize))
+    Pipe pipe;
+    if (!CreatePipe(pipe.reader.Out(), pipe.writer.Out(), &inheritable, PipeSize))
     {
-        RefuseToStart(L"a pipe");
+        FailToStart(L"a pipe");
     }
-    SetHandleInformation(read, HANDLE_FLAG_INHERIT, 0);
-    return {UniqueHandle(read), UniqueHandle(write)};
+    SetHandleInformation(pipe.reader.Get(), HANDLE_FLAG_INHERIT, 0);
+    return pipe;
 }
 
 /// A job that ends all its processes when it is closed.
-UniqueHandle NewJob()
+UniqueKernelHandle NewJob()
 {
-    UniqueHandle job(CreateJobObjectW(nullptr, nullptr));
+    UniqueKernelHandle job(CreateJobObjectW(nullptr, nullptr));
     JOBOBJECT_EXTENDED_LIMIT_INFORMATION limits{};
     limits.BasicLimitInformation.LimitFlags = JOB_OBJECT_LIMIT_KILL_ON_JOB_CLOSE;
-    if (!job || !SetInformationJobObject(job.get(), JobObjectExtendedLimitInformation, &limits, sizeof limits))
+    if (!job || !SetInformationJobObject(job.Get(), JobObjectExtendedLimitInformation, &limits, sizeof limits))
     {
-        RefuseToStart(L"a job");
+        FailToStart(L"a job");
     }
     return job;
 }
 
-/// The file that swallows what a library prints.
-UniqueHandle NewNullFile()
+/// The null device, which discards what a library prints.
+UniqueFile OpenNullDevice()
 {
     SECURITY_ATTRIBUTES inheritable{sizeof inheritable, nullptr, TRUE};
-    UniqueHandle file(CreateFileW(L"NUL", GENERIC_READ | GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE,
-                                  &inheritable, OPEN_EXISTING, 0, nullptr));
-    if (file.get() == INVALID_HANDLE_VALUE)
+    UniqueFile file(CreateFileW(L"NUL", GENERIC_READ | GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE, &inheritable,
+                                OPEN_EXISTING, 0, nullptr));
+    if (!file)
     {
-        file.release();
-        RefuseToStart(L"an output");
+        FailToStart(L"an output");
     }
     return file;
 }
 
-/// Starts a process in the job, and in the folder.
-UniqueHandle Start(const std::wstring& program, std::wstring commandLine, const std::wstring& folder, HANDLE job)
+/// Starts a process in the job. `folder` is its current folder.
+UniqueKernelHandle Start(const std::wstring& program, std::wstring commandLine, const std::wstring& folder, HANDLE job)
 {
-    const UniqueHandle nothing = NewNullFile();
+    const UniqueFile nullDevice = OpenNullDevice();
     STARTUPINFOW startup{};
     startup.cb = sizeof startup;
     startup.dwFlags = STARTF_USESTDHANDLES;
-    startup.hStdInput = startup.hStdOutput = startup.hStdError = nothing.get();
+    startup.hStdInput = startup.hStdOutput = startup.hStdError = nullDevice.Get();
     PROCESS_INFORMATION started{};
     if (!CreateProcessW(program.c_str(), commandLine.data(), nullptr, nullptr, TRUE, CREATE_SUSPENDED, nullptr,
                         folder.c_str(), &startup, &started))
     {
-        RefuseToStart(L"a process");
+        FailToStart(L"a process");
     }
-    UniqueHandle process(started.hProcess);
-    const UniqueHandle thread(started.hThread);
-    if (!AssignProcessToJobObject(job, process.get()))
+    UniqueKernelHandle process(started.hProcess);
+    const UniqueKernelHandle thread(started.hThread);
+    if (!AssignProcessToJobObject(job, process.Get()))
     {
         const DWORD error = GetLastError();
-        TerminateProcess(process.get(), 1);
-        RefuseToStart(L"a process in a job", error);
+        TerminateProcess(process.Get(), 1);
+        FailToStart(L"a process in a job", error);
     }
-    ResumeThread(thread.get());
+    ResumeThread(thread.Get());
     return process;
 }
 
-/// What can be read without waiting, a good piece of it at a time.
+/// Reads what the pipe holds without waiting, at most a few bytes more than `PipeSize`.
 std::string ReadAvailable(HANDLE pipe)
 {
     std::string all;
@@ -126,54 +119,59 @@ std::string ReadAvailable(HANDLE pipe)
     return all;
 }
 
-/// What a process has said on its pipe.
-struct Story
+/// The lines that a process wrote to its pipe.
+struct ProcessLines
 {
-    explicit Story(const std::string& text)
+    explicit ProcessLines(const std::string& text)
     {
-        std::istringstream lines(text);
-        for (std::string line; std::getline(lines, line);)
+        std::istringstream stream(text);
+        for (std::string line; std::getline(stream, line);)
         {
-            const std::string word = line.substr(0, line.find(' '));
-            const std::string rest = line.size() > word.size() ? line.substr(word.size() + 1) : "";
-            if (word == ValidationSubject::Step)
-            {
-                step = rest;
-            }
-            else if (word == ValidationSubject::Note)
-            {
-                note = rest;
-            }
-            else if (word == ValidationSubject::Pass)
-            {
-                result = {Verdict::Pass, note};
-            }
-            else if (word == ValidationSubject::Fail)
-            {
-                result = {Verdict::Fail, rest};
-            }
-            else if (word == ValidationSubject::Skip)
-            {
-                result = {Verdict::Skip, rest};
-            }
+            Add(line);
         }
     }
 
-    std::string step = "the start"; ///< what the library was called for last
+    void Add(const std::string& line)
+    {
+        const std::string word = line.substr(0, line.find(' '));
+        const std::string rest = line.size() > word.size() ? line.substr(word.size() + 1) : "";
+        if (word == ValidationSubject::Step)
+        {
+            step = rest;
+        }
+        else if (word == ValidationSubject::Note)
+        {
+            note = rest;
+        }
+        else if (word == ValidationSubject::Pass)
+        {
+            result = {Verdict::Pass, note};
+        }
+        else if (word == ValidationSubject::Fail)
+        {
+            result = {Verdict::Fail, rest};
+        }
+        else if (word == ValidationSubject::Skip)
+        {
+            result = {Verdict::Skip, rest};
+        }
+    }
+
+    std::string step = "the start"; ///< the last call of the library
     std::string note;
-    std::optional<ValidationResult> result;
+    std::optional<ValidationResult> result; ///< empty when the process ended before it had one
 };
 
-std::string HowItEnded(DWORD code)
+std::string DescribeEnd(DWORD exitCode)
 {
     constexpr DWORD FirstException = 0x80000000;
-    constexpr DWORD BehindExceptions = 0xF0000000; // small negative exit codes
-    return code >= FirstException && code < BehindExceptions
-               ? "crashes the process with exception " + Hexadecimal(code)
-               : "ends the process with exit code " + std::to_string(code);
+    constexpr DWORD AfterExceptions = 0xF0000000; // from here on: small negative exit codes
+    return exitCode >= FirstException && exitCode < AfterExceptions
+               ? "crashes the process with exception " + Hexadecimal(exitCode)
+               : "ends the process with exit code " + std::to_string(exitCode);
 }
 
-/// A crash is no box for people, and no long work of a debugger.
+/// Ends the process at a crash without a message box and without a debugger.
 LONG WINAPI EndAtOnce(EXCEPTION_POINTERS* exception)
 {
     TerminateProcess(GetCurrentProcess(), exception->ExceptionRecord->ExceptionCode);
@@ -185,19 +183,19 @@ void CheckInThisProcess(const ValidationRule& rule, ValidationSubject& subject)
     try
     {
         rule.check(subject);
-        subject.Tell(ValidationSubject::Pass, "");
+        subject.Send(ValidationSubject::Pass, "");
     }
     catch (const RuleBroken& broken)
     {
-        subject.Tell(ValidationSubject::Fail, broken.what());
+        subject.Send(ValidationSubject::Fail, broken.what());
     }
     catch (const RuleSkipped& skipped)
     {
-        subject.Tell(ValidationSubject::Skip, skipped.what());
+        subject.Send(ValidationSubject::Skip, skipped.what());
     }
     catch (const std::exception& error)
     {
-        subject.Tell(ValidationSubject::Skip, std::string("it cannot be checked: ") + error.what());
+        subject.Send(ValidationSubject::Skip, std::string("it cannot be checked: ") + error.what());
     }
 }
 
@@ -208,40 +206,40 @@ ValidationResult ValidationProcess::Check(const ValidationRule& rule) const
     using Clock = std::chrono::steady_clock;
 
     const ValidationScratch scratch;
-    Pipe pipe = NewPipe();
+    const Pipe pipe = NewPipe();
     const std::wstring program = ModulePath(nullptr);
     const std::wstring commandLine = L"orvix " + std::wstring(ChildArgument) + L' ' + Wide(rule.name) + L' ' +
                                      (m_isMSSCCI ? MSSCCIKind : PluginKind) + L" \"" + m_library + L"\" \"" +
                                      scratch.Path() + L"\" " +
-                                     std::to_wstring(reinterpret_cast<std::uintptr_t>(pipe.write.get()));
-    DWORD code = STILL_ACTIVE;
+                                     std::to_wstring(reinterpret_cast<std::uintptr_t>(pipe.writer.Get()));
+    DWORD exitCode = STILL_ACTIVE;
     bool ended = false;
     std::string text;
     {
-        const UniqueHandle job = NewJob();
-        const UniqueHandle process = Start(program, commandLine, scratch.Path(), job.get());
+        const UniqueKernelHandle job = NewJob();
+        const UniqueKernelHandle process = Start(program, commandLine, scratch.Path(), job.Get());
         const auto deadline = Clock::now() + m_limit;
         do
         {
-            ended = WaitForSingleObject(process.get(), PollMilliseconds) == WAIT_OBJECT_0;
-            text += ReadAvailable(pipe.read.get());
+            ended = WaitForSingleObject(process.Get(), PollMilliseconds) == WAIT_OBJECT_0;
+            text += ReadAvailable(pipe.reader.Get());
         } while (!ended && Clock::now() < deadline);
-        GetExitCodeProcess(process.get(), &code);
-        TerminateJobObject(job.get(), code);
-        WaitForSingleObject(process.get(), INFINITE); // its files can be deleted
+        GetExitCodeProcess(process.Get(), &exitCode);
+        TerminateJobObject(job.Get(), exitCode);
+        WaitForSingleObject(process.Get(), INFINITE); // after it its files can be deleted
     }
-    const Story story(text);
-    if (story.result)
+    const ProcessLines lines(text);
+    if (lines.result)
     {
-        return *story.result;
+        return *lines.result;
     }
-    return {Verdict::Fail, ended ? story.step + ' ' + HowItEnded(code)
-                                 : story.step + " hangs: ended after " + std::to_string(m_limit.count()) + " s"};
+    return {Verdict::Fail, ended ? lines.step + ' ' + DescribeEnd(exitCode)
+                                 : lines.step + " hangs: ended after " + std::to_string(m_limit.count()) + " s"};
 }
 
 std::optional<int> ValidationProcess::RunAsChild(int count, wchar_t** arguments)
 {
-    if (count != ChildArguments || std::wstring_view(arguments[1]) != ChildArgument)
+    if (count != NumChildArguments || std::wstring_view(arguments[1]) != ChildArgument)
     {
         return std::nullopt;
     }
@@ -254,12 +252,12 @@ std::optional<int> ValidationProcess::RunAsChild(int count, wchar_t** arguments)
     }
     SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX);
     SetUnhandledExceptionFilter(EndAtOnce);
-    RememberLibraryModule(GetModuleHandleW(L"OrvixCore.dll"));                  // its manifest holds for what is loaded
+    RememberLibraryModule(GetModuleHandleW(L"OrvixCore.dll")); // the library gets the manifest of this module
     const HANDLE pipe = ULongToHandle(std::wcstoul(arguments[6], nullptr, 10)); // handles have 32 bits
     SetHandleInformation(pipe, HANDLE_FLAG_INHERIT, 0);
     ValidationSubject subject(arguments[4], isMSSCCI, arguments[5], pipe);
     CheckInThisProcess(*rule, subject);
-    // Without the end code of a library that has stayed loaded: hosts free every library before they end.
+    // A library that is still loaded must not run its end code: hosts unload every library before they end.
     TerminateProcess(GetCurrentProcess(), 0);
     return 0;
 }

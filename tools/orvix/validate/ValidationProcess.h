@@ -6,7 +6,7 @@
 #include <optional>
 #include <string>
 
-/// What became of a rule.
+/// The result of a rule.
 struct ValidationResult
 {
     enum class Verdict
@@ -17,26 +17,26 @@ struct ValidationResult
     };
 
     Verdict verdict;
-    std::string reason; ///< UTF-8; may be empty for a rule that is kept
+    std::string reason; ///< UTF-8; for a rule that passes a remark, or empty
 };
 
-/// Checks rules in processes of their own, so that a library that crashes or hangs is a finding and no more: this
-/// program, started once more with arguments that only it knows.
+/// Checks each rule in a process of its own, so that a library that crashes or hangs fails one rule and nothing more.
+/// The process is this program, started again with internal arguments.
 class ValidationProcess
 {
 public:
-    /// `library` is a full path.
+    /// `library` is a full path. `limit` is the time for one rule.
     ValidationProcess(std::wstring library, bool isMSSCCI, std::chrono::seconds limit)
         : m_library(std::move(library)), m_isMSSCCI(isMSSCCI), m_limit(limit)
     {
     }
 
-    /// Checks one rule on a scratch project, which is gone afterwards, as is every process that the library started. At
-    /// the time limit the process is ended. Throws `ToolError` when no process can be made.
+    /// Checks one rule on a scratch project. The process is ended at the time limit. Afterwards the scratch project is
+    /// deleted, and every process that the library started is ended. Throws `ToolError` when no process can be started.
     ValidationResult Check(const ValidationRule& rule) const;
 
-    /// The started process's side: nothing when these arguments of `wmain` are not those of such a process, otherwise
-    /// its exit code, after the rule was checked and the pipe has the result.
+    /// Called in the started process: checks the rule, writes the result to the pipe and returns the exit code. Empty
+    /// when these arguments of `wmain` are not those of such a process.
     static std::optional<int> RunAsChild(int count, wchar_t** arguments);
 
 private:

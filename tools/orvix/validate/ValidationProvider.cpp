@@ -1,7 +1,7 @@
 #include "ValidationProvider.h"
 
-#include "CommandLine.h"
 #include "InstalledProviders.h"
+#include "OrvixProviderResult.h"
 #include "OrvixProviderSource.h"
 #include "PluginCandidate.h"
 #include "SccFunctions.h"
@@ -12,7 +12,7 @@ namespace
 
 constexpr wchar_t Name[] = L"Validated";
 
-void Demand(LSTATUS status)
+void Check(LSTATUS status)
 {
     if (status != ERROR_SUCCESS)
     {
@@ -21,15 +21,15 @@ void Demand(LSTATUS status)
     }
 }
 
-/// A key that would go with the session should this process be ended here.
+/// A volatile key: the system removes it when the user logs off, also after this process was terminated.
 UniqueRegistryKey NewKey(HKEY parent, const wchar_t* path)
 {
-    HKEY key = nullptr;
-    Demand(RegCreateKeyExW(parent, path, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, &key, nullptr));
-    return UniqueRegistryKey(key);
+    UniqueRegistryKey key;
+    Check(RegCreateKeyExW(parent, path, 0, nullptr, REG_OPTION_VOLATILE, KEY_ALL_ACCESS, nullptr, key.Out(), nullptr));
+    return key;
 }
 
-/// A key of the user for this process, which goes with this object.
+/// A key of the user for this process. It is deleted at the end.
 class PrivateKey
 {
 public:
@@ -45,12 +45,12 @@ private:
     UniqueRegistryKey m_key;
 };
 
-/// A key in the place of HKEY_LOCAL_MACHINE, for this process alone, under which one MSSCCI library is registered: the
-/// machine's own registry is left alone, and the services object finds this library and no other.
+/// Registers one MSSCCI library for this process alone, under a key that replaces HKEY_LOCAL_MACHINE. The registry of
+/// the machine stays unchanged, and the services object finds this library only.
 class PrivateRegistration
 {
 public:
-    /// Throws `RuleSkipped` when the system refuses: another library would be validated.
+    /// Throws `RuleSkipped` when the system refuses, since another library would be validated.
     explicit PrivateRegistration(const std::wstring& library)
     {
         const UniqueRegistryKey list = NewKey(m_root.Get(), InstalledProviders::ListPath);
@@ -58,7 +58,7 @@ public:
         Write(list.Get(), Name, Name);
         Write(provider.Get(), InstalledProviders::ServerName, Name);
         Write(provider.Get(), InstalledProviders::ServerPath, library);
-        Demand(RegOverridePredefKey(HKEY_LOCAL_MACHINE, m_root.Get()));
+        Check(RegOverridePredefKey(HKEY_LOCAL_MACHINE, m_root.Get()));
     }
     PrivateRegistration(const PrivateRegistration&) = delete;
     PrivateRegistration& operator=(const PrivateRegistration&) = delete;
@@ -67,8 +67,8 @@ public:
 private:
     static void Write(HKEY key, const wchar_t* name, const std::wstring& text)
     {
-        Demand(RegSetValueExW(key, name, 0, REG_SZ, reinterpret_cast<const BYTE*>(text.c_str()),
-                              static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t))));
+        Check(RegSetValueExW(key, name, 0, REG_SZ, reinterpret_cast<const BYTE*>(text.c_str()),
+                             static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t))));
     }
 
     PrivateKey m_root;
@@ -92,28 +92,34 @@ ValidationProvider::ValidationProvider(ValidationSubject& subject) : m_subject(s
     }
     if (m_provider == nullptr)
     {
-        throw RuleSkipped("it gives no provider");
+        throw RuleSkipped("it returns no provider");
     }
 }
 
 ValidationProvider::~ValidationProvider()
 {
-    const auto end = [this](const char* what, bool needed, auto work) {
-        if (needed)
-        {
-            m_subject.Tell(ValidationSubject::Step, what);
-            work();
-        }
-    };
     try
     {
-        end("CloseProject", m_provider->IsProjectOpen(), [this] { m_provider->CloseProject(); });
-        end("Uninitialize", m_provider->IsInitialized(), [this] { m_provider->Uninitialize(); });
+        Close();
     }
-    catch (...) // what it lets out is found where a rule calls these
+    catch (...) // a rule that calls these operations itself reports it
     {
     }
-    m_subject.Tell(ValidationSubject::Step, "releasing the provider");
+    m_subject.Send(ValidationSubject::Step, "releasing the provider");
+}
+
+void ValidationProvider::Close()
+{
+    if (m_provider->IsProjectOpen())
+    {
+        m_subject.Send(ValidationSubject::Step, "CloseProject");
+        m_provider->CloseProject();
+    }
+    if (m_provider->IsInitialized())
+    {
+        m_subject.Send(ValidationSubject::Step, "Uninitialize");
+        m_provider->Uninitialize();
+    }
 }
 
 void ValidationProvider::FindPlugin()
@@ -125,9 +131,9 @@ void ValidationProvider::FindPlugin()
 
 void ValidationProvider::FindInstalled()
 {
-    const ValidationLibrary loads(m_subject);
-    loads.Need<void()>(SccFunctions::GetVersion.name);
-    m_services.reset(GetIOrvixServices());
+    const ValidationLibrary library(m_subject); // skips the rule when it does not load
+    library.Need<void()>(SccFunctions::GetVersion.name);
+    m_services = MakeOrvixServices();
     if (m_services)
     {
         const PrivateRegistration registration(m_subject.Library());
@@ -159,11 +165,11 @@ int ValidationProvider::Uninitialize()
 
 void ValidationProvider::Begin()
 {
-    if (Initialize() != 0)
+    if (Initialize() != OrvixProviderResult::Success)
     {
         throw RuleSkipped("Initialize fails");
     }
-    if (OpenProject() != 0)
+    if (OpenProject() != OrvixProviderResult::Success)
     {
         throw RuleSkipped("OpenProject fails for the scratch project");
     }

@@ -1,20 +1,19 @@
 #pragma once
 
-#include "ClientAccess.h"
+#include "IOrvixClientAccess.h"
 #include "IOrvixProvider.h"
-#include "IOrvixServices.h"
 #include "OrvixClientInfo.h"
+#include "OrvixServicesPointer.h"
 #include "ValidationLibrary.h"
 
-#include <memory>
 #include <optional>
 
-/// The provider under validation as a host meets it: the object that a plug-in hands out, or an MSSCCI library behind
-/// OrvixCore's own wrapper and bridge. At the end it is closed and the library is freed.
+/// The provider under validation, as a host uses it: the object of a plug-in, or OrvixCore's own provider for an MSSCCI
+/// library. At the end it is closed, and the library is unloaded.
 class ValidationProvider
 {
 public:
-    /// Throws `RuleSkipped` when there is no provider to be had.
+    /// `subject` must outlive this object. Throws `RuleSkipped` when there is no provider.
     explicit ValidationProvider(ValidationSubject& subject);
     ValidationProvider(const ValidationProvider&) = delete;
     ValidationProvider& operator=(const ValidationProvider&) = delete;
@@ -22,29 +21,21 @@ public:
 
     IOrvixProvider& Get() { return *m_provider; }
 
-    // Each gives what the provider gives, and throws `RuleBroken` for an exception.
+    // Each returns what the provider returns, and throws `RuleBroken` for an exception.
     int Initialize();
     int OpenProject();
     int CloseProject();
     int Uninitialize();
 
-    /// Initialises the provider and opens the project. Throws `RuleSkipped` when it fails at one.
+    /// Initialises the provider and opens the project. Throws `RuleSkipped` when one of them fails.
     void Begin();
 
 private:
     void FindPlugin();
     void FindInstalled();
+    void Close();
 
-    struct Release
-    {
-        void operator()(IOrvixServices* services) const
-        {
-            services->Shutdown();
-            ReleaseIOrvixServices(services);
-        }
-    };
-
-    /// Keeps what a provider prints to itself.
+    /// Ignores what a provider prints.
     class SilentClient final : public IOrvixClientAccess
     {
     public:
@@ -58,7 +49,7 @@ private:
     ValidationSubject& m_subject;
     SilentClient m_access;
     OrvixClientInfo m_client;
-    std::optional<ValidationLibrary> m_library;          ///< of a plug-in
-    std::unique_ptr<IOrvixServices, Release> m_services; ///< of an MSSCCI library
-    IOrvixProvider* m_provider = nullptr;
+    std::optional<ValidationLibrary> m_library; // of a plug-in
+    OrvixServicesPointer m_services;            // of an MSSCCI library
+    IOrvixProvider* m_provider = nullptr;       // owned by one of these
 };

@@ -2,10 +2,9 @@
 
 #include "ValidationSubject.h"
 
-/// What the rules demand, each by the name that it has in the table of `ValidationRule::All`. All throw as
-/// `ValidationRule::check` does.
+// The checks of the rules in the table of `ValidationRule::All`. Each throws as `ValidationRule::check` does.
 
-/// Of every provider, as a host meets it.
+/// For every provider, as a host uses it.
 namespace ProviderRules
 {
 
@@ -16,9 +15,6 @@ void Reserved(ValidationSubject& subject);
 void Results(ValidationSubject& subject);
 void BadInput(ValidationSubject& subject);
 void EmptyList(ValidationSubject& subject);
-void StatusBits(ValidationSubject& subject);
-void StatusFailure(ValidationSubject& subject);
-void StatusClosed(ValidationSubject& subject);
 void ListUntouched(ValidationSubject& subject);
 void Sessions(ValidationSubject& subject);
 void Reload(ValidationSubject& subject);
@@ -27,7 +23,17 @@ void Dialogs(ValidationSubject& subject);
 
 } // namespace ProviderRules
 
-/// Of a plug-in's four functions.
+/// For the `QueryStatus` of every provider.
+namespace StatusRules
+{
+
+void Bits(ValidationSubject& subject);
+void Failure(ValidationSubject& subject);
+void Closed(ValidationSubject& subject);
+
+} // namespace StatusRules
+
+/// For the four functions of a plug-in.
 namespace PluginRules
 {
 
@@ -38,7 +44,7 @@ void Objects(ValidationSubject& subject);
 
 } // namespace PluginRules
 
-/// Of an MSSCCI library's functions.
+/// For the functions of an MSSCCI library.
 namespace SccRules
 {
 

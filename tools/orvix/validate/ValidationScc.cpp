@@ -11,7 +11,7 @@ ValidationScc::~ValidationScc()
     {
         End();
     }
-    catch (const std::exception&) // what they answer is looked at where a rule calls them
+    catch (const std::exception&) // a rule that calls these functions itself reports it
     {
     }
 }
@@ -20,12 +20,11 @@ void ValidationScc::Initialize()
 {
     LONG checkoutCommentLength = 0;
     LONG commentLength = 0;
-    const SCCRTN result =
-        Call<decltype(SccInitialize)>("SccInitialize", &m_context, HWND{nullptr}, LPCSTR{"orvix"}, m_name.Get(),
-                                      &m_capabilities, m_auxPathLabel.Get(), &checkoutCommentLength, &commentLength);
+    const SCCRTN result = Call(SccFunctions::Initialize, &m_context, nullptr, "orvix", m_name.Get(), &m_capabilities,
+                               m_auxPathLabel.Get(), &checkoutCommentLength, &commentLength);
     if (result != SCC_OK)
     {
-        throw RuleSkipped("SccInitialize gives " + std::to_string(result));
+        throw RuleSkipped("SccInitialize returns " + std::to_string(result));
     }
     m_initialized = true;
 }
@@ -40,11 +39,11 @@ void ValidationScc::End()
 {
     if (std::exchange(m_open, false))
     {
-        Call<decltype(SccCloseProject)>("SccCloseProject", m_context);
+        Call(SccFunctions::CloseProject, m_context);
     }
     if (std::exchange(m_initialized, false))
     {
-        Call<decltype(SccUninitialize)>("SccUninitialize", m_context);
+        Call(SccFunctions::Uninitialize, m_context);
     }
 }
 
@@ -52,16 +51,16 @@ void ValidationScc::Open(LPTEXTOUTPROC output)
 {
     m_localPath.Set(Narrow(m_subject.Project()));
     SCCRTN result = TryToOpen(output);
-    if (result == SCC_E_PROJSYNTAXERR && m_library.Find<decltype(SccGetProjPath)>("SccGetProjPath") != nullptr)
+    if (result == SCC_E_PROJSYNTAXERR && m_library.Has(SccFunctions::GetProjPath.name))
     {
         BOOL isNew = TRUE;
-        result = Call<decltype(SccGetProjPath)>("SccGetProjPath", m_context, HWND{nullptr}, m_user.Get(),
-                                                m_projectName.Get(), m_localPath.Get(), m_auxPath.Get(), FALSE, &isNew);
+        result = Call(SccFunctions::GetProjPath, m_context, nullptr, m_user.Get(), m_projectName.Get(),
+                      m_localPath.Get(), m_auxPath.Get(), FALSE, &isNew);
         result = result == SCC_OK ? TryToOpen(output) : result;
     }
     if (result != SCC_OK)
     {
-        throw RuleSkipped("SccOpenProject gives " + std::to_string(result) + " for the scratch project");
+        throw RuleSkipped("SccOpenProject returns " + std::to_string(result) + " for the scratch project");
     }
     m_open = true;
 }
@@ -70,16 +69,15 @@ SCCRTN ValidationScc::TryToOpen(LPTEXTOUTPROC output)
 {
     const auto projectName = m_projectName;
     const auto localPath = m_localPath;
-    const SCCRTN result = Call<decltype(SccOpenProject)>(
-        "SccOpenProject", m_context, HWND{nullptr}, m_user.Get(), LPCSTR{m_projectName.Get()},
-        LPCSTR{m_localPath.Get()}, m_auxPath.Get(), LPCSTR{"validation"}, output, SCC_OP_CREATEIFNEW);
-    m_inputTextsKept = m_inputTextsKept && m_projectName == projectName && m_localPath == localPath;
+    const SCCRTN result = Call(SccFunctions::OpenProject, m_context, nullptr, m_user.Get(), m_projectName.Get(),
+                               m_localPath.Get(), m_auxPath.Get(), "validation", output, SCC_OP_CREATEIFNEW);
+    m_inputTextsUnchanged = m_inputTextsUnchanged && m_projectName == projectName && m_localPath == localPath;
     return result;
 }
 
 void ValidationScc::CheckInputTexts() const
 {
-    if (!m_inputTextsKept)
+    if (!m_inputTextsUnchanged)
     {
         throw RuleBroken("SccOpenProject writes to the project name or the local path");
     }
@@ -87,9 +85,9 @@ void ValidationScc::CheckInputTexts() const
 
 void ValidationScc::CheckCodes() const
 {
-    if (!m_noCode.empty())
+    if (!m_firstInvalidCode.empty())
     {
-        throw RuleBroken(m_noCode);
+        throw RuleBroken(m_firstInvalidCode);
     }
 }
 
@@ -109,7 +107,7 @@ std::string ValidationScc::Narrow(const std::wstring& path)
     const WStr back(narrow.Get());
     if (narrow.Get() == nullptr || back.Get() == nullptr || back.Get() != path)
     {
-        throw RuleSkipped("the ANSI code page lacks a letter of the scratch project's path");
+        throw RuleSkipped("the ANSI code page lacks a character of the scratch project's path");
     }
     return narrow.Get();
 }

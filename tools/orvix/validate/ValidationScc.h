@@ -1,14 +1,15 @@
 #pragma once
 
 #include "MSSCCI.h"
+#include "SccFunctions.h"
 #include "ValidationLibrary.h"
 
 #include <algorithm>
 #include <array>
 #include <string>
 
-/// A text that an MSSCCI library may read and overwrite up to `Size` bytes, with guard bytes behind it and room enough
-/// for what some libraries write too much.
+/// A text that an MSSCCI library may read, and overwrite up to `Size` bytes. Guard bytes follow it, enough for
+/// libraries that write too much.
 template <std::size_t Size>
 class GuardedText
 {
@@ -23,14 +24,14 @@ public:
 
     char* Get() { return m_bytes.data(); }
 
-    /// Replaces the text, cut to what fits; the rest of its bytes are zeros.
+    /// Replaces the text, cut to what fits. The rest of its bytes are zeros.
     void Set(const std::string& text)
     {
         std::fill_n(m_bytes.begin(), Size, '\0');
         std::copy_n(text.begin(), std::min(text.size(), Size - 1), m_bytes.begin());
     }
 
-    /// Throws `RuleBroken`, naming the text, when bytes behind it were written or it has lost its terminator.
+    /// Throws `RuleBroken` with the name of the text when a guard byte was written, or when the text has no terminator.
     void Check(const std::string& name) const
     {
         const auto end = m_bytes.begin() + Size;
@@ -46,16 +47,17 @@ public:
 
 private:
     static constexpr char Guard = '\x5A';
-    static constexpr std::size_t Slack = 4096;
+    static constexpr std::size_t GuardBytes = 4096;
 
-    std::array<char, Size + Slack> m_bytes;
+    std::array<char, Size + GuardBytes> m_bytes;
 };
 
-/// The MSSCCI library under validation, called by its own functions. At the end it is closed and freed.
+/// The MSSCCI library under validation, called by its own functions. At the end its project is closed and it is ended
+/// and unloaded.
 class ValidationScc
 {
 public:
-    /// Throws `RuleSkipped` when the library does not load.
+    /// `subject` must outlive this object. Throws `RuleSkipped` when the library does not load.
     explicit ValidationScc(ValidationSubject& subject) : m_subject(subject), m_library(subject) {}
     ValidationScc(const ValidationScc&) = delete;
     ValidationScc& operator=(const ValidationScc&) = delete;
@@ -63,46 +65,47 @@ public:
 
     const ValidationLibrary& Library() const { return m_library; }
 
-    /// The result of a function. Throws `RuleSkipped` when the library lacks it, `RuleBroken` when the result is no
-    /// code of the interface.
+    /// Calls a function and returns its result. Throws `RuleSkipped` when the library does not export it, and
+    /// `RuleBroken` for an exception.
     template <typename Function, typename... Arguments>
-    SCCRTN Call(const char* name, Arguments... arguments)
+    SCCRTN Call(const SccFunction<Function>& function, Arguments... arguments)
     {
-        auto* const function = m_library.Need<Function>(name);
-        const SCCRTN result = m_subject.Call(name, [&] { return function(arguments...); });
-        if (m_noCode.empty() && (result < LowestCode || result > HighestCode))
+        auto* const exported = m_library.Need<Function>(function.name);
+        const SCCRTN result = m_subject.Call(function.name, [&] { return exported(arguments...); });
+        if (m_firstInvalidCode.empty() && (result < LowestCode || result > HighestCode))
         {
-            m_noCode = std::string(name) + " gives " + std::to_string(result);
+            m_firstInvalidCode = std::string(function.name) + " returns " + std::to_string(result);
         }
         return result;
     }
 
-    /// Starts the library. Throws `RuleSkipped` when it refuses.
+    /// Starts the library. Throws `RuleSkipped` when it fails.
     void Initialize();
 
-    /// Opens the scratch project, a new one, in a started library; `output` may be null. Throws `RuleSkipped` when it
-    /// refuses.
+    /// Opens the scratch project as a new project; the library is started. `output` may be null. Throws `RuleSkipped`
+    /// when it fails.
     void Open(LPTEXTOUTPROC output);
 
     /// `Initialize` and `Open`.
     void Begin(LPTEXTOUTPROC output);
 
-    /// Closes what is open and ends what is started.
+    /// Closes the project and ends the library, as far as they are open and started.
     void End();
 
     LPVOID Context() const { return m_context; }
     LONG Capabilities() const { return m_capabilities; }
 
-    /// Throws `RuleBroken` when a result so far was no code of the interface.
+    /// Throws `RuleBroken` when a function has returned what is no code of the interface.
     void CheckCodes() const;
 
-    /// Throws `RuleBroken` when one of the texts so far went beyond its limit.
+    /// Throws `RuleBroken` when the library has written a text beyond its limit.
     void CheckTexts() const;
 
-    /// Throws `RuleBroken` when SccOpenProject has written to a text that it only reads.
+    /// Throws `RuleBroken` when SccOpenProject has written to a text that it may only read.
     void CheckInputTexts() const;
 
-    /// The path of a project's file. Throws `RuleSkipped` when the ANSI code page does not carry it.
+    /// A path of the project in the ANSI code page. Throws `RuleSkipped` when the code page lacks one of its
+    /// characters.
     static std::string Narrow(const std::wstring& path);
 
 private:
@@ -117,8 +120,8 @@ private:
     LONG m_capabilities = 0;
     bool m_initialized = false;
     bool m_open = false;
-    bool m_inputTextsKept = true;
-    std::string m_noCode; ///< the first such result, in words
+    bool m_inputTextsUnchanged = true;
+    std::string m_firstInvalidCode; // as a message; empty for none
     GuardedText<SCC_NAME_SIZE> m_name;
     GuardedText<SCC_AUXLABEL_SIZE> m_auxPathLabel;
     GuardedText<SCC_USER_SIZE> m_user;

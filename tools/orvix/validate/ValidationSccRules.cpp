@@ -3,76 +3,75 @@
 #include "ValidationRules.h"
 #include "ValidationScc.h"
 
-#include <array>
+#include <algorithm>
 #include <cstring>
 #include <iterator>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace
 {
 
-/// A function of the interface.
-struct Function
+/// A function that a library need not export, or that a capability bit promises. Every other function is needed and has
+/// no bit.
+struct FunctionDetail
 {
     const char* name;
-    bool isNeeded;   ///< OrvixCore cannot do without it
-    LONG capability; ///< the bit that promises it; 0 for none
+    LONG capability; ///< 0 for none
+    bool isNeeded;   ///< OrvixCore cannot work on files without it
 };
 
-constexpr Function Functions[] = {
-    {SccFunctions::GetVersion.name, true, 0},
-    {SccFunctions::Initialize.name, true, 0},
-    {SccFunctions::Uninitialize.name, true, 0},
-    {SccFunctions::OpenProject.name, true, 0},
-    {SccFunctions::CloseProject.name, true, 0},
-    {SccFunctions::GetProjPath.name, false, SCC_CAP_GETPROJPATH},
-    {SccFunctions::Get.name, true, 0},
-    {SccFunctions::Checkout.name, true, 0},
-    {SccFunctions::Uncheckout.name, true, 0},
-    {SccFunctions::Checkin.name, true, 0},
-    {SccFunctions::Add.name, true, 0},
-    {SccFunctions::BeginBatch.name, false, SCC_CAP_BATCH},
-    {SccFunctions::EndBatch.name, false, SCC_CAP_BATCH},
-    {SccFunctions::History.name, false, SCC_CAP_HISTORY},
-    {SccFunctions::Properties.name, false, SCC_CAP_PROPERTIES},
-    {SccFunctions::QueryInfo.name, true, SCC_CAP_QUERYINFO},
-    {SccFunctions::PopulateList.name, false, SCC_CAP_POPULATELIST},
-    {SccFunctions::RunScc.name, false, SCC_CAP_RUNSCC},
-    {SccFunctions::GetCommandOptions.name, false, SCC_CAP_GETCOMMANDOPTIONS},
-    {SccFunctions::AddFromScc.name, false, SCC_CAP_ADDFROMSCC},
-    {SccFunctions::SetOption.name, false, 0},
+constexpr FunctionDetail FunctionDetails[] = {
+    {SccFunctions::GetProjPath.name, SCC_CAP_GETPROJPATH, false},
+    {SccFunctions::BeginBatch.name, SCC_CAP_BATCH, false},
+    {SccFunctions::EndBatch.name, SCC_CAP_BATCH, false},
+    {SccFunctions::History.name, SCC_CAP_HISTORY, false},
+    {SccFunctions::Properties.name, SCC_CAP_PROPERTIES, false},
+    {SccFunctions::QueryInfo.name, SCC_CAP_QUERYINFO, true},
+    {SccFunctions::PopulateList.name, SCC_CAP_POPULATELIST, false},
+    {SccFunctions::RunScc.name, SCC_CAP_RUNSCC, false},
+    {SccFunctions::GetCommandOptions.name, SCC_CAP_GETCOMMANDOPTIONS, false},
+    {SccFunctions::AddFromScc.name, SCC_CAP_ADDFROMSCC, false},
+    {SccFunctions::SetOption.name, 0, false},
 };
-static_assert(std::size(Functions) == std::size(SccFunctions::Names));
+
+FunctionDetail DetailOf(const char* name)
+{
+    const auto* found =
+        std::find_if(std::begin(FunctionDetails), std::end(FunctionDetails),
+                     [name = std::string_view(name)](const FunctionDetail& detail) { return detail.name == name; });
+    return found == std::end(FunctionDetails) ? FunctionDetail{name, 0, true} : *found;
+}
 
 constexpr LPCSTR Comment = "validation";
 
-/// File names as a library is given them.
+/// File names as they are passed to a library, with a copy to see whether the library writes to them.
 class Names
 {
 public:
-    explicit Names(std::vector<std::string> names) : m_names(std::move(names)), m_given(m_names)
+    explicit Names(std::vector<std::string> names) : m_names(std::move(names)), m_passed(m_names)
     {
-        for (const std::string& name : m_given)
+        for (const std::string& name : m_passed)
         {
             m_pointers.push_back(name.c_str());
         }
-        m_pointersGiven = m_pointers;
+        m_passedPointers = m_pointers;
     }
     Names(const Names&) = delete;
     Names& operator=(const Names&) = delete;
     ~Names() = default;
 
-    LONG Count() const { return static_cast<LONG>(m_pointersGiven.size()); }
-    LPCSTR* Get() { return m_pointersGiven.data(); }
+    LONG Count() const { return static_cast<LONG>(m_passedPointers.size()); }
+    LPCSTR* Get() { return m_passedPointers.data(); }
 
-    bool AreKept() const { return m_given == m_names && m_pointersGiven == m_pointers; }
+    bool AreUnchanged() const { return m_passed == m_names && m_passedPointers == m_pointers; }
 
 private:
     std::vector<std::string> m_names;
-    std::vector<std::string> m_given;
+    std::vector<std::string> m_passed;
     std::vector<LPCSTR> m_pointers;
-    std::vector<LPCSTR> m_pointersGiven;
+    std::vector<LPCSTR> m_passedPointers;
 };
 
 std::vector<std::string> GoodNames(const ValidationSubject& subject)
@@ -81,7 +80,7 @@ std::vector<std::string> GoodNames(const ValidationSubject& subject)
             ValidationScc::Narrow(subject.Write(L"with blanks.bin", std::string("\0\xFF", 2)))};
 }
 
-/// The good ones, and what is no file of the project. All lie in the scratch folder, the current one.
+/// The good names, and names of no file of the project. All are in the scratch folder, which is the current folder.
 std::vector<std::string> AllNames(const ValidationSubject& subject)
 {
     std::vector<std::string> names = GoodNames(subject);
@@ -105,70 +104,65 @@ struct Step
 SCCRTN QueryInfo(ValidationScc& scc, LONG count, LPCSTR* names)
 {
     std::vector<LONG> status(static_cast<std::size_t>(count) + 1);
-    return scc.Call<decltype(SccQueryInfo)>("SccQueryInfo", scc.Context(), count, names, status.data());
+    return scc.Call(SccFunctions::QueryInfo, scc.Context(), count, names, status.data());
 }
 
 template <LONG Options>
 SCCRTN Add(ValidationScc& scc, LONG count, LPCSTR* names)
 {
     std::vector<LONG> options(static_cast<std::size_t>(count) + 1, Options);
-    return scc.Call<decltype(SccAdd)>("SccAdd", scc.Context(), HWND{nullptr}, count, names, Comment, options.data(),
-                                      LPCMDOPTS{nullptr});
+    return scc.Call(SccFunctions::Add, scc.Context(), nullptr, count, names, Comment, options.data(), nullptr);
 }
 
 SCCRTN Checkout(ValidationScc& scc, LONG count, LPCSTR* names)
 {
-    return scc.Call<decltype(SccCheckout)>("SccCheckout", scc.Context(), HWND{nullptr}, count, names, Comment, LONG{0},
-                                           LPCMDOPTS{nullptr});
+    return scc.Call(SccFunctions::Checkout, scc.Context(), nullptr, count, names, Comment, 0, nullptr);
 }
 
 template <LONG Options>
 SCCRTN Checkin(ValidationScc& scc, LONG count, LPCSTR* names)
 {
-    return scc.Call<decltype(SccCheckin)>("SccCheckin", scc.Context(), HWND{nullptr}, count, names, Comment, Options,
-                                          LPCMDOPTS{nullptr});
+    return scc.Call(SccFunctions::Checkin, scc.Context(), nullptr, count, names, Comment, Options, nullptr);
 }
 
 SCCRTN Uncheckout(ValidationScc& scc, LONG count, LPCSTR* names)
 {
-    return scc.Call<decltype(SccUncheckout)>("SccUncheckout", scc.Context(), HWND{nullptr}, count, names, LONG{0},
-                                             LPCMDOPTS{nullptr});
+    return scc.Call(SccFunctions::Uncheckout, scc.Context(), nullptr, count, names, 0, nullptr);
 }
 
 SCCRTN Get(ValidationScc& scc, LONG count, LPCSTR* names)
 {
-    return scc.Call<decltype(SccGet)>("SccGet", scc.Context(), HWND{nullptr}, count, names, LONG{0},
-                                      LPCMDOPTS{nullptr});
+    return scc.Call(SccFunctions::Get, scc.Context(), nullptr, count, names, 0, nullptr);
 }
 
-/// A file's way through all states, with the options that OrvixCore passes.
-constexpr Step WayOfAFile[] = {
-    {"SccQueryInfo", QueryInfo},
-    {"SccAdd", Add<0>},
-    {"SccQueryInfo", QueryInfo},
-    {"SccCheckout", Checkout},
-    {"SccCheckin", Checkin<SCC_KEEP_CHECKEDOUT>},
-    {"SccUncheckout", Uncheckout},
-    {"SccCheckout", Checkout},
-    {"SccCheckin", Checkin<0>},
-    {"SccGet", Get},
-    {"SccAdd", Add<SCC_KEEP_CHECKEDOUT>},
-    {"SccQueryInfo", QueryInfo},
+/// The calls that take a file through all states, with the options that OrvixCore passes.
+constexpr Step Scenario[] = {
+    {SccFunctions::QueryInfo.name, QueryInfo},
+    {SccFunctions::Add.name, Add<0>},
+    {SccFunctions::QueryInfo.name, QueryInfo},
+    {SccFunctions::Checkout.name, Checkout},
+    {SccFunctions::Checkin.name, Checkin<SCC_KEEP_CHECKEDOUT>},
+    {SccFunctions::Uncheckout.name, Uncheckout},
+    {SccFunctions::Checkout.name, Checkout},
+    {SccFunctions::Checkin.name, Checkin<0>},
+    {SccFunctions::Get.name, Get},
+    {SccFunctions::Add.name, Add<SCC_KEEP_CHECKEDOUT>},
+    {SccFunctions::QueryInfo.name, QueryInfo},
 };
 
-void RunWayOfAFile(ValidationScc& scc, Names& names)
+void RunScenario(ValidationScc& scc, Names& names)
 {
-    for (const Step& step : WayOfAFile)
+    for (const Step& step : Scenario)
     {
         step.run(scc, names.Count(), names.Get());
     }
 }
 
-/// What a library prints. Its callback is a bare function, so there is one for the process.
-class Output
+/// Checks what a library prints. The callback is a plain function, so its data is static.
+class OutputCheck
 {
 public:
-    static inline std::string broken; ///< what was wrong with a line; empty for nothing
+    static inline std::string problem; ///< of the last line with one; empty for none
     static inline int lines = 0;
 
     static LONG Receive(LPCSTR text, LONG kind)
@@ -178,19 +172,43 @@ public:
         ++lines;
         if (kind < SCC_MSG_INFO || kind > LastKind)
         {
-            broken = "the kind " + std::to_string(kind) + " means nothing";
+            problem = "the kind " + std::to_string(kind) + " is unknown";
         }
         else if (kind <= SCC_MSG_ERROR && text == nullptr)
         {
-            broken = "a line of kind " + std::to_string(kind) + " has no text";
+            problem = "a line of kind " + std::to_string(kind) + " has no text";
         }
         else if (kind < DoCancel && text != nullptr && std::strpbrk(text, "\r\n") != nullptr)
         {
-            broken = "a line carries a line end";
+            problem = "a line contains a line end";
         }
         return SCC_MSG_RTN_OK;
     }
 };
+
+/// Throws `RuleBroken` when the status words of a query are wrong. `status` has more words than `count`, which were all
+/// `guard` before.
+void CheckStatusWords(const std::vector<LONG>& status, std::size_t count, LONG guard, bool succeeded)
+{
+    constexpr LONG KnownBits = 0x3FFF; // SCC_STATUS_...
+
+    const auto end = status.begin() + static_cast<std::ptrdiff_t>(count);
+    if (std::any_of(end, status.end(), [guard](LONG word) { return word != guard; }))
+    {
+        throw RuleBroken("SccQueryInfo writes more words than there are files");
+    }
+    for (auto word = status.begin(); succeeded && word != end; ++word)
+    {
+        if (*word == guard)
+        {
+            throw RuleBroken("SccQueryInfo does not write the word of a file");
+        }
+        if (*word != SCC_STATUS_INVALID && (*word & ~KnownBits) != 0)
+        {
+            throw RuleBroken("SccQueryInfo sets unknown bits: " + Hexadecimal(static_cast<unsigned long>(*word)));
+        }
+    }
+}
 
 } // namespace
 
@@ -199,20 +217,20 @@ void SccRules::Exports(ValidationSubject& subject)
     const ValidationLibrary library(subject);
     std::string missing;
     std::string without;
-    for (const Function& function : Functions)
+    for (const char* name : SccFunctions::Names)
     {
-        if (library.Find<void()>(function.name) == nullptr)
+        if (!library.Has(name))
         {
-            (function.isNeeded ? missing : without) += std::string(" ") + function.name;
+            (DetailOf(name).isNeeded ? missing : without) += std::string(" ") + name;
         }
     }
     if (!missing.empty())
     {
-        throw RuleBroken("it lacks" + missing);
+        throw RuleBroken("it does not export" + missing);
     }
     if (!without.empty())
     {
-        subject.Remark("without" + without + ": what needs these fails");
+        subject.Remark("without" + without + ": the operations that need these fail");
     }
 }
 
@@ -223,7 +241,7 @@ void SccRules::Version(ValidationSubject& subject)
                                       library.Need<decltype(SccGetVersion)>(SccFunctions::GetVersion.name));
     if (HIWORD(version) != 1 || LOWORD(version) > 3)
     {
-        throw RuleBroken("SccGetVersion gives " + Hexadecimal(static_cast<unsigned long>(version)));
+        throw RuleBroken("SccGetVersion returns " + Hexadecimal(static_cast<unsigned long>(version)));
     }
 }
 
@@ -232,11 +250,11 @@ void SccRules::Capabilities(ValidationSubject& subject)
     ValidationScc scc(subject);
     scc.Initialize();
     std::string missing;
-    for (const Function& function : Functions)
+    for (const char* name : SccFunctions::Names)
     {
-        if ((scc.Capabilities() & function.capability) != 0 && scc.Library().Find<void()>(function.name) == nullptr)
+        if ((scc.Capabilities() & DetailOf(name).capability) != 0 && !scc.Library().Has(name))
         {
-            missing += std::string(" ") + function.name;
+            missing += std::string(" ") + name;
         }
     }
     if (!missing.empty())
@@ -261,10 +279,10 @@ void SccRules::InputTexts(ValidationSubject& subject)
     scc.Begin(nullptr);
     scc.CheckInputTexts();
     Names names(GoodNames(subject));
-    for (const Step& step : WayOfAFile)
+    for (const Step& step : Scenario)
     {
         step.run(scc, names.Count(), names.Get());
-        if (!names.AreKept())
+        if (!names.AreUnchanged())
         {
             throw RuleBroken(std::string(step.name) + " writes to the file names");
         }
@@ -276,11 +294,11 @@ void SccRules::Codes(ValidationSubject& subject)
     ValidationScc scc(subject);
     scc.Begin(nullptr);
     Names good(GoodNames(subject));
-    RunWayOfAFile(scc, good);
+    RunScenario(scc, good);
     for (const std::string& name : AllNames(subject))
     {
         Names one({name});
-        RunWayOfAFile(scc, one);
+        RunScenario(scc, one);
     }
     scc.End();
     scc.CheckCodes();
@@ -290,70 +308,54 @@ void SccRules::NullArguments(ValidationSubject& subject)
 {
     ValidationScc scc(subject);
     scc.Begin(nullptr);
-    for (const Step& step : WayOfAFile)
+    for (const Step& step : Scenario)
     {
         LPCSTR none = nullptr;
         step.run(scc, 0, &none);
     }
-    if (scc.Library().Find<void()>("SccGetCommandOptions") != nullptr)
+    if (scc.Library().Has(SccFunctions::GetCommandOptions.name))
     {
-        scc.Call<decltype(SccGetCommandOptions)>("SccGetCommandOptions", scc.Context(), HWND{nullptr},
-                                                 SCC_COMMAND_OPTIONS, static_cast<LPCMDOPTS*>(nullptr));
+        scc.Call(SccFunctions::GetCommandOptions, scc.Context(), nullptr, SCC_COMMAND_OPTIONS, nullptr);
     }
-    if (scc.Library().Find<void()>("SccAddFromScc") != nullptr)
+    if (scc.Library().Has(SccFunctions::AddFromScc.name))
     {
-        scc.Call<decltype(SccAddFromScc)>("SccAddFromScc", scc.Context(), HWND{nullptr}, LPLONG{nullptr},
-                                          static_cast<LPCSTR**>(nullptr));
+        scc.Call(SccFunctions::AddFromScc, scc.Context(), nullptr, nullptr, nullptr);
     }
 }
 
 void SccRules::InfoBits(ValidationSubject& subject)
 {
-    constexpr LONG KnownBits = 0x3FFF;
     constexpr LONG Guard = 0x5A5A5A5A;
+    constexpr std::size_t GuardWords = 64;
 
     ValidationScc scc(subject);
     scc.Begin(nullptr);
     Names names(GoodNames(subject));
-    for (const Step& step : WayOfAFile)
+    const auto count = static_cast<std::size_t>(names.Count());
+    for (const Step& step : Scenario)
     {
         step.run(scc, names.Count(), names.Get());
-        std::vector<LONG> status(static_cast<std::size_t>(names.Count()) + 64, Guard);
+        std::vector<LONG> status(count + GuardWords, Guard);
         const SCCRTN result =
-            scc.Call<decltype(SccQueryInfo)>("SccQueryInfo", scc.Context(), names.Count(), names.Get(), status.data());
-        const auto end = status.begin() + names.Count();
-        if (std::any_of(end, status.end(), [](LONG word) { return word != Guard; }))
-        {
-            throw RuleBroken("SccQueryInfo writes more words than there are files");
-        }
-        for (auto word = status.begin(); result >= SCC_OK && word != end; ++word)
-        {
-            if (*word == Guard)
-            {
-                throw RuleBroken("SccQueryInfo leaves a file's word as it was");
-            }
-            if (*word != SCC_STATUS_INVALID && (*word & ~KnownBits) != 0)
-            {
-                throw RuleBroken("SccQueryInfo sets unknown bits: " + Hexadecimal(static_cast<unsigned long>(*word)));
-            }
-        }
+            scc.Call(SccFunctions::QueryInfo, scc.Context(), names.Count(), names.Get(), status.data());
+        CheckStatusWords(status, count, Guard, result >= SCC_OK);
     }
 }
 
 void SccRules::TextOutput(ValidationSubject& subject)
 {
     ValidationScc scc(subject);
-    scc.Begin(Output::Receive);
+    scc.Begin(OutputCheck::Receive);
     for (const std::string& name : AllNames(subject))
     {
         Names one({name});
-        RunWayOfAFile(scc, one);
+        RunScenario(scc, one);
     }
-    if (!Output::broken.empty())
+    if (!OutputCheck::problem.empty())
     {
-        throw RuleBroken(Output::broken);
+        throw RuleBroken(OutputCheck::problem);
     }
-    if (Output::lines == 0)
+    if (OutputCheck::lines == 0)
     {
         throw RuleSkipped("it prints nothing");
     }

@@ -2,17 +2,16 @@
 
 #include "FilePath.h"
 #include "ToolError.h"
+#include "UniqueHandle.h"
 
 #include <windows.h>
-
-#include <memory>
 
 ValidationScratch::ValidationScratch()
 {
     std::wstring root(MAX_PATH + 1, L'\0');
     root.resize(GetTempPathW(static_cast<DWORD>(root.size()), root.data()));
     const std::wstring name = root + L"orvix-validate-" + std::to_wstring(GetCurrentProcessId()) + L'-';
-    // The number of a process comes again, and what one left behind stays.
+    // A folder of an earlier process with the same number may still exist.
     for (int number = 1; m_path.empty(); ++number)
     {
         const std::wstring path = name + std::to_wstring(number);
@@ -28,15 +27,14 @@ ValidationScratch::ValidationScratch()
 
 ValidationScratch::~ValidationScratch()
 {
-    RemoveTree(LongPath(m_path)); // whatever the length of what was made in it
+    RemoveTree(LongPath(m_path)); // a library may have made long paths in it
 }
 
 void ValidationScratch::RemoveTree(const std::wstring& folder)
 {
     WIN32_FIND_DATAW found;
-    std::unique_ptr<void, decltype(&FindClose)> search(FindFirstFileW((folder + L"\\*").c_str(), &found), FindClose);
-    for (BOOL more = search.get() != INVALID_HANDLE_VALUE ? TRUE : FALSE; more;
-         more = FindNextFileW(search.get(), &found))
+    UniqueFind search(FindFirstFileW((folder + L"\\*").c_str(), &found));
+    for (bool more = static_cast<bool>(search); more; more = FindNextFileW(search.Get(), &found) != FALSE)
     {
         const std::wstring name = found.cFileName;
         const std::wstring path = folder + L'\\' + name;
@@ -53,14 +51,14 @@ void ValidationScratch::RemoveTree(const std::wstring& folder)
         }
         else if (isLink)
         {
-            RemoveDirectoryW(path.c_str()); // the link, not what it leads to
+            RemoveDirectoryW(path.c_str()); // the link, not its target
         }
         else
         {
             RemoveTree(path);
         }
     }
-    search.reset(); // an open search keeps the folder
+    search.Reset(); // a folder with an open search cannot be deleted
     SetFileAttributesW(folder.c_str(), FILE_ATTRIBUTE_NORMAL);
     RemoveDirectoryW(folder.c_str());
 }

@@ -2,11 +2,11 @@
 
 #include <string>
 
-/// A new, empty folder below the user's temporary folder; deleted with everything in it, read-only files included.
+/// A new, empty folder below the user's temporary folder. At the end it is deleted with everything in it.
 class ValidationScratch
 {
 public:
-    /// Throws `ToolError` when it cannot be made.
+    /// Throws `ToolError` when the folder cannot be made.
     ValidationScratch();
     ValidationScratch(const ValidationScratch&) = delete;
     ValidationScratch& operator=(const ValidationScratch&) = delete;
@@ -16,7 +16,7 @@ public:
     const std::wstring& Path() const { return m_path; }
 
     /// Deletes a folder with everything in it, read-only files included, as far as the system allows. A link is
-    /// deleted, never what it leads to.
+    /// deleted, never its target.
     static void RemoveTree(const std::wstring& folder);
 
 private:

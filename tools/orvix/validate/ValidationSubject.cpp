@@ -21,7 +21,7 @@ std::wstring ValidationSubject::Write(const std::wstring& name, std::string_view
     return path;
 }
 
-void ValidationSubject::Tell(std::string_view word, const std::string& text)
+void ValidationSubject::Send(std::string_view word, const std::string& text)
 {
     const std::string line = std::string(word) + ' ' + Printable(Wide(text)) + '\n';
     DWORD written = 0;

@@ -1,4 +1,4 @@
-#include "PromptCommand.h"
+#include "PromptFileEditor.h"
 
 #include "FilePath.h"
 #include "HostSession.h"
@@ -12,12 +12,13 @@
 #include <algorithm>
 #include <limits>
 #include <numeric>
+#include <optional>
 
 namespace
 {
 
-/// The 32 bits of an ID in decimal, with or without a sign.
-int ParseId(const std::wstring& text)
+/// An ID, a decimal number of 32 bits with or without a sign. Throws `ToolError` for any other text.
+int ParseID(const std::wstring& text)
 {
     const bool negative = text.starts_with(L'-');
     const std::wstring digits = text.substr(negative ? 1 : 0);
@@ -33,85 +34,85 @@ int ParseId(const std::wstring& text)
 
 } // namespace
 
-PromptCommand::PromptCommand(const CommandLine& commandLine, Output& output)
+PromptFileEditor::PromptFileEditor(const CommandLine& commandLine, Output& output)
     : m_commandLine(commandLine), m_output(output)
 {
     const std::wstring folder = HostSession::ConfigFolder(commandLine);
     if (!IsFolder(folder))
     {
-        throw ToolError(ExitCode::NoProject, L"no such configuration folder: " + folder);
+        throw ToolError(ExitCode::NotFound, L"no such configuration folder: " + folder);
     }
     m_path = folder + L'\\' + PromptFileName;
-    if (!ReadPromptFile(m_table, m_path.c_str(), &m_log) && PathExists(m_path))
+    if (!ReadPromptFile(m_table, m_path.c_str(), &m_diagnostics) && PathExists(m_path))
     {
         throw ToolError(ExitCode::Failed, L"the stored answers cannot be read and stay as they are: " + m_path);
     }
 }
 
-void PromptCommand::Run()
+void PromptFileEditor::List()
 {
-    const std::wstring& action = m_commandLine.action;
-    Rows rows = action == L"list" || m_commandLine.all ? All() : Named();
-    if (action == L"set")
+    Show(AllRows());
+}
+
+void PromptFileEditor::Set()
+{
+    const Rows rows = NamedRows();
+    const std::optional<std::uint32_t> action = PromptAnswer::Action(m_commandLine.answer);
+    if (!action)
     {
-        const auto answer = PromptAnswer::Action(m_commandLine.answer);
-        if (!answer)
-        {
-            throw ToolError(ExitCode::BadUsage,
-                            L"an answer is ask, yes, no, yes-to-all or no-to-all, not " + m_commandLine.answer);
-        }
-        Set(rows, *answer);
+        throw ToolError(ExitCode::BadUsage,
+                        L"an answer is ask, yes, no, yes-to-all or no-to-all, not " + m_commandLine.answer);
     }
-    else if (action == L"reset" && m_commandLine.all)
-    {
-        rows = ResetAll();
-    }
-    else if (action == L"reset")
-    {
-        Set(rows, OrvixPromptAction::Ask);
-    }
-    else if (action != L"list")
-    {
-        Lock(rows, action == L"lock");
-    }
+    SetRows(rows, *action);
     Show(rows);
 }
 
-PromptCommand::Rows PromptCommand::All()
+void PromptFileEditor::Reset()
+{
+    Rows rows = m_commandLine.all ? AllRows() : NamedRows();
+    if (m_commandLine.all)
+    {
+        m_leftLocked =
+            static_cast<unsigned int>(std::erase_if(rows, [this](unsigned int row) { return m_table.GetLocked(row); }));
+    }
+    SetRows(rows, OrvixPromptAction::Ask);
+    Show(rows);
+}
+
+void PromptFileEditor::Lock()
+{
+    LockRows(true);
+}
+
+void PromptFileEditor::Unlock()
+{
+    LockRows(false);
+}
+
+PromptFileEditor::Rows PromptFileEditor::AllRows()
 {
     Rows rows(static_cast<std::size_t>(m_table.NumPrompts()));
     std::iota(rows.begin(), rows.end(), 0U);
     return rows;
 }
 
-PromptCommand::Rows PromptCommand::Named()
+PromptFileEditor::Rows PromptFileEditor::NamedRows()
 {
-    const int id = ParseId(m_commandLine.prompt);
-    Rows rows = All();
+    const int id = ParseID(m_commandLine.prompt);
+    Rows rows = AllRows();
     std::erase_if(rows, [&](unsigned int row) { return m_table.GetPromptID(row) != id; });
     if (rows.empty())
     {
-        throw ToolError(ExitCode::NoProject, L"no such prompt: " + m_commandLine.prompt + L" (see orvix prompts list)");
+        throw ToolError(ExitCode::NotFound, L"no such prompt: " + m_commandLine.prompt + L" (see orvix prompts list)");
     }
     return rows;
 }
 
-void PromptCommand::Set(const Rows& rows, std::uint32_t action)
+void PromptFileEditor::SetRows(const Rows& rows, std::uint32_t action)
 {
     for (const unsigned int row : rows)
     {
-        if (m_table.GetLocked(row))
-        {
-            throw ToolError(ExitCode::Failed, L"prompt " + m_commandLine.prompt + L" is locked");
-        }
-        const std::uint32_t options = m_table.GetPromptOptions(row);
-        const bool hasIt = PromptAnswer::InWords(m_table.GetPrompt(row)) == PromptAnswer::InWords(action);
-        if (!hasIt && !PromptAnswer::IsOffered(options, action))
-        {
-            throw ToolError(ExitCode::Failed, L"prompt " + m_commandLine.prompt + L" does not offer " +
-                                                  PromptAnswer::InWords(action) + L" but " +
-                                                  PromptAnswer::OptionsInWords(options));
-        }
+        CheckOffered(row, action);
     }
     for (const unsigned int row : rows)
     {
@@ -120,44 +121,54 @@ void PromptCommand::Set(const Rows& rows, std::uint32_t action)
     Save();
 }
 
-PromptCommand::Rows PromptCommand::ResetAll()
+void PromptFileEditor::CheckOffered(unsigned int row, std::uint32_t action)
 {
-    Rows rows = All();
-    m_leftLocked =
-        static_cast<unsigned int>(std::erase_if(rows, [this](unsigned int row) { return m_table.GetLocked(row); }));
-    Set(rows, OrvixPromptAction::Ask);
-    return rows;
+    if (m_table.GetLocked(row))
+    {
+        throw ToolError(ExitCode::Failed, L"prompt " + m_commandLine.prompt + L" is locked");
+    }
+    const std::uint32_t options = m_table.GetPromptOptions(row);
+    const bool isStored = PromptAnswer::InWords(m_table.GetPrompt(row)) == PromptAnswer::InWords(action);
+    if (!isStored && !PromptAnswer::IsOffered(options, action))
+    {
+        throw ToolError(ExitCode::Failed, L"prompt " + m_commandLine.prompt + L" does not offer " +
+                                              PromptAnswer::InWords(action) + L" but " +
+                                              PromptAnswer::OptionsInWords(options));
+    }
 }
 
-void PromptCommand::Lock(const Rows& rows, bool locked)
+void PromptFileEditor::LockRows(bool locked)
 {
+    const Rows rows = NamedRows();
     for (const unsigned int row : rows)
     {
         m_table.SetLocked(row, locked);
     }
     Save();
+    Show(rows);
 }
 
-void PromptCommand::Save()
+void PromptFileEditor::Save()
 {
-    const auto losses = std::count_if(m_log.diagnostics.begin(), m_log.diagnostics.end(), [](const FileDiagnostics::Diagnostic& diagnostic) {
-        return diagnostic.kind != FileDiagnostics::Kind::UnknownValue;
-    });
+    const auto losses = std::count_if(m_diagnostics.diagnostics.begin(), m_diagnostics.diagnostics.end(),
+                                      [](const FileDiagnostics::Diagnostic& diagnostic) {
+                                          return diagnostic.kind != FileDiagnostics::Kind::UnknownValue;
+                                      });
     if (losses > 0)
     {
-        throw ToolError(ExitCode::Failed, L"nothing is changed: what the library passes over would be lost (" +
+        throw ToolError(ExitCode::Failed, L"nothing is changed: what the library ignores would be lost (" +
                                               std::to_wstring(losses) + L", see orvix doctor) in " + m_path);
     }
     if (m_table.NumPrompts() == 0)
     {
         return;
     }
-    // Written beside it first: the old file stays whole until the new one is.
+    // The new file is written beside the old one and then replaces it, so that no reader sees half of it.
     const std::wstring written = m_path + L".new";
     if (!WritePromptFile(m_table, written.c_str()) ||
         !ReplaceFileW(m_path.c_str(), written.c_str(), nullptr, 0, nullptr, nullptr))
     {
-        // A replacement that fails half-way may have taken the old file away already.
+        // A replacement that failed after it had removed the old file leaves the new one as the only copy.
         if (PathExists(m_path))
         {
             DeleteFileW(written.c_str());
@@ -166,7 +177,7 @@ void PromptCommand::Save()
     }
 }
 
-void PromptCommand::Show(const Rows& rows)
+void PromptFileEditor::Show(const Rows& rows)
 {
     Listing listing{
         .key = "prompts",

@@ -1,0 +1,212 @@
+#include "Command.h"
+#include "DoctorCommand.h"
+#include "FileCommands.h"
+#include "FilterCommand.h"
+#include "PromptCommands.h"
+#include "ProviderCommands.h"
+#include "ProviderList.h"
+#include "RegistrationCommands.h"
+#include "ValidateCommand.h"
+
+namespace
+{
+
+constexpr const char* FilesHelp = "Files, and folders with everything in them";
+
+constexpr Command Table[] = {
+    {
+        .name = "providers",
+        .description = "List the providers",
+        .examples = "  orvix providers\n"
+                    "  orvix providers --sources plugins,msscci --json",
+        .takes = Argument::Json,
+        .run = ListProviders,
+    },
+    {
+        .name = "doctor",
+        .description = "Say of every possible provider whether it is listed and why, and what is wrong",
+        .examples = "  orvix doctor\n"
+                    "  orvix doctor --sources msscci --json",
+        .takes = Argument::Json,
+        .defaultSources = OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI,
+        .run = RunDoctor,
+    },
+    {
+        .name = "status",
+        .description = "Show the state of files",
+        .examples = "  orvix status .\n"
+                    "  orvix status src\\a.txt --json",
+        .takes = Argument::Paths | Argument::Json,
+        .pathHelp = FilesHelp,
+        .run = FileCommands::ShowStatus,
+    },
+    {
+        .name = "add",
+        .description = "Put files under control",
+        .examples = "  orvix add src -m \"first version\"\n"
+                    "  orvix add new.txt --keep --unattended",
+        .takes = Argument::Paths | Argument::Json | Argument::Comment | Argument::Keep,
+        .pathHelp = FilesHelp,
+        .run = FileCommands::Add,
+    },
+    {
+        .name = "checkout",
+        .description = "Take files for editing",
+        .examples = "  orvix checkout src\\a.txt -m \"to mend the title\"\n"
+                    "  orvix checkout src --unattended --json",
+        .takes = Argument::Paths | Argument::Json | Argument::Comment,
+        .pathHelp = FilesHelp,
+        .run = FileCommands::CheckOut,
+    },
+    {
+        .name = "checkin",
+        .description = "Store new versions of checked-out files",
+        .examples = "  orvix checkin . -m \"title mended\"\n"
+                    "  orvix checkin . --unattended -m nightly --veto *.key",
+        .takes = Argument::Paths | Argument::Json | Argument::Comment | Argument::Keep,
+        .pathHelp = FilesHelp,
+        .run = FileCommands::CheckIn,
+    },
+    {
+        .name = "undo",
+        .description = "Give checked-out files back unchanged",
+        .examples = "  orvix undo src\\a.txt",
+        .takes = Argument::Paths | Argument::Json,
+        .pathHelp = FilesHelp,
+        .run = FileCommands::UndoCheckOut,
+    },
+    {
+        .name = "get",
+        .description = "Bring the latest versions",
+        .examples = "  orvix get . --unattended",
+        .takes = Argument::Paths | Argument::Json,
+        .pathHelp = FilesHelp,
+        .run = FileCommands::GetLatest,
+    },
+    {
+        .name = "history",
+        .description = "Show the versions of files",
+        .examples = "  orvix history src\\a.txt\n"
+                    "  orvix history src --json",
+        .takes = Argument::Paths | Argument::Json,
+        .pathHelp = FilesHelp,
+        .run = FileCommands::ShowHistory,
+    },
+    {
+        .name = "filters",
+        .description = "Show which files the filters of providers exclude, and why",
+        .examples = "  orvix filters src\n"
+                    "  orvix filters a.tmp --provider Archive --json",
+        .takes = Argument::Paths | Argument::Json,
+        .pathHelp = FilesHelp,
+        .run = ShowFilters,
+    },
+    {
+        .name = "prompts",
+        .description = "Show and change the stored answers",
+        .examples = "  orvix prompts list\n"
+                    "  orvix prompts set 1330796546 yes\n"
+                    "  orvix prompts reset --all\n"
+                    "  orvix prompts lock 1330796546",
+    },
+    {
+        .group = "prompts",
+        .name = "list",
+        .description = "List the prompts",
+        .examples = "  orvix prompts list\n"
+                    "  orvix prompts list --json --config D:\\Config",
+        .takes = Argument::Json,
+        .run = PromptCommands::List,
+    },
+    {
+        .group = "prompts",
+        .name = "set",
+        .description = "Store an answer",
+        .examples = "  orvix prompts set 1330796546 yes\n"
+                    "  orvix prompts set 7 ask",
+        .takes = Argument::Prompt | Argument::Answer | Argument::Json,
+        .run = PromptCommands::Set,
+    },
+    {
+        .group = "prompts",
+        .name = "reset",
+        .description = "Have a prompt ask again",
+        .examples = "  orvix prompts reset 7\n"
+                    "  orvix prompts reset --all",
+        .takes = Argument::PromptOrAll | Argument::Json,
+        .run = PromptCommands::Reset,
+    },
+    {
+        .group = "prompts",
+        .name = "lock",
+        .description = "Lock the answer of a prompt",
+        .examples = "  orvix prompts lock 7",
+        .takes = Argument::Prompt | Argument::Json,
+        .run = PromptCommands::Lock,
+    },
+    {
+        .group = "prompts",
+        .name = "unlock",
+        .description = "Unlock it",
+        .examples = "  orvix prompts unlock 7",
+        .takes = Argument::Prompt | Argument::Json,
+        .run = PromptCommands::Unlock,
+    },
+    {
+        .name = "open",
+        .description = "Open the project and close it again",
+        .examples = "  orvix open --project D:\\Projects\\Song",
+        .run = ProviderCommands::Open,
+    },
+    {
+        .name = "options",
+        .description = "Show the provider's own options",
+        .examples = "  orvix options --provider Archive",
+        .run = ProviderCommands::ShowOptions,
+    },
+    {
+        .name = "client",
+        .description = "Start the provider's own program",
+        .examples = "  orvix client --sources msscci",
+        .run = ProviderCommands::RunClient,
+    },
+    {
+        .name = "properties",
+        .description = "Show the properties of a file",
+        .examples = "  orvix properties src\\a.txt",
+        .takes = Argument::Path,
+        .pathHelp = "The file",
+        .run = ProviderCommands::ShowProperties,
+    },
+    {
+        .name = "register",
+        .description = "Register an MSSCCI library on this machine",
+        .examples = "  orvix register archive_msscci.dll \"Archive MSSCCI\"",
+        .takes = Argument::Path | Argument::Name,
+        .pathHelp = "The library, a 64-bit DLL",
+        .run = RegistrationCommands::Register,
+    },
+    {
+        .name = "unregister",
+        .description = "Undo register",
+        .examples = "  orvix unregister \"Archive MSSCCI\"",
+        .takes = Argument::Name,
+        .run = RegistrationCommands::Unregister,
+    },
+    {
+        .name = "validate",
+        .description = "Check a provider plug-in or an MSSCCI library",
+        .examples = "  orvix validate plugins\\depot.dll\n"
+                    "  orvix validate depot_msscci.dll --msscci --json",
+        .takes = Argument::Path | Argument::Validation | Argument::Json,
+        .pathHelp = "The plug-in or library",
+        .run = RunValidate,
+    },
+};
+
+} // namespace
+
+std::span<const Command> AllCommands()
+{
+    return Table;
+}

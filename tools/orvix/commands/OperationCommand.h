@@ -1,0 +1,48 @@
+#pragma once
+
+#include "FileCommand.h"
+#include "OperationRule.h"
+#include "OrvixFileListDialogParams.h"
+#include "TemporaryAnswer.h"
+
+#include <optional>
+#include <vector>
+
+/// A command that changes files through `IOrvixServices::RunFileListOperation`. The services object does not report
+/// what the provider returned, so the result of a file is its state after the operation.
+class OperationCommand final : public FileCommand
+{
+public:
+    /// The arguments must outlive this object.
+    OperationCommand(ProjectSession& project, const CommandLine& commandLine, Output& output, const OperationRule& rule)
+        : FileCommand(project, commandLine, output, ResultColumn::Shown), m_rule(rule)
+    {
+    }
+
+private:
+    void RunOnFiles() override;
+
+    /// Registers the prompts of the command. What the user stored before stays.
+    void RegisterPrompts();
+
+    /// Stores the answers of the command line while this object lives.
+    void StoreAnswers();
+
+    void FillDialog(OrvixFileListDialogParams& params);
+
+    /// Runs the operation with the listeners that the command line asks for. False when it was cancelled.
+    bool RunOperation(OrvixFileListDialogParams& params);
+
+    /// The results as far as the entries tell after the operation, one for each entry. Empty for a file that was only
+    /// found in a folder and that the command does not concern.
+    std::vector<std::optional<Result>> ResultsOfRun(bool ran);
+
+    /// Whether the files stay checked out, by the dialog, the command line or a stored answer.
+    bool IsKept(OrvixFileListDialogParams& params);
+
+    void ReportResults(const std::vector<std::optional<Result>>& results, bool kept);
+
+    const OperationRule& m_rule;
+    std::optional<TemporaryAnswer> m_dialogAnswer;
+    std::optional<TemporaryAnswer> m_keepAnswer;
+};

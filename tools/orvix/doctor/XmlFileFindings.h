@@ -1,0 +1,16 @@
+#pragma once
+
+#include "DoctorReport.h"
+#include "FileDiagnostics.h"
+
+/// Findings about OrvixProviders.xml and OrvixPrompts.xml. `file` has the path of the file as its location.
+namespace XmlFileFindings
+{
+
+/// Adds why the library reads nothing of the file, where that is so. `root`: the name that the root element must have.
+void AddContent(DoctorReport::Subject& file, const FileDiagnostics& diagnostics, const wchar_t* root);
+
+/// Adds what the library ignores in the file. `item`: what an element below the root is called.
+void AddDiagnostics(DoctorReport::Subject& file, const FileDiagnostics& diagnostics, const wchar_t* item);
+
+} // namespace XmlFileFindings
