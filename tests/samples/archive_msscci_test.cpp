@@ -1,5 +1,6 @@
 #include "AllocationFailure.h"
 #include "ArchiveProject.h"
+#include "BuiltFile.h"
 #include "SccLibrary.h"
 
 #include "IOrvixClientAccess.h"
@@ -51,7 +52,7 @@ public:
     }
     ~TextBuffer()
     {
-        EXPECT_TRUE(std::all_of(m_bytes.begin() + Size, m_bytes.end(), [](char byte) { return byte == Untouched; }));
+        EXPECT_TRUE(std::all_of(m_bytes.begin() + Size, m_bytes.end(), [](char guard) { return guard == Untouched; }));
     }
     TextBuffer(const TextBuffer&) = delete;
     TextBuffer& operator=(const TextBuffer&) = delete;
@@ -214,7 +215,7 @@ protected:
 
     bool HasArchive(const ArchiveProject& project) { return std::filesystem::exists(project.Path(L".archive")); }
 
-    SccLibrary m_library{ARCHIVE_MSSCCI};
+    SccLibrary m_library{BuiltFile(L"archive_msscci.dll").c_str()};
     ArchiveProject m_project;
     Session m_anna{m_library, "anna"};
     Session m_ben{m_library, "ben"};
@@ -296,7 +297,7 @@ BOOL StopAtOnce(LPVOID list, BOOL add, LONG status, LPSTR name)
 
 TEST(ArchiveSccLibrary, ExportsThe21FunctionsAndNothingElse)
 {
-    const SccLibrary library(ARCHIVE_MSSCCI);
+    const SccLibrary library(BuiltFile(L"archive_msscci.dll").c_str());
     ASSERT_NE(library.library.Module(), nullptr);
 
     EXPECT_EQ(library.library.ExportedNames(),
@@ -310,7 +311,7 @@ TEST(ArchiveSccLibrary, ExportsThe21FunctionsAndNothingElse)
 
 TEST(ArchiveSccLibrary, ReturnsItsNameAndItsCapabilities)
 {
-    const SccLibrary library(ARCHIVE_MSSCCI);
+    const SccLibrary library(BuiltFile(L"archive_msscci.dll").c_str());
     LPVOID context = nullptr;
     TextBuffer<SCC_NAME_SIZE> name("the name under which it is regi");
     TextBuffer<SCC_AUXLABEL_SIZE> label;
@@ -335,7 +336,7 @@ TEST(ArchiveSccLibrary, ReturnsItsNameAndItsCapabilities)
 
 TEST(ArchiveSccLibrary, DoesNotStartWithoutAPlaceForEachResult)
 {
-    const SccLibrary library(ARCHIVE_MSSCCI);
+    const SccLibrary library(BuiltFile(L"archive_msscci.dll").c_str());
     TextBuffer<SCC_NAME_SIZE> name;
     TextBuffer<SCC_AUXLABEL_SIZE> label;
     LONG number = 0;
@@ -1110,7 +1111,8 @@ class PluginHost final : public IOrvixClientAccess
 {
 public:
     PluginHost(const wchar_t* user, const ArchiveProject& project)
-        : m_library(ARCHIVE_PLUGIN), provider(m_library.Export<IOrvixProvider*()>("GetIOrvixProvider")())
+        : m_library(BuiltFile(L"plugins/archive.dll").c_str()),
+          provider(m_library.Export<IOrvixProvider*()>("GetIOrvixProvider")())
     {
         m_info.SetUserName(user);
         m_info.SetIOrvixClientAccess(this);

@@ -1,4 +1,5 @@
 #include "ArchiveProject.h"
+#include "BuiltFile.h"
 #include "LoadedLibrary.h"
 
 #include "BraeDiagnostics.h"
@@ -138,8 +139,8 @@ class ArchivePlugin : public testing::Test
 protected:
     void SetUp() override
     {
-        std::filesystem::copy_file(ARCHIVE_PLUGIN, m_copy.Path() / L"zweite Kopie.dll");
-        m_anna = std::make_unique<Host>(ARCHIVE_PLUGIN, L"anna");
+        std::filesystem::copy_file(BuiltFile(L"plugins/archive.dll"), m_copy.Path() / L"zweite Kopie.dll");
+        m_anna = std::make_unique<Host>(BuiltFile(L"plugins/archive.dll").c_str(), L"anna");
         m_ben = std::make_unique<Host>(m_copy.Path() / L"zweite Kopie.dll", L"ben");
         ASSERT_EQ(m_anna->Open(m_project), Success);
         ASSERT_EQ(m_ben->Open(m_project), Success);
@@ -179,7 +180,7 @@ protected:
 
 TEST(ArchivePluginContract, ExportsItsFourFunctionsAndNothingElse)
 {
-    const Plugin plugin(ARCHIVE_PLUGIN);
+    const Plugin plugin(BuiltFile(L"plugins/archive.dll").c_str());
     ASSERT_TRUE(plugin.IsLoaded());
 
     EXPECT_EQ(plugin.library.ExportedNames(), (std::vector<std::string>{"GetIOrvixProvider", "GetOrvixProviderName",
@@ -190,7 +191,7 @@ TEST(ArchivePluginContract, ExportsItsFourFunctionsAndNothingElse)
 
 TEST(ArchivePluginContract, ReturnsOneProviderUntilEveryRequestIsReleased)
 {
-    const Plugin plugin(ARCHIVE_PLUGIN);
+    const Plugin plugin(BuiltFile(L"plugins/archive.dll").c_str());
     ASSERT_TRUE(plugin.IsLoaded());
     const long before = BraeDiagnostics::LiveBlocks();
 
@@ -211,7 +212,7 @@ TEST(ArchivePluginContract, ReturnsOneProviderUntilEveryRequestIsReleased)
 TEST(ArchivePluginContract, DeletesTheProviderWhenItIsUnloaded)
 {
     const long before = BraeDiagnostics::LiveBlocks();
-    Plugin plugin(ARCHIVE_PLUGIN);
+    Plugin plugin(BuiltFile(L"plugins/archive.dll").c_str());
     ASSERT_TRUE(plugin.IsLoaded());
     ASSERT_NE(plugin.get(), nullptr);
 
@@ -222,7 +223,7 @@ TEST(ArchivePluginContract, DeletesTheProviderWhenItIsUnloaded)
 
 TEST(ArchivePluginContract, GivesNoProviderWhenTheHostsHeapIsExhausted)
 {
-    const Plugin plugin(ARCHIVE_PLUGIN);
+    const Plugin plugin(BuiltFile(L"plugins/archive.dll").c_str());
     ASSERT_TRUE(plugin.IsLoaded());
 
     BraeDiagnostics::FailAllocation(1, false);

@@ -1,5 +1,6 @@
 // The version in include/OrvixVersion.h is the one that everything else gives.
 
+#include "BuiltFile.h"
 #include "Files.h"
 #include "OrvixTool.h"
 #include "OrvixVersion.h"
@@ -69,7 +70,7 @@ class VersionResource : public testing::TestWithParam<const wchar_t*>
 
 TEST_P(VersionResource, NamesTheFileItsKindAndTheVersion)
 {
-    const std::filesystem::path file = GetParam();
+    const std::filesystem::path file = BuiltFile(GetParam());
     const VersionInfo info(file);
 
     constexpr DWORD MostSignificant = ORVIX_VERSION_MAJOR << 16 | ORVIX_VERSION_MINOR;
@@ -90,13 +91,15 @@ TEST_P(VersionResource, NamesTheFileItsKindAndTheVersion)
     EXPECT_NE(info.Text(L"CompanyName"), L"");
 }
 
-INSTANTIATE_TEST_SUITE_P(Files, VersionResource, testing::Values(ORVIX_VERSIONED_FILES),
+INSTANTIATE_TEST_SUITE_P(Files, VersionResource,
+                         testing::Values(L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll", L"orvix.exe",
+                                         L"archive_msscci.dll", L"plugins/archive.dll"),
                          [](const auto& file) { return std::filesystem::path(file.param).stem().string(); });
 
 TEST(Version, IsWhatTheToolPrints)
 {
     const TempFolder scratch;
-    EXPECT_EQ(OrvixTool::Run(ORVIX_TOOL, scratch.Path(), scratch.Path(), {L"--version"}).output,
+    EXPECT_EQ(OrvixTool::Run(BuiltFile(L"orvix.exe").wstring(), scratch.Path(), scratch.Path(), {L"--version"}).output,
               "orvix " + Version + "\n");
 }
 

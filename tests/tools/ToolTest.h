@@ -1,5 +1,6 @@
 #pragma once
 
+#include "BuiltFile.h"
 #include "Files.h"
 #include "OrvixTool.h"
 #include "TempFolder.h"
@@ -47,7 +48,7 @@ protected:
     /// From here on the tool is a copy of it, with these files from its folder beside it. Returns the folder.
     std::filesystem::path UseCopy(std::initializer_list<const wchar_t*> files)
     {
-        const std::filesystem::path original = ORVIX_TOOL;
+        const std::filesystem::path original = BuiltFile(L"orvix.exe");
         std::filesystem::path folder = Scratch() / L"bin";
         m_program = folder / original.filename();
         std::filesystem::create_directories(folder);
@@ -78,5 +79,5 @@ protected:
 
 private:
     TempFolder m_temp;
-    std::filesystem::path m_program = ORVIX_TOOL;
+    std::filesystem::path m_program = BuiltFile(L"orvix.exe");
 };

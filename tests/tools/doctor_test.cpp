@@ -1,5 +1,6 @@
 // orvix doctor.
 
+#include "BuiltFile.h"
 #include "RegistryToolTest.h"
 
 #include <gmock/gmock.h>
@@ -79,7 +80,7 @@ std::string SystemMessage(DWORD error)
 /// A library with every function of the interface.
 std::wstring Complete()
 {
-    return std::filesystem::path(ORVIX_TOOL).replace_filename(L"archive_msscci.dll").make_preferred().wstring();
+    return BuiltFile(L"archive_msscci.dll").make_preferred().wstring();
 }
 
 /// A recording library, which starts in a test program alone.
@@ -334,8 +335,7 @@ TEST_F(DoctorTest, PrintsWhatTheGuideShows)
     const std::size_t begin = guide.find(beginning) + beginning.size();
     const std::string shown = guide.substr(begin, guide.find("```", begin) - begin);
 
-    std::filesystem::copy_file(std::filesystem::path(ORVIX_TOOL).replace_filename(L"plugins") / L"archive.dll",
-                               Plugin(L"archive.dll"));
+    std::filesystem::copy_file(BuiltFile(L"plugins/archive.dll"), Plugin(L"archive.dll"));
     std::string depot = ReadBytes(Library(L"recording_dependent.dll"));
     const std::string needed = "scc_dependency.dll";
     std::string other = "depotnet.dll";

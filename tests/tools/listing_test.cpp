@@ -1,5 +1,6 @@
 // orvix filters, and the JSON output of every command that lists something.
 
+#include "BuiltFile.h"
 #include "ToolTest.h"
 
 #include <gmock/gmock.h>
@@ -38,7 +39,7 @@ protected:
     {
         const std::filesystem::path folder = Scratch() / L"two plugins";
         std::filesystem::create_directories(folder);
-        const std::filesystem::path archive = std::filesystem::path(ORVIX_TOOL).parent_path() / L"plugins\\archive.dll";
+        const std::filesystem::path archive = BuiltFile(L"plugins\\archive.dll");
         std::filesystem::copy_file(archive, folder / L"archive.dll");
         std::filesystem::copy_file(std::filesystem::path(ORVIX_STUBBORN_PLUGINS) / L"stubborn.dll",
                                    folder / L"stubborn.dll");

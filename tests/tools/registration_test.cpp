@@ -1,5 +1,6 @@
 // orvix register and orvix unregister.
 
+#include "BuiltFile.h"
 #include "RegistryToolTest.h"
 
 #include <gmock/gmock.h>
@@ -135,7 +136,7 @@ TEST_F(Registration, RefusesWhatIsNo64BitMSSCCILibrary)
         {L"text.dll", "not a 64-bit library: "},
         {L"half.dll", "not a 64-bit library: "},
         {fakes / L"good.dll", "no MSSCCI library, it has no SccGetVersion: "},
-        {ORVIX_TOOL, "no MSSCCI library, it has no SccGetVersion: "},
+        {BuiltFile(L"orvix.exe"), "no MSSCCI library, it has no SccGetVersion: "},
     };
     if (std::filesystem::exists(fakes / L"wrongbitness.dll"))
     {

@@ -1,5 +1,6 @@
 // orvix.exe on a terminal, which is a pseudo console of 60 columns.
 
+#include "BuiltFile.h"
 #include "PseudoConsole.h"
 #include "ToolTest.h"
 
@@ -50,7 +51,8 @@ private:
 
     PseudoConsole::Result RunToolThere(const std::wstring& arguments)
     {
-        const std::wstring tool = Quoted(ORVIX_TOOL) + L" --config " + Quoted(Config()) + L" " + arguments;
+        const std::wstring tool =
+            Quoted(BuiltFile(L"orvix.exe").wstring()) + L" --config " + Quoted(Config()) + L" " + arguments;
         return PseudoConsole::Run(L"\"" ORVIX_IN_CONSOLE L"\" \"" + tool + L"\"");
     }
 };

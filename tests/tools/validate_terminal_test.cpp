@@ -1,5 +1,6 @@
 // orvix validate on a terminal.
 
+#include "BuiltFile.h"
 #include "PseudoConsole.h"
 #include "ToolTest.h"
 
@@ -28,7 +29,8 @@ protected:
 
     static PseudoConsole::Result Validate(const std::filesystem::path& library, const std::wstring& arguments)
     {
-        const std::wstring tool = L"\\\"" ORVIX_TOOL L"\\\" validate \\\"" + library.wstring() + L"\\\" " + arguments;
+        const std::wstring tool = L"\\\"" + BuiltFile(L"orvix.exe").wstring() + L"\\\" validate \\\"" +
+                                  library.wstring() + L"\\\" " + arguments;
         return PseudoConsole::Run(L"\"" ORVIX_IN_CONSOLE L"\" \"" + tool + L"\"");
     }
 };

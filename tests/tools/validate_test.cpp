@@ -1,5 +1,6 @@
 // orvix validate: what it says of good libraries, and of one with a single defect.
 
+#include "BuiltFile.h"
 #include "Defect.h"
 #include "FilePath.h"
 #include "ToolTest.h"
@@ -139,13 +140,13 @@ void ExpectExactly(const Defects& defects, const std::map<std::string, std::stri
 
 TEST_F(Validate, PassesTheSamplePluginInEveryRule)
 {
-    const auto result = ValidatePlugin(ORVIX_ARCHIVE, Success, {L"--dialogs"});
+    const auto result = ValidatePlugin(BuiltFile(L"plugins\\archive.dll"), Success, {L"--dialogs"});
     EXPECT_THAT(result.output, EndsWith("\n19 rules, 19 passed, 0 failed, 0 skipped\n"));
 }
 
 TEST_F(Validate, PassesTheSampleLibraryInEveryRule)
 {
-    const auto result = ValidateLibrary(ORVIX_ARCHIVE_MSSCCI, Success, {L"--dialogs"});
+    const auto result = ValidateLibrary(BuiltFile(L"archive_msscci.dll"), Success, {L"--dialogs"});
     EXPECT_THAT(result.output, EndsWith("\n24 rules, 24 passed, 0 failed, 0 skipped\n"));
 }
 
@@ -323,7 +324,7 @@ TEST_F(Validate, LeavesNothingOnTheDiskAndInTheRegistry)
     const std::filesystem::path temp = Scratch() / L"temp";
     std::filesystem::create_directory(temp);
     const Environment environment(L"TMP", temp.wstring());
-    ValidateLibrary(ORVIX_ARCHIVE_MSSCCI, Success);
+    ValidateLibrary(BuiltFile(L"archive_msscci.dll"), Success);
     EXPECT_TRUE(std::filesystem::is_empty(temp));
     EXPECT_TRUE(std::filesystem::is_empty(Project()));
     UniqueRegistryKey key;

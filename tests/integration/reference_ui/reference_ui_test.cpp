@@ -1,3 +1,4 @@
+#include "BuiltFile.h"
 #include "IOrvixCoreUI.h"
 #include "OrvixDialogOption.h"
 #include "OrvixFileEntry.h"
@@ -48,7 +49,7 @@ protected:
         return reinterpret_cast<Pointer>(reinterpret_cast<void*>(GetProcAddress(m_module.Get(), name)));
     }
 
-    UniqueModule m_module{LoadLibraryW(ORVIX_REFERENCE_UI)};
+    UniqueModule m_module{LoadLibraryW(BuiltFile(L"OrvixCoreUI.dll").c_str())};
     IOrvixCoreUI* m_coreUI = nullptr;
 };
 
