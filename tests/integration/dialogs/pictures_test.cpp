@@ -3,7 +3,10 @@
 #include "OrvixDialogOption.h"
 #include "OrvixPrompt.h"
 #include "Picture.h"
+#include "TempFolder.h"
 
+#include <cstdlib>
+#include <filesystem>
 #include <string>
 #include <utility>
 
@@ -12,15 +15,17 @@ namespace
 
 constexpr std::uint32_t AllAnswers = OrvixPromptOption::OfferYesToAll | OrvixPromptOption::OfferNoToAll;
 
-/// Makes the pictures of the guides in every run and defines what they show.
+/// Makes the pictures of the guides in every run and defines what they show. They are kept in the folder that
+/// ORVIX_PICTURES in the environment names.
 class DialogPictures : public DialogsTest
 {
 protected:
     /// The user saves a picture and closes the dialog.
-    static Handler TakePicture(const wchar_t* name)
+    Handler TakePicture(const wchar_t* name) const
     {
-        return [name](const DialogWindow& dialog) {
-            const auto file = std::filesystem::path(ORVIX_PICTURES) / name;
+        const wchar_t* kept = _wgetenv(L"ORVIX_PICTURES");
+        const auto file = (kept == nullptr ? m_pictures.Path() : std::filesystem::path(kept)) / name;
+        return [file](const DialogWindow& dialog) {
             SendMessageW(dialog.Handle(), WM_NCACTIVATE, TRUE, 0); // the first dialog of a process may look inactive
             // The screen shows what is drawn some time later: when two pictures are equal, it is complete.
             std::string picture;
@@ -37,6 +42,9 @@ protected:
             dialog.Press(VK_ESCAPE);
         };
     }
+
+private:
+    TempFolder m_pictures;
 };
 
 TEST_F(DialogPictures, OfThePrompt)
@@ -67,7 +75,7 @@ TEST_F(DialogPictures, OfThePromptEditor)
     m_services->RegisterPrompt(2, L"Add new files to source control?", OrvixPromptAction::Ask, AllAnswers, true);
     m_services->RegisterPrompt(3, L"Overwrite files that were changed by hand?", OrvixPromptAction::NoToAll, AllAnswers,
                                true);
-    ShowEditor([](const DialogWindow& dialog) {
+    ShowEditor([this](const DialogWindow& dialog) {
         dialog.SelectRow(L"Prompts:", 0);
         TakePicture(L"prompt-editor.png")(dialog);
     });
