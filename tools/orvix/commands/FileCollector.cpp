@@ -31,10 +31,10 @@ void FileCollector::Add(const std::wstring& named)
     }
 }
 
-Listing::Count FileCollector::SkippedFolders() const
+Listing::Count FileCollector::CountOfSkipped(std::size_t number)
 {
-    return {"hiddenFolders", m_skippedFolders == 1 ? "hidden folder skipped" : "hidden folders skipped",
-            m_skippedFolders};
+    return {"hiddenFolders", number == 1 ? "hidden folder skipped" : "hidden folders skipped",
+            static_cast<unsigned int>(number)};
 }
 
 bool FileCollector::ReportUnreadableFolders() const
@@ -102,7 +102,7 @@ FileCollector::Content FileCollector::Read(const std::wstring& folder, const std
         }
         else if (name.front() == L'.' || (found.dwFileAttributes & SkippedAttributes) != 0)
         {
-            ++m_skippedFolders;
+            m_skippedFolders.push_back(prefix + name);
         }
         else
         {

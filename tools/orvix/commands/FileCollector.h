@@ -28,8 +28,11 @@ public:
 
     const std::vector<File>& Files() const { return m_files; }
 
-    /// The number of skipped folders.
-    Listing::Count SkippedFolders() const;
+    /// The paths of the skipped folders.
+    const std::vector<std::wstring>& SkippedFolders() const { return m_skippedFolders; }
+
+    /// A number of skipped folders, for a summary.
+    static Listing::Count CountOfSkipped(std::size_t number);
 
     /// Prints on the error output which folders could not be read. False when there are none.
     bool ReportUnreadableFolders() const;
@@ -50,7 +53,7 @@ private:
 
     Output& m_output;
     std::vector<File> m_files;
-    unsigned int m_skippedFolders = 0;
+    std::vector<std::wstring> m_skippedFolders;
     std::vector<std::wstring> m_unreadableFolders;
     std::unordered_set<std::wstring> m_keys; // of the files found so far, see `PathKey`
 };

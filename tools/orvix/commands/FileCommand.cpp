@@ -3,6 +3,7 @@
 #include "FileMark.h"
 #include "FilePath.h"
 #include "FileStateText.h"
+#include "OrvixFileFlags.h"
 #include "OrvixProviderResult.h"
 
 #include <new>
@@ -133,6 +134,27 @@ std::vector<Listing::Count> FileCommand::Summary() const
     }
     counts.push_back({"leftOutForState", "left out for their state", m_otherState});
     counts.push_back({"leftOutByFilters", "left out by filters", m_excluded});
-    counts.push_back(m_collector.SkippedFolders());
+    counts.push_back(FileCollector::CountOfSkipped(NumForeignSkippedFolders()));
     return counts;
+}
+
+std::size_t FileCommand::NumForeignSkippedFolders() const
+{
+    OrvixFileList list;
+    for (const std::wstring& folder : m_collector.SkippedFolders())
+    {
+        list.CreateEntry((folder + L"\\file").c_str(), nullptr, FileMark::Chosen, 0);
+    }
+    list.BuildActiveList(FileMark::Chosen, false);
+    std::size_t number = m_collector.SkippedFolders().size();
+    if (number > 0 && m_project.Provider().QueryStatus(&list, 0) == OrvixProviderResult::Success)
+    {
+        for (unsigned int i = 0; i < list.NumEntries(); ++i)
+        {
+            const unsigned long state = list.GetFileEntry(i)->GetFlagsOut();
+            constexpr unsigned long AnyUse = OrvixFileState::Controlled | OrvixFilePermission::Add;
+            number -= (state & AnyUse) == 0 ? 1 : 0;
+        }
+    }
+    return number;
 }

@@ -68,6 +68,10 @@ private:
     void Report(Result result, const Listing::State& state, const std::wstring& path);
     std::vector<Listing::Count> Summary() const;
 
+    /// The number of skipped folders, without those that belong to the provider itself: it lets nobody add a file
+    /// there.
+    std::size_t NumForeignSkippedFolders() const;
+
     ProjectSession& m_project;
     const CommandLine& m_commandLine;
     Output& m_output;

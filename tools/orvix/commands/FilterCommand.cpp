@@ -55,7 +55,7 @@ ExitCode FilterCommand::Run()
     const auto total = static_cast<unsigned int>(collector.Files().size());
     listing.summary = {{"files", total == 1 ? "file" : "files", total},
                        {"excluded", "excluded", numExcluded},
-                       collector.SkippedFolders()};
+                       FileCollector::CountOfSkipped(collector.SkippedFolders().size())};
     m_output.Show(listing);
     return collector.ReportUnreadableFolders() ? ExitCode::Failed : ExitCode::Success;
 }
