@@ -1,10 +1,16 @@
 #include "FileLists.h"
-#include "IOrvixProvider.h"
-#include "IOrvixServices.h"
 #include "Measure.h"
+#include "OrvixFileFlags.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixOperation.h"
+#include "OrvixPrompt.h"
+#include "OrvixProviderBase.h"
+#include "OrvixProviderResult.h"
+#include "OrvixServicesPointer.h"
 
 #include <memory>
+#include <string>
+#include <utility>
 #include <vector>
 
 namespace
@@ -12,7 +18,7 @@ namespace
 
 constexpr unsigned long Mask = 0x4;
 
-/// Every eleventh entry is a root; the ten behind it are its children. All are selected.
+/// Every eleventh entry is a root; the ten after it are its children. All are selected.
 std::unique_ptr<OrvixFileList> MakeTree(unsigned int count)
 {
     std::unique_ptr<OrvixFileList> list(new OrvixFileList);
@@ -24,6 +30,43 @@ std::unique_ptr<OrvixFileList> MakeTree(unsigned int count)
         {
             root = entry;
         }
+    }
+    return list;
+}
+
+/// An entry as a program would write it for itself, with the standard library's members.
+struct PlainEntry
+{
+    virtual ~PlainEntry() = default;
+
+    std::wstring path;
+    unsigned long flagsIn = Mask;
+    unsigned long flagsOut = 0;
+    long long clientPtr = 0;
+    PlainEntry* parent = nullptr;
+    std::vector<PlainEntry*> children;
+    std::vector<PlainEntry*> attachments;
+};
+
+/// What `MakeTree` does, with such entries.
+std::vector<std::unique_ptr<PlainEntry>> MakePlainTree(unsigned int count)
+{
+    std::vector<std::unique_ptr<PlainEntry>> list;
+    PlainEntry* root = nullptr;
+    for (unsigned int i = 0; i < count; ++i)
+    {
+        auto entry = std::make_unique<PlainEntry>();
+        entry->path = FileName(i);
+        if (i % 11 == 0)
+        {
+            root = entry.get();
+        }
+        else
+        {
+            entry->parent = root;
+            root->children.push_back(entry.get());
+        }
+        list.push_back(std::move(entry));
     }
     return list;
 }
@@ -70,39 +113,18 @@ void FloorTree(OrvixFileList& list, std::vector<OrvixFileEntry*>& active)
 }
 
 /// A provider that does nothing and changes no state.
-class IdleProvider final : public IOrvixProvider
+class IdleProvider final : public OrvixProviderBase
 {
 public:
     const wchar_t* GetName() override { return L"Idle"; }
-    int ReservedA() override { return 0; }
     bool IsInitialized() override { return true; }
     bool IsProjectOpen() override { return true; }
-    int Initialize(OrvixClientInfo*) override { return 0; }
-    int Uninitialize() override { return 0; }
-    int OpenProject(const wchar_t*, const wchar_t*) override { return 0; }
-    int CloseProject() override { return 0; }
-    int ReservedB() override { return 0; }
-    int ReservedC() override { return -2; }
-    int CheckIn(OrvixFileList*, const wchar_t*, unsigned long) override { return 0; }
-    int CheckOut(OrvixFileList*, const wchar_t*, unsigned long) override { return 0; }
-    int UndoCheckOut(OrvixFileList*, unsigned long) override { return 0; }
-    int GetLatest(OrvixFileList*, unsigned long) override { return 0; }
-    int ReservedD(void*, unsigned long* first, unsigned long* second) override
-    {
-        *first = *second = 0;
-        return -2;
-    }
-    int ReservedE() override { return -2; }
-    int Add(OrvixFileList*, const wchar_t*, unsigned long) override { return 0; }
-    int ShowHistory(OrvixFileList*) override { return 0; }
-    int ShowProperties(OrvixFileList*) override { return 0; }
-    int QueryStatus(OrvixFileList*, unsigned long) override { return 0; }
-    int ReservedF() override { return -2; }
-    int ReservedG() override { return -2; }
-    int ShowOptions() override { return 0; }
-    int RunProviderClient() override { return 0; }
-    int ReservedH() override { return -2; }
-    bool ReservedI() override { return true; }
+    int Initialize(OrvixClientInfo*) override { return OrvixProviderResult::Success; }
+    int Uninitialize() override { return OrvixProviderResult::Success; }
+    int OpenProject(const wchar_t*, const wchar_t*) override { return OrvixProviderResult::Success; }
+    int CloseProject() override { return OrvixProviderResult::Success; }
+    int CheckOut(OrvixFileList*, const wchar_t*, unsigned long) override { return OrvixProviderResult::Success; }
+    int QueryStatus(OrvixFileList*, unsigned long) override { return OrvixProviderResult::Success; }
 };
 
 /// Milliseconds per entry of a run on `count` entries of which every second one is dropped. Small lists are
@@ -110,11 +132,9 @@ public:
 double CostPerEntry(unsigned int count, unsigned int lists, bool fromRoots)
 {
     constexpr std::uint32_t Prompt = 1;
-    constexpr std::uint32_t CheckOut = 0x10;
-    constexpr std::uint32_t Fits = 0x2;
-    const std::unique_ptr<IOrvixServices, void (*)(IOrvixServices*)> services(GetIOrvixServices(),
-                                                                              ReleaseIOrvixServices);
-    services->RegisterPrompt(Prompt, L"Check out?", 0x2, 0, true);
+    constexpr unsigned long Fits = OrvixFileState::Controlled;
+    const OrvixServicesPointer services = MakeOrvixServices();
+    services->RegisterPrompt(Prompt, L"Check out?", OrvixPromptAction::Yes, 0, true);
     IdleProvider provider;
 
     std::vector<std::unique_ptr<OrvixFileList>> all;
@@ -133,7 +153,7 @@ double CostPerEntry(unsigned int count, unsigned int lists, bool fromRoots)
             for (const auto& list : all)
             {
                 params.SetOrvixFileList(list.get());
-                services->RunFileListOperation(nullptr, &params, true, &provider, CheckOut, Fits);
+                services->RunFileListOperation(nullptr, &params, true, &provider, OrvixOperation::CheckOut, Fits);
             }
         },
         [&] {
@@ -151,6 +171,11 @@ void BenchLists(MeasureTable& table)
 {
     {
         constexpr unsigned int Million = 1000000;
+        table.Print(Compare(
+            "making and deleting 1,000,000 entries in trees", 1.0, [] { MakeTree(Million); },
+            [] { MakePlainTree(Million); }));
+        table.Print({"size of an entry in bytes, without its texts and links", sizeof(OrvixFileEntry),
+                     sizeof(PlainEntry), 1.0});
         const auto list = MakeTree(Million);
         std::vector<OrvixFileEntry*> active;
         active.reserve(Million);

@@ -5,6 +5,7 @@
 #include "ModulePath.h"
 #include "OrvixClientInfo.h"
 #include "OrvixMSSCC.h"
+#include "OrvixProviderSource.h"
 #include "OrvixProviderWrapper.h"
 #include "RegistryKey.h"
 #include "TempFolder.h"
@@ -189,7 +190,8 @@ Measure InitializeFifty()
         Export<void(IOrvixServices*)>(core.Get(), "ReleaseIOrvixServices"));
     std::vector<UniqueModule> modules;
     return Compare(
-        "Initialize, 50 plug-ins and 50 MSSCCI registrations", 1.2, [&] { services->Initialize(&info, 0x1 | 0x2); },
+        "Initialize, 50 plug-ins and 50 MSSCCI registrations", 1.2,
+        [&] { services->Initialize(&info, OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI); },
         [&] { installed.LoadByHand(modules); },
         [&] {
             services->Shutdown();
