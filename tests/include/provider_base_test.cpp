@@ -1,7 +1,13 @@
+#include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixProviderBase.h"
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
+
+#include <vector>
+
+using testing::Each;
 
 namespace
 {
@@ -26,6 +32,14 @@ class ProviderBase : public testing::Test
 protected:
     IOrvixProvider& Provider() { return m_provider; }
 
+    std::vector<int> FileOperations()
+    {
+        return {Provider().CheckIn(&m_list, L"", 0), Provider().CheckOut(&m_list, L"", 0),
+                Provider().UndoCheckOut(&m_list, 0), Provider().GetLatest(&m_list, 0),
+                Provider().Add(&m_list, L"", 0),     Provider().ShowHistory(&m_list),
+                Provider().ShowProperties(&m_list)};
+    }
+
     OrvixFileList m_list;
 
 private:
@@ -36,17 +50,19 @@ private:
 
 TEST_F(ProviderBase, OffersNoOperationOnFiles)
 {
-    EXPECT_EQ(Provider().CheckIn(&m_list, L"", 0), OrvixProviderResult::NotOffered);
-    EXPECT_EQ(Provider().CheckOut(&m_list, L"", 0), OrvixProviderResult::NotOffered);
-    EXPECT_EQ(Provider().UndoCheckOut(&m_list, 0), OrvixProviderResult::NotOffered);
-    EXPECT_EQ(Provider().GetLatest(&m_list, 0), OrvixProviderResult::NotOffered);
-    EXPECT_EQ(Provider().Add(&m_list, L"", 0), OrvixProviderResult::NotOffered);
+    m_list.CreateEntry(L"C:\\a", nullptr, OrvixFileSelection::Selected, 0);
+    m_list.BuildActiveList(OrvixFileSelection::Selected, false);
+    EXPECT_THAT(FileOperations(), Each(OrvixProviderResult::NotOffered));
 }
 
-TEST_F(ProviderBase, OffersNoDialogAndNoProgram)
+TEST_F(ProviderBase, FailsInEveryFileOperationForAListWithoutActiveEntries)
 {
-    EXPECT_EQ(Provider().ShowHistory(&m_list), OrvixProviderResult::NotOffered);
-    EXPECT_EQ(Provider().ShowProperties(&m_list), OrvixProviderResult::NotOffered);
+    m_list.CreateEntry(L"C:\\a", nullptr, OrvixFileSelection::Selected, 0);
+    EXPECT_THAT(FileOperations(), Each(OrvixProviderResult::Failure));
+}
+
+TEST_F(ProviderBase, OffersNoDialogOfItsOwnAndNoProgram)
+{
     EXPECT_EQ(Provider().ShowOptions(), OrvixProviderResult::NotOffered);
     EXPECT_EQ(Provider().RunProviderClient(), OrvixProviderResult::NotOffered);
 }
