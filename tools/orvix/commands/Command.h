@@ -28,9 +28,9 @@ inline constexpr unsigned int PromptOrAll = 0x200; ///< ID of a prompt, or --all
 struct Command
 {
     const char* group = nullptr; ///< the command that it belongs to, such as prompts; null for none
-    const char* name;
-    const char* description;
-    const char* examples;           ///< lines of the command's help
+    const char* name = nullptr;
+    const char* description = nullptr;
+    const char* examples = nullptr; ///< lines of the command's help
     unsigned int takes = 0;         ///< bits of `Argument`
     const char* pathHelp = nullptr; ///< what PATH is, where the command takes one
     std::uint32_t defaultSources = OrvixProviderSource::Plugins;
