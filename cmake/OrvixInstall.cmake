@@ -1,10 +1,10 @@
-# What `cmake --install` gives; docs/sdk.md describes it. The files for debuggers are the component "debug", everything else
-# is "sdk".
+# What `cmake --install` gives; docs/sdk.md describes it. The files for debuggers are the component "debug",
+# everything else is "sdk".
 include(CMakePackageConfigHelpers)
 set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME sdk)
 
-# orvix_install_debug_file(<target> <folder>): installs a module's debug information beside the module in <folder>. Of GCC it
-# is a file that is split off at installation: the installed module is stripped and names it.
+# orvix_install_debug_file(<target> <folder>): installs a module's debug information beside the module in <folder>. Of
+# GCC it is a file that is split off at installation: the installed module is stripped and names it.
 function(orvix_install_debug_file target folder)
   if(MSVC)
     install(FILES $<TARGET_PDB_FILE:${target}> DESTINATION ${folder} COMPONENT debug OPTIONAL)

@@ -1,6 +1,6 @@
 # vcpkg install orvixcore --overlay-ports=ports
-# builds the tree that this port is part of. vcpkg does not see changes of the tree: run "vcpkg remove orvixcore" before you
-# install it again.
+# builds the tree that this port is part of. vcpkg does not see changes of the tree: run "vcpkg remove orvixcore"
+# before you install it again.
 vcpkg_check_linkage(ONLY_DYNAMIC_LIBRARY)
 get_filename_component(source_path "${CMAKE_CURRENT_LIST_DIR}/../.." ABSOLUTE)
 

@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
-"""Visual Studio's view of the records fits the records: each has one, its expressions compile as members of the class, and
-the constants that it names have the published numbers."""
+"""Visual Studio's view of the records fits the records: each has one, its expressions compile as members of the
+class, and the constants that it names have the published numbers."""
 
 import re
 import sys

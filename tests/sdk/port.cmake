@@ -1,5 +1,5 @@
-# cmake -D PORTFILE=FILE -D CURRENT_PACKAGES_DIR=FOLDER -P port.cmake: runs a portfile without vcpkg. The functions of vcpkg
-# print their arguments; the installation puts the files there of which a portfile has to take care.
+# cmake -D PORTFILE=FILE -D CURRENT_PACKAGES_DIR=FOLDER -P port.cmake: runs a portfile without vcpkg. The functions of
+# vcpkg print their arguments; the installation puts the files there of which a portfile has to take care.
 cmake_minimum_required(VERSION 3.25)
 set(PORT orvixcore)
 

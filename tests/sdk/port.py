@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
-"""The vcpkg port describes this tree: its manifest has the tree's version, its portfile runs and leaves a package as vcpkg
-wants it, and the targets that it tells users of are installed."""
+"""The vcpkg port describes this tree: its manifest has the tree's version, its portfile runs and leaves a package as
+vcpkg wants it, and the targets that it tells users of are installed."""
 
 import json
 import re
