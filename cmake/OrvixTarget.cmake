@@ -44,6 +44,9 @@ endif()
 function(orvix_precompile target)
   if(MINGW)
     target_precompile_headers(${target} REUSE_FROM orvix_precompiled)
+    # GCC 12 takes inlined code of a precompiled header for the target's own and warns about copies in wchar.h.
+    target_compile_options(${target} PRIVATE
+      $<$<CONFIG:Release>:-Wno-array-bounds> $<$<CONFIG:Release>:-Wno-stringop-overread>)
   endif()
 endfunction()
 if(MINGW)

@@ -1,5 +1,6 @@
 // Parsed once a build for all sources of the product (GCC only). Each source still includes what it uses; lint reads
-// them without this file.
+// them without this file. <iostream> is not for here: it puts an object into every source, which leaves handles open
+// whenever a DLL is unloaded.
 #include <windows.h>
 
 #include <comdef.h>
@@ -8,7 +9,6 @@
 #include <array>
 #include <cstdint>
 #include <filesystem>
-#include <iostream>
 #include <memory>
 #include <optional>
 #include <span>

@@ -56,10 +56,10 @@ std::string Sha256::Finish()
     Check(BCryptFinishHash(m_hash, digest, sizeof digest, 0));
     constexpr char Digits[] = "0123456789abcdef";
     std::string text;
-    for (const UCHAR byte : digest)
+    for (const UCHAR part : digest)
     {
-        text += Digits[byte >> 4];
-        text += Digits[byte & 15];
+        text += Digits[part >> 4];
+        text += Digits[part & 15];
     }
     return text;
 }

@@ -35,7 +35,7 @@ public:
     void Check(const std::string& name) const
     {
         const auto end = m_bytes.begin() + Size;
-        if (std::any_of(end, m_bytes.end(), [](char byte) { return byte != Guard; }))
+        if (std::any_of(end, m_bytes.end(), [](char guard) { return guard != Guard; }))
         {
             throw RuleBroken(name + " is written beyond its " + std::to_string(Size) + " bytes");
         }
