@@ -641,7 +641,7 @@ void* FailingAllocate(std::size_t size)
 
 } // namespace
 
-// Without the warm-up of LibraryHeap. Each test that the build runs has a process of its own, so that this one
+// Without the warm-up of LibraryHeap. The build runs it in a process of its own, so that it
 // really meets the first exception without memory; the thread's own state comes from an exception with memory.
 TEST(AllocationFailure, IsSurvivedByAProcessInWhichNoExceptionWasEverWithoutMemory)
 {
