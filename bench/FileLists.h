@@ -15,10 +15,11 @@ inline std::wstring FileName(unsigned int index)
 inline std::unique_ptr<OrvixFileList> MakeActiveList(unsigned int count)
 {
     std::unique_ptr<OrvixFileList> list(new OrvixFileList);
+    constexpr unsigned long Everything = 0x2; // a bit of the host
     for (unsigned int i = 0; i < count; ++i)
     {
-        list->CreateEntry(FileName(i).c_str(), nullptr, 1, 0);
+        list->CreateEntry(FileName(i).c_str(), nullptr, Everything, 0);
     }
-    list->BuildActiveList(1, false);
+    list->BuildActiveList(Everything, false);
     return list;
 }

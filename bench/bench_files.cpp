@@ -1,4 +1,5 @@
 #include "Measure.h"
+#include "OrvixPrompt.h"
 #include "OrvixPromptTable.h"
 #include "OrvixProviderConfig.h"
 #include "PromptFile.h"
@@ -115,7 +116,8 @@ void BenchPrompts(MeasureTable& table)
     for (int i = 0; i < Count; ++i)
     {
         const std::wstring text = L"The file 'scene " + std::to_wstring(i) + L"' is not checked out. Check it out now?";
-        prompts.AddPrompt(i, text.c_str(), 6, 2, false);
+        prompts.AddPrompt(i, text.c_str(), OrvixPromptOption::OfferYesToAll | OrvixPromptOption::OfferNoToAll,
+                          OrvixPromptAction::Yes, false);
     }
     table.Print(Compare(
         "SavePrompts, 10,000 prompts", 1.2, [&] { WritePromptFile(prompts, path.c_str()); },

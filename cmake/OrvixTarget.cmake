@@ -18,14 +18,13 @@ add_library(BuildOptions INTERFACE)
 target_compile_features(BuildOptions INTERFACE cxx_std_20)
 target_compile_definitions(BuildOptions INTERFACE UNICODE _UNICODE NOMINMAX WIN32_LEAN_AND_MEAN _WIN32_WINNT=0x0A00)
 if(MSVC)
-  # C4251: exported records hold standard containers; host and library share one tool chain.
-  target_compile_options(BuildOptions INTERFACE /wd4251 /utf-8 /permissive- /EHsc)
+  target_compile_options(BuildOptions INTERFACE /utf-8 /permissive- /EHsc)
   target_compile_definitions(BuildOptions INTERFACE _CRT_SECURE_NO_WARNINGS)
 else()
   target_link_options(BuildOptions INTERFACE -static -static-libgcc -static-libstdc++)
 endif()
 
-# The tree's own sources, moreover, compile without a warning, and with the debug information that OrvixInstall.cmake
+# The tree's own sources also compile without a warning, and with the debug information that OrvixInstall.cmake
 # installs: with GCC functions and lines, which cost no time, and with paths that begin at the root of the tree.
 add_library(orvix_build INTERFACE)
 target_link_libraries(orvix_build INTERFACE BuildOptions)

@@ -7,7 +7,7 @@
 #include <utility>
 #include <vector>
 
-/// Arrays of equal length, entry i of each belonging to row i. The texts lie in a deque, which never moves one: a
+/// Arrays of equal length, entry i of each belonging to row i. The texts are in a deque, which never moves one: a
 /// text's address holds until the text is set or removed.
 struct OrvixPromptTable::State
 {

@@ -12,7 +12,7 @@ struct FilteredPath
 
     std::wstring text;
     bool hasType;           ///< whether there is any dot
-    std::wstring_view type; ///< lies in `text` and reaches to its end
+    std::wstring_view type; ///< is in `text` and reaches to its end
 
     FilteredPath(const FilteredPath&) = delete;
     FilteredPath& operator=(const FilteredPath&) = delete;
@@ -33,7 +33,7 @@ public:
     virtual ~ProviderFilters() = default;
 
     /// Whether and why the filter excludes the file. An exclude filter excludes by folder or by type; an include
-    /// filter excludes what lies outside its folders, and inside them what has another type. A path without
+    /// filter excludes what is outside its folders, and inside them what has another type. A path without
     /// any dot has no type and is never excluded by it.
     Exclusion Judge(const FilteredPath& path) const;
 

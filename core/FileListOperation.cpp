@@ -245,7 +245,7 @@ void FileListOperation::StoreAnswers(std::int32_t result)
     }
 }
 
-/// Whether the record's options have a bit. Read afresh each time, since the dialog and listeners change them.
+/// Whether the record's options have a bit. Read each time, since the dialog and listeners change them.
 bool FileListOperation::HasOption(std::uint32_t bit)
 {
     return (m_params.GetOptions() & bit) != 0;

@@ -21,7 +21,7 @@ public:
     std::int32_t Run(bool callProviderFirst, std::uint32_t flagsOutMask);
 
 private:
-    /// A result of 0 means cancelled; `run` whether the provider is to be called.
+    /// The result is one of `OrvixOperationResult`; `run` says whether the provider is to be called.
     struct Confirmation
     {
         std::int32_t result;

@@ -73,7 +73,7 @@ struct Candidate
 /// Judges the library of a provider's key. Loads nothing. Throws std::bad_alloc.
 Candidate Judge(const std::wstring& keyPath, const OrvixProviderConfigManager& configs);
 
-/// Ends the process with the reason on the debug output; nothing more of it runs.
+/// Ends the process with the reason on the debug output; no code of it runs afterwards.
 [[noreturn]] void EndProcess();
 
 } // namespace InstalledProviders

@@ -32,5 +32,6 @@ public:
     virtual std::intptr_t RelayB(void* a, void* b, void* c, void* d) = 0;
 
 protected:
+    /// Not public: nobody deletes the object through this interface.
     ~IOrvixClientAccess() = default;
 };

@@ -33,6 +33,7 @@ public:
     virtual std::int32_t EditPrompts(void* a, void* b, OrvixPromptTable* prompts) = 0;
 
 protected:
+    /// Not public: nobody deletes the object through this interface.
     ~IOrvixCoreUI() = default;
 };
 

@@ -20,5 +20,6 @@ public:
     virtual std::intptr_t ClientRelayB(void* a, void* b, void* c, void* d) = 0;
 
 protected:
+    /// Not public: nobody deletes the object through this interface.
     ~IOrvixCoreUIClientAccess() = default;
 };

@@ -21,5 +21,6 @@ public:
     virtual std::uint32_t Notify(OrvixNotifyParams* params, std::int64_t userData) = 0;
 
 protected:
+    /// Not public: nobody deletes the object through this interface.
     ~IOrvixNotifyCallback() = default;
 };

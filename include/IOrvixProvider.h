@@ -22,9 +22,11 @@ class OrvixFileList;
 class IOrvixProvider : public BraeHeapOperators
 {
 public:
+    /// Makes the interface part of a provider; has no effect.
     IOrvixProvider() = default;
     IOrvixProvider(const IOrvixProvider&) = delete;
     IOrvixProvider& operator=(const IOrvixProvider&) = delete;
+    /// Destroys the provider. Only the module that made it does so.
     virtual ~IOrvixProvider() = default;
 
     /// Display name, valid as long as the provider. [plug-in, main-thread]

@@ -6,7 +6,7 @@
 class IOrvixClientAccess;
 struct HWND__;
 
-/// Who the client is and where its files lie; the argument of `IOrvixServices::Initialize`.
+/// Who the client is and where its files are; the argument of `IOrvixServices::Initialize`.
 ///
 /// Created and owned by the host; the library does not keep it. Texts are copied in: a setter given null
 /// (and any setter when memory runs out) leaves the old text. A getter's text is never null and is valid until the
@@ -14,9 +14,11 @@ struct HWND__;
 class ORVIX_API OrvixClientInfo : public BraeHeapOperators
 {
 public:
+    /// Makes a record without texts, window and client access; allocates nothing.
     OrvixClientInfo();
     OrvixClientInfo(const OrvixClientInfo&) = delete;
     OrvixClientInfo& operator=(const OrvixClientInfo&) = delete;
+    /// Frees the copies of the texts; the client access and the window stay with their owner.
     virtual ~OrvixClientInfo();
 
     /// Name of the client program, as providers show it; empty by default.

@@ -13,9 +13,11 @@
 class ORVIX_API OrvixExploreProviderParams : public BraeHeapOperators
 {
 public:
+    /// Makes a record with the default of each value; allocates nothing.
     OrvixExploreProviderParams();
     OrvixExploreProviderParams(const OrvixExploreProviderParams&) = delete;
     OrvixExploreProviderParams& operator=(const OrvixExploreProviderParams&) = delete;
+    /// Frees the copies of the texts and filters.
     virtual ~OrvixExploreProviderParams();
 
     /// Title of the dialog; empty by default.
@@ -46,10 +48,16 @@ public:
     virtual const wchar_t* GetFilterExtensions(std::uint32_t index);
 
 private:
+    enum Flag : std::uint32_t
+    {
+        MultipleSelections = 0x1,
+        DownloadFiles = 0x2
+    };
+
     // The texts and filters; null until one is stored. The flags are a member, so that setting them cannot fail.
     struct State;
     State* m_state = nullptr;
-    std::uint32_t m_flags = 2; // files are downloaded
+    std::uint32_t m_flags = DownloadFiles;
 };
 
 static_assert(sizeof(OrvixExploreProviderParams) == 24, "host and library must agree about the size of a record");

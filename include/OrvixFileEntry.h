@@ -12,6 +12,7 @@
 class ORVIX_API OrvixFileEntry : public BraeHeapOperators
 {
 public:
+    /// Makes an entry without a path, flags and links; allocates nothing.
     OrvixFileEntry();
     OrvixFileEntry(const OrvixFileEntry&) = delete;
     OrvixFileEntry& operator=(const OrvixFileEntry&) = delete;
@@ -22,7 +23,7 @@ public:
     /// The path; never null, empty by default, of any length. Valid until it is set again.
     virtual const wchar_t* GetFile();
 
-    /// Copies the path; null (or a lack of memory) leaves the old one. A path longer than two characters
+    /// Copies the path; null leaves the old one, and so does exhausted memory. A path longer than two characters
     /// that starts with two forward slashes gets two backslashes in their place; nothing else is changed.
     virtual void SetFile(const wchar_t* file);
 
@@ -44,7 +45,7 @@ public:
     virtual void SetFlagsOut(unsigned long flags);
 
     /// Appends a child, which is not owned; its parent link is not touched and duplicates are not looked
-    /// for. Links must not lead in a circle: whoever walks the tree would not come to an end. Returns `NumChildren()`,
+    /// for. Links must not form a cycle: walking the tree would never end. Returns `NumChildren()`,
     /// or 0 with nothing changed for null and when memory runs out.
     virtual unsigned int AddChild(OrvixFileEntry* child);
 

@@ -13,6 +13,7 @@ class OrvixFileEntry;
 class ORVIX_API OrvixFileList : public BraeHeapOperators
 {
 public:
+    /// Makes an empty list; allocates nothing.
     OrvixFileList();
     OrvixFileList(const OrvixFileList&) = delete;
     OrvixFileList& operator=(const OrvixFileList&) = delete;

@@ -8,7 +8,7 @@
 
 class OrvixFileList;
 
-/// What a file-list dialog shows and what it brings back.
+/// What a file-list dialog shows and what it returns.
 ///
 /// Created and owned by the host. Texts are copied in: a setter given null, or without memory left, leaves
 /// the old text. A getter's text is never null and is valid until the field is set again or the record is
@@ -16,9 +16,11 @@ class OrvixFileList;
 class ORVIX_API OrvixFileListDialogParams : public BraeHeapOperators
 {
 public:
+    /// Makes a record with the default of each value; allocates nothing.
     OrvixFileListDialogParams();
     OrvixFileListDialogParams(const OrvixFileListDialogParams&) = delete;
     OrvixFileListDialogParams& operator=(const OrvixFileListDialogParams&) = delete;
+    /// Frees the copies of the texts; the file list stays with its owner.
     virtual ~OrvixFileListDialogParams();
 
     /// Sets the options, bits of `OrvixDialogOption`. The setter comes first: that order is part of the published

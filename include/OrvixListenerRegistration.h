@@ -33,6 +33,7 @@ public:
 
     OrvixListenerRegistration(const OrvixListenerRegistration&) = delete;
     OrvixListenerRegistration& operator=(const OrvixListenerRegistration&) = delete;
+    /// Ends the registration. The listener stays with its owner. [library, main-thread]
     ~OrvixListenerRegistration() { OrvixNotification::UnRegisterOrvixNotification(m_listener); }
 
     /// False when memory was exhausted, and for an empty registration.

@@ -25,7 +25,7 @@ namespace OrvixListenerAnswer
 {
 
 inline constexpr std::uint32_t Accept = 0; ///< the next listener is called
-inline constexpr std::uint32_t Veto = 1;   ///< the record is marked as cancelled and the earlier listeners hear of it
+inline constexpr std::uint32_t Veto = 1;   ///< the record is marked as cancelled and the earlier listeners are notified
 inline constexpr std::uint32_t Stop = 2;   ///< ends the delivery without a veto, as any other value does
 
 } // namespace OrvixListenerAnswer

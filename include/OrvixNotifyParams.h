@@ -9,14 +9,16 @@ class OrvixFileList;
 
 /// One notification on its way through the listeners.
 ///
-/// Created by whoever broadcasts and owned by it. Values are stored unchanged and never checked.
+/// Created and owned by the sender. Values are stored unchanged and never checked.
 /// All operations: [library, main-thread], no failure.
 class ORVIX_API OrvixNotifyParams : public BraeHeapOperators
 {
 public:
+    /// Makes a record with the default of each value; allocates nothing.
     OrvixNotifyParams();
     OrvixNotifyParams(const OrvixNotifyParams&) = delete;
     OrvixNotifyParams& operator=(const OrvixNotifyParams&) = delete;
+    /// Frees nothing: all that the record names stays with its owner.
     virtual ~OrvixNotifyParams();
 
     /// The notification's identifier; 0 by default. The sender gives it its meaning.
@@ -31,7 +33,7 @@ public:
 
     /// True once a listener has cancelled; false by default.
     virtual bool IsCancelled();
-    /// Marks the notification as cancelled, or takes the mark away.
+    /// Marks the notification as cancelled, or clears the mark.
     virtual void SetCancelled(bool cancelled);
 
     /// The files that the notification concerns; null by default. Not owned.

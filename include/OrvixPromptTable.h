@@ -11,9 +11,11 @@
 class ORVIX_API OrvixPromptTable
 {
 public:
+    /// Makes an empty table; allocates nothing.
     OrvixPromptTable();
     OrvixPromptTable(const OrvixPromptTable&) = delete;
     OrvixPromptTable& operator=(const OrvixPromptTable&) = delete;
+    /// Frees the rows with their texts.
     virtual ~OrvixPromptTable();
 
     /// Appends a row with a copy of `text`; returns the new number of rows, or -1 with nothing changed when

@@ -13,33 +13,48 @@
 class OrvixProviderBase : public IOrvixProvider
 {
 public:
-    // The operations on files.
+    /// Not offered; fails for a list without an active entry.
     int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long) override { return NotOfferedFor(list); }
+    /// Not offered; fails for a list without an active entry.
     int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long) override { return NotOfferedFor(list); }
+    /// Not offered; fails for a list without an active entry.
     int UndoCheckOut(OrvixFileList* list, unsigned long) override { return NotOfferedFor(list); }
+    /// Not offered; fails for a list without an active entry.
     int GetLatest(OrvixFileList* list, unsigned long) override { return NotOfferedFor(list); }
+    /// Not offered; fails for a list without an active entry.
     int Add(OrvixFileList* list, const wchar_t*, unsigned long) override { return NotOfferedFor(list); }
+    /// Not offered; fails for a list without an active entry.
     int ShowHistory(OrvixFileList* list) override { return NotOfferedFor(list); }
+    /// Not offered; fails for a list without an active entry.
     int ShowProperties(OrvixFileList* list) override { return NotOfferedFor(list); }
 
-    // The dialogs and the provider's own program.
+    /// Not offered.
     int ShowOptions() override { return OrvixProviderResult::NotOffered; }
+    /// Not offered.
     int RunProviderClient() override { return OrvixProviderResult::NotOffered; }
 
-    // The reserved slots of the table.
+    /// Reserved: succeeds.
     int ReservedA() override { return OrvixProviderResult::Success; }
+    /// Reserved: succeeds.
     int ReservedB() override { return OrvixProviderResult::Success; }
+    /// Reserved: not offered.
     int ReservedC() override { return OrvixProviderResult::NotOffered; }
+    /// Reserved: not offered. Stores 0 through both pointers, which may not be null.
     int ReservedD(void*, unsigned long* first, unsigned long* second) override
     {
         *first = 0;
         *second = 0;
         return OrvixProviderResult::NotOffered;
     }
+    /// Reserved: not offered.
     int ReservedE() override { return OrvixProviderResult::NotOffered; }
+    /// Reserved: not offered.
     int ReservedF() override { return OrvixProviderResult::NotOffered; }
+    /// Reserved: not offered.
     int ReservedG() override { return OrvixProviderResult::NotOffered; }
+    /// Reserved: not offered.
     int ReservedH() override { return OrvixProviderResult::NotOffered; }
+    /// Reserved: true.
     bool ReservedI() override { return true; }
 
 private:

@@ -4,7 +4,7 @@
 
 #include <memory>
 
-/// Gives a services object back to the library.
+/// Releases a services object.
 struct OrvixServicesRelease
 {
     /// Shuts the object down and destroys it; null does nothing. [library, main-thread]

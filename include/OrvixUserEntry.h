@@ -12,9 +12,11 @@
 class ORVIX_API OrvixUserEntry : public BraeHeapOperators
 {
 public:
+    /// Makes an entry without a name; allocates nothing.
     OrvixUserEntry();
     OrvixUserEntry(const OrvixUserEntry&) = delete;
     OrvixUserEntry& operator=(const OrvixUserEntry&) = delete;
+    /// Frees the copies of the texts.
     virtual ~OrvixUserEntry();
 
     /// Login name. The getter's name ends in W so that no header's macro changes it.

@@ -11,6 +11,7 @@ class OrvixUserEntry;
 class ORVIX_API OrvixUserList : public BraeHeapOperators
 {
 public:
+    /// Makes an empty list; allocates nothing.
     OrvixUserList();
     OrvixUserList(const OrvixUserList&) = delete;
     OrvixUserList& operator=(const OrvixUserList&) = delete;

@@ -5,8 +5,9 @@
 /// One installed MSSCCI library, as the provider wrapper uses it.
 ///
 /// Texts are narrow, in the ANSI code page, and live for the call only. The results are those of the library's
-/// functions (MSSCCI.h), unchanged. The bridge's own are -1 (the library or the function is missing, or threw), -14
-/// (not offered) and -25 (no project open). Operations let no exception out. One thread at a time.
+/// functions (MSSCCI.h), unchanged. The bridge's own are SCC_E_INITIALIZEFAILED (the library or the function is
+/// missing, or threw), SCC_E_OPNOTSUPPORTED and SCC_E_PROJNOTOPEN. Operations let no exception out. One thread at a
+/// time.
 class IOrvixMSSCC
 {
 public:
@@ -34,8 +35,8 @@ public:
     virtual SCCRTN Uninitialize() = 0;
 
     /// Opens the project of a local folder, after closing the open one. Reads the project settings file there first and
-    /// writes it afterwards. When the library refuses its project strings (-23), it is asked for new ones and then to
-    /// open the project once more.
+    /// writes it afterwards. When the library refuses its project strings (SCC_E_PROJSYNTAXERR), it is asked for new
+    /// ones and then to open the project once more.
     virtual SCCRTN OpenProject(LPCSTR localPath, LPCSTR comment, LPTEXTOUTPROC output) = 0;
 
     virtual SCCRTN CloseProject() = 0;
@@ -71,10 +72,10 @@ public:
     virtual SCCRTN Reserved6() = 0;
     virtual SCCRTN RunScc(LONG count, LPCSTR* names) = 0;
 
-    /// Shows the library's options; -14 when it has none.
+    /// Shows the library's options; SCC_E_OPNOTSUPPORTED when it has none.
     virtual SCCRTN GetCommandOptions() = 0;
 
-    /// Adds files from the library's projects; -14 when it cannot.
+    /// Adds files from the library's projects; SCC_E_OPNOTSUPPORTED when it cannot.
     virtual SCCRTN AddFromScc(LPLONG count, LPCSTR** names) = 0;
 
     virtual SCCRTN SetOption(LONG option, LONG value) = 0;

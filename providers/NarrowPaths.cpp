@@ -16,7 +16,7 @@ namespace
 
 bool IsExact(std::wstring_view path, const char* narrow)
 {
-    // Every ANSI code page carries these as they are; only the others are worth a second conversion.
+    // Every ANSI code page carries these as they are; only the others need a second conversion.
     if (std::all_of(path.begin(), path.end(), [](wchar_t c) { return c < 0x80; }))
     {
         return true;

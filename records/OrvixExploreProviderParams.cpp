@@ -7,9 +7,6 @@
 namespace
 {
 
-constexpr std::uint32_t MultipleSelections = 0x1;
-constexpr std::uint32_t DownloadFiles = 0x2;
-
 std::uint32_t WithBit(std::uint32_t flags, std::uint32_t bit, bool set)
 {
     return set ? flags | bit : flags & ~bit;

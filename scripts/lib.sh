@@ -2,10 +2,10 @@
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 export WINEPREFIX=${ORVIX_WINEPREFIX:-$root/build/wine-prefix}
 export WINEARCH=win64 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree=;mshtml=;winemenubuilder.exe=;winedbg.exe="
-export LC_ALL=C.UTF-8 # in another locale Wine has no files with foreign letters in their names
+export LC_ALL=C.UTF-8 # in another locale Wine has no files with non-ASCII names
 wineserver=/usr/lib/wine/wineserver
 wine=(/usr/lib/wine/wine64)
-# Wine's loader lies below 2 GiB, and Linux lays its heap at random within 1 GiB behind it: one start in some 5,000
+# Wine's loader is below 2 GiB, and Linux puts its heap at random within 1 GiB after it: one start in some 5,000
 # finds the heap where Windows has the data that all processes share (0x7ffe0000) and ends there. Without that
 # randomness none does.
 if setarch -R true 2>/dev/null; then wine=(setarch -R "${wine[@]}"); fi
@@ -17,7 +17,7 @@ at_exit() {
 }
 
 # One X server without a screen serves the rest of the calling script, which shows its windows there and never on the
-# user's own display. It goes before use_one_wineserver: a wineserver keeps the display that it began with. Without such
+# user's own display. Call it before use_one_wineserver: a wineserver keeps the display that it began with. Without such
 # an X server there is no display, and the tests and measures that need one are skipped.
 use_virtual_display() {
     unset DISPLAY
@@ -33,7 +33,7 @@ use_virtual_display() {
     fi
 }
 
-# One wineserver serves the rest of the calling script: it starts here, with no pipe of the script in its hands, and
+# One wineserver serves the rest of the calling script: it starts here, with no pipe of the script open, and
 # is stopped when the script ends. One that was running already stays; ORVIX_KEEP_WINESERVER=1 keeps this one too.
 use_one_wineserver() {
     if ! "$wineserver" -k0; then

@@ -9,7 +9,7 @@ vcpkg_cmake_install()
 vcpkg_cmake_config_fixup(PACKAGE_NAME OrvixCore CONFIG_PATH lib/cmake/OrvixCore)
 vcpkg_copy_tools(TOOL_NAMES orvix AUTO_CLEAN)
 
-# What vcpkg wants once, or not in this place.
+# vcpkg wants these files once, or in another place.
 file(REMOVE_RECURSE "${CURRENT_PACKAGES_DIR}/debug/include" "${CURRENT_PACKAGES_DIR}/debug/share")
 file(REMOVE
   "${CURRENT_PACKAGES_DIR}/README.md" "${CURRENT_PACKAGES_DIR}/debug/README.md"

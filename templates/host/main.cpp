@@ -30,7 +30,7 @@ void Print(std::wstring_view text)
     std::puts(bytes.c_str());
 }
 
-/// What the library asks of this host. A dialog-based host shows the text in its own window and gives its own colours.
+/// What the library asks of this host. A host with windows shows the text in its own window and gives its own colours.
 class MyClientAccess final : public IOrvixClientAccess
 {
 public:
@@ -41,12 +41,14 @@ public:
     std::intptr_t RelayB(void*, void*, void*, void*) override { return 0; }
 };
 
-/// The provider with this name; null when there is none.
+/// The provider with this name, in any letter case; null when there is none.
 IOrvixProvider* FindProvider(IOrvixServices& services, std::wstring_view name)
 {
     for (std::uint32_t i = 0; i < services.GetProviderCount(); ++i)
     {
-        if (services.GetProviderName(i) == name)
+        const std::wstring_view found = services.GetProviderName(i);
+        if (CompareStringOrdinal(found.data(), static_cast<int>(found.size()), name.data(),
+                                 static_cast<int>(name.size()), TRUE) == CSTR_EQUAL)
         {
             return services.GetProvider(i);
         }

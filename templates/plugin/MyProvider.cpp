@@ -9,7 +9,6 @@
 #include "OrvixVersion.h"
 
 #include <cstdint>
-#include <exception>
 #include <utility>
 #include <vector>
 
@@ -50,9 +49,9 @@ public:
     {
         try
         {
-            return Result(WriteStates(*list));
+            return Result(list != nullptr && WriteStates(*list));
         }
-        catch (const std::exception&) // no exception may leave an operation
+        catch (...) // no exception may leave an operation
         {
             return OrvixProviderResult::Failure;
         }

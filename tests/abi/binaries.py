@@ -22,7 +22,7 @@ def read_lists(path):
 
 
 def exports(tables):
-    """Every entry of the export table; one without a name stands as its ordinal."""
+    """Every entry of the export table; one without a name is given as its ordinal."""
     count = int(re.search(r"^\tExport Address Table \t\t(\w+)$", tables, re.M).group(1), 16)
     names = re.findall(r"^\t\[ *\d+\] ([^+\s]\S*)$", tables.split("[Ordinal/Name Pointer] Table")[1], re.M)
     return {*names, *(f"unnamed entry {index}" for index in range(len(names), count))}

@@ -88,7 +88,7 @@ def dumped_tables(output, word):
 
 def main():
     slots = read_slots(Path(__file__).with_name("slots.txt"))
-    errors = [f"{name}: stands in only one of the headers and slots.txt"
+    errors = [f"{name}: is in only one of the headers and slots.txt"
               for name in sorted(classes_with_virtual_operations() ^ slots.keys())]
     source = compilers.include_all([*compilers.HEADERS, *INTERNAL_HEADERS])
     source += "".join(address_of_an_operation(name, operations) for name, operations in slots.items())

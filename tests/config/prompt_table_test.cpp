@@ -55,7 +55,7 @@ void ExpectNoRow(OrvixPromptTable& table, unsigned int index)
 }
 
 const Row Sample{7, L"Save the file?", 0xFFFFFFFF, 0x80000001, true};
-const std::wstring LongText = L"a text too long to lie inside a string object";
+const std::wstring LongText = L"a text too long to be inside a string object";
 
 } // namespace
 

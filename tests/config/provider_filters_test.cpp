@@ -8,7 +8,7 @@
 namespace
 {
 
-/// A filter as it stands after loading: folders and types in upper case.
+/// A filter as it is after loading: folders and types in upper case.
 struct Filter : ProviderFilters
 {
     Filter(bool exclude, std::initializer_list<std::wstring> folders, std::initializer_list<std::wstring> types)

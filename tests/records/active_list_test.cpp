@@ -39,7 +39,7 @@ public:
     unsigned long GetFlagsIn() override { return 1; }
 };
 
-/// A folder with one child that does not lie in the library's own storage.
+/// A folder with one child that is not in the library's own storage.
 class HostFolder : public SelectedEntry
 {
 public:

@@ -20,7 +20,7 @@
 namespace
 {
 
-constexpr const wchar_t* LongText = L"a text too long to lie inside a string object";
+constexpr const wchar_t* LongText = L"a text too long to be inside a string object";
 constexpr const wchar_t* OtherLongText = L"another text that is too long for that, and longer than the first";
 OrvixFileEntry* const NoParent = nullptr;
 

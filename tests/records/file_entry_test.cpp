@@ -10,7 +10,7 @@
 namespace
 {
 
-/// A file of the host's own making, whose values come out of its getters and lie nowhere else.
+/// A file of the host's own making, whose values come from its getters and are nowhere else.
 class ComputedEntry : public OrvixFileEntry
 {
 public:

@@ -64,7 +64,7 @@ public:
     std::vector<OrvixFileEntry*> offered;
 };
 
-/// A folder whose children do not lie in the library's own storage.
+/// A folder whose children are not in the library's own storage.
 class HostFolder : public OrvixFileEntry
 {
 public:
@@ -434,7 +434,7 @@ TEST(FileListRemoveEntryByIndex, WalksEachSequenceDepthFirstAndStopsItAtTheRemov
     EXPECT_EQ(afterDeep->NumChildren(), 0u) << "a removal further down does not end the walk above it";
     EXPECT_EQ(before->NumChildren(), 2u) << "and is followed by the rest of the sequence above";
     EXPECT_EQ(root->NumChildren(), 2u);
-    EXPECT_EQ(after->NumChildren(), 1u) << "a sibling behind the removed child is not visited";
+    EXPECT_EQ(after->NumChildren(), 1u) << "a sibling after the removed child is not visited";
 }
 
 TEST(FileListRemoveEntryByIndex, WalksEveryRoot)

@@ -323,7 +323,7 @@ TEST(ExploreProviderParamsAddFilter, TakesManyFiltersWithinTheTimeLimit)
 
 TEST(ExploreProviderParamsGetFilter, KeepsTheAddressesOfItsTextsWhileFiltersAreAdded)
 {
-    const wchar_t* const longText = L"a text too long to lie inside a string object";
+    const wchar_t* const longText = L"a text too long to be inside a string object";
     OrvixExploreProviderParams params;
     params.AddFilter(L"Text", L"*.txt");
     params.AddFilter(longText, longText);

@@ -27,7 +27,7 @@ using Flags = unsigned long;
 int g_target;
 const Address SomeAddress = &g_target;
 
-/// A record made for the test, whose slots count from the one behind the destructor.
+/// A record made for the test, whose slots count from the one after the destructor.
 template <typename Record>
 class Slots
 {

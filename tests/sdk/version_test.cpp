@@ -54,7 +54,7 @@ private:
         UINT size = 0;
         if (!VerQueryValueW(m_data.data(), path.c_str(), &value, &size) || size == 0)
         {
-            throw std::runtime_error("the version resource lacks " + std::filesystem::path(path).string());
+            throw std::runtime_error("the version resource has no " + std::filesystem::path(path).string());
         }
         return value;
     }

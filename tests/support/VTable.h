@@ -10,7 +10,7 @@ inline constexpr std::size_t DestructorSlots = 2;
 #endif
 
 /// Calls an operation by its raw slot in the object's virtual table, as a client built by another compiler
-/// does. For a class whose destructor stands first, the first operation behind it has slot `DestructorSlots`.
+/// does. For a class whose destructor comes first, the first operation after it has slot `DestructorSlots`.
 template <typename Result, typename... Arguments>
 Result CallSlot(void* object, std::size_t slot, Arguments... arguments)
 {

@@ -19,7 +19,7 @@ using InstalledWithoutMemory = InstalledTest;
 const wchar_t* const LongName = L"A provider's name that is long enough to need memory of its own";
 const wchar_t* const OtherLongName = L"Another provider's name, which is long enough as well";
 
-/// Makes the n-th allocation of braeutil's texts fail, and counts all of them. They lie on another heap than the
+/// Makes the n-th allocation of braeutil's texts fail, and counts all of them. They are on another heap than the
 /// records.
 class TextMemory
 {

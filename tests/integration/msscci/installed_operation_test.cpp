@@ -27,7 +27,7 @@ class InstalledOperation : public InstalledTest
 protected:
     static constexpr std::uint32_t DialogPrompt = 7;
     static constexpr std::uint32_t OptionPrompt = 8;
-    static constexpr unsigned long Everything = 0x1; ///< the host's flag for files to work on
+    static constexpr unsigned long Everything = 0x2; ///< the host's flag for files to work on
 
     void SetUp() override
     {

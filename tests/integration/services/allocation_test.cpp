@@ -4,7 +4,7 @@
 namespace
 {
 
-/// Too long to lie inside a string object.
+/// Too long to be inside a string object.
 const wchar_t* const LongText = L"A question that is long enough to need memory of its own";
 const std::string LongTextInFile = "A question that is long enough to need memory of its own";
 

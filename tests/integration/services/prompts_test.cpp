@@ -279,8 +279,8 @@ TEST_F(PromptsFileLoad, SurvivesElementsWhoseTypedValueIsNoText)
 
 TEST_F(PromptsFileSave, WritesTheWholeTableInOrder)
 {
-    constexpr std::uint32_t anyAction = 18;
-    constexpr std::uint32_t anyOptions = 256;
+    constexpr std::uint32_t anyAction = Action::Yes | Action::NoToAll;
+    constexpr std::uint32_t anyOptions = OrvixPromptOption::OfferStopAsking;
     Initialize(0);
     m_services->RegisterPrompt(7, L"\u00C4 & <b> \"q\" \U0001F600", anyAction, anyOptions, false);
     m_services->RegisterPrompt(LargestID, L"second", HighestBit, AllBits, false);

@@ -221,7 +221,7 @@ void Parser::AddPathArguments(CLI::App& app, const Command& command)
 
 void Parser::AddPromptArguments(CLI::App& app, const Command& command)
 {
-    constexpr const char* IDHelp = "ID of the prompt; every row that has it is meant";
+    constexpr const char* IDHelp = "ID of the prompt; applies to every row with this ID";
     if ((command.takes & Argument::Prompt) != 0)
     {
         app.add_option("ID", m_texts.prompt, IDHelp)->required();

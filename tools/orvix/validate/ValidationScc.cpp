@@ -107,7 +107,7 @@ std::string ValidationScc::Narrow(const std::wstring& path)
     const WStr back(narrow.Get());
     if (narrow.Get() == nullptr || back.Get() == nullptr || back.Get() != path)
     {
-        throw RuleSkipped("the ANSI code page lacks a character of the scratch project's path");
+        throw RuleSkipped("the ANSI code page does not have a character of the scratch project's path");
     }
     return narrow.Get();
 }

@@ -104,7 +104,7 @@ public:
     /// Throws `RuleBroken` when SccOpenProject has written to a text that it may only read.
     void CheckInputTexts() const;
 
-    /// A path of the project in the ANSI code page. Throws `RuleSkipped` when the code page lacks one of its
+    /// A path of the project in the ANSI code page. Throws `RuleSkipped` when the code page does not have one of its
     /// characters.
     static std::string Narrow(const std::wstring& path);
 
