@@ -186,7 +186,7 @@ SCCRTN ArchiveScc::OpenProject(LPSTR user, LPCSTR projectName, LPCSTR localPath,
         return Report(failures);
     }
     const bool wasChosen = m_folder == m_newFolder;
-    if (!isProject && !(wasChosen && (flags & SCC_OP_CREATEIFNEW) != 0))
+    if (!isProject && (!wasChosen || (flags & SCC_OP_CREATEIFNEW) == 0))
     {
         m_refusedFolder = m_folder;
         return wasChosen || (flags & SCC_OP_SILENTOPEN) != 0 ? SCC_E_UNKNOWNPROJECT : SCC_E_PROJSYNTAXERR;
