@@ -44,9 +44,9 @@ public:
     /// Sets the state flags; every value is stored as it is.
     virtual void SetFlagsOut(unsigned long flags);
 
-    /// Appends a child, which is not owned; its parent link is not touched and duplicates are not looked
-    /// for. Links must not form a cycle: walking the tree would never end. Returns `NumChildren()`,
-    /// or 0 with nothing changed for null and when memory runs out.
+    /// Appends a child, which is not owned; its parent link is not touched and duplicates are not looked for. A list
+    /// does not follow links that form a cycle; a host that walks the tree itself would not end. Returns
+    /// `NumChildren()`, or 0 with nothing changed for null and when memory runs out.
     virtual unsigned int AddChild(OrvixFileEntry* child);
 
     /// Number of children.
@@ -91,10 +91,14 @@ public:
     virtual OrvixFileEntry* GetParent();
 
 private:
+    friend class OrvixFileList; // makes room for a child before it changes anything
+    friend class TreeWalk;      // marks the entries that it has reached
+
     // Plain members of fixed size, so that host and library agree about every object. Null: empty.
     wchar_t* m_file = nullptr;
     unsigned long m_flagsIn = 0;
     unsigned long m_flagsOut = 0;
+    unsigned long long m_walkMark = 0;
     long long m_clientPtr = 0;
     OrvixFileEntry** m_children = nullptr;
     unsigned int m_numChildren = 0;
@@ -105,4 +109,4 @@ private:
     unsigned int m_attachmentCapacity = 0;
 };
 
-static_assert(sizeof(OrvixFileEntry) == 72, "host and library must agree about the size of a record");
+static_assert(sizeof(OrvixFileEntry) == 80, "host and library must agree about the size of a record");

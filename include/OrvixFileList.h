@@ -25,12 +25,12 @@ public:
         /// Appends a copy of an entry; the list owns it. Copies path, flags, client value and parent link, and the
         /// attachments one level deep. The children are shared: the same objects, whose parent links still name
         /// the source. The copy is added to the children of the source's parent, or to the roots when there is
-        /// none. Returns the copy; null with the list unchanged when memory runs out (a parent whose
-        /// `AddChild` gives 0 counts as exhausted).
+        /// none. Returns the copy; null with the list unchanged when memory runs out. The result of the parent's
+        /// `AddChild` is not looked at. Null, too, when the parent's own code has removed the copy again.
         virtual OrvixFileEntry* CreateEntry(OrvixFileEntry& source),
         /// Appends an entry made from a path and values; the list owns it. It is added to the children of
         /// `parent`, which need not belong to this list, or to the roots when `parent` is null. Returns the entry;
-        /// null with the list unchanged when `file` is null or memory runs out, as in the other form.
+        /// null with the list unchanged when `file` is null or memory runs out, and as in the other form.
         virtual OrvixFileEntry* CreateEntry(const wchar_t* file, OrvixFileEntry* parent, unsigned long flagsIn,
                                             long long clientPtr));
 

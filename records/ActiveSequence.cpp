@@ -3,94 +3,157 @@
 #include "ExceptionBarrier.h"
 
 #include <algorithm>
+#include <utility>
+
+namespace
+{
+
+constexpr auto NoSlot = static_cast<std::size_t>(-1);
+
+/// As far as a reader that goes through holes may jump; a longer jump closes the holes first.
+constexpr std::size_t MaxJump = 32;
+
+/// An index is made once as many slots have been searched as this times the length, which is about what it costs, and
+/// never for a short sequence.
+constexpr std::size_t SearchesWorthAnIndex = 4;
+constexpr std::size_t ShortSequence = 64;
+
+} // namespace
 
 void ActiveSequence::Clear()
 {
     m_slots.clear();
-    m_gapBegin = m_gapEnd = 0;
+    m_index.Clear();
+    m_holes = 0;
     m_distinct = true;
+    m_firstSlot = m_nextSlot = 0;
+    m_cursor = m_cursorIndex = 0;
+    m_searched = 0;
+    ++m_fill;
 }
 
 bool ActiveSequence::Remove(OrvixFileEntry* entry)
 {
-    const std::size_t position = PositionOf(entry);
-    if (position == m_slots.size())
+    if (entry == nullptr || Size() == 0)
     {
         return false;
     }
-
-    // Move the gap to the entry and let it swallow the entry's slot.
-    const auto at = [this](std::size_t slot) { return m_slots.begin() + static_cast<std::ptrdiff_t>(slot); };
-    if (m_gapBegin == m_gapEnd)
+    const std::size_t slot = Find(entry);
+    if (slot == NoSlot)
     {
-        m_gapBegin = position;
-        m_gapEnd = position + 1;
+        return false;
     }
-    else if (position >= m_gapEnd)
+    if (Size() == 1)
     {
-        std::move(at(m_gapEnd), at(position), at(m_gapBegin));
-        m_gapBegin += position - m_gapEnd;
-        m_gapEnd = position + 1;
+        Clear();
+        return true;
     }
-    else
+    m_slots[slot] = nullptr;
+    ++m_holes;
+    m_nextSlot = slot + 1;
+    while (m_slots[m_firstSlot] == nullptr)
     {
-        std::move_backward(at(position + 1), at(m_gapBegin), at(m_gapEnd));
-        m_gapEnd -= m_gapBegin - (position + 1);
-        m_gapBegin = position;
+        ++m_firstSlot;
+    }
+    if (slot < m_cursor && m_cursorIndex > 0)
+    {
+        --m_cursorIndex;
     }
     return true;
 }
 
-/// Slot of the first occurrence; the number of slots when there is none.
-std::size_t ActiveSequence::PositionOf(OrvixFileEntry* entry)
+/// Reads on from the entry that was read last.
+OrvixFileEntry* ActiveSequence::AtWithHoles(std::size_t index)
 {
-    const auto find = [&](std::size_t from, std::size_t to) {
-        const auto begin = m_slots.begin();
-        const auto end = begin + static_cast<std::ptrdiff_t>(to);
-        const auto found = std::find(begin + static_cast<std::ptrdiff_t>(from), end, entry);
-        return found == end ? m_slots.size() : static_cast<std::size_t>(found - begin);
-    };
-
-    // Sorting pays once as much has been searched from the front as it costs.
-    constexpr std::size_t SearchesWorthASort = 16;
-    if (!m_distinct && m_searched > SearchesWorthASort * Size())
+    if (index < m_cursorIndex || m_cursor < m_firstSlot)
     {
-        m_distinct = HasNoRepetition();
-        m_searched = 0;
+        m_cursor = m_firstSlot;
+        m_cursorIndex = 0;
     }
+    if (index - m_cursorIndex > MaxJump)
+    {
+        CloseHoles();
+        return m_slots[index];
+    }
+    for (;; ++m_cursor)
+    {
+        if (m_slots[m_cursor] != nullptr && m_cursorIndex++ == index)
+        {
+            --m_cursorIndex;
+            return m_slots[m_cursor];
+        }
+    }
+}
 
-    // Without repetition any occurrence is the first, and the search may start after the gap.
+void ActiveSequence::CloseHoles()
+{
+    if (m_holes == 0)
+    {
+        return;
+    }
+    std::erase(m_slots, nullptr);
+    m_index.Clear();
+    m_holes = 0;
+    m_firstSlot = m_nextSlot = 0;
+    m_cursor = m_cursorIndex = 0;
+}
+
+/// Slot of the first occurrence; `NoSlot` when there is none.
+std::size_t ActiveSequence::Find(OrvixFileEntry* entry)
+{
     if (m_distinct)
     {
-        const std::size_t position = find(m_gapEnd, m_slots.size());
-        return position < m_slots.size() ? position : find(0, m_gapBegin);
+        // Any occurrence is the first.
+        const std::size_t slot = FindBetween(m_nextSlot, m_slots.size(), entry);
+        return slot != NoSlot ? slot : FindBetween(m_firstSlot, m_nextSlot, entry);
     }
-    std::size_t position = find(0, m_gapBegin);
-    if (position == m_slots.size())
+    if (m_index.IsEmpty() && Size() > ShortSequence && m_searched > SearchesWorthAnIndex * m_slots.size())
     {
-        position = find(m_gapEnd, m_slots.size());
+        m_searched = 0;
+        MakeIndex();
     }
-    m_searched += position;
-    return position;
-}
-
-bool ActiveSequence::HasNoRepetition() const
-{
-    return WithBarrier(false, [this] {
-        std::vector<OrvixFileEntry*> sorted;
-        sorted.reserve(Size());
-        for (std::size_t i = 0; i < Size(); ++i)
+    if (!m_index.IsEmpty())
+    {
+        std::size_t* const first = m_index.Find(entry);
+        if (first == nullptr || *first == NoSlot)
         {
-            sorted.push_back(At(i));
+            return NoSlot;
         }
-        std::sort(sorted.begin(), sorted.end());
-        return std::adjacent_find(sorted.begin(), sorted.end()) == sorted.end();
-    });
+        return std::exchange(*first, m_nextOccurrence[*first]);
+    }
+    const std::size_t slot = FindBetween(m_firstSlot, m_slots.size(), entry);
+    m_searched += (slot == NoSlot ? m_slots.size() : slot) - m_firstSlot;
+    return slot;
 }
 
-void ActiveSequence::CloseGap()
+std::size_t ActiveSequence::FindBetween(std::size_t from, std::size_t to, OrvixFileEntry* entry) const
 {
-    const auto begin = m_slots.begin();
-    m_slots.erase(begin + static_cast<std::ptrdiff_t>(m_gapBegin), begin + static_cast<std::ptrdiff_t>(m_gapEnd));
-    m_gapEnd = m_gapBegin;
+    const auto begin = m_slots.begin() + static_cast<std::ptrdiff_t>(from);
+    const auto end = m_slots.begin() + static_cast<std::ptrdiff_t>(to);
+    const auto found = from < to ? std::find(begin, end, entry) : end;
+    return found == end || from >= to ? NoSlot : static_cast<std::size_t>(found - m_slots.begin());
+}
+
+/// Without memory there is none, and the search stays linear.
+void ActiveSequence::MakeIndex()
+{
+    const bool made = Completes([this] {
+        m_nextOccurrence.assign(m_slots.size(), NoSlot);
+        m_index.Reserve(Size());
+        for (std::size_t slot = m_slots.size(); slot-- > m_firstSlot;)
+        {
+            if (m_slots[slot] != nullptr)
+            {
+                const auto [first, isNew] = m_index.Add(m_slots[slot], slot);
+                if (!isNew)
+                {
+                    m_nextOccurrence[slot] = std::exchange(first, slot);
+                }
+            }
+        }
+    });
+    if (!made)
+    {
+        m_index.Clear();
+    }
 }

@@ -1,56 +1,74 @@
 #pragma once
 
+#include "FlatMap.h"
+
 #include <cstddef>
 #include <vector>
 
 class OrvixFileEntry;
 
-/// The active list's storage: entry pointers in order, never null, with a gap at the place of the last
-/// removal. Removals that walk through the list in order, as operations on files make them, therefore cost
-/// as much as one walk; any other removal costs a linear search and a move.
+/// The active list's storage: entry pointers in order, never null. It compares pointers and never looks into an entry,
+/// which the host may have deleted.
 ///
-/// Part of `OrvixFileList`; not exported. `Append`, `AppendDistinct` and `Reserve` may throw std::bad_alloc,
-/// with nothing changed.
+/// A removal leaves a hole, so that many removals in a row cost as much as one walk, whatever their order and however
+/// often an entry repeats. Reading in order passes the holes; any other access closes them first, which costs a move of
+/// the rest.
 class ActiveSequence
 {
 public:
-    std::size_t Size() const { return m_slots.size() - (m_gapEnd - m_gapBegin); }
+    std::size_t Size() const { return m_slots.size() - m_holes; }
 
-    OrvixFileEntry* At(std::size_t index) const
-    {
-        return m_slots[index < m_gapBegin ? index : index + (m_gapEnd - m_gapBegin)];
-    }
+    /// The entry at an index below `Size()`.
+    OrvixFileEntry* At(std::size_t index) { return m_holes == 0 ? m_slots[index] : AtWithHoles(index); }
 
     /// Empties the sequence; the storage is kept.
     void Clear();
+
+    /// Throws std::bad_alloc with nothing changed.
     void Reserve(std::size_t count) { m_slots.reserve(count); }
 
-    /// Appends an entry that may already be there.
+    /// Appends an entry that may already be there. Throws std::bad_alloc with nothing changed.
     void Append(OrvixFileEntry* entry)
+    {
+        AppendDistinct(entry);
+        m_distinct = false;
+    }
+
+    /// Which filling of the sequence this is: `Clear` begins the next one.
+    unsigned int Fill() const { return m_fill; }
+
+    /// Appends an entry that is known not to be there. Throws std::bad_alloc with nothing changed.
+    void AppendDistinct(OrvixFileEntry* entry)
     {
         if (m_slots.size() == m_slots.capacity())
         {
-            CloseGap();
+            CloseHoles();
         }
         m_slots.push_back(entry);
-        m_distinct = false;
-        m_searched = 0;
+        m_index.Clear();
     }
-
-    /// Appends to an empty or distinct sequence an entry that is known not to be there.
-    void AppendDistinct(OrvixFileEntry* entry) { m_slots.push_back(entry); }
 
     /// Removes the first occurrence of the entry; false when it is not there.
     bool Remove(OrvixFileEntry* entry);
 
 private:
-    std::size_t PositionOf(OrvixFileEntry* entry);
-    bool HasNoRepetition() const;
-    void CloseGap();
+    OrvixFileEntry* AtWithHoles(std::size_t index);
+    void CloseHoles();
+    std::size_t Find(OrvixFileEntry* entry);
+    std::size_t FindBetween(std::size_t from, std::size_t to, OrvixFileEntry* entry) const;
+    void MakeIndex();
 
-    std::vector<OrvixFileEntry*> m_slots;
-    std::size_t m_gapBegin = 0;
-    std::size_t m_gapEnd = 0;
-    bool m_distinct = true;     ///< no entry is known to be in the sequence twice
-    std::size_t m_searched = 0; ///< slots searched since that was last unknown
+    std::vector<OrvixFileEntry*> m_slots; ///< null: a hole
+    std::size_t m_holes = 0;
+    unsigned int m_fill = 0;
+    bool m_distinct = true;        ///< known that no entry repeats
+    std::size_t m_firstSlot = 0;   ///< no entry is before it
+    std::size_t m_nextSlot = 0;    ///< after the last removal, where the next one is likely
+    std::size_t m_cursor = 0;      ///< slot of the entry that was read last, ...
+    std::size_t m_cursorIndex = 0; ///< ... and its index; 0 and 0 when none was
+    std::size_t m_searched = 0;    ///< slots searched since the index was last given up
+
+    // Where entries repeat: for each entry the slot of its first occurrence, and for each slot the next occurrence.
+    FlatMap<OrvixFileEntry*, std::size_t> m_index; ///< empty: not made
+    std::vector<std::size_t> m_nextOccurrence;
 };

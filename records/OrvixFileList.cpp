@@ -2,104 +2,130 @@
 
 #include "ActiveSequence.h"
 #include "EntryFactory.h"
+#include "EntryLinks.h"
 #include "ExceptionBarrier.h"
 #include "RecordState.h"
+#include "TreeWalk.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <utility>
 #include <vector>
 
 namespace
 {
 
-/// One step on the path down a tree: an entry and the child to look at next.
-struct TreeStep
+/// Makes room for one more element. Throws std::bad_alloc with nothing changed.
+void ReserveOne(std::vector<OrvixFileEntry*>& entries)
 {
-    OrvixFileEntry* entry;
-    unsigned int nextChild;
+    if (entries.size() == entries.capacity())
+    {
+        entries.reserve(std::max<std::size_t>(2 * entries.size(), 8));
+    }
+}
+
+/// Tells whether an entry is still there after a host's code has run. Those of a list form a chain, innermost first.
+/// An address says nothing, since a new entry may have that of a deleted one.
+class Watch
+{
+public:
+    Watch(Watch*& innermost, const OrvixFileEntry* entry) : m_innermost(innermost), m_outer(innermost), m_entry(entry)
+    {
+        innermost = this;
+    }
+    Watch(const Watch&) = delete;
+    Watch& operator=(const Watch&) = delete;
+    ~Watch() { m_innermost = m_outer; }
+
+    bool IsThere() const { return m_entry != nullptr; }
+    Watch* Outer() const { return m_outer; }
+
+    /// Called before an entry is deleted, or all are (null).
+    void Forget(const OrvixFileEntry* entry)
+    {
+        if (entry == nullptr || entry == m_entry)
+        {
+            m_entry = nullptr;
+        }
+    }
+
+private:
+    Watch*& m_innermost;
+    Watch* m_outer;
+    const OrvixFileEntry* m_entry;
 };
-
-/// Appends to the active list, children before their parents, what the mask selects in the tree below `root`.
-/// The path down is kept on the heap: a tree may be deeper than the stack.
-void AppendTree(OrvixFileEntry* root, unsigned long mask, std::vector<TreeStep>& path, ActiveSequence& active)
-{
-    path.push_back({root, 0});
-    while (!path.empty())
-    {
-        TreeStep& step = path.back();
-        OrvixFileEntry* entry = step.entry;
-        if (step.nextChild < entry->NumChildren())
-        {
-            if (OrvixFileEntry* child = entry->GetChild(step.nextChild++))
-            {
-                path.push_back({child, 0});
-            }
-            continue;
-        }
-        if (entry->GetFlagsIn() & mask)
-        {
-            active.Append(entry);
-        }
-        path.pop_back();
-    }
-}
-
-/// Removes the first occurrence of `target` from every sequence of children below `root`; the siblings after it are
-/// not visited.
-void DetachFromTree(OrvixFileEntry* root, OrvixFileEntry* target, std::vector<TreeStep>& path)
-{
-    path.push_back({root, 0});
-    while (!path.empty())
-    {
-        TreeStep& step = path.back();
-        if (step.nextChild >= step.entry->NumChildren())
-        {
-            path.pop_back();
-            continue;
-        }
-        const unsigned int position = step.nextChild++;
-        OrvixFileEntry* child = step.entry->GetChild(position);
-        if (child == target)
-        {
-            step.entry->RemoveChild(position);
-            path.pop_back();
-        }
-        else if (child != nullptr)
-        {
-            path.push_back({child, 0});
-        }
-    }
-}
-
-/// Puts the entry into the list's sequences and under its parent; null with nothing changed when the parent cannot take
-/// it. Throws std::bad_alloc with nothing changed.
-OrvixFileEntry* Append(std::vector<OrvixFileEntry*>& entries, std::vector<OrvixFileEntry*>& roots,
-                       std::unique_ptr<OrvixFileEntry> entry)
-{
-    entries.push_back(entry.get());
-    const bool linked = WithBarrier(false, [&] {
-        if (OrvixFileEntry* parent = entry->GetParent())
-        {
-            return parent->AddChild(entry.get()) != 0;
-        }
-        roots.push_back(entry.get());
-        return true;
-    });
-    if (!linked)
-    {
-        entries.pop_back();
-        return nullptr;
-    }
-    return entry.release();
-}
 
 } // namespace
 
 struct OrvixFileList::State
 {
+    /// A number for the next walk. Those of two lists differ, as their addresses do.
+    unsigned long long NextWalk()
+    {
+        constexpr unsigned int CounterBits = 16;
+        walks += 2;
+        return (static_cast<unsigned long long>(reinterpret_cast<std::uintptr_t>(this)) << CounterBits) + walks;
+    }
+
+    /// Where the entry is, which usually is at `index`; the end when the list does not hold it.
+    std::vector<OrvixFileEntry*>::iterator Find(const OrvixFileEntry* entry, std::size_t index)
+    {
+        if (index < entries.size() && entries[index] == entry)
+        {
+            return entries.begin() + static_cast<std::ptrdiff_t>(index);
+        }
+        return std::find(entries.begin(), entries.end(), entry);
+    }
+
+    bool Holds(const OrvixFileEntry* entry, std::size_t index) { return Find(entry, index) != entries.end(); }
+
+    /// Takes a new entry into the list and under its parent. Throws std::bad_alloc with nothing changed. Null when the
+    /// parent's own code has removed the entry again.
+    OrvixFileEntry* Append(std::unique_ptr<OrvixFileEntry> made)
+    {
+        OrvixFileEntry* parent = made->GetParent();
+        ReserveOne(entries);
+        if (parent == nullptr)
+        {
+            ReserveOne(roots);
+        }
+        else
+        {
+            EntryLinks(parent->m_children, parent->m_numChildren, parent->m_childCapacity).Reserve();
+        }
+
+        // From here on nothing runs out of memory.
+        OrvixFileEntry* entry = made.release();
+        entries.push_back(entry);
+        if (parent == nullptr)
+        {
+            roots.push_back(entry);
+            return entry;
+        }
+        const Watch watch(watches, entry);
+        Completes([&] { parent->AddChild(entry); }); // its result is the parent's own affair
+        return watch.IsThere() ? entry : nullptr;
+    }
+
+    /// Before an entry is deleted, or all are (null).
+    void Forget(const OrvixFileEntry* entry)
+    {
+        for (Watch* watch = watches; watch != nullptr; watch = watch->Outer())
+        {
+            watch->Forget(entry);
+        }
+        for (TreeWalk* walk = innermostWalk; walk != nullptr; walk = walk->Outer())
+        {
+            walk->Forget(entry);
+        }
+    }
+
     std::vector<OrvixFileEntry*> entries;
     std::vector<OrvixFileEntry*> roots;
     ActiveSequence active;
+    TreeWalk* innermostWalk = nullptr;
+    unsigned int walks = 0;
+    Watch* watches = nullptr; ///< the innermost one
 };
 
 OrvixFileList::OrvixFileList() = default;
@@ -130,7 +156,7 @@ OrvixFileEntry* OrvixFileList::CreateEntry(OrvixFileEntry& source)
                 return nullptr;
             }
         }
-        return Append(StateOf(m_state).entries, StateOf(m_state).roots, std::move(copy));
+        return StateOf(m_state).Append(std::move(copy));
     });
 }
 
@@ -141,38 +167,52 @@ OrvixFileEntry* OrvixFileList::CreateEntry(const wchar_t* file, OrvixFileEntry* 
     {
         return nullptr;
     }
-    return WithBarrier(static_cast<OrvixFileEntry*>(nullptr), [&] {
-        return Append(StateOf(m_state).entries, StateOf(m_state).roots, MakeEntry(file, parent, flagsIn, clientPtr));
-    });
+    return WithBarrier(static_cast<OrvixFileEntry*>(nullptr),
+                       [&] { return StateOf(m_state).Append(MakeEntry(file, parent, flagsIn, clientPtr)); });
 }
 
 bool OrvixFileList::RemoveEntry(unsigned int index)
 {
-    if (m_state == nullptr || index >= m_state->entries.size())
+    if (index >= NumEntries())
     {
         return false;
     }
-    OrvixFileEntry* entry = m_state->entries[index];
+    OrvixFileEntry* entry = GetFileEntry(index);
+    if (m_state == nullptr || !m_state->Holds(entry, index))
+    {
+        return false;
+    }
+    State& state = *m_state;
+    const Watch watch(state.watches, entry);
+    const auto root = std::find(state.roots.begin(), state.roots.end(), entry);
+    if (root != state.roots.end())
+    {
+        state.roots.erase(root);
+    }
     const bool detached = Completes([&] {
-        auto& roots = m_state->roots;
-        const auto root = std::find(roots.begin(), roots.end(), entry);
-        if (root != roots.end())
+        TreeWalk walk(state.innermostWalk, state.NextWalk());
+        for (unsigned int i = 0; i < NumRootEntries() && watch.IsThere(); ++i)
         {
-            roots.erase(root);
-        }
-        std::vector<TreeStep> path;
-        for (OrvixFileEntry* remaining : roots)
-        {
-            DetachFromTree(remaining, entry, path);
+            if (OrvixFileEntry* remaining = GetRootEntry(i))
+            {
+                walk.Detach(remaining, entry);
+            }
         }
     });
     if (!detached)
     {
         return false;
     }
-    RemoveActiveEntry(entry);
-    delete entry;
-    m_state->entries.erase(m_state->entries.begin() + index);
+    if (watch.IsThere())
+    {
+        RemoveActiveEntry(entry);
+    }
+    if (watch.IsThere())
+    {
+        state.Forget(entry);
+        state.entries.erase(state.Find(entry, index));
+        delete entry;
+    }
     return true;
 }
 
@@ -180,11 +220,10 @@ bool OrvixFileList::RemoveEntry(OrvixFileEntry* entry)
 {
     if (m_state != nullptr)
     {
-        const auto& entries = m_state->entries;
-        const auto found = std::find(entries.begin(), entries.end(), entry);
-        if (found != entries.end())
+        const auto found = m_state->Find(entry, 0);
+        if (found != m_state->entries.end())
         {
-            return RemoveEntry(static_cast<unsigned int>(found - entries.begin()));
+            return RemoveEntry(static_cast<unsigned int>(found - m_state->entries.begin()));
         }
     }
     return RemoveEntry(NumEntries());
@@ -199,13 +238,14 @@ bool OrvixFileList::RemoveAll()
 {
     if (m_state != nullptr)
     {
+        m_state->Forget(nullptr);
+        m_state->roots.clear();
+        m_state->active.Clear();
         for (OrvixFileEntry* entry : m_state->entries)
         {
             delete entry;
         }
         m_state->entries.clear();
-        m_state->roots.clear();
-        m_state->active.Clear();
     }
     return true;
 }
@@ -218,17 +258,25 @@ OrvixFileEntry* OrvixFileList::GetFileEntry(unsigned int index)
 unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
 {
     const bool built = Completes([&] {
-        ActiveSequence& active = StateOf(m_state).active;
+        State& state = StateOf(m_state);
+        ActiveSequence& active = state.active;
         active.Clear();
         active.Reserve(std::max(NumEntries(), 1U));
+        const unsigned int fill = active.Fill();
+        // An entry's own code may have filled the sequence anew meanwhile.
+        const auto append = [&](OrvixFileEntry* entry, bool isNew) {
+            isNew&& active.Fill() == fill ? active.AppendDistinct(entry) : active.Append(entry);
+        };
+        const auto isSelected = [mask](OrvixFileEntry* entry) { return (entry->GetFlagsIn() & mask) != 0; };
         if (fromRoots)
         {
-            std::vector<TreeStep> path;
+            TreeWalk walk(state.innermostWalk, state.NextWalk());
             for (unsigned int i = 0; i < NumRootEntries(); ++i)
             {
                 if (OrvixFileEntry* root = GetRootEntry(i))
                 {
-                    AppendTree(root, mask, path, active);
+                    walk.PostOrder(root, isSelected,
+                                   [&](OrvixFileEntry* entry) { append(entry, !walk.HasRepetition()); });
                 }
             }
             return;
@@ -236,9 +284,10 @@ unsigned int OrvixFileList::BuildActiveList(unsigned long mask, bool fromRoots)
         for (unsigned int i = 0; i < NumEntries(); ++i)
         {
             OrvixFileEntry* entry = GetFileEntry(i);
-            if (entry != nullptr && (entry->GetFlagsIn() & mask) != 0)
+            if (entry != nullptr && isSelected(entry))
             {
-                active.AppendDistinct(entry);
+                // The list's own entries do not repeat; those that a derived list gives may.
+                append(entry, i < state.entries.size() && state.entries[i] == entry);
             }
         }
     });

@@ -22,7 +22,7 @@ SIZES = {
     "CStr": 8,
     "OrvixClientInfo": 32,
     "OrvixExploreProviderParams": 24,
-    "OrvixFileEntry": 72,
+    "OrvixFileEntry": 80,
     "OrvixFileList": 16,
     "OrvixFileListDialogParams": 40,
     "OrvixNotifyParams": 32,

@@ -613,3 +613,42 @@ TEST(RemoveActiveEntry, KeepsTheOrderWhateverTheOrderOfRemovalInAListOfDistinctE
         }
     }
 }
+
+TEST(RemoveActiveEntry, RemovesFirstOccurrencesInALongListOfRepetitions)
+{
+    constexpr std::size_t Count = 200;
+    OrvixFileList list;
+    Entries model;
+    for (std::size_t i = 0; i < 2 * Count; ++i)
+    {
+        OrvixFileEntry* entry = i < Count ? Create(list, nullptr, 1) : model[i - Count];
+        list.AddActiveEntry(entry);
+        model.push_back(entry);
+    }
+    const auto remove = [&](OrvixFileEntry* entry) {
+        const auto found = std::find(model.begin(), model.end(), entry);
+        EXPECT_EQ(list.RemoveActiveEntry(entry), found != model.end());
+        if (found != model.end())
+        {
+            model.erase(found);
+        }
+    };
+    // From the back, so that much is searched and an index is made.
+    for (unsigned int i = Count; i-- > Count / 2;)
+    {
+        remove(list.GetFileEntry(i));
+    }
+    list.AddActiveEntry(list.GetFileEntry(0));
+    model.push_back(list.GetFileEntry(0));
+    EXPECT_EQ(Active(list), model);
+    for (unsigned int i = 1; i <= Count; i += 1 + i % 3)
+    {
+        remove(list.GetFileEntry(Count - i));
+        // A step, a long jump and a step back over the holes.
+        for (const std::size_t at : {std::size_t{1}, model.size() / 2, model.size() / 2 + 40, std::size_t{0}})
+        {
+            EXPECT_EQ(list.GetActiveFileEntry(static_cast<unsigned int>(at)), at < model.size() ? model[at] : nullptr);
+        }
+    }
+    EXPECT_EQ(Active(list), model);
+}
