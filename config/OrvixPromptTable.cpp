@@ -1,5 +1,7 @@
 #include "OrvixPromptTable.h"
 
+#include "FlatMap.h"
+#include "PromptRows.h"
 #include "RecordState.h"
 
 #include <deque>
@@ -11,11 +13,56 @@
 /// text's address holds until the text is set or removed.
 struct OrvixPromptTable::State
 {
+    /// The first and the last row of an ID.
+    struct Rows
+    {
+        int first = PromptRows::None;
+        int last = PromptRows::None;
+    };
+
+    /// Without memory for an index the search is linear.
+    Rows Find(int id)
+    {
+        if (!indexed)
+        {
+            index.Clear();
+            indexed = Completes([this] { AddToIndex(0); });
+        }
+        if (indexed)
+        {
+            const Rows* rows = index.Find(id);
+            return rows != nullptr ? *rows : Rows{};
+        }
+        Rows rows;
+        for (int row = 0; row < static_cast<int>(ids.size()); ++row)
+        {
+            if (ids[static_cast<std::size_t>(row)] == id)
+            {
+                rows = {rows.first == PromptRows::None ? row : rows.first, row};
+            }
+        }
+        return rows;
+    }
+
+    /// Adds the rows from `first` on. Throws std::bad_alloc.
+    void AddToIndex(std::size_t first)
+    {
+        index.Reserve(ids.size());
+        for (std::size_t i = first; i < ids.size(); ++i)
+        {
+            const int row = static_cast<int>(i);
+            index.Add(ids[i], {row, row}).first.last = row;
+        }
+    }
+
     std::vector<int> ids;
     std::deque<std::wstring> texts;
     std::vector<unsigned long> options;
     std::vector<unsigned long> prompts;
     std::vector<bool> locked;
+
+    FlatMap<int, Rows> index;
+    bool indexed = true; ///< the index holds all rows
 };
 
 namespace
@@ -45,6 +92,10 @@ int OrvixPromptTable::AddPrompt(int id, const wchar_t* text, unsigned long optio
     const std::size_t count = m_state != nullptr ? m_state->ids.size() : 0;
     const bool added = Completes([&] {
         State& state = StateOf(m_state);
+        if (state.indexed)
+        {
+            state.index.Reserve(count + 1);
+        }
         state.ids.push_back(id);
         state.texts.emplace_back(text);
         state.options.push_back(options);
@@ -62,6 +113,10 @@ int OrvixPromptTable::AddPrompt(int id, const wchar_t* text, unsigned long optio
             m_state->prompts.resize(count);
         }
         return -1;
+    }
+    if (m_state->indexed)
+    {
+        m_state->AddToIndex(count);
     }
     return NumPrompts();
 }
@@ -88,6 +143,7 @@ bool OrvixPromptTable::SetPromptID(unsigned int index, int id)
         return false;
     }
     m_state->ids[index] = id;
+    m_state->indexed = false;
     return true;
 }
 
@@ -144,4 +200,14 @@ bool OrvixPromptTable::SetLocked(unsigned int index, bool locked)
     }
     m_state->locked[index] = locked;
     return true;
+}
+
+int PromptRows::First(const OrvixPromptTable& table, int id)
+{
+    return table.m_state != nullptr ? table.m_state->Find(id).first : None;
+}
+
+int PromptRows::Last(const OrvixPromptTable& table, int id)
+{
+    return table.m_state != nullptr ? table.m_state->Find(id).last : None;
 }

@@ -54,6 +54,8 @@ public:
     virtual bool SetLocked(unsigned int index, bool locked);
 
 private:
+    friend struct PromptRows; // the library's search by ID
+
     // What the library alone knows; null until something is stored.
     struct State;
     State* m_state = nullptr;
