@@ -6,6 +6,7 @@
 #include <oleauto.h>
 
 #include <exception>
+#include <string_view>
 
 /// A VARIANT that clears itself. Throws `_com_error` when memory is exhausted and when it cannot be cleared
 /// (unless an exception is under way already).
@@ -35,6 +36,30 @@ public:
         {
             object->AddRef();
         }
+    }
+    explicit ComVariant(IUnknown* object) : ComVariant()
+    {
+        V_VT(&m_value) = VT_UNKNOWN;
+        V_UNKNOWN(&m_value) = object;
+        if (object != nullptr)
+        {
+            object->AddRef();
+        }
+    }
+
+    /// An array with a copy of the bytes.
+    explicit ComVariant(std::string_view bytes) : ComVariant()
+    {
+        SAFEARRAY* array = SafeArrayCreateVector(VT_UI1, 0, static_cast<ULONG>(bytes.size()));
+        void* data = nullptr;
+        if (array == nullptr || FAILED(SafeArrayAccessData(array, &data)))
+        {
+            throw _com_error(E_OUTOFMEMORY);
+        }
+        bytes.copy(static_cast<char*>(data), bytes.size());
+        SafeArrayUnaccessData(array);
+        V_VT(&m_value) = VT_ARRAY | VT_UI1;
+        V_ARRAY(&m_value) = array;
     }
     ComVariant(const ComVariant&) = delete;
     ComVariant& operator=(const ComVariant&) = delete;

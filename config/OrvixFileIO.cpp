@@ -2,10 +2,10 @@
 
 #include "ComString.h"
 #include "ComVariant.h"
-
-#include <io.h>
+#include "XmlProlog.h"
 
 #include <memory>
+#include <utility>
 
 using Microsoft::WRL::ComPtr;
 
@@ -18,8 +18,7 @@ constexpr IID InterfaceDocument = {0x2933BF81, 0x7B36, 0x11D2, {0xB2, 0x0E, 0x00
 constexpr IID InterfaceNode = {0x2933BF80, 0x7B36, 0x11D2, {0xB2, 0x0E, 0x00, 0xC0, 0x4F, 0x98, 0x3E, 0x60}};
 constexpr IID InterfaceElement = {0x2933BF86, 0x7B36, 0x11D2, {0xB2, 0x0E, 0x00, 0xC0, 0x4F, 0x98, 0x3E, 0x60}};
 
-constexpr int ReadPermission = 4; // mode of _waccess
-constexpr long ElementType = 1;   // NODE_ELEMENT of createNode
+constexpr long ElementType = 1; // NODE_ELEMENT of createNode
 
 ComPtr<IXMLDOMElement> AsElement(IXMLDOMNode* node)
 {
@@ -102,8 +101,12 @@ OrvixFileIO::~OrvixFileIO()
 /// Initialises COM and makes an empty document.
 bool OrvixFileIO::MakeDocument()
 {
-    return SUCCEEDED(CoInitialize(nullptr)) &&
-           SUCCEEDED(CoCreateInstance(ClassDOMDocument, nullptr, CLSCTX_INPROC_SERVER, InterfaceDocument,
+    if (FAILED(CoInitialize(nullptr)))
+    {
+        return false;
+    }
+    m_usesCom = true;
+    return SUCCEEDED(CoCreateInstance(ClassDOMDocument, nullptr, CLSCTX_INPROC_SERVER, InterfaceDocument,
                                       reinterpret_cast<void**>(m_document.ReleaseAndGetAddressOf())));
 }
 
@@ -126,25 +129,32 @@ bool OrvixFileIO::CreateDocument()
 
 bool OrvixFileIO::OpenDocument(const wchar_t* path)
 {
+    m_content = Content::Missing;
+    std::string bytes;
+    switch (path != nullptr ? FileBytes::Read(path, MaxFileSize, bytes) : FileBytes::Found::Missing)
+    {
+    case FileBytes::Found::Missing:
+        return true;
+    case FileBytes::Found::Unreadable:
+        m_content = Content::Unreadable;
+        return true;
+    case FileBytes::Found::TooLarge:
+        m_content = Content::TooLarge;
+        return true;
+    case FileBytes::Found::Bytes:
+        break;
+    }
+    if (XmlProlog::MayDeclareEntities(bytes))
+    {
+        m_content = Content::UsesEntities;
+        return true;
+    }
+    m_content = Content::Unreadable;
     if (!MakeDocument())
     {
         return false;
     }
-    m_document->put_async(VARIANT_FALSE);
-    m_document->put_validateOnParse(VARIANT_FALSE);
-    m_document->put_resolveExternals(VARIANT_FALSE);
-    m_content = Content::Missing;
-    if (path != nullptr && _waccess(path, ReadPermission) == 0)
-    {
-        VARIANT_BOOL loaded = VARIANT_FALSE;
-        m_document->load(ComVariant(path).Get(), &loaded);
-        m_content = loaded ? Content::Document : Content::Malformed;
-        if (UsesEntities(m_document.Get()))
-        {
-            m_document->loadXML(ComString(L"").Get(), &loaded);
-            m_content = Content::UsesEntities;
-        }
-    }
+    Parse(bytes);
     if (FAILED(m_document->QueryInterface(InterfaceNode,
                                           reinterpret_cast<void**>(m_documentNode.ReleaseAndGetAddressOf()))))
     {
@@ -154,9 +164,43 @@ bool OrvixFileIO::OpenDocument(const wchar_t* path)
     return true;
 }
 
-bool OrvixFileIO::SaveDocument(const wchar_t* path)
+void OrvixFileIO::Parse(std::string_view bytes)
 {
-    return m_document != nullptr && SUCCEEDED(m_document->save(ComVariant(path).Get()));
+    m_document->put_async(VARIANT_FALSE);
+    m_document->put_validateOnParse(VARIANT_FALSE);
+    m_document->put_resolveExternals(VARIANT_FALSE);
+    VARIANT_BOOL loaded = VARIANT_FALSE;
+    if (!bytes.empty())
+    {
+        m_document->load(ComVariant(bytes).Get(), &loaded);
+    }
+    m_content = loaded ? Content::Document : Content::Malformed;
+    if (UsesEntities(m_document.Get()))
+    {
+        m_document->loadXML(ComString(L"").Get(), &loaded);
+        m_content = Content::UsesEntities;
+    }
+}
+
+bool OrvixFileIO::SaveDocument(const wchar_t* path, FileBytes::Previous previous)
+{
+    ComPtr<IStream> stream;
+    HGLOBAL memory = nullptr;
+    STATSTG status = {};
+    if (m_document == nullptr || path == nullptr || FAILED(CreateStreamOnHGlobal(nullptr, TRUE, &stream)) ||
+        FAILED(m_document->save(ComVariant(stream.Get()).Get())) || FAILED(stream->Stat(&status, STATFLAG_NONAME)) ||
+        FAILED(GetHGlobalFromStream(stream.Get(), &memory)))
+    {
+        return false;
+    }
+    const char* data = static_cast<const char*>(GlobalLock(memory));
+    if (data == nullptr)
+    {
+        return false;
+    }
+    const std::string bytes(data, static_cast<std::size_t>(status.cbSize.QuadPart));
+    GlobalUnlock(memory);
+    return FileBytes::Replace(path, bytes, previous);
 }
 
 bool OrvixFileIO::CloseDocument()
@@ -165,7 +209,10 @@ bool OrvixFileIO::CloseDocument()
     m_rootNode.Reset();
     m_documentNode.Reset();
     m_document.Reset();
-    CoUninitialize();
+    if (std::exchange(m_usesCom, false))
+    {
+        CoUninitialize();
+    }
     return true;
 }
 
@@ -301,16 +348,49 @@ bool OrvixFileIO::AddTextElement(IXMLDOMNode* parent, const wchar_t* name, const
     return AppendText(element.Get(), text);
 }
 
-bool OrvixFileIO::AppendText(IXMLDOMNode* element, const wchar_t* text)
+bool OrvixFileIO::AppendText(IXMLDOMNode* node, const wchar_t* text)
 {
-    if (AsElement(element) == nullptr)
+    const ComPtr<IXMLDOMElement> element = AsElement(node);
+    if (element == nullptr)
     {
         return false;
     }
-    ComPtr<IXMLDOMText> textNode;
-    m_document->createTextNode(ComString(XmlText(text).c_str()).Get(), &textNode);
-    element->appendChild(textNode.Get(), nullptr);
+    const std::wstring allowed = XmlText(text);
+    const auto isSpace = [](wchar_t c) { return c == L' ' || c == L'\t' || c == L'\n' || c == L'\r'; };
+    if (!allowed.empty() &&
+        (isSpace(allowed.front()) || isSpace(allowed.back()) || allowed.find(L'\r') != std::wstring::npos))
+    {
+        SetAttribute(node, L"xml:space", L"preserve");
+    }
+    std::size_t start = 0;
+    for (std::size_t end = 0; (end = allowed.find(L'\r', start)) != std::wstring::npos; start = end + 1)
+    {
+        if (end > start)
+        {
+            AppendTextNode(*element.Get(), allowed.substr(start, end - start));
+        }
+        ComPtr<IXMLDOMEntityReference> reference;
+        if (SUCCEEDED(m_document->createEntityReference(ComString(L"#13").Get(), &reference)) && reference != nullptr)
+        {
+            element->appendChild(reference.Get(), nullptr);
+        }
+        else
+        {
+            AppendTextNode(*element.Get(), L"\r"); // which a reader takes for a line feed
+        }
+    }
+    if (start == 0 || start < allowed.size())
+    {
+        AppendTextNode(*element.Get(), allowed.substr(start));
+    }
     return true;
+}
+
+void OrvixFileIO::AppendTextNode(IXMLDOMElement& element, const std::wstring& text)
+{
+    ComPtr<IXMLDOMText> node;
+    m_document->createTextNode(ComString(text.c_str()).Get(), &node);
+    element.appendChild(node.Get(), nullptr);
 }
 
 bool OrvixFileIO::SetAttribute(IXMLDOMNode* node, const wchar_t* name, const wchar_t* value)

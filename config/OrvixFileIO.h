@@ -1,5 +1,7 @@
 #pragma once
 
+#include "FileBytes.h"
+
 #include <windows.h>
 
 #include <msxml.h>
@@ -12,9 +14,11 @@
 /// Reads or writes one XML file through the MSXML document object model.
 ///
 /// Used on one thread, for one file: `OpenDocument` or `CreateDocument`, then the node operations, then
-/// `CloseDocument` (see `OpenedDocument`). Both starting operations initialise COM on the thread;
-/// `CloseDocument` is the only place that uninitialises it, so it is called after a success only, and no node
+/// `CloseDocument` (see `OpenedDocument`). COM is initialised on the thread where there is something to parse or to
+/// write; `CloseDocument` is the only place that uninitialises it, so it is called after a success only, and no node
 /// may be held across it. A failed start leaves COM as it is.
+///
+/// MSXML never sees the file's path, which it would take for a URL in reading: bytes go to and from it.
 ///
 /// A node argument may not be null, except a parent: null means the document node. Operations report failure by
 /// false. When memory for a string runs out, `_com_error` is thrown.
@@ -33,29 +37,38 @@ public:
     /// Starts a new document that holds an XML declaration (version 1.0, standalone) and nothing else.
     bool CreateDocument();
 
+    /// In bytes. Larger files are not read: MSXML needs a minute for one text of 50 MB, and real files are a thousand
+    /// times smaller.
+    static constexpr std::size_t MaxFileSize = 16 * 1024 * 1024;
+
     /// What `OpenDocument` found.
     enum class Content
     {
-        Missing, ///< or not to be read
+        Missing,
+        Unreadable, ///< kept from us by the system or another program; also when MSXML cannot be started
+        TooLarge,   ///< more than `MaxFileSize`
         Malformed,
-        UsesEntities,
+        UsesEntities, ///< or declares some, or has an encoding in which this cannot be told
         Document
     };
 
-    /// Loads a file. A file that is missing, unreadable or not well-formed, and one that uses entities of its
-    /// own, gives an empty document and true: the reader notices it by not finding its root element.
+    /// Loads a file. A file that is missing, unreadable, too large or not well-formed, and one that declares or uses
+    /// entities of its own, gives an empty document and true: the reader notices it by not finding its root element.
+    /// The declarations are found before MSXML sees them, since a few hundred bytes of them can keep it busy for
+    /// hours. False when COM or MSXML cannot be started.
     bool OpenDocument(const wchar_t* path);
 
     /// What the last `OpenDocument` found.
     Content GetContent() const { return m_content; }
 
-    /// Saves to `path`; false without a document and when MSXML reports a failure.
-    bool SaveDocument(const wchar_t* path);
+    /// Saves to `path` in one step, see `FileBytes::Replace`; false without a document and when MSXML or the system
+    /// reports a failure.
+    bool SaveDocument(const wchar_t* path, FileBytes::Previous previous = FileBytes::Previous::Replaced);
 
-    /// Releases the document and uninitialises COM once; always true.
+    /// Releases the document and uninitialises COM once if it was initialised; always true.
     bool CloseDocument();
 
-    /// The document node of an opened document; null otherwise. Owned by this object.
+    /// The document node of a document that was read; null otherwise. Owned by this object.
     Node* GetDocumentRoot();
 
     /// The root element, whatever is around it, and its name; false when there is none.
@@ -93,15 +106,19 @@ public:
     /// Adds an element whose only child is a text node.
     bool AddTextElement(IXMLDOMNode* parent, const wchar_t* name, const wchar_t* text);
 
-    /// Appends a text node to an element; false when the node is no element. Characters that XML cannot carry
-    /// become U+FFFD, since one of them would make the whole saved file unreadable.
-    bool AppendText(IXMLDOMNode* element, const wchar_t* text);
+    /// Appends a text to an element; false when the node is no element. Characters that XML cannot carry become
+    /// U+FFFD, since one of them would make the whole saved file unreadable. For a text that begins or ends with white
+    /// space, or contains a carriage return, the element gets `xml:space="preserve"`, and the carriage return is
+    /// written as a character reference: a parser would drop the one and change the other.
+    bool AppendText(IXMLDOMNode* node, const wchar_t* text);
 
     /// Sets an attribute; false when the node is no element.
     bool SetAttribute(IXMLDOMNode* node, const wchar_t* name, const wchar_t* value);
 
 private:
     bool MakeDocument();
+    void Parse(std::string_view bytes);
+    void AppendTextNode(IXMLDOMElement& element, const std::wstring& text);
     IXMLDOMNode* ParentOrDocument(IXMLDOMNode* parent) const
     {
         return parent != nullptr ? parent : m_documentNode.Get();
@@ -111,6 +128,7 @@ private:
     Node m_documentNode;
     Node m_rootNode;
     Content m_content = Content::Missing;
+    bool m_usesCom = false;
 };
 
 /// Closes a document at the end of a scope, also when an exception leaves it. Declared before any node.

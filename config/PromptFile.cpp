@@ -82,10 +82,13 @@ void Explain(OrvixFileIO& file, IXMLDOMNode* prompt, DiagnosticReporter& reporte
     }
 }
 
-bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, FileDiagnostics* diagnostics)
+bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, FileDiagnostics* diagnostics,
+                 OrvixFileIO::Content& content)
 {
     OrvixFileIO file;
-    if (!file.OpenDocument(path))
+    const bool isOpen = file.OpenDocument(path);
+    content = file.GetContent();
+    if (!isOpen)
     {
         return false;
     }
@@ -136,11 +139,13 @@ std::wstring Decimal(unsigned long value)
 
 } // namespace
 
-bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path, FileDiagnostics* diagnostics)
+bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path, FileDiagnostics* diagnostics,
+                    OrvixFileIO::Content* content)
 {
+    OrvixFileIO::Content ignored = OrvixFileIO::Content::Missing;
     try
     {
-        return ReadPrompts(table, path, diagnostics);
+        return ReadPrompts(table, path, diagnostics, content != nullptr ? *content : ignored);
     }
     catch (...)
     {
@@ -150,7 +155,7 @@ bool ReadPromptFile(OrvixPromptTable& table, const wchar_t* path, FileDiagnostic
     }
 }
 
-bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
+bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path, FileBytes::Previous previous)
 {
     if (table.NumPrompts() == 0)
     {
@@ -188,5 +193,5 @@ bool WritePromptFile(OrvixPromptTable& table, const wchar_t* path)
             }
         }
     }
-    return file.SaveDocument(path);
+    return file.SaveDocument(path, previous);
 }

@@ -1,41 +1,60 @@
 #include "StoredAnswers.h"
 
-namespace
-{
+#include "PromptFile.h"
+#include "PromptRows.h"
 
-constexpr int NoRow = -1;
+#include <utility>
 
-bool HasID(OrvixPromptTable& table, int row, std::uint32_t promptID)
+bool StoredAnswers::Load(const wchar_t* path)
 {
-    return static_cast<std::uint32_t>(table.GetPromptID(static_cast<unsigned int>(row))) == promptID;
+    m_table.RemoveAll();
+    m_knownFile.clear(); // also when an exception leaves
+    std::wstring file = path;
+    OrvixFileIO::Content content = OrvixFileIO::Content::Missing;
+    const bool loaded = ReadPromptFile(m_table, path, nullptr, &content);
+    if (loaded || content == OrvixFileIO::Content::Missing)
+    {
+        m_knownFile = std::move(file);
+    }
+    return loaded;
 }
 
-} // namespace
+bool StoredAnswers::Save(const wchar_t* path)
+{
+    std::wstring file = path;
+    const auto previous = file == m_knownFile ? FileBytes::Previous::Replaced : FileBytes::Previous::Kept;
+    const bool saved = WritePromptFile(m_table, path, previous);
+    if (saved && m_table.NumPrompts() > 0)
+    {
+        m_knownFile = std::move(file);
+    }
+    return saved;
+}
 
 std::uint32_t StoredAnswers::GetAction(std::uint32_t promptID)
 {
-    const int row = FirstRow(promptID);
-    return row == NoRow ? 0 : m_table.GetPrompt(static_cast<unsigned int>(row));
+    const int row = PromptRows::First(m_table, static_cast<int>(promptID));
+    return row == PromptRows::None ? 0 : m_table.GetPrompt(static_cast<unsigned int>(row));
 }
 
 bool StoredAnswers::IsLocked(std::uint32_t promptID)
 {
-    const int row = FirstRow(promptID);
-    return row != NoRow && m_table.GetLocked(static_cast<unsigned int>(row));
+    const int row = PromptRows::First(m_table, static_cast<int>(promptID));
+    return row != PromptRows::None && m_table.GetLocked(static_cast<unsigned int>(row));
 }
 
 bool StoredAnswers::SetAction(std::uint32_t promptID, std::uint32_t action)
 {
-    const int row = LastRow(promptID);
-    return row != NoRow && !m_table.GetLocked(static_cast<unsigned int>(row)) &&
+    const int row = PromptRows::Last(m_table, static_cast<int>(promptID));
+    return row != PromptRows::None && !m_table.GetLocked(static_cast<unsigned int>(row)) &&
            m_table.SetPrompt(static_cast<unsigned int>(row), action);
 }
 
 void StoredAnswers::Register(std::uint32_t promptID, const wchar_t* text, std::uint32_t action,
                              std::uint32_t actionOpts, bool overwriteSettings)
 {
-    const int row = LastRow(promptID);
-    if (row == NoRow)
+    const int row = PromptRows::Last(m_table, static_cast<int>(promptID));
+    if (row == PromptRows::None)
     {
         m_table.AddPrompt(static_cast<int>(promptID), text, actionOpts, action, false);
         return;
@@ -47,28 +66,4 @@ void StoredAnswers::Register(std::uint32_t promptID, const wchar_t* text, std::u
         m_table.SetPromptOptions(index, actionOpts);
         m_table.SetPrompt(index, action);
     }
-}
-
-int StoredAnswers::FirstRow(std::uint32_t promptID)
-{
-    for (int row = 0; row < m_table.NumPrompts(); ++row)
-    {
-        if (HasID(m_table, row, promptID))
-        {
-            return row;
-        }
-    }
-    return NoRow;
-}
-
-int StoredAnswers::LastRow(std::uint32_t promptID)
-{
-    for (int row = m_table.NumPrompts() - 1; row >= 0; --row)
-    {
-        if (HasID(m_table, row, promptID))
-        {
-            return row;
-        }
-    }
-    return NoRow;
 }

@@ -3,6 +3,7 @@
 #include "OrvixPromptTable.h"
 
 #include <cstdint>
+#include <string>
 
 /// The stored answers of a session, by prompt ID, in the table that the host's dialogs edit.
 ///
@@ -12,6 +13,12 @@ class StoredAnswers
 {
 public:
     OrvixPromptTable& Table() { return m_table; }
+
+    /// Fills the table from a file; false, with an empty table, when the file is missing or cannot be read.
+    bool Load(const wchar_t* path);
+
+    /// Writes the table to the file. One that was not read before is kept beside it, once.
+    bool Save(const wchar_t* path);
 
     /// The action of the first row (bits of `OrvixPromptAction`); 0 when there is none.
     std::uint32_t GetAction(std::uint32_t promptID);
@@ -27,8 +34,6 @@ public:
                   bool overwriteSettings);
 
 private:
-    int FirstRow(std::uint32_t promptID);
-    int LastRow(std::uint32_t promptID);
-
     OrvixPromptTable m_table;
+    std::wstring m_knownFile; ///< the file that was read, found missing or written last
 };

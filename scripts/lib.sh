@@ -33,6 +33,19 @@ use_virtual_display() {
     fi
 }
 
+# A drive of 128 KB for the tests that fill one, until the script ends. Where the user may not mount one, they are
+# skipped.
+use_small_drive() {
+    local folder=$WINEPREFIX.small-drive
+    mkdir -p "$folder"
+    if mount -t tmpfs -o size=128k tmpfs "$folder" 2>/dev/null; then
+        at_exit umount "$folder"
+        export ORVIX_SMALL_DRIVE=Z:${folder//\//\\}
+    else
+        echo "no small drive (mount is not allowed): the tests that fill one are skipped"
+    fi
+}
+
 # One wineserver serves the rest of the calling script: it starts here, with no pipe of the script open, and
 # is stopped when the script ends. One that was running already stays; ORVIX_KEEP_WINESERVER=1 keeps this one too.
 use_one_wineserver() {

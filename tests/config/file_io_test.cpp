@@ -2,6 +2,7 @@
 #include "Files.h"
 #include "OrvixFileIO.h"
 #include "TempFolder.h"
+#include "UniqueHandle.h"
 
 #include <gtest/gtest.h>
 #include <objbase.h>
@@ -93,23 +94,85 @@ bool HasApartment()
 
 } // namespace
 
-TEST_F(OrvixFileIOOpenDocument, GivesAnEmptyDocumentForAMissingFile)
+TEST_F(OrvixFileIOOpenDocument, HasNothingForAMissingFileAndStartsNoCom)
 {
-    ASSERT_TRUE(m_file.OpenDocument(m_path.c_str()));
-    m_open = true;
-    ASSERT_NE(m_file.GetDocumentRoot(), nullptr);
-    EXPECT_EQ(m_file.NumChildNodes(m_file.GetDocumentRoot()->Get()), 0);
-    EXPECT_FALSE(m_file.GetChildNode(nullptr, 0, m_node));
-    EXPECT_FALSE(m_file.GetChildNode(nullptr, 1, m_node));
+    std::thread([&] {
+        EXPECT_TRUE(m_file.OpenDocument(m_path.c_str()));
+        EXPECT_FALSE(HasApartment());
+        EXPECT_EQ(m_file.GetContent(), OrvixFileIO::Content::Missing);
+        EXPECT_EQ(m_file.GetDocumentRoot(), nullptr);
+        EXPECT_FALSE(m_file.GetChildNode(nullptr, 0, m_node));
+        EXPECT_FALSE(m_file.GetChildNode(nullptr, 1, m_node));
+        std::wstring name;
+        EXPECT_FALSE(m_file.GetRootElement(m_node, name));
+        EXPECT_TRUE(m_file.CloseDocument());
+    }).join();
 }
 
-TEST_F(OrvixFileIOOpenDocument, GivesAnEmptyDocumentForAFolderAndForANullPath)
+TEST_F(OrvixFileIOOpenDocument, HasNothingForAFolderAndForANullPath)
 {
     for (const wchar_t* path : {m_folder.Path().c_str(), static_cast<const wchar_t*>(nullptr), L""})
     {
         OrvixFileIO file;
-        ASSERT_TRUE(file.OpenDocument(path));
-        EXPECT_EQ(file.NumChildNodes(file.GetDocumentRoot()->Get()), 0);
+        EXPECT_TRUE(file.OpenDocument(path));
+        EXPECT_FALSE(file.GetChildNode(nullptr, 0, m_node));
+        file.CloseDocument();
+    }
+}
+
+TEST_F(OrvixFileIOOpenDocument, TakesNoPartOfAPathForAnEscapeOfAUrl)
+{
+    for (const wchar_t* name : {L"a%20b", L"a b"})
+    {
+        std::filesystem::create_directories(m_folder.Path() / name);
+    }
+    WriteBytes(m_folder.Path() / L"a b" / L"f.xml", "<wrong/>");
+    const std::wstring path = (m_folder.Path() / L"a%20b" / L"f.xml").wstring();
+    WriteBytes(path, "<right/>");
+    for (const std::wstring& spelling : {path, L"\\\\?\\" + path})
+    {
+        OrvixFileIO file;
+        ASSERT_TRUE(file.OpenDocument(spelling.c_str()));
+        const OpenedDocument opened(file);
+        Node root;
+        std::wstring name;
+        EXPECT_TRUE(file.GetRootElement(root, name));
+        EXPECT_EQ(name, L"right");
+    }
+}
+
+TEST_F(OrvixFileIOOpenDocument, ReadsAFileThatAnotherProgramWrites)
+{
+    WriteBytes(m_path, "<a/>");
+    const UniqueFile writer(CreateFileW(m_path.c_str(), GENERIC_READ | GENERIC_WRITE | DELETE,
+                                        FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr, OPEN_EXISTING,
+                                        0, nullptr));
+    ASSERT_TRUE(writer);
+    ASSERT_TRUE(m_file.OpenDocument(m_path.c_str()));
+    m_open = true;
+    EXPECT_EQ(m_file.GetContent(), OrvixFileIO::Content::Document);
+}
+
+TEST_F(OrvixFileIOOpenDocument, HasNothingForAFileThatAnotherProgramKeepsToItself)
+{
+    WriteBytes(m_path, "<a/>");
+    const UniqueFile owner(CreateFileW(m_path.c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr));
+    ASSERT_TRUE(m_file.OpenDocument(m_path.c_str()));
+    m_open = true;
+    EXPECT_EQ(m_file.GetContent(), OrvixFileIO::Content::Unreadable);
+    EXPECT_FALSE(m_file.GetChildNode(nullptr, 0, m_node));
+}
+
+TEST_F(OrvixFileIOOpenDocument, ReadsUpToTheLargestSizeAndNothingLarger)
+{
+    const std::string start = "<a>";
+    const std::string end = "</a>";
+    for (const std::size_t more : {std::size_t{0}, std::size_t{1}})
+    {
+        WriteBytes(m_path, start + std::string(OrvixFileIO::MaxFileSize - start.size() - end.size() + more, 'x') + end);
+        OrvixFileIO file;
+        ASSERT_TRUE(file.OpenDocument(m_path.c_str()));
+        EXPECT_EQ(file.GetContent(), more == 0 ? OrvixFileIO::Content::Document : OrvixFileIO::Content::TooLarge);
         file.CloseDocument();
     }
 }
@@ -136,22 +199,23 @@ TEST_F(OrvixFileIOOpenDocument, TakesANameRelativeToTheCurrentFolder)
     EXPECT_EQ(m_file.NumChildNodes(m_file.GetDocumentRoot()->Get()), 1);
 }
 
-TEST_F(OrvixFileIOOpenDocument, GivesAnEmptyDocumentForAFileThatUsesEntitiesOfItsOwn)
+TEST_F(OrvixFileIOOpenDocument, HasNothingForAFileThatDeclaresEntities)
 {
-    for (const char* content : {"<a>&e;</a>", "<a><b>text</b><!-- --><b>text<c/>&e;</b></a>"})
+    for (const char* content : {"<a>&e;</a>", "<a/>"})
     {
         OrvixFileIO file;
         WriteBytes(m_path, std::string(R"(<?xml version="1.0"?><!DOCTYPE a [<!ENTITY e "text">]>)") + content);
         ASSERT_TRUE(file.OpenDocument(m_path.c_str()));
-        EXPECT_EQ(file.NumChildNodes(file.GetDocumentRoot()->Get()), 0) << content;
+        EXPECT_EQ(file.GetContent(), OrvixFileIO::Content::UsesEntities) << content;
+        EXPECT_FALSE(file.GetChildNode(nullptr, 0, m_node));
         file.CloseDocument();
     }
 }
 
-TEST_F(OrvixFileIOOpenDocument, ReadsAFileWithADocumentTypeThatNothingRefersTo)
+TEST_F(OrvixFileIOOpenDocument, ReadsAFileWithADocumentTypeThatDeclaresNoEntities)
 {
     for (const char* type :
-         {"<!DOCTYPE a>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "other.dtd">)"})
+         {"<!DOCTYPE a>", R"(<!DOCTYPE a [<!ELEMENT a ANY><!-- <!ENTITY -->]>)", R"(<!DOCTYPE a SYSTEM "other.dtd">)"})
     {
         OrvixFileIO file;
         WriteBytes(m_path, std::string("<?xml version=\"1.0\"?>") + type + "<a>text &amp; &#65;</a>");
@@ -483,6 +547,36 @@ TEST_F(OrvixFileIOAppendText, SavesCharactersThatXmlCannotCarryAsTheReplacementC
     EXPECT_EQ(m_text, expected);
 }
 
+TEST_F(OrvixFileIOAppendText, KeepsWhiteSpaceAndCarriageReturnsInASaveAndLoad)
+{
+    const std::wstring texts[] = {L"a\rb",        L"a\r\nb", L" out er ", L"\r\nx\n",   L"\t",     L"",
+                                  L"a\nb inside", L"\r",     L"\r\r",     L"a\r \r\nb", L"a & <b>"};
+    Create();
+    ASSERT_TRUE(m_file.AddElement(nullptr, L"root", m_node, false));
+    for (const std::wstring& text : texts)
+    {
+        EXPECT_TRUE(m_file.AddTextElement(m_node.Get(), L"t", text.c_str()));
+    }
+    ASSERT_TRUE(m_file.SaveDocument(m_path.c_str()));
+
+    OrvixFileIO reader;
+    ASSERT_TRUE(reader.OpenDocument(m_path.c_str()));
+    const OpenedDocument opened(reader);
+    Node root;
+    Node child;
+    std::wstring name;
+    ASSERT_TRUE(reader.GetRootElement(root, name));
+    bool more = reader.GetFirstChild(root.Get(), child);
+    for (const std::wstring& text : texts)
+    {
+        ASSERT_TRUE(more);
+        std::wstring read = L"nothing";
+        EXPECT_TRUE(reader.GetNodeText(child.Get(), read));
+        EXPECT_EQ(read, text);
+        more = reader.GetNextSibling(child);
+    }
+}
+
 TEST_F(OrvixFileIOSetAttribute, SetsAndReplacesOnElements)
 {
     Create();
@@ -527,6 +621,7 @@ TEST_F(OrvixFileIOCloseDocument, LeavesAThreadWithoutComAsItWas)
 
 TEST_F(OrvixFileIOCloseDocument, IsWhatLeavesCom)
 {
+    WriteBytes(m_path, "<a/>");
     std::thread([&] {
         {
             OrvixFileIO file;

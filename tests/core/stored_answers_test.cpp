@@ -1,8 +1,15 @@
 #include "StoredAnswers.h"
 
+#include "FileBytes.h"
+#include "Files.h"
 #include "OrvixPrompt.h"
+#include "TempFolder.h"
+#include "UniqueHandle.h"
 
 #include <gtest/gtest.h>
+
+#include <filesystem>
+#include <string>
 
 namespace
 {
@@ -132,4 +139,91 @@ TEST_F(StoredAnswersTest, RegisterWithoutATextAddsNothingAndLeavesAnOldText)
     m_answers.Register(Save, nullptr, OrvixPromptAction::No, 0, !Overwrite);
     ASSERT_EQ(m_answers.Table().NumPrompts(), 1);
     EXPECT_STREQ(m_answers.Table().GetPromptText(0), L"text");
+}
+
+namespace
+{
+
+class StoredAnswersFile : public StoredAnswersTest
+{
+protected:
+    bool Load() { return m_answers.Load(m_path.c_str()); }
+    bool SaveFile() { return m_answers.Save(m_path.c_str()); }
+
+    TempFolder m_folder;
+    std::wstring m_path = (m_folder.Path() / L"OrvixPrompts.xml").wstring();
+    std::wstring m_kept = FileBytes::KeptName(m_path);
+};
+
+} // namespace
+
+TEST_F(StoredAnswersFile, ThatCannotBeReadIsKeptBeforeTheFirstSaveReplacesIt)
+{
+    for (const std::string bad : {"<?xml version=\"1.0\"?><OrvixPrompts><Prompt>", "<OrvixPrompts/>", ""})
+    {
+        WriteBytes(m_path, bad);
+        EXPECT_FALSE(Load());
+        AddRow(Save, OrvixPromptAction::Yes);
+        EXPECT_TRUE(SaveFile());
+        EXPECT_EQ(ReadBytes(m_kept), bad);
+        std::filesystem::remove(m_kept);
+        EXPECT_TRUE(SaveFile());
+        EXPECT_FALSE(std::filesystem::exists(m_kept)) << "kept twice";
+        EXPECT_TRUE(Load());
+        EXPECT_EQ(m_answers.GetAction(Save), OrvixPromptAction::Yes);
+    }
+}
+
+TEST_F(StoredAnswersFile, ThatWasLockedWhileItWasLoadedIsKept)
+{
+    AddRow(Other, OrvixPromptAction::No);
+    EXPECT_TRUE(SaveFile());
+    const std::string before = ReadBytes(m_path);
+    {
+        const UniqueFile owner(CreateFileW(m_path.c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr));
+        EXPECT_FALSE(Load());
+    }
+    AddRow(Save, OrvixPromptAction::Yes);
+    EXPECT_TRUE(SaveFile());
+    EXPECT_EQ(ReadBytes(m_kept), before);
+}
+
+TEST_F(StoredAnswersFile, ThatWasMissingOrReadIsNotKept)
+{
+    EXPECT_FALSE(Load());
+    AddRow(Save, OrvixPromptAction::Yes);
+    EXPECT_TRUE(SaveFile());
+    EXPECT_TRUE(Load());
+    EXPECT_TRUE(SaveFile());
+    EXPECT_FALSE(std::filesystem::exists(m_kept));
+}
+
+TEST_F(StoredAnswersFile, StaysAsItIsWhileThereAreNoAnswersToSave)
+{
+    WriteBytes(m_path, "bad");
+    EXPECT_FALSE(Load());
+    EXPECT_TRUE(SaveFile());
+    EXPECT_EQ(ReadBytes(m_path), "bad");
+    AddRow(Save, OrvixPromptAction::Yes);
+    EXPECT_TRUE(SaveFile());
+    EXPECT_EQ(ReadBytes(m_kept), "bad") << "kept by the first save that replaces the file";
+}
+
+TEST_F(StoredAnswersFile, ThatWasNeverLoadedIsKept)
+{
+    WriteBytes(m_path, "another program's");
+    AddRow(Save, OrvixPromptAction::Yes);
+    EXPECT_TRUE(SaveFile());
+    EXPECT_EQ(ReadBytes(m_kept), "another program's");
+}
+
+TEST_F(StoredAnswersFile, OfAnotherFolderThanTheOneThatWasLoadedIsKept)
+{
+    AddRow(Save, OrvixPromptAction::Yes);
+    EXPECT_TRUE(SaveFile());
+    EXPECT_TRUE(Load());
+    const std::wstring other = (m_folder.Path() / L"other.xml").wstring();
+    WriteBytes(other, "not read");
+    EXPECT_TRUE(m_answers.Save(other.c_str()));
+    EXPECT_EQ(ReadBytes(FileBytes::KeptName(other)), "not read");
 }

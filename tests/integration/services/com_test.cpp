@@ -132,12 +132,14 @@ private:
     IUnknown* m_document = nullptr;
 };
 
-/// Makes the allocation of the n-th text fail that OrvixCore.dll passes to COM.
+/// Makes the allocation of the n-th text, or array of bytes, fail that OrvixCore.dll passes to COM.
 class TextAllocationFailure
 {
 public:
     explicit TextAllocationFailure(long n, bool forGood = false)
         : m_hook(GetModuleHandleW(L"OrvixCore.dll"), "SysAllocString", reinterpret_cast<void*>(&Allocate)),
+          m_arrayHook(GetModuleHandleW(L"OrvixCore.dll"), "SafeArrayCreateVector",
+                      reinterpret_cast<void*>(&AllocateArray)),
           m_countdown(n), m_forGood(forGood)
     {
         s_failure = this;
@@ -146,23 +148,29 @@ public:
     TextAllocationFailure& operator=(const TextAllocationFailure&) = delete;
     ~TextAllocationFailure() { s_failure = nullptr; }
 
-    bool IsActive() const { return m_hook.IsActive(); }
+    bool IsActive() const { return m_hook.IsActive() && m_arrayHook.IsActive(); }
     bool HasFailed() const { return m_countdown <= 0; }
 
 private:
+    bool FailsNow()
+    {
+        --m_countdown;
+        return m_countdown == 0 || (m_countdown < 0 && m_forGood);
+    }
     static BSTR WINAPI Allocate(const OLECHAR* text)
     {
-        const long n = --s_failure->m_countdown;
-        if (n == 0 || (n < 0 && s_failure->m_forGood))
-        {
-            return nullptr;
-        }
-        return s_failure->m_hook.Original<decltype(SysAllocString)>()(text);
+        return s_failure->FailsNow() ? nullptr : s_failure->m_hook.Original<decltype(SysAllocString)>()(text);
+    }
+    static SAFEARRAY* WINAPI AllocateArray(VARTYPE type, LONG first, ULONG count)
+    {
+        const auto create = s_failure->m_arrayHook.Original<decltype(SafeArrayCreateVector)>();
+        return s_failure->FailsNow() ? nullptr : create(type, first, count);
     }
 
     static inline TextAllocationFailure* s_failure = nullptr;
 
     ImportHook m_hook;
+    ImportHook m_arrayHook;
     long m_countdown;
     bool m_forGood;
 };
@@ -265,7 +273,7 @@ TEST_F(ComError, LeavesInitializeAndTheObjectStaysUsable)
         }
         EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
     }
-    EXPECT_GT(n, 3) << "two files are opened by name";
+    EXPECT_GT(n, 3) << "two files are read";
 }
 
 TEST_F(ComError, LeavesShutdownAndNothingStoredIsLost)

@@ -35,6 +35,18 @@ std::string NestedEntities()
     return dtd + "]>";
 }
 
+/// Parameter entities that name each other, which a parser expands although no text refers to them.
+std::string NestedParameterEntities()
+{
+    std::string dtd = "<!DOCTYPE a [<!ENTITY % e0 \"<!-- -->\">";
+    for (int i = 1; i <= 10; ++i)
+    {
+        dtd +=
+            "<!ENTITY % e" + std::to_string(i) + " \"" + Repeated("&#37;e" + std::to_string(i - 1) + ";", 10) + "\">";
+    }
+    return dtd + "%e10;]>";
+}
+
 /// One long entity, to be used often.
 std::string LongEntity()
 {
@@ -125,6 +137,11 @@ INSTANTIATE_TEST_SUITE_P(
                        return Declaration + NestedEntities() + "<OrvixProviders><a><Name>&e11;</Name></a>" +
                               "</OrvixProviders>";
                    }},
+        Unreadable{"ParameterEntitiesOfEntities",
+                   [] {
+                       return Declaration + NestedParameterEntities() +
+                              "<OrvixProviders><a><Name>Depot</Name><Enabled>false</Enabled></a></OrvixProviders>";
+                   }},
         Unreadable{"DocumentTypeOfPrompts",
                    [] {
                        std::string xml = PromptsXml({{.id = "1", .action = InFile(Action::Yes)}});
@@ -161,7 +178,7 @@ TEST_F(HostileFile, InUtf16IsReadLikeAnyOther)
 TEST_F(HostileFile, WithADocumentTypeThatNothingRefersToStillDisablesAProvider)
 {
     AddPlugin(L"good");
-    for (const char* type : {"<!DOCTYPE a>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
+    for (const char* type : {"<!DOCTYPE a>", "<!DOCTYPE a [<!ELEMENT a ANY>]>", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
     {
         SCOPED_TRACE(type);
         WriteBytes(m_config.Path() / L"OrvixProviders.xml",

@@ -163,16 +163,8 @@ void PromptFileEditor::Save()
     {
         return;
     }
-    // The new file is written beside the old one and then replaces it, so that no reader sees half of it.
-    const std::wstring written = m_path + L".new";
-    if (!WritePromptFile(m_table, written.c_str()) ||
-        !ReplaceFileW(m_path.c_str(), written.c_str(), nullptr, 0, nullptr, nullptr))
+    if (!WritePromptFile(m_table, m_path.c_str()))
     {
-        // A replacement that failed after it had removed the old file leaves the new one as the only copy.
-        if (PathExists(m_path))
-        {
-            DeleteFileW(written.c_str());
-        }
         throw ToolError(ExitCode::Failed, L"the stored answers cannot be saved: " + m_path);
     }
 }

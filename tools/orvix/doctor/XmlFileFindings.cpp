@@ -23,8 +23,9 @@ std::wstring Quoted(const std::wstring& text)
 /// The system's error when the file is opened for reading.
 DWORD OpenError(const std::wstring& path)
 {
-    const UniqueFile file(CreateFileW(path.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr,
-                                      OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr));
+    const UniqueFile file(CreateFileW(path.c_str(), GENERIC_READ,
+                                      FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr, OPEN_EXISTING,
+                                      FILE_ATTRIBUTE_NORMAL, nullptr));
     return file ? ERROR_SUCCESS : GetLastError();
 }
 
@@ -84,14 +85,22 @@ void XmlFileFindings::AddContent(DoctorReport::Subject& file, const FileDiagnost
         file.AddProblem("unreadable-file",
                         L"the file cannot be opened and counts as empty: " + SystemMessage(error, file.location));
     }
-    else if (diagnostics.content == Content::Missing)
+    else if (diagnostics.content == Content::Missing || diagnostics.content == Content::Unreadable)
     {
         file.AddProblem("no-xml-service",
                         L"the system's XML service does not start, so the file is not read and counts as empty");
     }
     else if (diagnostics.content == Content::UsesEntities)
     {
-        file.AddProblem("entities", L"the file uses entities of its own and therefore counts as empty");
+        file.AddProblem("entities",
+                        L"the file declares or uses entities of its own, or is in an encoding in which that cannot "
+                        L"be told, and therefore counts as empty");
+    }
+    else if (diagnostics.content == Content::TooLarge)
+    {
+        file.AddProblem("too-large", L"the file has more than " +
+                                         std::to_wstring(OrvixFileIO::MaxFileSize / 1024 / 1024) +
+                                         L" MB and therefore counts as empty");
     }
     else if (diagnostics.content == Content::Malformed)
     {
