@@ -1,5 +1,7 @@
 #include "FileListOperation.h"
 
+#include "ExceptionBarrier.h"
+#include "GuardedBroadcast.h"
 #include "IOrvixCoreUI.h"
 #include "IOrvixProvider.h"
 #include "OrvixDialogOption.h"
@@ -7,7 +9,6 @@
 #include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
-#include "OrvixNotification.h"
 #include "OrvixNotificationID.h"
 #include "OrvixNotifyParams.h"
 #include "OrvixOperation.h"
@@ -55,13 +56,15 @@ const NotificationIDs* IDsFor(std::uint32_t operations)
     return nullptr;
 }
 
-std::uint32_t Broadcast(std::uint32_t id, OrvixFileList& list, bool cancelled)
+/// A listener that throws counts as one that gives the last answer.
+std::uint32_t Broadcast(std::uint32_t id, OrvixFileList& list, bool cancelled,
+                        std::uint32_t answerForException = OrvixListenerAnswer::Accept)
 {
     OrvixNotifyParams params;
     params.SetID(id);
     params.SetOrvixFileList(&list);
     params.SetCancelled(cancelled);
-    return OrvixNotification::BroadcastOrvixNotification(&params);
+    return BroadcastGuarded(params, answerForException);
 }
 
 void RemoveActiveEntries(OrvixFileList& list, const std::vector<OrvixFileEntry*>& entries)
@@ -92,7 +95,7 @@ std::int32_t FileListOperation::Run(bool callProviderFirst, std::uint32_t flagsO
         {
             return OrvixOperationResult::Cancelled;
         }
-        m_provider->QueryStatus(&m_list, 0);
+        Completes([&] { m_provider->QueryStatus(&m_list, 0); });
     }
     if (m_list.NumActiveEntries() == 0)
     {
@@ -111,7 +114,9 @@ std::int32_t FileListOperation::Run(bool callProviderFirst, std::uint32_t flagsO
         return OrvixOperationResult::Cancelled;
     }
 
-    const Confirmation confirmation = Confirm();
+    // A dialog or a host that throws has cancelled, and nothing is remembered.
+    const Confirmation confirmation =
+        WithBarrier(Confirmation{OrvixOperationResult::Cancelled, false}, [this] { return Confirm(); });
     if (confirmation.result == OrvixOperationResult::Cancelled)
     {
         NotifyBefore(true);
@@ -261,36 +266,29 @@ unsigned long FileListOperation::OfferedOption()
     return HasOption(OrvixDialogOption::OfferGetLatest) ? OrvixProviderOption::GetLatest : 0;
 }
 
+/// Runs each operation that is asked for. One that throws has failed, and the next one runs, as after a failure.
 void FileListOperation::CallProvider()
 {
     const wchar_t* comment = m_params.GetComment();
-    if ((m_operations & OrvixOperation::Add) != 0)
-    {
-        m_provider->Add(&m_list, comment, m_mode);
-    }
-    if ((m_operations & OrvixOperation::CheckIn) != 0)
-    {
-        m_provider->CheckIn(&m_list, comment, m_mode);
-    }
-    if ((m_operations & OrvixOperation::GetLatest) != 0)
-    {
-        m_provider->GetLatest(&m_list, m_mode);
-    }
-    if ((m_operations & OrvixOperation::CheckOut) != 0)
-    {
-        m_provider->CheckOut(&m_list, comment, m_mode);
-    }
-    if ((m_operations & OrvixOperation::UndoCheckOut) != 0)
-    {
-        m_provider->UndoCheckOut(&m_list, m_mode);
-    }
+    const auto run = [this](std::uint32_t operation, const auto& call) {
+        if ((m_operations & operation) != 0)
+        {
+            Completes(call);
+        }
+    };
+    run(OrvixOperation::Add, [&] { m_provider->Add(&m_list, comment, m_mode); });
+    run(OrvixOperation::CheckIn, [&] { m_provider->CheckIn(&m_list, comment, m_mode); });
+    run(OrvixOperation::GetLatest, [&] { m_provider->GetLatest(&m_list, m_mode); });
+    run(OrvixOperation::CheckOut, [&] { m_provider->CheckOut(&m_list, comment, m_mode); });
+    run(OrvixOperation::UndoCheckOut, [&] { m_provider->UndoCheckOut(&m_list, m_mode); });
 }
 
-/// True when a listener vetoed.
+/// True when a listener vetoed; one that throws counts as a veto while something can still be stopped.
 bool FileListOperation::NotifyBefore(bool cancelled)
 {
     const NotificationIDs* ids = IDsFor(m_operations);
-    return ids != nullptr && Broadcast(ids->before, m_list, cancelled) == OrvixListenerAnswer::Veto;
+    const std::uint32_t answerForException = cancelled ? OrvixListenerAnswer::Accept : OrvixListenerAnswer::Veto;
+    return ids != nullptr && Broadcast(ids->before, m_list, cancelled, answerForException) == OrvixListenerAnswer::Veto;
 }
 
 void FileListOperation::NotifyAfter()

@@ -35,15 +35,44 @@ IOrvixServices* GetIOrvixServices()
 
 void ReleaseIOrvixServices(IOrvixServices* services)
 {
-    delete services;
+    if (services != nullptr)
+    {
+        static_cast<OrvixServices*>(services)->Release();
+    }
+}
+
+void OrvixServices::Release()
+{
+    if (m_operations > 0)
+    {
+        m_releaseWaits = true;
+        return;
+    }
+    delete this;
+}
+
+/// At the end of the outermost operation: what waited for it, still held, since releasing providers runs their code.
+/// The object may be gone afterwards.
+void OrvixServices::EndHeld()
+{
+    while (std::exchange(m_shutdownWaits, false))
+    {
+        Completes([this] { SaveAndReleaseProviders(); });
+    }
+    m_operations = 0;
+    if (m_releaseWaits)
+    {
+        delete this;
+    }
 }
 
 bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
 {
-    if (info == nullptr)
+    if (info == nullptr || m_operations > 0)
     {
         return false;
     }
+    const Hold hold(*this);
     return WithXmlBarrier(false, [&] {
         if (const wchar_t* configPath = info->GetConfigFilePath())
         {
@@ -64,12 +93,24 @@ bool OrvixServices::Initialize(OrvixClientInfo* info, std::uint32_t sources)
 
 void OrvixServices::Shutdown()
 {
+    if (m_operations > 0)
+    {
+        m_shutdownWaits = true;
+        return;
+    }
+    const Hold hold(*this);
+    SaveAndReleaseProviders();
+}
+
+void OrvixServices::SaveAndReleaseProviders()
+{
     SavePrompts();
     ReleaseProviders();
 }
 
 OrvixServices::~OrvixServices()
 {
+    ++m_operations; // what a provider's last code calls waits for ever
     if (m_initialized)
     {
         try
@@ -106,6 +147,7 @@ const wchar_t* OrvixServices::GetProviderName(std::uint32_t index)
 
 IOrvixProvider* OrvixServices::GetProvider(std::uint32_t index)
 {
+    const Hold hold(*this);
     if (index >= GetProviderCount())
     {
         return nullptr;
@@ -121,6 +163,7 @@ IOrvixProvider* OrvixServices::GetProvider(std::uint32_t index)
 std::int32_t OrvixServices::ShowPrompt(void* a, void* b, void* c, std::uint32_t options, std::uint32_t promptID,
                                        bool* dontAskAgain)
 {
+    const Hold hold(*this);
     return WithBarrier(OrvixPromptAnswer::No, [&] {
         const bool stored = promptID != OrvixPromptID::None;
         if (stored)
@@ -157,6 +200,7 @@ std::int32_t OrvixServices::ShowPrompt(void* a, void* b, void* c, std::uint32_t 
 
 std::int32_t OrvixServices::ShowFileListDialog(void* a, OrvixFileListDialogParams* params)
 {
+    const Hold hold(*this);
     return WithBarrier(OrvixDialogResult::Cancelled,
                        [&] { return m_userInterface.CoreUI().ShowFileListDialog(a, params); });
 }
@@ -165,6 +209,7 @@ std::int32_t OrvixServices::RunFileListOperation(void* a, OrvixFileListDialogPar
                                                  IOrvixProvider* provider, std::uint32_t operations,
                                                  std::uint32_t flagsOutMask)
 {
+    const Hold hold(*this);
     return WithBarrier(OrvixOperationResult::Cancelled, [&] {
         OrvixFileList* list = params != nullptr ? params->GetOrvixFileList() : nullptr;
         if (list == nullptr)
@@ -195,6 +240,7 @@ bool OrvixServices::RegisterPrompt(std::uint32_t promptID, const wchar_t* text, 
 
 std::int32_t OrvixServices::EditPrompts(void* a, void* b)
 {
+    const Hold hold(*this);
     return WithXmlBarrier(OrvixPromptEditorResult::Unchanged, [&] {
         const std::int32_t result = m_userInterface.CoreUI().EditPrompts(a, b, &m_answers.Table());
         if (result == OrvixPromptEditorResult::Changed)
@@ -328,15 +374,12 @@ void OrvixServices::AddMSSCCIProvider(const std::wstring& keyPath)
 
 bool OrvixServices::LoadPrompts()
 {
-    m_answers.Table().RemoveAll();
-    return WithXmlBarrier(false,
-                          [&] { return ReadPromptFile(m_answers.Table(), (m_configFolder + PromptFileName).c_str()); });
+    return WithXmlBarrier(false, [&] { return m_answers.Load((m_configFolder + PromptFileName).c_str()); });
 }
 
 bool OrvixServices::SavePrompts()
 {
-    return WithXmlBarrier(
-        false, [&] { return WritePromptFile(m_answers.Table(), (m_configFolder + PromptFileName).c_str()); });
+    return WithXmlBarrier(false, [&] { return m_answers.Save((m_configFolder + PromptFileName).c_str()); });
 }
 
 OrvixProviderConfig* OrvixServices::ConfigOf(std::uint32_t index)

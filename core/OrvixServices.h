@@ -15,6 +15,9 @@ class OrvixServices final : public IOrvixServices, public IOrvixCoreUIClientAcce
 {
 public:
     OrvixServices() = default;
+    /// Destroys the object, at once or at the end of the operation in which it is called.
+    void Release();
+
     OrvixServices(const OrvixServices&) = delete;
     OrvixServices& operator=(const OrvixServices&) = delete;
 
@@ -46,6 +49,30 @@ public:
     std::intptr_t ClientRelayB(void* a, void* b, void* c, void* d) override;
 
 private:
+    /// Holds the object for an operation that calls foreign code: `Shutdown` and `Release` wait for the end of the last
+    /// one. Declared first in an operation, which touches the object no more when it is gone.
+    class Hold
+    {
+    public:
+        explicit Hold(OrvixServices& services) : m_services(services) { ++services.m_operations; }
+        Hold(const Hold&) = delete;
+        Hold& operator=(const Hold&) = delete;
+        ~Hold()
+        {
+            if (m_services.m_operations == 1)
+            {
+                m_services.EndHeld();
+                return;
+            }
+            --m_services.m_operations;
+        }
+
+    private:
+        OrvixServices& m_services;
+    };
+
+    void EndHeld();
+    void SaveAndReleaseProviders();
     bool DiscoverPlugins(OrvixClientInfo* info);
     bool DiscoverMSSCCIProviders();
     void AddMSSCCIProvider(const std::wstring& keyPath);
@@ -55,6 +82,9 @@ private:
     OrvixProviderConfig* ConfigOf(std::uint32_t index);
 
     bool m_initialized = false;
+    bool m_shutdownWaits = false;
+    bool m_releaseWaits = false;
+    unsigned int m_operations = 0; ///< operations that are running, one within the other
     std::vector<std::unique_ptr<OrvixProviderEntry>> m_providers;
     std::wstring m_configFolder;
     StoredAnswers m_answers;

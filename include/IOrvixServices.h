@@ -29,11 +29,14 @@ public:
     /// `info` lives only for the call; its client access is kept, not owned. `sources` is a set of bits of
     /// `OrvixProviderSource`. True when a plug-in was added or the registry of MSSCCI libraries could be read. The
     /// object is initialised in either case, except when `info` is null or memory runs out before the configuration
-    /// folder is known: false, and nothing is done. A second call adds every provider again. [library, main-thread]
+    /// folder is known: false, and nothing is done. A second call adds every provider again. While another operation of
+    /// the object runs foreign code (`RunFileListOperation`, a dialog, `Initialize`, `Shutdown`; a listener, a dialog or
+    /// a provider calls back): false, and nothing is done. [library, main-thread]
     virtual bool Initialize(OrvixClientInfo* info, std::uint32_t sources) = 0;
 
     /// Saves the stored answers (a failure to save is ignored) and releases every provider. The user-interface library
-    /// stays until the object is destroyed. [library, main-thread]
+    /// stays until the object is destroyed. In a call-back of such an operation, this and `ReleaseIOrvixServices` are
+    /// remembered and happen when the outermost operation returns. [library, main-thread]
     virtual void Shutdown() = 0;
 
     /// Number of providers found. [library, main-thread]

@@ -1,14 +1,15 @@
 #include "OrvixNotification.h"
 
 #include "ExceptionBarrier.h"
+#include "GuardedBroadcast.h"
 #include "IOrvixNotifyCallback.h"
 #include "OrvixNotificationID.h"
 #include "OrvixNotifyParams.h"
 
 #include <algorithm>
 #include <cstddef>
-#include <memory>
 #include <new>
+#include <utility>
 #include <vector>
 
 namespace
@@ -23,23 +24,64 @@ struct Listener
 /// In order of registration.
 using Registry = std::vector<Listener>;
 
-/// The process-wide registry; freed when the library is unloaded.
-std::unique_ptr<Registry> theRegistry;
+Registry* theRegistry = nullptr;
+
+/// Frees the process-wide registry when the library is unloaded. A host's library that unregisters its listeners even
+/// later finds an empty one.
+struct RegistryEnd
+{
+    RegistryEnd() = default;
+    RegistryEnd(const RegistryEnd&) = delete;
+    RegistryEnd& operator=(const RegistryEnd&) = delete;
+    ~RegistryEnd() { delete std::exchange(theRegistry, nullptr); }
+} const RegistryEndInstance;
 
 /// The registry, made on first use; null when memory runs out.
 Registry* GetRegistry()
 {
-    if (!theRegistry)
+    if (theRegistry == nullptr)
     {
-        theRegistry.reset(new (std::nothrow) Registry);
+        theRegistry = new (std::nothrow) Registry;
     }
-    return theRegistry.get();
+    return theRegistry;
 }
 
 Registry::iterator Find(Registry& registry, const IOrvixNotifyCallback* callback)
 {
     return std::find_if(registry.begin(), registry.end(),
                         [callback](const Listener& listener) { return listener.callback == callback; });
+}
+
+/// Delivers a record through `notify`, which calls one listener.
+template <typename Notify>
+std::uint32_t Deliver(OrvixNotifyParams& params, const Notify& notify)
+{
+    const Registry* registry = GetRegistry();
+    if (registry == nullptr)
+    {
+        return OrvixListenerAnswer::Accept;
+    }
+    // A listener may register and unregister listeners: the registry is read afresh at every step.
+    for (std::size_t i = 0; i < registry->size(); ++i)
+    {
+        const Listener listener = (*registry)[i];
+        const std::uint32_t answer = notify(listener);
+        if (answer == OrvixListenerAnswer::Accept)
+        {
+            continue;
+        }
+        if (answer == OrvixListenerAnswer::Veto)
+        {
+            params.SetCancelled(true);
+            for (std::size_t j = 0; j < i && j < registry->size(); ++j)
+            {
+                const Listener earlier = (*registry)[j];
+                notify(earlier);
+            }
+        }
+        return answer;
+    }
+    return OrvixListenerAnswer::Accept;
 }
 
 } // namespace
@@ -82,30 +124,17 @@ std::uint32_t OrvixNotification::BroadcastOrvixNotification(std::uint32_t id, st
 
 std::uint32_t OrvixNotification::BroadcastOrvixNotification(OrvixNotifyParams* params)
 {
-    const Registry* registry = GetRegistry();
-    if (registry == nullptr || params == nullptr)
+    if (params == nullptr)
     {
         return OrvixListenerAnswer::Accept;
     }
-    // A listener may register and unregister listeners: the registry is read afresh at every step.
-    for (std::size_t i = 0; i < registry->size(); ++i)
-    {
-        const Listener listener = (*registry)[i];
-        const std::uint32_t answer = listener.callback->Notify(params, listener.userData);
-        if (answer == OrvixListenerAnswer::Accept)
-        {
-            continue;
-        }
-        if (answer == OrvixListenerAnswer::Veto)
-        {
-            params->SetCancelled(true);
-            for (std::size_t j = 0; j < i && j < registry->size(); ++j)
-            {
-                const Listener earlier = (*registry)[j];
-                earlier.callback->Notify(params, earlier.userData);
-            }
-        }
-        return answer;
-    }
-    return OrvixListenerAnswer::Accept;
+    return Deliver(*params,
+                   [params](const Listener& listener) { return listener.callback->Notify(params, listener.userData); });
+}
+
+std::uint32_t BroadcastGuarded(OrvixNotifyParams& params, std::uint32_t answerForException)
+{
+    return Deliver(params, [&](const Listener& listener) {
+        return WithBarrier(answerForException, [&] { return listener.callback->Notify(&params, listener.userData); });
+    });
 }

@@ -43,50 +43,74 @@ protected:
                                                              [] { throw _com_error(E_FAIL); }};
 };
 
-TEST_F(OperationFailures, AProviderThatThrowsCancelsTheOperation)
+TEST_F(OperationFailures, AProviderThatThrowsHasFailedAndTheNextOperationRuns)
 {
     for (const auto& fail : m_exceptions)
     {
-        for (const char* failing : {"QueryStatus", "CheckIn"})
-        {
-            m_provider.onCall = [&](const std::string& operation, OrvixFileList&) {
-                if (operation == failing)
-                {
-                    fail();
-                }
-            };
-            EXPECT_EQ(RunAll(), OperationResult::Cancelled) << failing;
-            ExpectUsable();
-        }
+        m_provider.onCall = [&](const std::string&, OrvixFileList&) { fail(); };
+        m_log.clear();
+        EXPECT_EQ(m_services->RunFileListOperation(nullptr, &m_params, true, &m_provider,
+                                                   Operation::Notify | Operation::Add | Operation::CheckIn |
+                                                       Operation::GetLatest | Operation::CheckOut |
+                                                       Operation::UndoCheckOut,
+                                                   AllBits),
+                  OperationResult::Done);
+        EXPECT_EQ(m_log, (Lines{"QueryStatus [a]", "Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared",
+                                "Notify FilesConfirmed [a]", "Add [a] comment", "CheckIn [a] comment", "GetLatest [a]",
+                                "CheckOut [a] comment", "UndoCheckOut [a]", "Notify AfterCheckIn [a]"}));
+        ExpectUsable();
     }
 }
 
-TEST_F(OperationFailures, AListenerThatThrowsCancelsTheOperation)
+TEST_F(OperationFailures, AListenerThatThrowsBeforeTheOperationVetoesIt)
 {
     for (const auto& fail : m_exceptions)
     {
-        for (const std::uint32_t id : {OrvixNotificationID::BeforeCheckIn, OrvixNotificationID::FilesConfirmed,
-                                       OrvixNotificationID::AfterCheckIn})
-        {
-            m_listener.onNotify = [&](OrvixNotifyParams& params) {
-                if (params.GetID() == id)
-                {
-                    fail();
-                }
-                return OrvixListenerAnswer::Accept;
-            };
-            EXPECT_EQ(RunAll(), OperationResult::Cancelled) << id;
-            ExpectUsable();
-        }
+        RecordingListener second(m_log, "Second");
+        second.onNotify = [&](OrvixNotifyParams&) {
+            fail();
+            return OrvixListenerAnswer::Accept;
+        };
+        RecordingListener third(m_log, "Third");
+        m_log.clear();
+        EXPECT_EQ(RunAll(), OperationResult::Cancelled);
+        EXPECT_EQ(m_log, (Lines{"QueryStatus [a]", "Notify BeforeCheckIn [a]", "Second BeforeCheckIn [a]",
+                                "Notify BeforeCheckIn [a] cancelled"}));
     }
+    ExpectUsable();
 }
 
-TEST_F(OperationFailures, ADialogThatThrowsCancelsTheOperation)
+TEST_F(OperationFailures, AListenerThatThrowsLaterStopsNothing)
+{
+    for (const auto& fail : m_exceptions)
+    {
+        RecordingListener second(m_log, "Second");
+        m_listener.onNotify = [&](OrvixNotifyParams& params) {
+            if (params.GetID() != OrvixNotificationID::BeforeCheckIn)
+            {
+                fail();
+            }
+            return OrvixListenerAnswer::Accept;
+        };
+        m_log.clear();
+        EXPECT_EQ(RunAll(), OperationResult::Done);
+        EXPECT_EQ(m_log,
+                  (Lines{"QueryStatus [a]", "Notify BeforeCheckIn [a]", "Second BeforeCheckIn [a]",
+                         "Dialog [a] EntriesCanBeCleared", "Notify FilesConfirmed [a]", "Second FilesConfirmed [a]",
+                         "CheckIn [a] comment", "Notify AfterCheckIn [a]", "Second AfterCheckIn [a]"}));
+    }
+    ExpectUsable();
+}
+
+TEST_F(OperationFailures, ADialogThatThrowsHasBeenCancelled)
 {
     for (const auto& fail : m_exceptions)
     {
         m_onDialog = [&](OrvixFileListDialogParams&) { fail(); };
+        m_log.clear();
         EXPECT_EQ(RunAll(), OperationResult::Cancelled);
+        EXPECT_EQ(m_log, (Lines{"QueryStatus [a]", "Notify BeforeCheckIn [a]", "Dialog [a] EntriesCanBeCleared",
+                                "Notify BeforeCheckIn [a] cancelled"}));
         ExpectUsable();
     }
 }
