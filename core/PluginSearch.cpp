@@ -40,9 +40,10 @@ void PluginSearch::Next()
     } while (m_state == State::Found && (name == L"." || name == L".."));
 }
 
-/// No separator is put between the folder and what follows: the folder ends in one.
+/// No separator is put between the folder and what follows: the folder ends in one. Empty when the client names no
+/// folder: the name alone would be looked for in the current folder.
 std::wstring PluginSearch::PathOf(const wchar_t* name) const
 {
     const wchar_t* folder = m_client.GetProviderPluginPath();
-    return folder != nullptr ? std::wstring(folder) + name : std::wstring();
+    return folder != nullptr && *folder != L'\0' ? std::wstring(folder) + name : std::wstring();
 }

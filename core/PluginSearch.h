@@ -14,8 +14,8 @@ public:
 
     enum class State
     {
-        Found, ///< there is a file to look at
-        NoFolder,
+        Found,    ///< there is a file to look at
+        NoFolder, ///< the client names none
         FolderTooLong,
         End
     };

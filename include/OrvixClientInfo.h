@@ -37,7 +37,8 @@ public:
     virtual void SetParentWindow(HWND__* window);
 
     /// Folder that is searched for provider plug-ins. "*.dll" is appended to it directly, so it ends in a
-    /// backslash; the whole path of a plug-in must fit 260 characters, terminator included.
+    /// backslash; the whole path of a plug-in must fit 260 characters, terminator included. Null or empty (the
+    /// default) means that there are no plug-ins: the current folder is never searched.
     virtual const wchar_t* GetProviderPluginPath();
     /// Sets the plug-in folder; a copy is kept as it is, with no backslash added.
     virtual void SetProviderPluginPath(const wchar_t* path);

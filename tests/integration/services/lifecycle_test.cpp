@@ -231,6 +231,43 @@ TEST_F(ServicesInitialize, ANullPluginPathFindsNothing)
     EXPECT_EQ(m_services->GetProviderCount(), 0u);
 }
 
+TEST_F(ServicesInitialize, AnUnsetPluginPathNeverSearchesTheCurrentFolder)
+{
+    AddPlugin(L"good");
+    const CurrentFolder current(m_plugins.Path());
+    NamelessClientInfo nameless;
+    EXPECT_FALSE(m_services->Initialize(&nameless, OrvixProviderSource::Plugins));
+    OrvixClientInfo unset;
+    EXPECT_FALSE(m_services->Initialize(&unset, OrvixProviderSource::Plugins));
+    unset.SetProviderPluginPath(L"");
+    EXPECT_FALSE(m_services->Initialize(&unset, OrvixProviderSource::Plugins));
+    EXPECT_EQ(m_services->GetProviderCount(), 0u);
+}
+
+TEST_F(ServicesInitialize, AFolderWithAnEscapeOfAUrlInItsNameIsTakenAsItIs)
+{
+    AddPlugin(L"good");
+    const std::filesystem::path folder = m_config.Path() / L"a%20b";
+    const std::filesystem::path other = m_config.Path() / L"a b";
+    for (const auto& [path, enabled] : {std::pair{folder, "false"}, std::pair{other, "true"}})
+    {
+        std::filesystem::create_directory(path);
+        WriteBytes(path / L"OrvixProviders.xml", std::string("<OrvixProviders><a><Name>Depot</Name><Enabled>") +
+                                                     enabled + "</Enabled></a></OrvixProviders>");
+    }
+    m_info.SetConfigFilePath(folder.c_str());
+    EXPECT_FALSE(Initialize());
+    EXPECT_EQ(m_services->GetProviderCount(), 0u);
+    m_services->RegisterPrompt(1, L"text", Action::Yes, 0, false);
+    m_services->Shutdown();
+    EXPECT_TRUE(std::filesystem::exists(folder / L"OrvixPrompts.xml"));
+    EXPECT_FALSE(std::filesystem::exists(other / L"OrvixPrompts.xml"));
+    m_info.SetConfigFilePath((L"\\\\?\\" + folder.wstring()).c_str());
+    m_services = MakeOrvixServices();
+    EXPECT_FALSE(Initialize());
+    EXPECT_EQ(m_services->GetPromptAction(1), Action::Yes);
+}
+
 TEST_F(ServicesInitialize, ANullRecordDoesNothing)
 {
     EXPECT_FALSE(m_services->Initialize(nullptr, OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI));
