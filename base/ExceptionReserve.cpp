@@ -24,6 +24,18 @@ extern "C" void* __wrap_malloc(std::size_t size) // NOLINT(readability-identifie
     return nullptr;
 }
 
+namespace __gnu_cxx // of GCC's run-time, declared in no header
+{
+
+void __freeres(); // NOLINT(bugprone-reserved-identifier,readability-identifier-naming)
+
+} // namespace __gnu_cxx
+
+void FreeExceptionReserve()
+{
+    __gnu_cxx::__freeres();
+}
+
 void ReserveForExceptions()
 {
     failNext = true; // the exception object's allocation, so that the pool has to help out
@@ -39,6 +51,10 @@ void ReserveForExceptions()
 #else
 
 void ReserveForExceptions()
+{
+}
+
+void FreeExceptionReserve()
 {
 }
 

@@ -5,7 +5,7 @@
 #include <windows.h>
 
 /// Start and stop of the library. What it holds for the whole process frees itself when it is unloaded.
-extern "C" BOOL WINAPI DllMain(HINSTANCE module, DWORD reason, LPVOID)
+extern "C" BOOL WINAPI DllMain(HINSTANCE module, DWORD reason, LPVOID processEnds)
 {
     if (reason == DLL_PROCESS_ATTACH)
     {
@@ -13,6 +13,10 @@ extern "C" BOOL WINAPI DllMain(HINSTANCE module, DWORD reason, LPVOID)
         BraeSDK::Util::UseLanguagePackLocale(module);
         RememberLibraryModule(module);
         DisableThreadLibraryCalls(module);
+    }
+    else if (reason == DLL_PROCESS_DETACH && processEnds == nullptr)
+    {
+        FreeExceptionReserve();
     }
     return TRUE;
 }
