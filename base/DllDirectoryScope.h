@@ -5,30 +5,37 @@
 #include <algorithm>
 #include <string>
 
-/// The folder that the process searches for libraries, for a scope; an empty one leaves it as it is.
+/// Makes a folder the process's DLL directory for a scope. An empty one changes nothing, not even at the end: what a
+/// host has set stays, also an empty text, which takes the current folder out of the search and which cannot be read
+/// back.
 class DllDirectoryScope
 {
 public:
-    explicit DllDirectoryScope(const std::wstring& folder)
+    explicit DllDirectoryScope(const std::wstring& folder) : m_changed(!folder.empty())
     {
+        if (!m_changed)
+        {
+            return;
+        }
         if (const DWORD size = GetDllDirectoryW(0, nullptr))
         {
             m_saved.resize(size);
             m_saved.resize(std::min(GetDllDirectoryW(size, m_saved.data()), size));
         }
-        if (!folder.empty())
-        {
-            SetDllDirectoryW(folder.c_str());
-        }
+        SetDllDirectoryW(folder.c_str());
     }
     DllDirectoryScope(const DllDirectoryScope&) = delete;
     DllDirectoryScope& operator=(const DllDirectoryScope&) = delete;
     ~DllDirectoryScope()
     {
-        // An empty text would take the current folder out of the search.
-        SetDllDirectoryW(m_saved.empty() ? nullptr : m_saved.c_str());
+        if (m_changed)
+        {
+            // An empty text would take the current folder out of the search.
+            SetDllDirectoryW(m_saved.empty() ? nullptr : m_saved.c_str());
+        }
     }
 
 private:
+    bool m_changed;
     std::wstring m_saved;
 };

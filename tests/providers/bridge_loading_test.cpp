@@ -266,6 +266,13 @@ TEST_F(BridgeDllDirectory, OfTheProcessStaysWithoutASearchFolder)
     EXPECT_EQ(ProcessDllDirectory::Current(), L"C:\\some folder");
 }
 
+TEST_F(BridgeDllDirectory, IsNotTouchedWithoutASearchFolder)
+{
+    const GivenDllDirectories given;
+    Start();
+    EXPECT_TRUE(GivenDllDirectories::Folders().empty()) << "a host may have set an empty one, which cannot be read";
+}
+
 TEST_F(BridgeDllDirectory, ThatWasNotSetIsNotSetAfterwards)
 {
     NewBridge(L"recording_full", NeededFolder.c_str());

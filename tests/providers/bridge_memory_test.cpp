@@ -73,13 +73,17 @@ protected:
 TEST_F(BridgeMemory, ThatIsExhaustedDuringTheLoadFailsThatCallAlone)
 {
     const ProcessDllDirectory process(L"C:\\a folder with a long name");
-    const long failures = Sweep([] {}, [&] { return m_bridge->Initialize("host"); },
-                                [&](SCCRTN result, bool failed) {
-                                    EXPECT_EQ(result, failed ? SCC_E_INITIALIZEFAILED : SCC_OK);
-                                    EXPECT_EQ(m_bridge->IsInitialized(), !failed);
-                                    EXPECT_EQ(ProcessDllDirectory::Current(), L"C:\\a folder with a long name");
-                                    EXPECT_EQ(m_bridge->Initialize("host"), SCC_OK);
-                                });
+    const auto useSearchFolder = [&] {
+        NewBridge(L"recording_full", L"C:\\a search folder, for which the other one is kept");
+    };
+    const long failures = Sweep(
+        useSearchFolder, [&] { return m_bridge->Initialize("host"); },
+        [&](SCCRTN result, bool failed) {
+            EXPECT_EQ(result, failed ? SCC_E_INITIALIZEFAILED : SCC_OK);
+            EXPECT_EQ(m_bridge->IsInitialized(), !failed);
+            EXPECT_EQ(ProcessDllDirectory::Current(), L"C:\\a folder with a long name");
+            EXPECT_EQ(m_bridge->Initialize("host"), SCC_OK);
+        });
     EXPECT_GT(failures, 0);
 }
 
