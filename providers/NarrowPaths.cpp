@@ -1,12 +1,10 @@
 #include "NarrowPaths.h"
 
 #include "CStr.h"
-#include "OrvixFileEntry.h"
-#include "OrvixFileList.h"
 #include "WStr.h"
 
-#include <algorithm>
 #include <cstring>
+#include <cwchar>
 #include <new>
 #include <stdexcept>
 #include <string_view>
@@ -14,49 +12,48 @@
 namespace
 {
 
-bool IsExact(std::wstring_view path, const char* narrow)
+/// Copies `size` characters to bytes; false when one of them is not ASCII. Every ANSI code page carries ASCII as it is.
+bool CopyAscii(const wchar_t* __restrict path, std::size_t size, char* __restrict bytes)
 {
-    // Every ANSI code page carries these as they are; only the others need a second conversion.
-    if (std::all_of(path.begin(), path.end(), [](wchar_t c) { return c < 0x80; }))
+    unsigned int all = 0;
+    for (std::size_t i = 0; i < size; ++i)
     {
-        return true;
+        bytes[i] = static_cast<char>(path[i]);
+        all |= path[i];
     }
-    const WStr back(narrow);
-    return back.Get() != nullptr && back.Get() == path;
+    return all < 0x80;
 }
 
 } // namespace
 
-NarrowPaths::NarrowPaths(OrvixFileList& list, unsigned int count)
+bool NarrowPaths::Add(const wchar_t* path)
 {
-    m_pointers.reserve(count);
-    for (unsigned int i = 0; i < count; ++i)
+    if (path == nullptr)
     {
-        OrvixFileEntry* entry = list.GetActiveFileEntry(i);
-        if (entry == nullptr)
+        throw std::invalid_argument("path");
+    }
+    const std::size_t size = std::wcslen(path) + 1;
+    auto* bytes = static_cast<char*>(m_texts.allocate(size, 1));
+    if (!CopyAscii(path, size, bytes))
+    {
+        const CStr text(path);
+        if (text.Get() == nullptr)
         {
-            throw std::out_of_range("active entry");
+            throw std::bad_alloc();
         }
-        Add(entry->GetFile());
+        const WStr back(text.Get());
+        if (back.Get() == nullptr)
+        {
+            throw std::bad_alloc();
+        }
+        if (back.Get() != std::wstring_view(path))
+        {
+            return false;
+        }
+        const std::size_t narrowSize = std::strlen(text.Get()) + 1;
+        bytes = static_cast<char*>(m_texts.allocate(narrowSize, 1));
+        std::memcpy(bytes, text.Get(), narrowSize);
     }
-}
-
-NarrowPaths::NarrowPaths(const wchar_t* path)
-{
-    Add(path);
-}
-
-void NarrowPaths::Add(const wchar_t* path)
-{
-    const CStr text(path);
-    if (text.Get() == nullptr)
-    {
-        throw std::bad_alloc();
-    }
-    if (!IsExact(path, text.Get()))
-    {
-        throw std::range_error("path");
-    }
-    const std::size_t size = std::strlen(text.Get()) + 1;
-    m_pointers.push_back(static_cast<char*>(std::memcpy(m_texts.allocate(size, 1), text.Get(), size)));
+    m_pointers.push_back(bytes);
+    return true;
 }

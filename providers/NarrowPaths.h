@@ -5,18 +5,16 @@
 #include <memory_resource>
 #include <vector>
 
-class OrvixFileList;
-
-/// Paths in the ANSI code page, as an MSSCCI library takes them. Throws std::bad_alloc without memory, and
-/// std::range_error for a path that the code page does not carry exactly.
+/// Paths in the ANSI code page, as an MSSCCI library takes them.
 class NarrowPaths
 {
 public:
-    /// The first `count` active entries of a list. Throws std::out_of_range when one is missing.
-    NarrowPaths(OrvixFileList& list, unsigned int count);
+    /// Room for so many paths. Throws std::bad_alloc.
+    explicit NarrowPaths(unsigned int count) { m_pointers.reserve(count); }
 
-    /// A single path. Throws std::bad_alloc for null as well.
-    explicit NarrowPaths(const wchar_t* path);
+    /// Appends a path, of which nothing is kept; false when the code page does not carry it exactly, so that it would
+    /// name another file. Throws std::bad_alloc, and std::invalid_argument for null.
+    bool Add(const wchar_t* path);
 
     LONG Count() const { return static_cast<LONG>(m_pointers.size()); }
 
@@ -24,8 +22,6 @@ public:
     LPCSTR* Get() { return m_pointers.data(); }
 
 private:
-    void Add(const wchar_t* path);
-
     std::pmr::monotonic_buffer_resource m_texts;
     std::vector<LPCSTR> m_pointers;
 };

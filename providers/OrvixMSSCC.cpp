@@ -378,6 +378,7 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
     {
         return;
     }
+    m_previousSettings = FileBytes::Previous::Kept; // also when memory runs out
     Completes([&] {
         OrvixFileIO file;
         if (!file.OpenDocument((folder + (L'\\' + m_settingsFileName)).c_str()))
@@ -385,6 +386,10 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
             return;
         }
         const OpenedDocument opened(file);
+        if (file.GetContent() == OrvixFileIO::Content::Missing)
+        {
+            m_previousSettings = FileBytes::Previous::Replaced;
+        }
         OrvixFileIO::Node root;
         std::wstring name;
         if (!file.GetRootElement(root, name) || !EqualNames(name, RootName))
@@ -408,6 +413,7 @@ void OrvixMSSCC::ReadProjectSettings(const wchar_t* folder)
                 Store(m_projectName, text, FieldLimit);
             }
         }
+        m_previousSettings = FileBytes::Previous::Replaced;
     });
 }
 
@@ -430,7 +436,7 @@ void OrvixMSSCC::WriteProjectSettings(const wchar_t* folder)
         if (root != nullptr && file.AddTextElement(root.Get(), AuxPathName, m_auxPath.data()) &&
             file.AddTextElement(root.Get(), ProjectNameName, m_projectName.data()))
         {
-            file.SaveDocument((folder + (L'\\' + m_settingsFileName)).c_str());
+            file.SaveDocument((folder + (L'\\' + m_settingsFileName)).c_str(), m_previousSettings);
         }
     });
 }

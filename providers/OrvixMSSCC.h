@@ -1,5 +1,7 @@
 #pragma once
 
+#include "BareFileName.h"
+#include "FileBytes.h"
 #include "IOrvixMSSCC.h"
 #include "UniqueHandle.h"
 
@@ -36,8 +38,12 @@ public:
     /// std::bad_alloc.
     bool SetProvider(const wchar_t* dllPath, const wchar_t* searchFolder, const wchar_t* providerName, bool loadNow);
 
-    /// Bare name of the settings file that is kept in each project's folder; empty for none. Throws std::bad_alloc.
-    void SetProjectSettingsFile(const std::wstring& name) { m_settingsFileName = name; }
+    /// Bare name of the settings file that is kept in each project's folder; empty for none. Any other name, which
+    /// could lead out of the folder, counts as none. Throws std::bad_alloc.
+    void SetProjectSettingsFile(const std::wstring& name)
+    {
+        m_settingsFileName = IsBareFileName(name) ? name : std::wstring();
+    }
 
     /// Parent of the library's dialogs; may be null.
     void SetParentWindow(HWND window) { m_parentWindow = window; }
@@ -102,6 +108,7 @@ private:
     std::wstring m_dllPath;
     std::wstring m_searchFolder;
     std::wstring m_settingsFileName;
+    FileBytes::Previous m_previousSettings = FileBytes::Previous::Replaced; ///< what the next save does with the file
     bool m_initialized = false;
     bool m_projectOpen = false;
     bool m_commandOptionsPending = true; // until the library has said that it has options

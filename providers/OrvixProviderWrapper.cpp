@@ -13,8 +13,57 @@
 #include "OrvixProviderResult.h"
 #include "WStr.h"
 
+#include <algorithm>
+#include <limits>
 #include <new>
+#include <string>
+#include <string_view>
 #include <utility>
+#include <vector>
+
+/// The wrappers, and the one client access that they share: set by every `Initialize` and read by the text output, to
+/// which a library hands no wrapper.
+class ClientAccessUsers
+{
+public:
+    static IOrvixClientAccess* Access() { return s_access; }
+
+    static void Add(OrvixProviderWrapper& wrapper)
+    {
+        wrapper.m_nextWrapper = s_wrappers;
+        s_wrappers = &wrapper;
+    }
+
+    static void Use(OrvixProviderWrapper& wrapper, IOrvixClientAccess* access)
+    {
+        wrapper.m_clientAccess = access;
+        s_access = access;
+    }
+
+    /// The last wrapper that was initialised with the access takes it along.
+    static void Remove(OrvixProviderWrapper& wrapper)
+    {
+        bool isUsed = false;
+        for (OrvixProviderWrapper** link = &s_wrappers; *link != nullptr;)
+        {
+            if (*link == &wrapper)
+            {
+                *link = wrapper.m_nextWrapper;
+                continue;
+            }
+            isUsed |= (*link)->m_clientAccess == s_access;
+            link = &(*link)->m_nextWrapper;
+        }
+        if (!isUsed)
+        {
+            s_access = nullptr;
+        }
+    }
+
+private:
+    static inline OrvixProviderWrapper* s_wrappers = nullptr;
+    static inline IOrvixClientAccess* s_access = nullptr;
+};
 
 namespace
 {
@@ -22,9 +71,6 @@ namespace
 using OrvixProviderResult::Failure;
 using OrvixProviderResult::NotOffered;
 using OrvixProviderResult::Success;
-
-/// Shared by all wrappers: set by every `Initialize`, read by the text output, to which no wrapper is given.
-IOrvixClientAccess* clientAccess = nullptr;
 
 int ToResult(SCCRTN result)
 {
@@ -36,7 +82,26 @@ LONG KeepOption(unsigned long options)
     return (options & OrvixProviderOption::KeepCheckedOut) != 0 ? SCC_KEEP_CHECKEDOUT : 0;
 }
 
-/// A comment or a name in the ANSI code page, never null. Throws std::bad_alloc.
+/// Sends a line to the host.
+void Tell(const wchar_t* text)
+{
+    if (IOrvixClientAccess* access = ClientAccessUsers::Access())
+    {
+        Completes([&] { access->OutputText(text, 0); });
+    }
+}
+
+/// Receives the library's text output, of whatever kind.
+LONG OutputText(LPCSTR text, LONG)
+{
+    if (const WStr wide(text); wide.Get() != nullptr)
+    {
+        Tell(wide.Get());
+    }
+    return SCC_MSG_RTN_OK;
+}
+
+/// A name in the ANSI code page, never null; characters that it does not have are replaced. Throws std::bad_alloc.
 class NarrowText
 {
 public:
@@ -53,31 +118,84 @@ private:
     CStr m_text;
 };
 
-/// Receives the library's text output, of whatever kind.
-LONG OutputText(LPCSTR text, LONG)
+/// A comment, with a line to the host when it loses characters. Throws std::bad_alloc.
+class NarrowComment : public NarrowText
 {
-    return WithBarrier(LONG{0}, [text] {
-        const WStr wide(text);
-        if (clientAccess != nullptr && wide.Get() != nullptr)
+public:
+    explicit NarrowComment(const wchar_t* comment) : NarrowText(comment)
+    {
+        const std::wstring_view wide = comment != nullptr ? comment : L"";
+        if (std::all_of(wide.begin(), wide.end(), [](wchar_t c) { return c < 0x80; }))
         {
-            clientAccess->OutputText(wide.Get(), 0);
+            return;
         }
-        return LONG{0};
+        const WStr back(Get());
+        if (back.Get() == nullptr)
+        {
+            throw std::bad_alloc();
+        }
+        if (back.Get() != wide)
+        {
+            Tell(L"The comment has characters that the code page of this system does not have. They are replaced.");
+        }
+    }
+};
+
+/// Runs an operation and gives its result: `Failure` when anything is thrown, with a line to the host when memory ran
+/// out.
+template <typename Operation>
+int Run(const Operation& operation)
+{
+    return WithBarrier(Failure, [&] {
+        try
+        {
+            return operation();
+        }
+        catch (const std::bad_alloc&)
+        {
+            Tell(L"There is not enough memory. The operation failed.");
+            return Failure;
+        }
     });
+}
+
+/// Adds a path; false, with a line to the host, when the code page does not carry it.
+bool AddOrTell(NarrowPaths& paths, const wchar_t* path)
+{
+    if (paths.Add(path))
+    {
+        return true;
+    }
+    const std::wstring file = path;
+    Tell((file +
+          L": the name has characters that the code page of this system does not have. The provider was not called.")
+             .c_str());
+    return false;
+}
+
+/// Number of active entries; 0 for a list that no library can be asked about.
+unsigned int CountOf(OrvixFileList* list)
+{
+    const unsigned int count = list != nullptr ? list->NumActiveEntries() : 0;
+    return count <= static_cast<unsigned int>(std::numeric_limits<LONG>::max()) ? count : 0;
 }
 
 /// Hands the paths of the active entries, of which there must be one, to `work` and gives its result.
 template <typename Work>
-int FileOperation(OrvixFileList* list, Work work)
+int FileOperation(OrvixFileList* list, const Work& work)
 {
-    return WithBarrier(Failure, [&] {
-        const unsigned int count = list != nullptr ? list->NumActiveEntries() : 0;
-        if (count == 0)
+    return Run([&] {
+        const unsigned int count = CountOf(list);
+        NarrowPaths paths(count);
+        for (unsigned int i = 0; i < count; ++i)
         {
-            return Failure;
+            OrvixFileEntry* entry = list->GetActiveFileEntry(i);
+            if (entry == nullptr || !AddOrTell(paths, entry->GetFile()))
+            {
+                return Failure;
+            }
         }
-        NarrowPaths paths(*list, count);
-        return work(paths);
+        return count > 0 ? work(paths) : Failure;
     });
 }
 
@@ -108,8 +226,16 @@ unsigned long FlagsOf(LONG status, bool projectOpen)
 
 } // namespace
 
-OrvixProviderWrapper::OrvixProviderWrapper() = default;
-OrvixProviderWrapper::~OrvixProviderWrapper() = default;
+OrvixProviderWrapper::OrvixProviderWrapper()
+{
+    ClientAccessUsers::Add(*this);
+}
+
+OrvixProviderWrapper::~OrvixProviderWrapper()
+{
+    m_bridge.reset(); // the library may send text until it is gone
+    ClientAccessUsers::Remove(*this);
+}
 
 void OrvixProviderWrapper::SetMSSCC(std::unique_ptr<OrvixMSSCC> bridge)
 {
@@ -138,13 +264,13 @@ bool OrvixProviderWrapper::IsProjectOpen()
 
 int OrvixProviderWrapper::Initialize(OrvixClientInfo* info)
 {
-    return WithBarrier(Failure, [&] {
+    return Run([&] {
         if (info == nullptr)
         {
             return Failure;
         }
         m_bridge->SetParentWindow(info->GetParentWindow());
-        clientAccess = info->GetIOrvixClientAccess();
+        ClientAccessUsers::Use(*this, info->GetIOrvixClientAccess());
         return ToResult(m_bridge->Initialize(NarrowText(info->GetClientName()).Get()));
     });
 }
@@ -156,9 +282,13 @@ int OrvixProviderWrapper::Uninitialize()
 
 int OrvixProviderWrapper::OpenProject(const wchar_t* localPath, const wchar_t* comment)
 {
-    return WithBarrier(Failure, [&] {
-        NarrowPaths folder(localPath);
-        return ToResult(m_bridge->OpenProject(*folder.Get(), NarrowText(comment).Get(), OutputText));
+    return Run([&] {
+        NarrowPaths folder(1);
+        if (!AddOrTell(folder, localPath))
+        {
+            return Failure;
+        }
+        return ToResult(m_bridge->OpenProject(*folder.Get(), NarrowComment(comment).Get(), OutputText));
     });
 }
 
@@ -180,7 +310,7 @@ int OrvixProviderWrapper::ReservedC()
 int OrvixProviderWrapper::CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
-        const NarrowText text(comment);
+        const NarrowComment text(comment);
         return ToResult(m_bridge->Checkin(paths.Count(), paths.Get(), text.Get(), KeepOption(options), nullptr));
     });
 }
@@ -188,7 +318,7 @@ int OrvixProviderWrapper::CheckIn(OrvixFileList* list, const wchar_t* comment, u
 int OrvixProviderWrapper::CheckOut(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
-        const NarrowText text(comment);
+        const NarrowComment text(comment);
         if ((options & OrvixProviderOption::GetLatest) != 0)
         {
             m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr); // a failed get does not stop the check-out
@@ -230,7 +360,7 @@ int OrvixProviderWrapper::ReservedE()
 int OrvixProviderWrapper::Add(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
-        const NarrowText text(comment);
+        const NarrowComment text(comment);
         std::vector<LONG> perFile(static_cast<std::size_t>(paths.Count()), KeepOption(options));
         return ToResult(m_bridge->Add(paths.Count(), paths.Get(), text.Get(), perFile.data(), nullptr));
     });
@@ -250,31 +380,57 @@ int OrvixProviderWrapper::ShowHistory(OrvixFileList* list)
 
 int OrvixProviderWrapper::ShowProperties(OrvixFileList* list)
 {
-    return WithBarrier(Failure, [&] {
-        if (list == nullptr || list->NumActiveEntries() == 0)
+    return Run([&] {
+        OrvixFileEntry* entry = CountOf(list) > 0 ? list->GetActiveFileEntry(0) : nullptr;
+        NarrowPaths first(1);
+        if (entry == nullptr || !AddOrTell(first, entry->GetFile()))
         {
             return Failure;
         }
-        NarrowPaths first(*list, 1);
         return ToResult(m_bridge->Properties(*first.Get()));
     });
 }
 
 int OrvixProviderWrapper::QueryStatus(OrvixFileList* list, unsigned long)
 {
-    return FileOperation(list, [&](NarrowPaths& paths) {
-        // Whatever a library does not fill stays "not controlled".
-        std::vector<LONG> statuses(static_cast<std::size_t>(paths.Count()), 0);
-        if (IsProjectOpen() && m_bridge->QueryInfo(paths.Count(), paths.Get(), statuses.data()) != SCC_OK)
+    return Run([&] {
+        const unsigned int count = CountOf(list);
+        if (count == 0)
         {
             return Failure;
         }
-        for (unsigned int i = 0; i < statuses.size(); ++i)
+        const bool isOpen = IsProjectOpen();
+        NarrowPaths paths(isOpen ? count : 0);
+        std::vector<unsigned int> leftOut; // the entries whose names no library can take
+        for (unsigned int i = 0; isOpen && i < count; ++i)
         {
+            OrvixFileEntry* entry = list->GetActiveFileEntry(i);
+            if (entry == nullptr)
+            {
+                return Failure;
+            }
+            if (!paths.Add(entry->GetFile()))
+            {
+                leftOut.push_back(i);
+            }
+        }
+        // Whatever a library does not fill stays "not controlled".
+        std::vector<LONG> statuses(static_cast<std::size_t>(paths.Count()), SCC_STATUS_NOTCONTROLLED);
+        if (!statuses.empty() && m_bridge->QueryInfo(paths.Count(), paths.Get(), statuses.data()) != SCC_OK)
+        {
+            return Failure;
+        }
+        auto nextLeftOut = leftOut.begin();
+        auto nextStatus = statuses.begin();
+        for (unsigned int i = 0; i < count; ++i)
+        {
+            const bool isLeftOut = nextLeftOut != leftOut.end() && *nextLeftOut == i;
+            nextLeftOut += isLeftOut ? 1 : 0;
+            const LONG status = isOpen && !isLeftOut ? *nextStatus++ : SCC_STATUS_NOTCONTROLLED;
             // A library that shows windows may have let the host shorten the list.
             if (OrvixFileEntry* entry = list->GetActiveFileEntry(i))
             {
-                entry->SetFlagsOut(FlagsOf(statuses[i], IsProjectOpen()));
+                entry->SetFlagsOut(isLeftOut ? OrvixFileState::NotControlled : FlagsOf(status, IsProjectOpen()));
             }
         }
         return Success;

@@ -4,16 +4,22 @@
 
 #include <memory>
 
+class IOrvixClientAccess;
 class OrvixMSSCC;
 
 /// An installed MSSCCI library as a provider: turns the active entries of a list into narrow paths, calls the bridge,
 /// and turns its result into 0 (the library answered 0) or -1.
 ///
-/// An operation fails with -1 before anything is sent: for a null or empty list, for a null path, when memory runs out,
-/// and for a path that the ANSI code page does not carry exactly, since it would name another file. Comments and names
-/// may lose characters. A null comment counts as empty. An exception of the library or the host fails the operation.
+/// An operation fails with -1 before anything is sent: for a null or empty list, for a list of 2^31 files or more, for
+/// a null path, when memory runs out, and for a path that the ANSI code page does not carry exactly, since it would
+/// name another file. The host is told of the last two, and of a comment that loses characters, through `OutputText`. A
+/// null comment counts as empty. An exception of the library or the host fails the operation.
 ///
-/// The library's text output goes to the client access of the last `Initialize` of any wrapper.
+/// `QueryStatus` does not fail for such a path: it leaves the file out of the call and writes
+/// `OrvixFileState::NotControlled` alone. With no project open it converts nothing.
+///
+/// The library's text output goes to the client access of the last `Initialize` of any wrapper, until the last wrapper
+/// that was initialised with that access is gone.
 class OrvixProviderWrapper : public IOrvixProvider
 {
 public:
@@ -53,5 +59,9 @@ public:
     bool ReservedI() override;
 
 private:
+    friend class ClientAccessUsers;
+
     std::unique_ptr<OrvixMSSCC> m_bridge;
+    IOrvixClientAccess* m_clientAccess = nullptr;  ///< of the last `Initialize`
+    OrvixProviderWrapper* m_nextWrapper = nullptr; ///< in the list of all wrappers
 };

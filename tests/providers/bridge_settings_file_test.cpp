@@ -2,6 +2,7 @@
 
 #include "Bridge.h"
 #include "CodePage.h"
+#include "FileBytes.h"
 #include "Files.h"
 
 #include <cstring>
@@ -109,7 +110,7 @@ TEST_F(SettingsFileReading, FindsARootAfterOtherNodes)
 TEST_F(SettingsFileReading, FindsTheRootAfterADocumentTypeThatNothingRefersTo)
 {
     for (const char* type :
-         {"<!DOCTYPE MSSCCProjectSettings>", R"(<!DOCTYPE a [<!ENTITY e "text">]>)", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
+         {"<!DOCTYPE MSSCCProjectSettings>", "<!DOCTYPE a [<!ELEMENT a ANY>]>", R"(<!DOCTYPE a SYSTEM "b.dtd">)"})
     {
         SCOPED_TRACE(type);
         ExpectRead(type + Shape("server", "$/song").substr(Shape("", "").find("<MSS")), "server", "$/song");
@@ -327,3 +328,38 @@ TEST_F(SettingsFileWriting, GoesToAFolderWithANonAsciiName)
 }
 
 } // namespace
+
+TEST_F(SettingsFile, ThatCannotBeReadIsKeptBeforeItIsReplaced)
+{
+    const std::filesystem::path kept = FileBytes::KeptName(Path().wstring());
+    for (const std::string xml : {"<MSSCCProjectSettings><AuxPath>a</Aux", "<Other/>"})
+    {
+        Write(xml);
+        Start();
+        Choose("path", "project");
+        EXPECT_EQ(Open(), SCC_OK);
+        EXPECT_EQ(Content(), Shape("path", "project"));
+        EXPECT_EQ(ReadBytes(kept), xml);
+        std::filesystem::remove(kept);
+        NewBridge(L"recording_full");
+        m_bridge->SetProjectSettingsFile(L"settings.xml");
+    }
+    Start();
+    Choose("path", "project");
+    EXPECT_EQ(Open(), SCC_OK);
+    EXPECT_FALSE(std::filesystem::exists(kept)) << "it was read";
+}
+
+TEST_F(SettingsFile, OfANameThatIsNotBareIsNotUsed)
+{
+    for (const wchar_t* name : {L"..\\settings.xml", L"sub\\settings.xml", L"settings.xml:stream", L"NUL", L".."})
+    {
+        NewBridge(L"recording_full");
+        m_bridge->SetProjectSettingsFile(name);
+        Start();
+        Choose("path", "project");
+        EXPECT_EQ(Open(), SCC_OK);
+        EXPECT_TRUE(std::filesystem::is_empty(m_folder.Path()));
+        EXPECT_FALSE(std::filesystem::exists(m_folder.Path().parent_path() / L"settings.xml"));
+    }
+}

@@ -1,6 +1,8 @@
+#include "OrvixFileFlags.h"
 #include "WrapperTest.h"
 
 #include <stdexcept>
+#include <string_view>
 
 using testing::Contains;
 using testing::Each;
@@ -68,6 +70,10 @@ protected:
 
 TEST_P(WrapperTextsOperation, SendsNothingForAPathThatTheCodePageCannotExpress)
 {
+    if (std::string_view(GetParam().name) == "QueryStatus")
+    {
+        return; // leaves such files out, see below
+    }
     Open();
     for (const wchar_t* path : InexactPaths)
     {
@@ -93,8 +99,35 @@ TEST_F(WrapperTexts, OneInexactPathAmongManyStopsTheOperation)
     Open();
     ActiveList list{L"C:\\a", L"C:\\b", L"C:\\\uFF21"};
     EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"", 0), Result::Failure);
-    EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), Result::Failure);
     EXPECT_THAT(m_scc.Take(), IsEmpty());
+}
+
+TEST_F(WrapperTexts, AQueryLeavesInexactPathsOutAsNeitherControlledNorToBeAdded)
+{
+    Open();
+    m_scc.queryInfo = [](LPVOID, LONG, LPCSTR*, LONG* status) {
+        status[0] = SCC_STATUS_CONTROLLED;
+        status[1] = SCC_STATUS_NOTCONTROLLED;
+        return SCC_OK;
+    };
+    ActiveList list{L"C:\\\u5009", L"C:\\a", L"C:\\\uFF21", L"C:\\b", L"C:\\\u0100"};
+    EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), Result::Success);
+    EXPECT_THAT(m_scc.Take(), ElementsAre(HasSubstr(R"(0x2, ["C:\a", "C:\b"])")));
+    for (const unsigned int leftOut : {0U, 2U, 4U})
+    {
+        EXPECT_EQ(list.FlagsOf(leftOut), OrvixFileState::NotControlled);
+    }
+    EXPECT_NE(list.FlagsOf(1) & OrvixFileState::Controlled, 0U);
+    EXPECT_NE(list.FlagsOf(3) & OrvixFilePermission::Add, 0U);
+}
+
+TEST_F(WrapperTexts, AQueryOfInexactPathsAloneAsksNothing)
+{
+    Open();
+    ActiveList list{L"C:\\\u5009"};
+    EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), Result::Success);
+    EXPECT_THAT(m_scc.Take(), IsEmpty());
+    EXPECT_EQ(list.FlagsOf(0), OrvixFileState::NotControlled);
 }
 
 TEST_F(WrapperTexts, ProjectFolderMustBeExact)
@@ -211,6 +244,28 @@ TEST_F(WrapperOutput, WithoutClientAccessIsIgnored)
     EXPECT_THAT(Host().lines, IsEmpty());
 }
 
+TEST_F(WrapperOutput, TellsWhichFileStopsAnOperationAndWhy)
+{
+    InitializeFor(*m_wrapper, &Host());
+    OpenForOutput(*m_wrapper);
+    ActiveList list{L"C:\\a", L"C:\\\xD800.txt"};
+    EXPECT_EQ(m_wrapper->GetLatest(list.Get(), 0), Result::Failure);
+    ASSERT_EQ(Host().lines.size(), 1U);
+    EXPECT_EQ(Host().lines[0].second, 0);
+    EXPECT_NE(Host().lines[0].first.find(L"C:\\\xD800.txt: "), std::wstring::npos);
+}
+
+TEST_F(WrapperOutput, TellsOnceThatACommentLosesCharacters)
+{
+    InitializeFor(*m_wrapper, &Host());
+    OpenForOutput(*m_wrapper);
+    ActiveList list{L"C:\\a"};
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"plain", 0), Result::Success);
+    EXPECT_THAT(Host().lines, IsEmpty());
+    EXPECT_EQ(m_wrapper->CheckIn(list.Get(), L"\xD800", 0), Result::Success);
+    EXPECT_EQ(Host().lines.size(), 1U);
+}
+
 TEST_F(WrapperOutput, ReachesTheHostAsWideTextOfKindZero)
 {
     InitializeFor(*m_wrapper, &Host());
@@ -297,4 +352,48 @@ TEST_F(WrapperOutput, LetsTheHostCallBack)
     Host().onOutput = [&] { EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), Result::Success); };
     EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
     EXPECT_EQ(list.FlagsOf(0), State::NotControlled | Permission::Add);
+}
+
+TEST_F(WrapperOutput, ForgetsTheClientAccessWithTheLastWrapperThatUsesIt)
+{
+    OrvixProviderWrapper other;
+    other.SetMSSCC(NewBridge(L"recording_full"));
+    InitializeFor(other, &Host());
+    InitializeFor(*m_wrapper, &Host());
+    const LPTEXTOUTPROC output = OpenForOutput(other);
+    m_wrapper.reset();
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
+    EXPECT_EQ(Host().lines.size(), 1U) << "another one uses it";
+    Host() = {};
+    InitializeFor(other, nullptr);
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
+    auto last = std::make_unique<OrvixProviderWrapper>();
+    last->SetMSSCC(NewBridge(L"recording_full"));
+    InitializeFor(*last, &Host());
+    last.reset();
+    EXPECT_EQ(output("text", SCC_MSG_INFO), SCC_MSG_RTN_OK);
+    EXPECT_THAT(Host().lines, IsEmpty());
+}
+
+using WrapperQuery = WrapperTest;
+
+TEST_F(WrapperQuery, OfAnInexactNameWithoutAProjectIsNotControlled)
+{
+    ActiveList list{L"C:\\a", L"C:\\\xD800.txt"};
+    EXPECT_EQ(m_wrapper->QueryStatus(list.Get(), 0), Result::Success);
+    EXPECT_EQ(list.FlagsOf(0), State::NotControlled);
+    EXPECT_EQ(list.FlagsOf(1), State::NotControlled);
+}
+
+TEST_F(WrapperQuery, OfMoreFilesThanTheInterfaceCountsIsRefused)
+{
+    struct HugeList : OrvixFileList
+    {
+        unsigned int NumActiveEntries() override { return 0x80000000U; }
+    };
+    Open();
+    HugeList list;
+    EXPECT_EQ(m_wrapper->QueryStatus(&list, 0), Result::Failure);
+    EXPECT_EQ(m_wrapper->CheckIn(&list, L"", 0), Result::Failure);
+    EXPECT_THAT(m_scc.Take(), IsEmpty());
 }

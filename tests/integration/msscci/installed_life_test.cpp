@@ -1,5 +1,8 @@
 #include "InstalledTest.h"
 #include "ModulePath.h"
+#include "OrvixFileEntry.h"
+#include "OrvixFileList.h"
+#include "OrvixFileListDialogParams.h"
 #include "ProcessDllDirectory.h"
 
 using testing::ElementsAre;
@@ -214,4 +217,71 @@ TEST_F(InstalledLibrary, SendsItsTextOutputToTheHost)
     };
     EXPECT_EQ(provider->OpenProject(L"C:\\p", L""), OrvixProviderResult::Success);
     EXPECT_THAT(host.lines, ElementsAre(OutputHost::Line(L"opening", 0)));
+}
+
+TEST_F(InstalledLibrary, MayLetTheHostEndTheServicesInItsLastCall)
+{
+    // Each of the host's calls, while the library ends after a shutdown and after one that waited.
+    enum class Act
+    {
+        Release,
+        ReleaseAndPrompt,
+        Shutdown,
+        Initialize
+    };
+    for (const Act act : {Act::Release, Act::ReleaseAndPrompt, Act::Shutdown, Act::Initialize})
+    {
+        for (const bool waits : {false, true})
+        {
+            m_scc = {};
+            m_services.reset();
+            IOrvixServices* services = GetIOrvixServices();
+            Install(L"Recorded");
+            ASSERT_TRUE(services->Initialize(&m_info, OrvixProviderSource::InstalledMSSCCI));
+            IOrvixProvider* provider = services->GetProvider(0);
+            ASSERT_EQ(provider->Initialize(&m_info), OrvixProviderResult::Success);
+            ASSERT_EQ(provider->OpenProject(L"C:\\p", L""), OrvixProviderResult::Success);
+            m_scc.uninitialize = [&](LPVOID) {
+                switch (act)
+                {
+                case Act::ReleaseAndPrompt:
+                    ReleaseIOrvixServices(services);
+                    services->ShowPrompt(nullptr, nullptr, nullptr, 0, 0, nullptr);
+                    break;
+                case Act::Release:
+                    ReleaseIOrvixServices(services);
+                    break;
+                case Act::Shutdown:
+                    services->Shutdown();
+                    break;
+                case Act::Initialize:
+                    EXPECT_FALSE(services->Initialize(&m_info, OrvixProviderSource::InstalledMSSCCI));
+                    break;
+                }
+                return SCC_OK;
+            };
+            m_scc.queryInfo = [&](LPVOID, LONG, LPCSTR*, LPLONG) {
+                services->Shutdown();
+                EXPECT_NE(GetModuleHandleW(Recording(L"recording_full").c_str()), nullptr) << "the library runs";
+                return SCC_OK;
+            };
+            if (waits)
+            {
+                OrvixFileList list;
+                list.AddActiveEntry(list.CreateEntry(L"C:\\p\\a", nullptr, 0, 0));
+                OrvixFileListDialogParams params;
+                params.SetOrvixFileList(&list);
+                services->RunFileListOperation(nullptr, &params, true, provider, 0, 0);
+            }
+            else
+            {
+                services->Shutdown();
+            }
+            EXPECT_EQ(GetModuleHandleW(Recording(L"recording_full").c_str()), nullptr) << "all is released";
+            if (act == Act::Shutdown || act == Act::Initialize)
+            {
+                ReleaseIOrvixServices(services);
+            }
+        }
+    }
 }
