@@ -98,9 +98,10 @@ bool ReadPrompts(OrvixPromptTable& table, const wchar_t* path, FileDiagnostics* 
         Describe(file, *diagnostics);
     }
     OrvixFileIO::Node root;
-    if (!file.GetChildNode(nullptr, RootIndex, root))
+    std::wstring rootName;
+    if (!file.GetChildNode(nullptr, RootIndex, root) || !file.GetNodeName(root.Get(), rootName))
     {
-        return false;
+        return false; // also for a comment in the root's place: the prompts after it were not read
     }
 
     DiagnosticReporter reporter(diagnostics);

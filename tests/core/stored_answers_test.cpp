@@ -159,7 +159,8 @@ protected:
 
 TEST_F(StoredAnswersFile, ThatCannotBeReadIsKeptBeforeTheFirstSaveReplacesIt)
 {
-    for (const std::string bad : {"<?xml version=\"1.0\"?><OrvixPrompts><Prompt>", "<OrvixPrompts/>", ""})
+    for (const std::string bad : {"<?xml version=\"1.0\"?><OrvixPrompts><Prompt>", "<OrvixPrompts/>", "",
+                                  "<?xml version=\"1.0\"?><!-- mine --><OrvixPrompts><Prompt/></OrvixPrompts>"})
     {
         WriteBytes(m_path, bad);
         EXPECT_FALSE(Load());
