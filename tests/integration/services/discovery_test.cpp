@@ -1,3 +1,4 @@
+#include "CurrentFolder.h"
 #include "ModulePath.h"
 #include "ServicesTest.h"
 #include "UniqueHandle.h"
@@ -234,10 +235,25 @@ INSTANTIATE_TEST_SUITE_P(
                     Rejected{L"noname", L"noname.load noname.version noname.unload "},
                     Rejected{L"noobjects", L"noobjects.load noobjects.version noobjects.name noobjects.unload "},
                     Rejected{L"noexports", L"noexports.load noexports.unload "},
+                    Rejected{L"versionthrows", L"versionthrows.load versionthrows.version versionthrows.unload "},
                     Rejected{L"namethrows", L"namethrows.load namethrows.version namethrows.name namethrows.unload "},
                     Rejected{L"namethrowscom",
                              L"namethrowscom.load namethrowscom.version namethrowscom.name namethrowscom.unload "}),
     [](const testing::TestParamInfo<Rejected>& test) { return std::filesystem::path(test.param.fake).string(); });
+
+TEST_F(Plugin, ThatChangesTheCurrentFolderWhenItIsLoadedDoesNoHarm)
+{
+    const CurrentFolder current(m_config.Path());
+    AddPlugin(L"changesfolder");
+    AddPlugin(L"other");
+    WritePrompts({{.id = "1", .action = InFile(Action::Yes)}});
+    EXPECT_TRUE(Initialize());
+    EXPECT_NE(std::filesystem::current_path(), m_config.Path());
+    EXPECT_EQ(m_services->GetProviderCount(), 2u);
+    EXPECT_TRUE(m_services->SetPromptAction(1, Action::No));
+    m_services->Shutdown();
+    EXPECT_EQ(SavedPrompts(), PromptsXml({{.id = "1", .action = InFile(Action::No)}}));
+}
 
 TEST_F(Plugin, WhoseStartUpCodeFailsIsNeverAsked)
 {

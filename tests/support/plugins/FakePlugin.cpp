@@ -63,7 +63,11 @@ extern "C" {
 std::int32_t GetOrvixVersion()
 {
     Note(L"version");
+#ifdef FAKE_VERSION_THROWS
+    throw FAKE_VERSION_THROWS;
+#else
     return FAKE_VERSION;
+#endif
 }
 
 IOrvixProvider* GetIOrvixProvider()
@@ -102,6 +106,9 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
     {
         Note(L"load");
         Print("I am loaded");
+#ifdef FAKE_CHANGES_FOLDER
+        SetCurrentDirectoryW(L"C:\\windows");
+#endif
         SetEnvironmentVariableW(L"ORVIX_FAKE_MANIFEST", ActiveManifest().c_str());
         Report(ActiveManifest());
 #ifdef FAKE_START_FAILS
