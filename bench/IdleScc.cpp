@@ -1,5 +1,5 @@
-// An MSSCCI library that does nothing at once; it only remembers how much memory its process had in the middle of
-// the last SccQueryInfo.
+// An MSSCCI library that does nothing at once; when it is asked to, it remembers how much memory its process has in the
+// middle of the next SccQueryInfo.
 
 #include "MSSCCI.h"
 
@@ -8,6 +8,7 @@
 namespace
 {
 
+bool isWatched = false;
 SIZE_T memoryInQuery = 0;
 
 } // namespace
@@ -41,10 +42,19 @@ SCCRTN SccCheckout(LPVOID, HWND, LONG, LPCSTR*, LPCSTR, LONG, LPCMDOPTS)
 
 SCCRTN SccQueryInfo(LPVOID, LONG, LPCSTR*, LPLONG)
 {
-    PROCESS_MEMORY_COUNTERS counters = {};
-    GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters);
-    memoryInQuery = counters.PagefileUsage;
+    if (isWatched)
+    {
+        PROCESS_MEMORY_COUNTERS counters = {};
+        GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters);
+        memoryInQuery = counters.PagefileUsage;
+        isWatched = false;
+    }
     return SCC_OK;
+}
+
+void WatchNextQuery()
+{
+    isWatched = true;
 }
 
 SIZE_T MemoryInQuery()

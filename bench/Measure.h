@@ -23,6 +23,14 @@ Measure Compare(
 double BestTime(
     const std::function<void()>& work, const std::function<void()>& prepare = [] {});
 
+/// Keeps a value that nothing else uses: the work that made it is not optimised away.
+template <typename Value>
+void Keep(const Value& value)
+{
+    const volatile Value kept = value;
+    static_cast<void>(kept);
+}
+
 /// Prints the table.
 class MeasureTable
 {
@@ -31,8 +39,11 @@ public:
     void Print(const Measure& measure);
 };
 
+void BenchDialogs(MeasureTable& table);
+void BenchFilters(MeasureTable& table);
+void BenchInitialize(MeasureTable& table);
 void BenchLists(MeasureTable& table);
 void BenchMsscci(MeasureTable& table);
-void BenchFiles(MeasureTable& table);
 void BenchNotifications(MeasureTable& table);
-void BenchDialogs(MeasureTable& table);
+void BenchOperations(MeasureTable& table);
+void BenchPrompts(MeasureTable& table);
