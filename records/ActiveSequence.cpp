@@ -3,19 +3,21 @@
 #include "ExceptionBarrier.h"
 
 #include <algorithm>
-#include <utility>
 
 namespace
 {
 
-constexpr auto NoSlot = static_cast<std::size_t>(-1);
+constexpr auto NoSlot = SlotIndex::NoSlot;
 
 /// As far as a reader that goes through holes may jump; a longer jump closes the holes first.
 constexpr std::size_t MaxJump = 32;
 
-/// An index is made once as many slots have been searched as this times the length, which is about what it costs, and
-/// never for a short sequence.
-constexpr std::size_t SearchesWorthAnIndex = 4;
+/// How far removals in order are looked for before the index is asked.
+constexpr std::size_t Near = 8;
+
+/// An index is made when as many slots have been searched as this times the length, and never for a short sequence: it
+/// costs about ten searched slots for each entry.
+constexpr std::size_t SearchesWorthAnIndex = 2;
 constexpr std::size_t ShortSequence = 64;
 
 } // namespace
@@ -98,61 +100,51 @@ void ActiveSequence::CloseHoles()
     m_cursor = m_cursorIndex = 0;
 }
 
-/// Slot of the first occurrence; `NoSlot` when there is none.
-std::size_t ActiveSequence::Find(OrvixFileEntry* entry)
+/// Slot of the first occurrence, which the caller then empties; `NoSlot` when there is none.
+std::size_t ActiveSequence::Find(const OrvixFileEntry* entry)
 {
-    if (m_distinct)
+    if (m_index.IsEmpty() && Size() > ShortSequence && m_searched > SearchesWorthAnIndex * Size())
     {
-        // Any occurrence is the first.
-        const std::size_t slot = FindBetween(m_nextSlot, m_slots.size(), entry);
-        return slot != NoSlot ? slot : FindBetween(m_firstSlot, m_nextSlot, entry);
-    }
-    if (m_index.IsEmpty() && Size() > ShortSequence && m_searched > SearchesWorthAnIndex * m_slots.size())
-    {
-        m_searched = 0;
         MakeIndex();
     }
-    if (!m_index.IsEmpty())
+    if (m_index.IsEmpty())
     {
-        std::size_t* const first = m_index.Find(entry);
-        if (first == nullptr || *first == NoSlot)
-        {
-            return NoSlot;
-        }
-        return std::exchange(*first, m_nextOccurrence[*first]);
+        return m_distinct ? FindInOrder(entry) : FindBetween(m_firstSlot, m_slots.size(), entry);
     }
-    const std::size_t slot = FindBetween(m_firstSlot, m_slots.size(), entry);
-    m_searched += (slot == NoSlot ? m_slots.size() : slot) - m_firstSlot;
-    return slot;
+    if (!m_index.HasRepetition())
+    {
+        const std::size_t slot = FindBetween(m_nextSlot, std::min(m_nextSlot + Near, m_slots.size()), entry);
+        if (slot != NoSlot)
+        {
+            return slot;
+        }
+    }
+    return m_index.Take(m_slots, entry);
 }
 
-std::size_t ActiveSequence::FindBetween(std::size_t from, std::size_t to, OrvixFileEntry* entry) const
+/// Of distinct entries any occurrence is the first: the search begins after the last removal.
+std::size_t ActiveSequence::FindInOrder(const OrvixFileEntry* entry)
 {
-    const auto begin = m_slots.begin() + static_cast<std::ptrdiff_t>(from);
-    const auto end = m_slots.begin() + static_cast<std::ptrdiff_t>(to);
-    const auto found = from < to ? std::find(begin, end, entry) : end;
-    return found == end || from >= to ? NoSlot : static_cast<std::size_t>(found - m_slots.begin());
+    const std::size_t slot = FindBetween(m_nextSlot, m_slots.size(), entry);
+    return slot != NoSlot ? slot : FindBetween(m_firstSlot, m_nextSlot, entry);
+}
+
+std::size_t ActiveSequence::FindBetween(std::size_t from, std::size_t to, const OrvixFileEntry* entry)
+{
+    std::size_t slot = from;
+    while (slot < to && m_slots[slot] != entry)
+    {
+        ++slot;
+    }
+    m_searched += slot - from;
+    return slot < to ? slot : NoSlot;
 }
 
 /// Without memory there is none, and the search stays linear.
 void ActiveSequence::MakeIndex()
 {
-    const bool made = Completes([this] {
-        m_nextOccurrence.assign(m_slots.size(), NoSlot);
-        m_index.Reserve(Size());
-        for (std::size_t slot = m_slots.size(); slot-- > m_firstSlot;)
-        {
-            if (m_slots[slot] != nullptr)
-            {
-                const auto [first, isNew] = m_index.Add(m_slots[slot], slot);
-                if (!isNew)
-                {
-                    m_nextOccurrence[slot] = std::exchange(first, slot);
-                }
-            }
-        }
-    });
-    if (!made)
+    m_searched = 0;
+    if (!Completes([this] { m_index.Make(m_slots, Size()); }))
     {
         m_index.Clear();
     }

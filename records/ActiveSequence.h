@@ -1,6 +1,6 @@
 #pragma once
 
-#include "FlatMap.h"
+#include "SlotIndex.h"
 
 #include <cstddef>
 #include <vector>
@@ -45,7 +45,10 @@ public:
             CloseHoles();
         }
         m_slots.push_back(entry);
-        m_index.Clear();
+        if (!m_index.IsEmpty())
+        {
+            m_index.Clear();
+        }
     }
 
     /// Removes the first occurrence of the entry; false when it is not there.
@@ -54,8 +57,9 @@ public:
 private:
     OrvixFileEntry* AtWithHoles(std::size_t index);
     void CloseHoles();
-    std::size_t Find(OrvixFileEntry* entry);
-    std::size_t FindBetween(std::size_t from, std::size_t to, OrvixFileEntry* entry) const;
+    std::size_t Find(const OrvixFileEntry* entry);
+    std::size_t FindBetween(std::size_t from, std::size_t to, const OrvixFileEntry* entry);
+    std::size_t FindInOrder(const OrvixFileEntry* entry);
     void MakeIndex();
 
     std::vector<OrvixFileEntry*> m_slots; ///< null: a hole
@@ -66,9 +70,6 @@ private:
     std::size_t m_nextSlot = 0;    ///< after the last removal, where the next one is likely
     std::size_t m_cursor = 0;      ///< slot of the entry that was read last, ...
     std::size_t m_cursorIndex = 0; ///< ... and its index; 0 and 0 when none was
-    std::size_t m_searched = 0;    ///< slots searched since the index was last given up
-
-    // Where entries repeat: for each entry the slot of its first occurrence, and for each slot the next occurrence.
-    FlatMap<OrvixFileEntry*, std::size_t> m_index; ///< empty: not made
-    std::vector<std::size_t> m_nextOccurrence;
+    std::size_t m_searched = 0;    ///< slots searched since there was an index
+    SlotIndex m_index;             ///< empty: not made
 };
