@@ -9,16 +9,12 @@
 namespace
 {
 
-/// Folders share their beginnings: the last character tells most of them apart without a comparison.
+/// Most folders are told from the path by one character: the first one on another drive, the last one in another
+/// folder of the same drive.
 bool StartsWith(std::wstring_view path, std::wstring_view folder)
 {
-    return folder.empty() ||
-           (path.size() >= folder.size() && path[folder.size() - 1] == folder.back() && path.starts_with(folder));
-}
-
-bool IsAscii(std::wstring_view text)
-{
-    return std::all_of(text.begin(), text.end(), [](wchar_t c) { return c < 0x80; });
+    return folder.empty() || (path.size() >= folder.size() && path[0] == folder[0] &&
+                              path[folder.size() - 1] == folder.back() && path.starts_with(folder));
 }
 
 /// Equal without regard to letter case. Both are in upper case from a to z; only letters beyond need the C
@@ -29,18 +25,36 @@ bool IsSameType(std::wstring_view type, std::wstring_view pathType)
     {
         return false;
     }
-    return type == pathType || (!(IsAscii(type) && IsAscii(pathType)) && _wcsicmp(type.data(), pathType.data()) == 0);
+    for (std::size_t i = 0; i < type.size(); ++i)
+    {
+        if (type[i] != pathType[i])
+        {
+            const bool ascii = (type[i] | pathType[i]) < 0x80;
+            return !ascii && _wcsicmp(type.data() + i, pathType.data() + i) == 0;
+        }
+    }
+    return true;
 }
 
 } // namespace
 
-FilteredPath::FilteredPath(const wchar_t* path) : text(UpperCase(path))
+// NOLINTNEXTLINE(cppcoreguidelines-pro-type-member-init): to fill the array would cost more than the copy
+FilteredPath::FilteredPath(const wchar_t* path)
 {
-    const std::size_t dot = text.rfind(L'.');
-    hasType = dot != std::wstring::npos;
-    if (hasType)
+    const std::size_t size = std::wcslen(path);
+    wchar_t* text = m_short.data();
+    if (size >= m_short.size())
     {
-        type = std::wstring_view(text).substr(dot + 1);
+        m_long.resize(size);
+        text = m_long.data();
+    }
+    std::transform(path, path + size, text, UpperCaseLetter);
+    text[size] = L'\0';
+    m_text = {text, size};
+    const std::size_t dot = m_text.rfind(L'.');
+    if (dot != std::wstring_view::npos)
+    {
+        m_type = m_text.substr(dot + 1);
     }
 }
 
@@ -49,18 +63,18 @@ Exclusion ProviderFilters::Judge(const FilteredPath& path) const
     if (!m_folders.empty())
     {
         const bool inFolder = std::any_of(m_folders.begin(), m_folders.end(),
-                                          [&](const std::wstring& folder) { return StartsWith(path.text, folder); });
+                                          [&](const std::wstring& folder) { return StartsWith(path.Text(), folder); });
         if (inFolder == m_exclude)
         {
             return Exclusion::ByFolder;
         }
     }
-    if (m_fileTypes.empty() || !path.hasType)
+    if (m_fileTypes.empty() || !path.HasType())
     {
         return Exclusion::None;
     }
     const bool hasType = std::any_of(m_fileTypes.begin(), m_fileTypes.end(),
-                                     [&](const std::wstring& type) { return IsSameType(type, path.type); });
+                                     [&](const std::wstring& type) { return IsSameType(type, path.Type()); });
     return hasType == m_exclude ? Exclusion::ByType : Exclusion::None;
 }
 

@@ -1,21 +1,33 @@
 #pragma once
 
+#include <array>
 #include <string>
 #include <string_view>
 #include <vector>
 
 /// A path in upper case and the text after its last dot, made once for all filters.
-struct FilteredPath
+class FilteredPath
 {
+public:
+    /// Throws std::bad_alloc; not for a path of usual length, whose copy is within the object.
     explicit FilteredPath(const wchar_t* path);
-    ~FilteredPath() = default;
-
-    std::wstring text;
-    bool hasType;           ///< whether there is any dot
-    std::wstring_view type; ///< is in `text` and reaches to its end
-
     FilteredPath(const FilteredPath&) = delete;
     FilteredPath& operator=(const FilteredPath&) = delete;
+    ~FilteredPath() = default;
+
+    std::wstring_view Text() const { return m_text; }
+
+    /// Whether there is any dot.
+    bool HasType() const { return m_type.data() != nullptr; }
+
+    /// Ends with the text, and with a null character after it.
+    std::wstring_view Type() const { return m_type; }
+
+private:
+    std::array<wchar_t, 260> m_short; // not filled: most of it is not used
+    std::wstring m_long;              // a text for which the array is too short
+    std::wstring_view m_text;
+    std::wstring_view m_type;
 };
 
 /// Why a filter excludes a file.
