@@ -63,6 +63,23 @@ TEST(OrvixProviderConfigIsFileExcluded, GivesTheVerdictWithoutAPlaceForTheName)
     EXPECT_FALSE(config.IsFileExcluded(L"a.txt", nullptr));
 }
 
+TEST(OrvixProviderConfigIsFileExcluded, GivesTheSameWhenFiltersAreThereSeveralTimes)
+{
+    ProviderFilters* objects = ExcludeType(L"objects", L"OBJ");
+    ProviderFilters* first = ExcludeType(L"first of two", L"TMP");
+    ProviderFilters* second = ExcludeType(L"second", L"TMP");
+    OrvixProviderConfig config;
+    config.m_filters = {objects, objects, objects, first, first, objects, second, second, first};
+    std::wstring name = L"before";
+    EXPECT_FALSE(config.IsFileExcluded(L"a.txt", &name));
+    EXPECT_EQ(name, L"before");
+    EXPECT_TRUE(config.IsFileExcluded(L"a.tmp", &name));
+    EXPECT_EQ(name, L"first of two");
+    EXPECT_EQ(config.FindExclusion(L"a.tmp").filter, first);
+    EXPECT_TRUE(config.IsFileExcluded(L"a.obj", &name));
+    EXPECT_EQ(name, L"objects");
+}
+
 TEST(OrvixProviderConfigIsFileExcluded, IsFalseForANullPath)
 {
     OrvixProviderConfig config;

@@ -1,7 +1,9 @@
+#include "ImportHook.h"
 #include "ProviderFilters.h"
 
 #include <gtest/gtest.h>
 
+#include <cstddef>
 #include <initializer_list>
 #include <string>
 
@@ -18,6 +20,15 @@ struct Filter : ProviderFilters
         m_fileTypes = types;
     }
 };
+
+int g_allocations = 0;
+void* (*g_malloc)(std::size_t) = nullptr;
+
+void* CountingMalloc(std::size_t size)
+{
+    ++g_allocations;
+    return g_malloc(size);
+}
 
 constexpr bool Exclude = true;
 constexpr bool Include = false;
@@ -164,6 +175,53 @@ TEST(ProviderFiltersExcludes, TakesVeryLongPaths)
     const std::wstring path = L"c:\\" + std::wstring(100000, L'x') + L".tmp";
     EXPECT_TRUE(Filter(Exclude, {}, {L"TMP"}).Excludes(path.c_str()));
     EXPECT_FALSE(Filter(Exclude, {}, {L"TXT"}).Excludes(path.c_str()));
+}
+
+TEST(ProviderFiltersExcludes, TakesPathsThatJustFitOrDoNotFitItsBuffer)
+{
+    for (std::size_t size = 250; size < 270; ++size)
+    {
+        const std::wstring path = L"c:\\" + std::wstring(size - 7, L'x') + L".tmp";
+        ASSERT_EQ(path.size(), size);
+        EXPECT_TRUE(Filter(Exclude, {}, {L"TMP"}).Excludes(path.c_str())) << size;
+        EXPECT_FALSE(Filter(Exclude, {}, {L"TM"}).Excludes(path.c_str())) << size;
+        EXPECT_TRUE(Filter(Exclude, {L"C:\\XX"}, {}).Excludes(path.c_str())) << size;
+        EXPECT_TRUE(Filter(Exclude, {L"C:\\" + std::wstring(size - 7, L'X') + L".TMP"}, {}).Excludes(path.c_str()))
+            << size;
+    }
+}
+
+TEST(ProviderFiltersExcludes, ComparesTheWholeFolderThatAgreesInItsFirstAndLastCharacters)
+{
+    EXPECT_FALSE(Filter(Exclude, {L"C:\\ABC\\"}, {}).Excludes(L"c:\\axc\\file"));
+    EXPECT_FALSE(Filter(Exclude, {L"D:\\ABC\\"}, {}).Excludes(L"c:\\abc\\file"));
+    EXPECT_FALSE(Filter(Exclude, {L"C:\\ABC\\"}, {}).Excludes(L"c:\\abcd\\file"));
+    EXPECT_TRUE(Filter(Exclude, {L"C"}, {}).Excludes(L"c:\\file"));
+    EXPECT_FALSE(Filter(Exclude, {L"D"}, {}).Excludes(L"c:\\file"));
+}
+
+TEST(ProviderFiltersExcludes, ComparesTypesThatBeginWithNonAsciiOrEndDifferently)
+{
+    EXPECT_TRUE(Filter(Exclude, {}, {L"\u00C4BC"}).Excludes(L"a.\u00C4bc"));
+    EXPECT_FALSE(Filter(Exclude, {}, {L"\u00C4BC"}).Excludes(L"a.\u00C4bd"));
+    EXPECT_FALSE(Filter(Exclude, {}, {L"A\u00C4C"}).Excludes(L"a.b\u00C4c"));
+    EXPECT_FALSE(Filter(Exclude, {}, {L"TMP"}).Excludes(L"a.tmq"));
+    EXPECT_FALSE(Filter(Exclude, {}, {L"TMP"}).Excludes(L"a.xmp"));
+}
+
+TEST(ProviderFiltersExcludes, AllocatesNothingForAPathOfUsualLength)
+{
+    const Filter filter(Exclude, {L"C:\\OUT\\"}, {L"TMP"});
+    const std::wstring usual = L"c:\\project\\" + std::wstring(200, L'x') + L".txt";
+    const std::wstring longer = L"c:\\project\\" + std::wstring(300, L'x') + L".txt";
+    const ImportHook hook(GetModuleHandleW(nullptr), "malloc", reinterpret_cast<void*>(&CountingMalloc));
+    ASSERT_TRUE(hook.IsActive());
+    g_malloc = hook.Original<void*(std::size_t)>();
+    g_allocations = 0;
+    EXPECT_FALSE(filter.Excludes(usual.c_str()));
+    EXPECT_EQ(g_allocations, 0);
+    EXPECT_FALSE(filter.Excludes(longer.c_str()));
+    EXPECT_GT(g_allocations, 0);
 }
 
 TEST(ProviderFiltersJudge, TellsTheFolderFromTheType)

@@ -8,8 +8,11 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <filesystem>
+#include <random>
 #include <string>
+#include <vector>
 
 namespace
 {
@@ -139,6 +142,52 @@ TEST_F(StoredAnswersTest, RegisterWithoutATextAddsNothingAndLeavesAnOldText)
     m_answers.Register(Save, nullptr, OrvixPromptAction::No, 0, !Overwrite);
     ASSERT_EQ(m_answers.Table().NumPrompts(), 1);
     EXPECT_STREQ(m_answers.Table().GetPromptText(0), L"text");
+}
+
+/// The rows are found through an index, which every change of the table keeps right.
+TEST_F(StoredAnswersTest, AreThoseOfTheTableAfterAnyChangeOfIt)
+{
+    std::mt19937 random(1);
+    const auto anyID = [&] { return static_cast<std::uint32_t>(random() % 40); };
+    OrvixPromptTable& table = m_answers.Table();
+    const auto rowsWith = [&](std::uint32_t id) {
+        std::vector<unsigned int> rows;
+        for (unsigned int row = 0; row < static_cast<unsigned int>(table.NumPrompts()); ++row)
+        {
+            if (table.GetPromptID(row) == static_cast<int>(id))
+            {
+                rows.push_back(row);
+            }
+        }
+        return rows;
+    };
+    for (std::uint32_t step = 0; step < 20000; ++step)
+    {
+        const auto count = static_cast<unsigned int>(table.NumPrompts());
+        switch (random() % 8)
+        {
+        case 0:
+            AddRow(anyID(), step, random() % 4 == 0);
+            break;
+        case 1:
+            table.SetPromptID(count != 0 ? random() % count : 0, static_cast<int>(anyID()));
+            break;
+        case 2:
+            if (random() % 100 == 0)
+            {
+                table.RemoveAll();
+            }
+            break;
+        default:
+            const std::uint32_t id = anyID();
+            const std::vector<unsigned int> rows = rowsWith(id);
+            ASSERT_EQ(m_answers.GetAction(id), rows.empty() ? 0 : table.GetPrompt(rows.front()));
+            ASSERT_EQ(m_answers.IsLocked(id), !rows.empty() && table.GetLocked(rows.front()));
+            const bool isWritable = !rows.empty() && !table.GetLocked(rows.back());
+            ASSERT_EQ(m_answers.SetAction(id, step), isWritable);
+            ASSERT_TRUE(!isWritable || table.GetPrompt(rows.back()) == step);
+        }
+    }
 }
 
 namespace

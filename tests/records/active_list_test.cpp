@@ -652,3 +652,55 @@ TEST(RemoveActiveEntry, RemovesFirstOccurrencesInALongListOfRepetitions)
     }
     EXPECT_EQ(Active(list), model);
 }
+
+/// Long enough for an index, which is made after some searches; appending ends it and reading from afar closes the
+/// gaps.
+TEST(RemoveActiveEntry, KeepsTheOrderWhateverTheOrderOfRemovalInALongListWithRepetitions)
+{
+    for (unsigned int seed = 0; seed < 40; ++seed)
+    {
+        std::mt19937 random(seed);
+        const unsigned int mostOften = 1 + seed % 4;
+        OrvixFileList list;
+        Entries expected;
+        for (unsigned int n = 0; n < 200; ++n)
+        {
+            expected.insert(expected.end(), 1 + random() % mostOften, Create(list, nullptr, 1));
+        }
+        if (seed % 3 != 0)
+        {
+            std::shuffle(expected.begin(), expected.end(), random);
+        }
+        for (OrvixFileEntry* entry : expected)
+        {
+            list.AddActiveEntry(entry);
+        }
+        Entries order = expected;
+        if (seed % 2 != 0)
+        {
+            std::shuffle(order.begin(), order.end(), random);
+        }
+        for (std::size_t n = 0; n < order.size(); ++n)
+        {
+            ASSERT_TRUE(list.RemoveActiveEntry(order[n]));
+            expected.erase(std::find(expected.begin(), expected.end(), order[n]));
+            if (n % 100 == 50)
+            {
+                expected.push_back(order[n]);
+                order.push_back(order[n]);
+                ASSERT_EQ(list.AddActiveEntry(order[n]), expected.size());
+            }
+            const auto middle = static_cast<unsigned int>(expected.size() / 2);
+            if (n % 70 == 20 && !expected.empty())
+            {
+                ASSERT_EQ(list.GetActiveFileEntry(middle), expected[middle]);
+            }
+            if (n % 10 == 0)
+            {
+                ASSERT_EQ(Active(list), expected) << "sequence " << seed << ", removal " << n;
+            }
+        }
+        ASSERT_FALSE(list.RemoveActiveEntry(order[0]));
+        ASSERT_EQ(list.NumActiveEntries(), 0u);
+    }
+}
