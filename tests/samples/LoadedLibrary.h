@@ -4,6 +4,8 @@
 
 #include <windows.h>
 
+#include <array>
+#include <cstddef>
 #include <filesystem>
 #include <string>
 #include <vector>
@@ -46,3 +48,40 @@ public:
 private:
     UniqueModule m_module;
 };
+
+/// Bytes in use in all heaps of the process.
+inline std::size_t BusyHeapBytes()
+{
+    std::array<HANDLE, 64> heaps = {};
+    const DWORD count = GetProcessHeaps(static_cast<DWORD>(heaps.size()), heaps.data());
+    std::size_t bytes = 0;
+    for (DWORD i = 0; i < count && i < heaps.size(); ++i)
+    {
+        HeapLock(heaps[i]);
+        PROCESS_HEAP_ENTRY entry = {};
+        while (HeapWalk(heaps[i], &entry) != FALSE)
+        {
+            bytes += (entry.wFlags & PROCESS_HEAP_ENTRY_BUSY) != 0 ? entry.cbData : 0;
+        }
+        HeapUnlock(heaps[i]);
+    }
+    return bytes;
+}
+
+/// The heap memory in bytes that a library leaves behind each time that it is loaded and unloaded.
+inline std::size_t LeftByLoading(const std::filesystem::path& file)
+{
+    constexpr std::size_t Times = 20;
+    const auto load = [&] { return LoadedLibrary(file).Module() != nullptr; };
+    if (!load())
+    {
+        return static_cast<std::size_t>(-1);
+    }
+    const std::size_t before = BusyHeapBytes();
+    for (std::size_t i = 0; i < Times; ++i)
+    {
+        load();
+    }
+    const std::size_t after = BusyHeapBytes();
+    return after > before ? (after - before) / Times : 0;
+}

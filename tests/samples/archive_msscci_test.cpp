@@ -295,6 +295,11 @@ BOOL StopAtOnce(LPVOID list, BOOL add, LONG status, LPSTR name)
 
 // The library
 
+TEST(ArchiveSccLibrary, LeavesLittleMemoryWhenItIsUnloaded)
+{
+    EXPECT_LT(LeftByLoading(BuiltFile(L"archive_msscci.dll").c_str()), 10000u);
+}
+
 TEST(ArchiveSccLibrary, ExportsThe21FunctionsAndNothingElse)
 {
     const SccLibrary library(BuiltFile(L"archive_msscci.dll").c_str());

@@ -221,6 +221,11 @@ TEST(ArchivePluginContract, DeletesTheProviderWhenItIsUnloaded)
     EXPECT_EQ(BraeDiagnostics::LiveBlocks(), before);
 }
 
+TEST(ArchivePluginContract, LeavesLittleMemoryWhenItIsUnloaded)
+{
+    EXPECT_LT(LeftByLoading(BuiltFile(L"plugins/archive.dll").c_str()), 10000u);
+}
+
 TEST(ArchivePluginContract, GivesNoProviderWhenTheHostsHeapIsExhausted)
 {
     const Plugin plugin(BuiltFile(L"plugins/archive.dll").c_str());
