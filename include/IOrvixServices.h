@@ -30,8 +30,8 @@ public:
     /// `OrvixProviderSource`. True when a plug-in was added or the registry of MSSCCI libraries could be read. The
     /// object is initialised in either case, except when `info` is null or memory runs out before the configuration
     /// folder is known: false, and nothing is done. A second call adds every provider again. While another operation of
-    /// the object runs foreign code (`RunFileListOperation`, a dialog, `Initialize`, `Shutdown`; a listener, a dialog or
-    /// a provider calls back): false, and nothing is done. [library, main-thread]
+    /// the object runs foreign code (`RunFileListOperation`, a dialog, `Initialize`, `Shutdown`) and that code calls
+    /// back: false, and nothing is done. [library, main-thread]
     virtual bool Initialize(OrvixClientInfo* info, std::uint32_t sources) = 0;
 
     /// Saves the stored answers (a failure to save is ignored) and releases every provider. The user-interface library
