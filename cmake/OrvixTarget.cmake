@@ -64,6 +64,8 @@ function(orvix_windows_path variable path)
   endif()
 endfunction()
 
+option(ORVIX_COVERAGE "GCC: the library counts which of its lines and branches run; see scripts/coverage" OFF)
+
 # orvix_floor(<name> USES <floor>... SOURCES <file>...)
 # One folder of the library, as the static library orvix_<name>. Its include path is its own folder and the floors that
 # it uses, with the floors below those: an include of a higher floor does not compile.
@@ -74,7 +76,13 @@ function(orvix_floor name)
   target_compile_definitions(orvix_${name} PRIVATE ORVIXCORE_BUILD)
   list(TRANSFORM arg_USES PREPEND orvix_)
   target_link_libraries(orvix_${name} PUBLIC ${arg_USES} PRIVATE orvix_build)
-  orvix_precompile(orvix_${name})
+  if(ORVIX_COVERAGE)
+    # The checks of the debug build would be branches. Its precompiled headers belong to them.
+    target_compile_options(orvix_${name} PRIVATE --coverage -fno-sanitize=undefined)
+    target_link_options(orvix_${name} PUBLIC --coverage)
+  else()
+    orvix_precompile(orvix_${name})
+  endif()
 endfunction()
 
 # orvix_link_floors(<target>): links every floor whole, as OrvixCore.dll needs it and test programs that use what the
