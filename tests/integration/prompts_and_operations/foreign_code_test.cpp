@@ -13,6 +13,7 @@
 #include <array>
 #include <cfloat>
 #include <clocale>
+#include <filesystem>
 #include <functional>
 #include <ostream>
 #include <string>
@@ -111,6 +112,7 @@ TEST_P(ForeignCodeThat, LosesNeitherTheOperationNorAnAnswer)
         EXPECT_EQ(m_services->GetPromptAction(StoredPrompt), Action::YesToAll);
         EXPECT_EQ(m_services->GetPromptAction(DialogPrompt), Action::Ask | Action::Yes);
         GetParam().undo();
+        EXPECT_TRUE(std::filesystem::remove(m_config.Path() / L"OrvixPrompts.xml"));
         m_services->SetPromptAction(StoredPrompt, Action::No);
     }
 }
