@@ -290,7 +290,7 @@ std::wstring RootOf(const std::filesystem::path& path)
 
 TEST_F(MutatedFiles, OfPromptsAreReadOrKeptAndTheNextSaveIsWhole)
 {
-    Run(Prompts, 3, [this](bool isWhole) {
+    Run(Prompts, 2, [this](bool isWhole) {
         StoredAnswers answers;
         const bool loaded = answers.Load(m_path.c_str());
         EXPECT_EQ(loaded, HasRootInItsPlace(m_path));
@@ -315,7 +315,7 @@ TEST_F(MutatedFiles, OfPromptsAreReadOrKeptAndTheNextSaveIsWhole)
 
 TEST_F(MutatedFiles, OfProvidersAreReadOrIgnoredAndStayAsTheyAre)
 {
-    Run(Providers, 5, [this](bool isWhole) {
+    Run(Providers, 7, [this](bool isWhole) {
         OrvixProviderConfigManager manager;
         const bool loaded = manager.LoadConfig(m_path.c_str());
         const OrvixProviderConfig* config = manager.FindConfig(L"Depot");
@@ -347,7 +347,7 @@ TEST_F(MutatedFiles, OfProjectSettingsAreReadOrKeptAndTheNextSaveIsWhole)
     bridge.SetProjectSettingsFile(m_path.filename().wstring());
     ASSERT_EQ(bridge.Initialize("host"), SCC_OK);
     const std::string folder = m_folder.Path().string();
-    Run(Settings, 2, [&](bool isWhole) {
+    Run(Settings, 1, [&](bool isWhole) {
         const bool isReadable = _wcsicmp(RootOf(m_path).c_str(), L"MSSCCProjectSettings") == 0;
         EXPECT_EQ(bridge.OpenProject(folder.c_str(), "", nullptr), SCC_OK);
         recorder.calls.clear();
