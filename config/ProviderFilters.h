@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <string>
 #include <string_view>
@@ -15,15 +16,24 @@ public:
     FilteredPath& operator=(const FilteredPath&) = delete;
     ~FilteredPath() = default;
 
-    std::wstring_view Text() const { return m_text; }
-
     /// Whether there is any dot.
     bool HasType() const { return m_type.data() != nullptr; }
 
-    /// Ends with the text, and with a null character after it.
-    std::wstring_view Type() const { return m_type; }
+    /// Whether the path begins with a folder's path in upper case. Most folders are told from the path by one
+    /// character: the first one on another drive, the last one in another folder of the same drive.
+    bool IsBelow(const std::wstring& folder) const
+    {
+        return folder.empty() || (m_text.size() >= folder.size() && m_text[0] == folder[0] &&
+                                  m_text[folder.size() - 1] == folder.back() && m_text.starts_with(folder));
+    }
+
+    /// Whether the text after the last dot equals this one, which is in upper case from a to z, without regard to
+    /// letter case.
+    bool IsOfType(const std::wstring& type) const { return type.size() == m_type.size() && EqualsType(type); }
 
 private:
+    bool EqualsType(const std::wstring& type) const;
+
     std::array<wchar_t, 260> m_short; // not filled: most of it is not used
     std::wstring m_long;              // a text for which the array is too short
     std::wstring_view m_text;
@@ -47,7 +57,21 @@ public:
     /// Whether and why the filter excludes the file. An exclude filter excludes by folder or by type; an include
     /// filter excludes what is outside its folders, and inside them what has another type. A path without
     /// any dot has no type and is never excluded by it.
-    Exclusion Judge(const FilteredPath& path) const;
+    Exclusion Judge(const FilteredPath& path) const
+    {
+        const auto isBelow = [&](const std::wstring& folder) { return path.IsBelow(folder); };
+        if (!m_folders.empty() && std::any_of(m_folders.begin(), m_folders.end(), isBelow) == m_exclude)
+        {
+            return Exclusion::ByFolder;
+        }
+        if (m_fileTypes.empty() || !path.HasType())
+        {
+            return Exclusion::None;
+        }
+        const auto isOfType = [&](const std::wstring& type) { return path.IsOfType(type); };
+        return std::any_of(m_fileTypes.begin(), m_fileTypes.end(), isOfType) == m_exclude ? Exclusion::ByType
+                                                                                          : Exclusion::None;
+    }
 
     /// True when the filter excludes the file. Null gives false, and so does exhausted memory.
     bool Excludes(const wchar_t* path) const;
