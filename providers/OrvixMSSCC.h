@@ -45,6 +45,10 @@ public:
         m_settingsFileName = IsBareFileName(name) ? name : std::wstring();
     }
 
+    /// How many bytes a comment may have, as the library said when it was initialised; 0 when it did not say.
+    LONG CommentLength() const { return m_commentLength; }
+    LONG CheckoutCommentLength() const { return m_checkoutCommentLength; }
+
     /// Parent of the library's dialogs; may be null.
     void SetParentWindow(HWND window) { m_parentWindow = window; }
 

@@ -14,6 +14,7 @@
 #include "WStr.h"
 
 #include <algorithm>
+#include <cstring>
 #include <limits>
 #include <new>
 #include <string>
@@ -118,12 +119,20 @@ private:
     CStr m_text;
 };
 
-/// A comment, with a line to the host when it loses characters. Throws std::bad_alloc.
+/// A comment, with a line to the host when it loses characters or is longer than the library takes. Throws
+/// std::bad_alloc.
 class NarrowComment : public NarrowText
 {
 public:
-    explicit NarrowComment(const wchar_t* comment) : NarrowText(comment)
+    /// `limit`: in bytes; 0 for none.
+    NarrowComment(const wchar_t* comment, LONG limit) : NarrowText(comment)
     {
+        if (limit > 0 && std::strlen(Get()) > static_cast<std::size_t>(limit))
+        {
+            Tell((L"The comment is longer than the " + std::to_wstring(limit) +
+                  L" bytes that the provider takes, which may cut or refuse it.")
+                     .c_str());
+        }
         const std::wstring_view wide = comment != nullptr ? comment : L"";
         if (std::all_of(wide.begin(), wide.end(), [](wchar_t c) { return c < 0x80; }))
         {
@@ -288,7 +297,7 @@ int OrvixProviderWrapper::OpenProject(const wchar_t* localPath, const wchar_t* c
         {
             return Failure;
         }
-        return ToResult(m_bridge->OpenProject(*folder.Get(), NarrowComment(comment).Get(), OutputText));
+        return ToResult(m_bridge->OpenProject(*folder.Get(), NarrowComment(comment, 0).Get(), OutputText));
     });
 }
 
@@ -310,7 +319,7 @@ int OrvixProviderWrapper::ReservedC()
 int OrvixProviderWrapper::CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
-        const NarrowComment text(comment);
+        const NarrowComment text(comment, m_bridge->CommentLength());
         return ToResult(m_bridge->Checkin(paths.Count(), paths.Get(), text.Get(), KeepOption(options), nullptr));
     });
 }
@@ -318,7 +327,7 @@ int OrvixProviderWrapper::CheckIn(OrvixFileList* list, const wchar_t* comment, u
 int OrvixProviderWrapper::CheckOut(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
-        const NarrowComment text(comment);
+        const NarrowComment text(comment, m_bridge->CheckoutCommentLength());
         if ((options & OrvixProviderOption::GetLatest) != 0)
         {
             m_bridge->Get(paths.Count(), paths.Get(), 0, nullptr); // a failed get does not stop the check-out
@@ -360,7 +369,7 @@ int OrvixProviderWrapper::ReservedE()
 int OrvixProviderWrapper::Add(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
     return FileOperation(list, [&](NarrowPaths& paths) {
-        const NarrowComment text(comment);
+        const NarrowComment text(comment, m_bridge->CommentLength());
         std::vector<LONG> perFile(static_cast<std::size_t>(paths.Count()), KeepOption(options));
         return ToResult(m_bridge->Add(paths.Count(), paths.Get(), text.Get(), perFile.data(), nullptr));
     });

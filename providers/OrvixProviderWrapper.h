@@ -12,8 +12,8 @@ class OrvixMSSCC;
 ///
 /// An operation fails with -1 before anything is sent: for a null or empty list, for a list of 2^31 files or more, for
 /// a null path, when memory runs out, and for a path that the ANSI code page does not carry exactly, since it would
-/// name another file. The host is told of the last two, and of a comment that loses characters, through `OutputText`. A
-/// null comment counts as empty. An exception of the library or the host fails the operation.
+/// name another file. The host is told of the last two, and of a comment that loses characters or is too long, through
+/// `OutputText`. A null comment counts as empty. An exception of the library or the host fails the operation.
 ///
 /// `QueryStatus` does not fail for such a path: it leaves the file out of the call and writes
 /// `OrvixFileState::NotControlled` alone. With no project open it converts nothing.

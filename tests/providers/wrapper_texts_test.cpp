@@ -354,6 +354,29 @@ TEST_F(WrapperOutput, LetsTheHostCallBack)
     EXPECT_EQ(list.FlagsOf(0), State::NotControlled | Permission::Add);
 }
 
+TEST_F(WrapperOutput, TellsOnceThatACommentIsLongerThanTheLibraryTakes)
+{
+    m_scc.initialize = [](LPVOID* context, HWND, LPCSTR, LPSTR, LPLONG, LPSTR, LPLONG checkoutLength, LPLONG length) {
+        *context = reinterpret_cast<LPVOID>(0x77);
+        *checkoutLength = 5;
+        *length = 3;
+        return SCC_OK;
+    };
+    InitializeFor(*m_wrapper, &Host());
+    OpenForOutput(*m_wrapper);
+    ActiveList list{L"C:\\a"};
+    m_wrapper->CheckIn(list.Get(), L"abc", 0);
+    m_wrapper->Add(list.Get(), L"abc", 0);
+    m_wrapper->CheckOut(list.Get(), L"abcde", 0);
+    EXPECT_THAT(Host().lines, IsEmpty());
+    m_wrapper->CheckIn(list.Get(), L"abcd", 0);
+    ASSERT_EQ(Host().lines.size(), 1U);
+    EXPECT_NE(Host().lines[0].first.find(L"longer than the 3 bytes"), std::wstring::npos);
+    m_wrapper->Add(list.Get(), L"abcd", 0);
+    m_wrapper->CheckOut(list.Get(), L"abcdef", 0);
+    EXPECT_EQ(Host().lines.size(), 3U);
+}
+
 TEST_F(WrapperOutput, ForgetsTheClientAccessWithTheLastWrapperThatUsesIt)
 {
     OrvixProviderWrapper other;
