@@ -688,6 +688,18 @@ TEST_F(DoctorOnRegistrations, LookForALibraryOfABareNameWhereTheSettingsSay)
     EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"configured", "not-a-library", "!does-not-load"}));
 }
 
+TEST_F(DoctorOnRegistrations, SayThatAPathOrASettingsFileCannotBeTrusted)
+{
+    Install(L"bare", L"Bare", L"orvix no such library.dll");
+    Install(L"value", L"Recorded", Library(L"recording_full.dll"));
+    WriteSettings("<a><Name>Recorded</Name><MSSCCProjectFile>..\\settings.xml</MSSCCProjectFile></a>");
+    const Json report = Report();
+    EXPECT_EQ(CodesOf(Candidate(report, "bare")), (Codes{"!no-path-folder", "!no-library"}));
+    EXPECT_EQ(CodesOf(Candidate(report, "value")), (Codes{"configured", "!bad-file-name"}));
+    WriteSettings("<a><Name>Recorded</Name><MSSCCProjectFile>settings.xml</MSSCCProjectFile></a>");
+    EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"configured"}));
+}
+
 TEST_F(DoctorOnRegistrations, SayThatASettingIsCut)
 {
     AddKey().SetString(ServerName, L"Recorded");
