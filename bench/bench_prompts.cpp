@@ -216,6 +216,7 @@ void PrintAnswers(MeasureTable& table)
 {
     const std::vector<int> ids = MixedIDs();
     std::vector<std::wstring> texts;
+    texts.reserve(ids.size());
     for (const int id : ids)
     {
         texts.push_back(PromptText(id));

@@ -35,11 +35,11 @@ const std::array<std::wstring, 10> Texts = {L"",
 
 struct Row
 {
-    int id;
+    int id = 0;
     std::wstring text;
-    unsigned long options;
-    unsigned long action;
-    bool locked;
+    unsigned long options = 0;
+    unsigned long action = 0;
+    bool locked = false;
 };
 
 class PromptTableModel : public RandomModel
