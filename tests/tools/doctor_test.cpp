@@ -691,13 +691,13 @@ TEST_F(DoctorOnRegistrations, LookForALibraryOfABareNameWhereTheSettingsSay)
 TEST_F(DoctorOnRegistrations, SayThatAPathOrASettingsFileCannotBeTrusted)
 {
     Install(L"bare", L"Bare", L"orvix no such library.dll");
-    Install(L"value", L"Recorded", Library(L"recording_full.dll"));
+    Install(L"value", L"Recorded", Library(L"recording_full.dll")); // which loads into its own test program only
     WriteSettings("<a><Name>Recorded</Name><MSSCCProjectFile>..\\settings.xml</MSSCCProjectFile></a>");
     const Json report = Report();
     EXPECT_EQ(CodesOf(Candidate(report, "bare")), (Codes{"!no-path-folder", "!no-library"}));
-    EXPECT_EQ(CodesOf(Candidate(report, "value")), (Codes{"configured", "!bad-file-name"}));
+    EXPECT_EQ(CodesOf(Candidate(report, "value")), (Codes{"configured", "!bad-file-name", "!does-not-load"}));
     WriteSettings("<a><Name>Recorded</Name><MSSCCProjectFile>settings.xml</MSSCCProjectFile></a>");
-    EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"configured"}));
+    EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"configured", "!does-not-load"}));
 }
 
 TEST_F(DoctorOnRegistrations, SayThatASettingIsCut)
