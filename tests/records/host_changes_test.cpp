@@ -217,6 +217,38 @@ TEST(HostChangesDuringBuildActiveList, EntriesThatAreRemovedOnTheWayAreNotTouche
     EXPECT_EQ(ActiveNames(list), (List{L"last"}));
 }
 
+TEST(HostChangesDuringBuildActiveList, AnAncestorThatIsRemovedOnTheWayEndsItsBranch)
+{
+    BusyFolder folder;
+    BusyEntry entry;
+    for (OrvixFileEntry* child : {static_cast<OrvixFileEntry*>(&folder), static_cast<OrvixFileEntry*>(&entry)})
+    {
+        OrvixFileList list;
+        Create(list, L"first");
+        OrvixFileEntry* parent = Create(list, L"parent");
+        parent->AddChild(child);
+        const auto remove = [&] { EXPECT_TRUE(list.RemoveEntry(parent)); };
+        folder.onCount = remove;
+        entry.onFlags = remove;
+        list.BuildActiveList(Selected, true);
+        EXPECT_EQ(ActiveNames(list), (List{L"first"}));
+        EXPECT_EQ(Names(list), (List{L"first"}));
+    }
+}
+
+TEST(HostChangesDuringRemoveEntry, AnAncestorThatIsRemovedOnTheWayEndsItsBranch)
+{
+    BusyFolder folder;
+    OrvixFileList list;
+    OrvixFileEntry* parent = Create(list, L"parent");
+    OrvixFileEntry* removed = Create(list, L"removed");
+    Create(list, L"last");
+    parent->AddChild(&folder);
+    folder.onCount = [&] { EXPECT_TRUE(list.RemoveEntry(parent)); };
+    EXPECT_TRUE(list.RemoveEntry(removed));
+    EXPECT_EQ(Names(list), (List{L"last"}));
+}
+
 TEST(HostChangesDuringBuildActiveList, AFillingWithinTheFillingKeepsTheOrderOfRemovals)
 {
     BusyEntry entry;
