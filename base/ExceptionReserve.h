@@ -6,7 +6,6 @@
 /// nothing.
 void ReserveForExceptions();
 
-/// Gives back what the run-time has reserved for exceptions, which it would otherwise leave behind each time that the
-/// library is unloaded: GCC's emergency pool has 73 KB. Called once, when the library is unloaded from a process that
-/// goes on.
+/// Frees what the run-time has reserved for exceptions, 73 KB in GCC's emergency pool. Without it, each unloading of
+/// the library leaves that memory allocated. Called once, when the library is unloaded from a process that goes on.
 void FreeExceptionReserve();

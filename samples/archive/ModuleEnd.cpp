@@ -1,5 +1,5 @@
-// GCC's run-time is linked into the module. When it starts, it reserves 73 KB for exceptions, which the module would
-// leave behind each time that a host unloads it: hosts load plug-ins only to look at them, too.
+// GCC's run-time is linked into the module. At its start it reserves 73 KB for exceptions. They are freed here, since a
+// host may load and unload a plug-in often, for example one that is switched off.
 
 #include <windows.h>
 
