@@ -220,9 +220,12 @@ TEST_F(Tool, GetNeverOverwritesAChangeMadeWithoutACheckOutAndFails)
     Control(L"a.txt", "one\n");
     SetFileAttributesW(File(L"a.txt").c_str(), FILE_ATTRIBUTE_NORMAL);
     Write(L"a.txt", "changed by hand");
-    const auto result = Run({L"get", L"a.txt"});
-    EXPECT_EQ(result.code, Failed);
-    EXPECT_THAT(result.output, HasSubstr("failed  checked in, modified  a.txt\n"));
+    const auto refused = Run({L"get", L"a.txt"});
+    EXPECT_EQ(refused.code, Failed);
+    EXPECT_THAT(refused.output, HasSubstr("refused  checked in, modified  a.txt\n"));
+    const auto forced = Run({L"get", L"a.txt", L"--force"}); // this provider does not overwrite it either
+    EXPECT_EQ(forced.code, Failed);
+    EXPECT_THAT(forced.output, HasSubstr("failed  checked in, modified  a.txt\n"));
     EXPECT_EQ(ReadBytes(File(L"a.txt")), "changed by hand");
 }
 

@@ -2,6 +2,7 @@
 
 #include "BuiltFile.h"
 #include "Defect.h"
+#include "Environment.h"
 #include "FilePath.h"
 #include "ToolTest.h"
 #include "UniqueHandle.h"
@@ -28,22 +29,6 @@ using testing::StartsWith;
 
 const std::filesystem::path Plugins = ORVIX_DEFECTIVE_PLUGINS;
 const std::filesystem::path Libraries = ORVIX_DEFECTIVE_MSSCCI;
-
-/// A variable that processes inherit, for as long as this object lives.
-class Environment
-{
-public:
-    Environment(const wchar_t* variable, const std::wstring& text) : m_variable(variable)
-    {
-        SetEnvironmentVariableW(m_variable, text.c_str());
-    }
-    Environment(const Environment&) = delete;
-    Environment& operator=(const Environment&) = delete;
-    ~Environment() { SetEnvironmentVariableW(m_variable, nullptr); }
-
-private:
-    const wchar_t* m_variable;
-};
 
 class Validate : public ToolTest
 {

@@ -1,5 +1,8 @@
+#include "ComApartment.h"
 #include "CommandLineParser.h"
+#include "CommandProcess.h"
 #include "ConsoleCodePage.h"
+#include "ParentLink.h"
 #include "ValidationProcess.h"
 
 #include <comdef.h>
@@ -9,10 +12,16 @@
 namespace
 {
 
-ExitCode Run(int count, wchar_t** arguments)
+ExitCode Run(int count, wchar_t** arguments, bool isChild)
 {
     const std::optional<Invocation> invocation = ParseCommandLine(count, arguments);
-    const ExitCode code = invocation ? invocation->command->run(invocation->commandLine) : ExitCode::Success;
+    ExitCode code = ExitCode::Success;
+    if (invocation)
+    {
+        const auto& [command, commandLine] = *invocation;
+        const bool inChild = command->usesProviders && !isChild;
+        code = inChild ? CommandProcess::RunInChild(commandLine) : command->run(commandLine);
+    }
     if (!std::cout.flush())
     {
         throw ToolError(ExitCode::Failed, L"the output cannot be written");
@@ -20,19 +29,13 @@ ExitCode Run(int count, wchar_t** arguments)
     return code;
 }
 
-} // namespace
-
-int wmain(int count, wchar_t** arguments)
+/// The same, but what goes wrong becomes a message and an exit code.
+ExitCode RunToEnd(int count, wchar_t** arguments, bool isChild)
 {
-    if (const std::optional<int> childCode = ValidationProcess::RunAsChild(count, arguments))
-    {
-        return *childCode;
-    }
-    const ConsoleCodePage codePage;
     ExitCode code = ExitCode::Failed;
     try
     {
-        code = Run(count, arguments);
+        code = Run(count, arguments, isChild);
     }
     catch (const ToolError& error)
     {
@@ -46,6 +49,28 @@ int wmain(int count, wchar_t** arguments)
     catch (const std::exception& error)
     {
         std::cerr << "orvix: unexpected: " << error.what() << '\n';
+    }
+    return code;
+}
+
+} // namespace
+
+int wmain(int count, wchar_t** arguments)
+{
+    const bool isChild = ParentLink::Attach(count, arguments);
+    const ComApartment apartment;
+    if (isChild)
+    {
+        if (const std::optional<int> code = ValidationProcess::RunAsChild(count, arguments))
+        {
+            return *code;
+        }
+    }
+    const ConsoleCodePage codePage;
+    const ExitCode code = RunToEnd(count, arguments, isChild);
+    if (isChild)
+    {
+        CommandProcess::SendResult(code);
     }
     return static_cast<int>(code);
 }

@@ -20,6 +20,7 @@ constexpr Command Table[] = {
         .examples = "  orvix providers\n"
                     "  orvix providers --sources plugins,msscci --json",
         .takes = Argument::Json,
+        .usesProviders = true,
         .run = ListProviders,
     },
     {
@@ -29,6 +30,7 @@ constexpr Command Table[] = {
                     "  orvix doctor --sources msscci --json",
         .takes = Argument::Json,
         .defaultSources = OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI,
+        .timeout = 30,
         .run = RunDoctor,
     },
     {
@@ -38,6 +40,7 @@ constexpr Command Table[] = {
                     "  orvix status src\\a.txt --json",
         .takes = Argument::Paths | Argument::Json,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = FileCommands::ShowStatus,
     },
     {
@@ -47,6 +50,7 @@ constexpr Command Table[] = {
                     "  orvix add new.txt --keep --unattended",
         .takes = Argument::Paths | Argument::Json | Argument::Comment | Argument::Keep,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = FileCommands::Add,
     },
     {
@@ -56,6 +60,7 @@ constexpr Command Table[] = {
                     "  orvix checkout src --unattended --json",
         .takes = Argument::Paths | Argument::Json | Argument::Comment,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = FileCommands::CheckOut,
     },
     {
@@ -65,6 +70,7 @@ constexpr Command Table[] = {
                     "  orvix checkin . --unattended -m nightly --veto *.key",
         .takes = Argument::Paths | Argument::Json | Argument::Comment | Argument::Keep,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = FileCommands::CheckIn,
     },
     {
@@ -73,14 +79,17 @@ constexpr Command Table[] = {
         .examples = "  orvix undo src\\a.txt",
         .takes = Argument::Paths | Argument::Json,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = FileCommands::UndoCheckOut,
     },
     {
         .name = "get",
         .description = "Bring the latest versions",
-        .examples = "  orvix get . --unattended",
-        .takes = Argument::Paths | Argument::Json,
+        .examples = "  orvix get . --unattended\n"
+                    "  orvix get src\\a.txt --force",
+        .takes = Argument::Paths | Argument::Json | Argument::Force,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = FileCommands::GetLatest,
     },
     {
@@ -90,6 +99,7 @@ constexpr Command Table[] = {
                     "  orvix history src --json",
         .takes = Argument::Paths | Argument::Json,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = FileCommands::ShowHistory,
     },
     {
@@ -99,6 +109,7 @@ constexpr Command Table[] = {
                     "  orvix filters a.tmp --provider Archive --json",
         .takes = Argument::Paths | Argument::Json,
         .pathHelp = FilesHelp,
+        .usesProviders = true,
         .run = ShowFilters,
     },
     {
@@ -156,18 +167,21 @@ constexpr Command Table[] = {
         .name = "open",
         .description = "Open the project and close it again",
         .examples = "  orvix open --project D:\\Projects\\Song",
+        .usesProviders = true,
         .run = ProviderCommands::Open,
     },
     {
         .name = "options",
         .description = "Show the provider's own options",
         .examples = "  orvix options --provider Archive",
+        .usesProviders = true,
         .run = ProviderCommands::ShowOptions,
     },
     {
         .name = "client",
         .description = "Start the provider's own program",
         .examples = "  orvix client --sources msscci",
+        .usesProviders = true,
         .run = ProviderCommands::RunClient,
     },
     {
@@ -176,6 +190,7 @@ constexpr Command Table[] = {
         .examples = "  orvix properties src\\a.txt",
         .takes = Argument::Path,
         .pathHelp = "The file",
+        .usesProviders = true,
         .run = ProviderCommands::ShowProperties,
     },
     {
@@ -200,6 +215,7 @@ constexpr Command Table[] = {
                     "  orvix validate depot_msscci.dll --msscci --json",
         .takes = Argument::Path | Argument::Validation | Argument::Json,
         .pathHelp = "The plug-in or library",
+        .timeout = 30,
         .run = RunValidate,
     },
 };

@@ -1,5 +1,6 @@
 #include "CommandLineParser.h"
 
+#include "FilePath.h"
 #include "OrvixVersion.h"
 
 #include <CLI/CLI.hpp>
@@ -64,6 +65,17 @@ std::vector<std::string> ReversedArguments(int count, wchar_t** arguments)
     return utf8;
 }
 
+std::wstring FullPathOrEmpty(const std::wstring& path)
+{
+    return path.empty() ? path : FullPath(path);
+}
+
+std::vector<std::wstring> FullPaths(std::vector<std::wstring> paths)
+{
+    std::transform(paths.begin(), paths.end(), paths.begin(), FullPath);
+    return paths;
+}
+
 constexpr struct
 {
     const char* text;
@@ -87,13 +99,15 @@ std::uint32_t ParseSources(const std::string& text)
     return found->bits;
 }
 
-constexpr const char* Footer = "Examples:\n"
-                               "  orvix providers\n"
-                               "  orvix checkin . -m \"title mended\"\n"
-                               "  orvix checkin --help\n"
-                               "\n"
-                               "Exit codes: 0 success, 1 something failed, was refused or is wrong, 2 bad usage,\n"
-                               "3 no such provider, project, folder, library or prompt.";
+constexpr const char* Footer =
+    "Examples:\n"
+    "  orvix providers\n"
+    "  orvix checkin . -m \"title mended\"\n"
+    "  orvix checkin --help\n"
+    "\n"
+    "Exit codes: 0 success, 1 something failed, was refused or is wrong, 2 bad usage,\n"
+    "3 no such provider, project, folder, library or prompt, 4 OrvixProviders.xml cannot be\n"
+    "read, 5 a provider ended the process, 6 a provider gave no sign of life.";
 
 std::string Version()
 {
@@ -112,7 +126,7 @@ private:
     /// Texts as CLI11 stores them: UTF-8, some with a mark.
     struct Texts
     {
-        std::string sources, plugins, config, provider, project, user, comment, name, prompt, answer;
+        std::string sources, plugins, config, provider, project, user, comment, name, prompt, answer, onWindow;
         std::vector<std::string> paths, vetoes;
     };
 
@@ -124,12 +138,14 @@ private:
     void AddValidationOptions(CLI::App& app);
 
     const Command& ChosenCommand() const;
+    std::optional<std::chrono::seconds> Timeout(const Command& command) const;
     CommandLine MakeCommandLine(const Command& command) const;
 
     CLI::App m_app{"Source control for files, through the providers of OrvixCore.", "orvix"};
     std::map<const CLI::App*, const Command*> m_commands;
     Texts m_texts;
-    CommandLine m_values; // flags and numbers, which CLI11 stores itself
+    CommandLine m_values; // flags, which CLI11 stores itself
+    unsigned int m_timeout = 0;
 };
 
 Parser::Parser()
@@ -162,6 +178,13 @@ void Parser::AddSharedOptions()
         ->take_all()
         ->allow_extra_args(false);
     m_app.add_flag("--unattended", m_values.unattended, "Answer yes instead of showing a dialog");
+    m_app
+        .add_option("--timeout", m_timeout,
+                    "Seconds that a provider may take without a sign of life (default: 60 with --unattended, otherwise "
+                    "none; doctor and validate: 30)")
+        ->check(CLI::Range(1, 3600));
+    m_app.add_option("--on-window", m_texts.onWindow, "What to do when a provider shows a window: report or cancel")
+        ->check(CLI::IsMember({"report", "cancel"}));
     m_app.add_flag("--no-color", m_values.noColor, "No colours on a terminal; the same as the variable NO_COLOR");
     m_app.add_flag("--verbose", m_values.verbose, "Print notifications; doctor: name each library before it is loaded");
 }
@@ -204,6 +227,10 @@ void Parser::AddArguments(CLI::App& app, const Command& command)
     {
         app.add_flag("--keep", m_values.keep, "Keep the files checked out");
     }
+    if ((command.takes & Argument::Force) != 0)
+    {
+        app.add_flag("--force", m_values.force, "Replace also files that you have changed or checked out");
+    }
     AddPromptArguments(app, command);
 }
 
@@ -243,8 +270,6 @@ void Parser::AddValidationOptions(CLI::App& app)
 {
     app.add_flag("--msscci", m_values.msscci, "It is an MSSCCI library");
     app.add_flag("--dialogs", m_values.dialogs, "Check also what may show windows");
-    app.add_option("--timeout", m_values.timeout, "Seconds that a rule may take (default: 30)")
-        ->check(CLI::Range(1, 3600));
 }
 
 std::optional<Invocation> Parser::Parse(int count, wchar_t** arguments)
@@ -278,19 +303,37 @@ const Command& Parser::ChosenCommand() const
     return *m_commands.at(app);
 }
 
+std::optional<std::chrono::seconds> Parser::Timeout(const Command& command) const
+{
+    constexpr std::chrono::seconds Unattended(60);
+
+    if (m_timeout != 0)
+    {
+        return std::chrono::seconds(m_timeout);
+    }
+    if (command.timeout != 0)
+    {
+        return std::chrono::seconds(command.timeout);
+    }
+    return m_values.unattended ? std::optional(Unattended) : std::nullopt;
+}
+
 CommandLine Parser::MakeCommandLine(const Command& command) const
 {
     CommandLine result = m_values;
     result.command = Wide(command.group != nullptr ? command.group : command.name);
+    result.folder = FullPath(L".");
+    result.timeout = Timeout(command);
+    result.cancelsWindows = m_texts.onWindow == "cancel";
     result.prompt = Unmarked(m_texts.prompt);
     result.answer = Unmarked(m_texts.answer);
-    result.paths = Unmarked(m_texts.paths);
+    result.paths = FullPaths(Unmarked(m_texts.paths));
     result.name = Unmarked(m_texts.name);
     result.sources = m_app.count("--sources") == 0 ? command.defaultSources : ParseSources(m_texts.sources);
-    result.plugins = Unmarked(m_texts.plugins);
-    result.config = Unmarked(m_texts.config);
+    result.plugins = FullPathOrEmpty(Unmarked(m_texts.plugins));
+    result.config = FullPathOrEmpty(Unmarked(m_texts.config));
     result.provider = Unmarked(m_texts.provider);
-    result.project = Unmarked(m_texts.project);
+    result.project = FullPathOrEmpty(Unmarked(m_texts.project));
     result.user = Unmarked(m_texts.user);
     result.comment = Unmarked(m_texts.comment);
     result.vetoes = Unmarked(m_texts.vetoes);

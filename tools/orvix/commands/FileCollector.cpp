@@ -20,7 +20,7 @@ constexpr DWORD SkippedAttributes = FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTE
 
 void FileCollector::Add(const std::wstring& named)
 {
-    std::wstring path = FullPath(named);
+    std::wstring path = PathAsOnDisk(named);
     if (IsFolder(path))
     {
         AddFolder(path);

@@ -22,8 +22,7 @@ public:
     /// `output` shows the progress and must outlive this object.
     explicit FileCollector(Output& output) : m_output(output) {}
 
-    /// Adds a file or the files of a folder. What the user named need not exist. Throws `ToolError` when the text is
-    /// not a path.
+    /// Adds a file or the files of a folder, by its full path. It need not exist. Letter case becomes that of the disk.
     void Add(const std::wstring& named);
 
     const std::vector<File>& Files() const { return m_files; }

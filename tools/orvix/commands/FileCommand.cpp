@@ -88,11 +88,21 @@ ExitCode FileCommand::Run()
     return m_collector.ReportUnreadableFolders() || bad > 0 ? ExitCode::Failed : ExitCode::Success;
 }
 
-void FileCommand::QueryStatus()
+void FileCommand::QueryStatus(unsigned long mark)
 {
-    m_list.BuildActiveList(FileMark::Chosen, false);
+    m_list.BuildActiveList(mark, false);
+    if (m_list.NumActiveEntries() == 0)
+    {
+        return;
+    }
     m_output.Progress(L"asking for the state, files: " + std::to_wstring(m_list.NumActiveEntries()));
-    if (m_project.Provider().QueryStatus(&m_list, 0) != OrvixProviderResult::Success)
+    m_project.Provider().QueryStatus(&m_list, 0);
+    RequireStatus();
+}
+
+void FileCommand::RequireStatus()
+{
+    if (!m_project.Provider().KnowsStatus())
     {
         throw ToolError(ExitCode::Failed, L"the provider does not tell the state of the files");
     }
@@ -133,6 +143,7 @@ std::vector<Listing::Count> FileCommand::Summary() const
         }
     }
     counts.push_back({"leftOutForState", "left out for their state", m_otherState});
+    counts.push_back({"leftOutForChanges", "left out for your changes (--force gets them)", m_protected});
     counts.push_back({"leftOutByFilters", "left out by filters", m_excluded});
     counts.push_back(FileCollector::CountOfSkipped(NumForeignSkippedFolders()));
     return counts;

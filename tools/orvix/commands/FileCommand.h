@@ -1,6 +1,7 @@
 #pragma once
 
 #include "FileCollector.h"
+#include "FileMark.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileList.h"
 #include "ProjectSession.h"
@@ -44,8 +45,12 @@ protected:
     /// Runs on the entries of the list, of which there is at least one, and reports each result.
     virtual void RunOnFiles() = 0;
 
-    /// Makes every entry active and asks the provider for its state. Throws `ToolError` when the provider fails.
-    void QueryStatus();
+    /// Makes the entries with a mark active and asks the provider for their state. Throws `ToolError` when the provider
+    /// fails. `mark`: of `FileMark`.
+    void QueryStatus(unsigned long mark = FileMark::Chosen);
+
+    /// Throws `ToolError` when the provider failed to tell the state of the files.
+    void RequireStatus();
 
     bool IsNamed(OrvixFileEntry& entry) const;
 
@@ -57,6 +62,9 @@ protected:
 
     /// Counts a file that was found in a folder and that the command does not concern.
     void CountOtherState() { ++m_otherState; }
+
+    /// Counts a file that was found in a folder and has changes that the command would discard.
+    void CountProtected() { ++m_protected; }
 
     ProjectSession& Project() { return m_project; }
     const CommandLine& Arguments() const { return m_commandLine; }
@@ -82,4 +90,5 @@ private:
     std::array<unsigned int, NumResults> m_counts{};
     unsigned int m_excluded = 0;
     unsigned int m_otherState = 0;
+    unsigned int m_protected = 0;
 };

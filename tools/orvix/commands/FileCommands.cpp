@@ -3,15 +3,33 @@
 #include "CommandOutput.h"
 #include "HistoryCommand.h"
 #include "OperationCommand.h"
+#include "SettingsExaminer.h"
 #include "StatusCommand.h"
 
 namespace
 {
 
-/// Runs a command of this class in an open project. `rule` is that of an operation.
+/// Throws `ToolError` when the administrator's settings are there and cannot be read: the library would lift their
+/// rules in silence.
+void RequireSettings(const CommandLine& commandLine)
+{
+    const std::wstring path = HostSession::ConfigFolder(commandLine) + L'\\' + OrvixProviderConfigManager::FileName;
+    if (const std::wstring reason = SettingsExaminer::WhyUnread(path); !reason.empty())
+    {
+        throw ToolError(ExitCode::BrokenSettings,
+                        L"no file is touched, since the administrator's rules are not known: " + path + L": " + reason +
+                            L" (see orvix doctor)");
+    }
+}
+
+/// Runs a command of this class in an open project. `rule` is that of an operation, which changes files.
 template <typename CommandClass, typename... Rule>
 ExitCode RunInProject(const CommandLine& commandLine, const Rule&... rule)
 {
+    if constexpr (sizeof...(rule) > 0)
+    {
+        RequireSettings(commandLine);
+    }
     return WithOutput(commandLine, [&](CommandOutput& output) {
         HostSession host(commandLine, output.Results());
         ProjectSession project(host, commandLine);

@@ -32,10 +32,12 @@ void OperationCommand::RunOnFiles()
     FillDialog(params);
     RegisterPrompts();
     StoreAnswers();
+    Project().Provider().Withhold(m_rule.allowedBy, m_rule.protects);
     const bool ran = RunOperation(params);
+    RequireStatus();
     const std::vector<std::optional<Result>> results = ResultsOfRun(ran);
     const bool kept = IsKept(params);
-    QueryStatus();
+    QueryConcerned();
     ReportResults(results, kept);
 }
 
@@ -117,7 +119,7 @@ std::vector<std::optional<FileCommand::Result>> OperationCommand::ResultsOfRun(b
         {
             results.emplace_back(!ran ? Cancelled : active ? Done : Cleared);
         }
-        else if (IsNamed(*entry) || m_rule.Concerns(entry->GetFlagsOut()))
+        else if (IsNamed(*entry) || (m_rule.Concerns(entry->GetFlagsOut()) && !IsProtected(*entry)))
         {
             results.emplace_back(Refused);
         }
@@ -140,14 +142,39 @@ bool OperationCommand::IsKept(OrvixFileListDialogParams& params)
                                                         OrvixPromptAction::OptionChecked);
 }
 
+void OperationCommand::QueryConcerned()
+{
+    for (unsigned int i = 0; i < List().NumEntries(); ++i)
+    {
+        OrvixFileEntry* entry = List().GetFileEntry(i);
+        if ((entry->GetFlagsIn() & OrvixFileSelection::Selected) != 0)
+        {
+            entry->SetFlagsIn(entry->GetFlagsIn() | FileMark::Concerned);
+        }
+    }
+    QueryStatus(FileMark::Concerned);
+}
+
+bool OperationCommand::IsProtected(OrvixFileEntry& entry) const
+{
+    return m_rule.Protects(entry.GetFlagsOut()) && PathExists(entry.GetFile());
+}
+
 void OperationCommand::ReportResults(const std::vector<std::optional<Result>>& results, bool kept)
 {
     for (unsigned int i = 0; i < List().NumEntries(); ++i)
     {
         OrvixFileEntry* entry = List().GetFileEntry(i);
+        const bool isProtected = IsProtected(*entry);
         if (!results[i])
         {
-            CountOtherState();
+            isProtected ? CountProtected() : CountOtherState();
+        }
+        else if (*results[i] == Refused && isProtected)
+        {
+            Report(Refused, *entry);
+            std::cerr << "orvix: " << Printable(entry->GetFile())
+                      << " has your changes, which get would replace: use undo, or get --force\n";
         }
         else if (*results[i] == Done)
         {

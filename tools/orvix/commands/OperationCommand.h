@@ -17,6 +17,10 @@ public:
     OperationCommand(ProjectSession& project, const CommandLine& commandLine, Output& output, const OperationRule& rule)
         : FileCommand(project, commandLine, output, ResultColumn::Shown), m_rule(rule)
     {
+        if (commandLine.force)
+        {
+            m_rule.protects = 0;
+        }
     }
 
 private:
@@ -40,9 +44,15 @@ private:
     /// Whether the files stay checked out, by the dialog, the command line or a stored answer.
     bool IsKept(OrvixFileListDialogParams& params);
 
+    /// Asks for the state of the files that the operation may have changed.
+    void QueryConcerned();
+
+    /// Whether the file has changes of the user that the command would discard.
+    bool IsProtected(OrvixFileEntry& entry) const;
+
     void ReportResults(const std::vector<std::optional<Result>>& results, bool kept);
 
-    const OperationRule& m_rule;
+    OperationRule m_rule;
     std::optional<TemporaryAnswer> m_dialogAnswer;
     std::optional<TemporaryAnswer> m_keepAnswer;
 };

@@ -19,6 +19,9 @@ struct OperationRule
     unsigned long concerns = 0;
     unsigned long concernsNone = 0;
 
+    /// States in which the command would discard work of the user: it leaves such files alone, unless it is forced.
+    unsigned long protects = 0;
+
     // The state of a file after the command: in the first state and in none of the others.
     unsigned long leadsTo = 0;
     unsigned long ends = 0;
@@ -31,6 +34,9 @@ struct OperationRule
 
     /// Whether the command concerns a file in this state that was found in a folder.
     bool Concerns(unsigned long flags) const { return (flags & concerns) != 0 && (flags & concernsNone) == 0; }
+
+    /// Whether the command would discard changes of the user in a file in this state, which is on the disk.
+    bool Protects(unsigned long flags) const { return (flags & protects) != 0; }
 
     /// Whether a file in this state shows that the command was done. `kept`: it was to stay checked out.
     bool IsReached(unsigned long flags, bool kept) const;
@@ -95,6 +101,7 @@ inline constexpr OperationRule GetLatest = {
     .operation = OrvixOperation::GetLatest,
     .allowedBy = OrvixFilePermission::GetLatest,
     .concerns = OrvixFileState::Controlled,
+    .protects = OrvixFileState::CheckedOut | OrvixFileState::Modified,
     .leadsTo = OrvixFileState::Controlled,
     .ends = OrvixFileState::OutOfDate,
     .endsUnlessCheckedOut = OrvixFileState::Modified,

@@ -5,10 +5,16 @@
 DoctorReport::Subject SettingsExaminer::Examine(const std::wstring& path)
 {
     DoctorReport::Subject file{.kind = "settings file", .location = path, .findings = {}};
+    m_path = path;
     m_configs.LoadConfig(path.c_str(), &m_diagnostics);
     XmlFileFindings::AddContent(file, m_diagnostics, OrvixProviderConfigManager::RootName);
     XmlFileFindings::AddDiagnostics(file, m_diagnostics, L"provider element");
     return file;
+}
+
+std::wstring SettingsExaminer::WhyUnread(const std::wstring& path)
+{
+    return XmlFileFindings::WhyUnread(SettingsExaminer().Examine(path));
 }
 
 void SettingsExaminer::Explain(DoctorReport::Candidate& candidate, const OrvixProviderConfig* config, bool switchedOff)

@@ -16,6 +16,12 @@ public:
     /// Reads the file of this path; called once. Returns what in it the library ignores.
     DoctorReport::Subject Examine(const std::wstring& path);
 
+    /// Why the library reads nothing of the file of this path, although it is there; empty when it reads it.
+    static std::wstring WhyUnread(const std::wstring& path);
+
+    /// Of the file that was read.
+    const std::wstring& Path() const { return m_path; }
+
     const OrvixProviderConfigManager& Configs() const { return m_configs; }
 
     /// Adds to the candidate which provider element applies to it, and which others would. `config` is the one that
@@ -29,6 +35,7 @@ private:
     /// The provider element as messages name it.
     std::wstring ElementOf(const OrvixProviderConfig* config) const;
 
+    std::wstring m_path;
     OrvixProviderConfigManager m_configs;
     FileDiagnostics m_diagnostics;
     std::set<const OrvixProviderConfig*> m_used;

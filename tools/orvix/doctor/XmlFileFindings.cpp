@@ -5,8 +5,11 @@
 #include "UniqueHandle.h"
 #include "XmlFault.h"
 
+#include <algorithm>
 #include <filesystem>
+#include <iterator>
 #include <map>
+#include <string_view>
 #include <system_error>
 
 namespace
@@ -117,6 +120,16 @@ void XmlFileFindings::AddContent(DoctorReport::Subject& file, const FileDiagnost
         file.AddProblem("no-root", L"the root element is " + Quoted(diagnostics.root) + L", not " + Quoted(root) +
                                        L", so nothing in the file is read");
     }
+}
+
+std::wstring XmlFileFindings::WhyUnread(const DoctorReport::Subject& file)
+{
+    constexpr std::string_view Codes[] = {"unreadable-file", "no-xml-service",  "entities",
+                                          "malformed",       "root-not-second", "no-root"};
+    const auto found =
+        std::find_first_of(file.findings.begin(), file.findings.end(), std::begin(Codes), std::end(Codes),
+                           [](const auto& finding, std::string_view code) { return finding.code == code; });
+    return found != file.findings.end() ? found->text : L"";
 }
 
 void XmlFileFindings::AddDiagnostics(DoctorReport::Subject& file, const FileDiagnostics& diagnostics,

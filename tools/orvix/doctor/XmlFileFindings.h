@@ -10,6 +10,10 @@ namespace XmlFileFindings
 /// Adds why the library reads nothing of the file, where that is so. `root`: the name that the root element must have.
 void AddContent(DoctorReport::Subject& file, const FileDiagnostics& diagnostics, const wchar_t* root);
 
+/// Why the library reads nothing of a file that is there; empty when it reads it. The finding of `AddContent` that is a
+/// problem.
+std::wstring WhyUnread(const DoctorReport::Subject& file);
+
 /// Adds what the library ignores in the file. `item`: what an element below the root is called.
 void AddDiagnostics(DoctorReport::Subject& file, const FileDiagnostics& diagnostics, const wchar_t* item);
 

@@ -1,11 +1,14 @@
 #include "ClientAccess.h"
 
+#include "ParentLink.h"
+
 #include <windows.h>
 
 void ClientAccess::OutputText(const wchar_t* text, int)
 {
     if (text != nullptr)
     {
+        ParentLink::Send(ParentLink::Alive);
         m_output.Print(text);
     }
 }

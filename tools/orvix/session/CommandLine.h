@@ -1,12 +1,16 @@
 #pragma once
 
+#include <chrono>
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
-/// What the user typed. Folders and files are as typed; an option that was not given is empty.
+/// What the user typed; an option that was not given is empty. Files and folders are full paths, so that a provider
+/// that changes the current folder does not change what they name.
 struct CommandLine
 {
+    std::wstring folder;  ///< the current folder
     std::wstring command; ///< its name; of prompts list and the like: prompts
     std::vector<std::wstring> paths;
     std::wstring provider; ///< name or index
@@ -17,6 +21,8 @@ struct CommandLine
     std::uint32_t sources = 0; ///< bits of `OrvixProviderSource`
     std::vector<std::wstring> vetoes;
     bool unattended = false;
+    std::optional<std::chrono::seconds> timeout; ///< 1 to 3600; empty for none
+    bool cancelsWindows = false;                 ///< presses Cancel in windows of providers
     bool noColor = false;
     bool verbose = false;
     bool json = false;
@@ -24,6 +30,7 @@ struct CommandLine
     // Of the commands that change files.
     std::wstring comment;
     bool keep = false;
+    bool force = false; ///< get: also files with changes of the user
 
     // Of prompts.
     std::wstring prompt; ///< ID
@@ -36,5 +43,4 @@ struct CommandLine
     // Of validate.
     bool msscci = false;
     bool dialogs = false;
-    unsigned int timeout = 30; ///< seconds, 1 to 3600
 };

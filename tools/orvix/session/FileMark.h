@@ -8,6 +8,8 @@ namespace FileMark
 
 /// Bit of FlagsIn: the tool chose this file for the operation. The active list is built from it.
 inline constexpr unsigned long Chosen = 0x2;
-static_assert((Chosen & OrvixFileSelection::Selected) == 0, "RunFileListOperation sets the other bit");
+/// The operation may have changed this file.
+inline constexpr unsigned long Concerned = 0x4;
+static_assert(((Chosen | Concerned) & OrvixFileSelection::Selected) == 0, "RunFileListOperation sets the other bit");
 
 } // namespace FileMark

@@ -1,6 +1,7 @@
 #include "HostSession.h"
 
 #include "FilePath.h"
+#include "GuardedCall.h"
 #include "ModulePath.h"
 #include "OrvixProviderSource.h"
 #include "ToolError.h"
@@ -63,14 +64,14 @@ HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_acc
     {
         throw std::bad_alloc();
     }
-    m_services->Initialize(&m_client, commandLine.sources);
+    GuardedCall("the search for providers", [&] { m_services->Initialize(&m_client, commandLine.sources); });
 }
 
 HostSession::~HostSession()
 {
     try
     {
-        m_services->Shutdown();
+        GuardedCall("the unloading of the providers", [this] { m_services->Shutdown(); });
     }
     catch (const _com_error&)
     {

@@ -8,26 +8,31 @@ namespace
 {
 
 /// The folder that the user named; otherwise the administrator's fixed root; otherwise the current folder.
-std::wstring ProjectFolder(const std::wstring& named, const wchar_t* fixedRoot)
+std::wstring ProjectFolder(const CommandLine& commandLine, const wchar_t* fixedRoot)
 {
-    if (!named.empty())
+    if (!commandLine.project.empty())
     {
-        return FullPath(named);
+        return commandLine.project;
     }
-    return FullPath(fixedRoot != nullptr && *fixedRoot != L'\0' ? fixedRoot : L".");
+    return fixedRoot != nullptr && *fixedRoot != L'\0' ? FullPath(fixedRoot) : commandLine.folder;
 }
 
 } // namespace
 
 ProjectSession::ProjectSession(HostSession& host, const CommandLine& commandLine)
-    : m_host(host), m_index(host.FindProvider(commandLine.provider)), m_provider(Services().GetProvider(m_index)),
-      m_folder(ProjectFolder(commandLine.project, Services().GetProviderFixedProjectRoot(m_index)))
+    : m_host(host), m_index(host.FindProvider(commandLine.provider)),
+      m_folder(ProjectFolder(commandLine, Services().GetProviderFixedProjectRoot(m_index)))
 {
     if (!IsFolder(m_folder))
     {
         throw ToolError(ExitCode::NotFound, L"no such project folder: " + m_folder);
     }
-    if (m_provider == nullptr || m_provider->Initialize(&Client()) != OrvixProviderResult::Success)
+    if (IOrvixProvider* const provider =
+            GuardedCall("the start of " + Utf8(ProviderName()), [this] { return Services().GetProvider(m_index); }))
+    {
+        m_provider.emplace(*provider, ProviderName());
+    }
+    if (!m_provider || m_provider->Initialize(&Client()) != OrvixProviderResult::Success)
     {
         throw ToolError(ExitCode::NotFound, L"the provider does not start: " + ProviderName());
     }

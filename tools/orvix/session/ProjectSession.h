@@ -1,8 +1,9 @@
 #pragma once
 
+#include "GuardedProvider.h"
 #include "HostSession.h"
-#include "IOrvixProvider.h"
 
+#include <optional>
 #include <string>
 
 /// A provider with an open project. At the end the project is closed.
@@ -18,7 +19,7 @@ public:
 
     OrvixClientInfo& Client() { return m_host.Client(); }
     IOrvixServices& Services() { return m_host.Services(); }
-    IOrvixProvider& Provider() { return *m_provider; }
+    GuardedProvider& Provider() { return *m_provider; }
     std::uint32_t ProviderIndex() const { return m_index; }
     std::wstring ProviderName() { return Services().GetProviderName(m_index); }
 
@@ -31,6 +32,6 @@ public:
 private:
     HostSession& m_host;
     std::uint32_t m_index;
-    IOrvixProvider* m_provider; // owned by the services object
     std::wstring m_folder;
+    std::optional<GuardedProvider> m_provider; // of an object that the services object owns
 };

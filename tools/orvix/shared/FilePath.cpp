@@ -1,6 +1,7 @@
 #include "FilePath.h"
 
 #include "ToolError.h"
+#include "UniqueHandle.h"
 
 #include <windows.h>
 
@@ -23,6 +24,34 @@ std::wstring FullPath(const std::wstring& path)
         full.pop_back();
     }
     return full;
+}
+
+std::wstring PathAsOnDisk(const std::wstring& full)
+{
+    std::size_t start = full.find(L'\\');
+    for (int part = 0; full.starts_with(L"\\\\") && part < 3 && start != std::wstring::npos; ++part)
+    {
+        start = full.find(L'\\', start + 1); // after \\server\share
+    }
+    std::wstring path = full.substr(0, start);
+    if (path.size() == 2)
+    {
+        CharUpperBuffW(path.data(), 1); // the letter of the drive
+    }
+    while (start != std::wstring::npos)
+    {
+        const std::size_t end = full.find(L'\\', start + 1);
+        std::wstring name = full.substr(start + 1, end == std::wstring::npos ? end : end - start - 1);
+        WIN32_FIND_DATAW found;
+        const bool isPattern = name.find_first_of(L"*?") != std::wstring::npos;
+        if (!isPattern && UniqueFind(FindFirstFileW((path + L'\\' + name).c_str(), &found)))
+        {
+            name = found.cFileName;
+        }
+        path += L'\\' + name;
+        start = end;
+    }
+    return path;
 }
 
 std::wstring PathBelow(const std::wstring& folder, const std::wstring& path)

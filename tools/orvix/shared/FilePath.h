@@ -6,6 +6,9 @@
 /// with `ExitCode::BadUsage` when the text is not a path.
 std::wstring FullPath(const std::wstring& path);
 
+/// A full path in the letter case of the disk, as far as it exists.
+std::wstring PathAsOnDisk(const std::wstring& full);
+
 /// The part of a path below a folder; the whole path when it is not below the folder. Letter case does not count.
 std::wstring PathBelow(const std::wstring& folder, const std::wstring& path);
 

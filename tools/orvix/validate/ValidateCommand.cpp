@@ -124,7 +124,7 @@ std::vector<const ValidationRule*> RulesOf(unsigned int kind)
 template <typename Report>
 ExitCode CheckRules(const CommandLine& commandLine, const std::wstring& library, Report& report)
 {
-    const ValidationProcess process(library, commandLine.msscci, std::chrono::seconds(commandLine.timeout));
+    const ValidationProcess process(library, commandLine.msscci, *commandLine.timeout);
     const std::vector<const ValidationRule*> rules =
         RulesOf(commandLine.msscci ? ValidationRule::MSSCCI : ValidationRule::Plugin);
     VerdictCounts counts;

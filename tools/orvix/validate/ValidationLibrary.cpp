@@ -17,5 +17,5 @@ ValidationLibrary::ValidationLibrary(ValidationSubject& subject) : m_subject(sub
 
 ValidationLibrary::~ValidationLibrary()
 {
-    m_subject.Send(ValidationSubject::Step, "unloading");
+    ParentLink::Send(ParentLink::Step, "unloading");
 }

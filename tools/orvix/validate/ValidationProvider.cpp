@@ -105,19 +105,19 @@ ValidationProvider::~ValidationProvider()
     catch (...) // a rule that calls these operations itself reports it
     {
     }
-    m_subject.Send(ValidationSubject::Step, "releasing the provider");
+    ParentLink::Send(ParentLink::Step, "releasing the provider");
 }
 
 void ValidationProvider::Close()
 {
     if (m_provider->IsProjectOpen())
     {
-        m_subject.Send(ValidationSubject::Step, "CloseProject");
+        ParentLink::Send(ParentLink::Step, "CloseProject");
         m_provider->CloseProject();
     }
     if (m_provider->IsInitialized())
     {
-        m_subject.Send(ValidationSubject::Step, "Uninitialize");
+        ParentLink::Send(ParentLink::Step, "Uninitialize");
         m_provider->Uninitialize();
     }
 }

@@ -2,12 +2,14 @@
 
 #include "Text.h"
 
+#include <windows.h>
+
 #include <filesystem>
 #include <fstream>
 
-ValidationSubject::ValidationSubject(std::wstring library, bool isMSSCCI, const std::wstring& scratch, HANDLE pipe)
+ValidationSubject::ValidationSubject(std::wstring library, bool isMSSCCI, const std::wstring& scratch)
     : m_library(std::move(library)), m_isMSSCCI(isMSSCCI), m_project(scratch + L"\\project"),
-      m_outside(scratch + L"\\outside"), m_pipe(pipe)
+      m_outside(scratch + L"\\outside")
 {
     std::filesystem::create_directory(m_project);
     std::filesystem::create_directory(m_outside);
@@ -19,11 +21,4 @@ std::wstring ValidationSubject::Write(const std::wstring& name, std::string_view
     SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_NORMAL); // a provider may have made it read-only
     std::ofstream(std::filesystem::path(path), std::ios::binary) << text;
     return path;
-}
-
-void ValidationSubject::Send(std::string_view word, const std::string& text)
-{
-    const std::string line = std::string(word) + ' ' + Printable(Wide(text)) + '\n';
-    DWORD written = 0;
-    WriteFile(m_pipe, line.data(), static_cast<DWORD>(line.size()), &written, nullptr);
 }

@@ -1,20 +1,19 @@
 #pragma once
 
+#include "ParentLink.h"
 #include "ValidationRule.h"
-
-#include <windows.h>
 
 #include <string>
 #include <string_view>
 
-/// The library under validation, in the process that checks one rule: its path, a scratch folder, and the pipe to the
-/// validating process. The pipe carries each step before it is done, so that the validating process knows what a
-/// library was called for when it crashed or hung.
+/// The library under validation, in the process that checks one rule: its path and a scratch folder. Each step is sent
+/// to the validating process before it is done, so that this one knows what a library was called for when it crashed or
+/// hung.
 class ValidationSubject
 {
 public:
-    /// `scratch` is an empty folder. `pipe` is written to and not owned.
-    ValidationSubject(std::wstring library, bool isMSSCCI, const std::wstring& scratch, HANDLE pipe);
+    /// `scratch` is an empty folder.
+    ValidationSubject(std::wstring library, bool isMSSCCI, const std::wstring& scratch);
 
     /// Full path.
     const std::wstring& Library() const { return m_library; }
@@ -34,7 +33,7 @@ public:
     template <typename Work>
     auto Call(const std::string& what, Work work)
     {
-        Send(Step, what);
+        ParentLink::Send(ParentLink::Step, what);
         try
         {
             return work();
@@ -46,22 +45,17 @@ public:
     }
 
     /// Adds a remark to the result of a rule that is kept.
-    void Remark(const std::string& text) { Send(Note, text); }
+    void Remark(const std::string& text) { ParentLink::Send(Note, text); }
 
-    // The words of the lines on the pipe. A line that starts with one of the last three is the last line.
-    static constexpr std::string_view Step = "step";
+    // The words of the lines to the validating process. A line that starts with one of the last three is the last line.
     static constexpr std::string_view Note = "note";
     static constexpr std::string_view Pass = "pass";
     static constexpr std::string_view Fail = "fail";
     static constexpr std::string_view Skip = "skip";
-
-    /// Writes a line to the pipe: the word, and after a blank the text.
-    void Send(std::string_view word, const std::string& text);
 
 private:
     std::wstring m_library;
     bool m_isMSSCCI;
     std::wstring m_project;
     std::wstring m_outside;
-    HANDLE m_pipe;
 };

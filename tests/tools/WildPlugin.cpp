@@ -1,0 +1,108 @@
+// A provider that works, and does in one place what libraries in the wild do. `Defect` names it.
+
+#include "Defect.h"
+#include "DiskProvider.h"
+#include "OrvixVersion.h"
+
+#include <windows.h>
+
+#include <objbase.h>
+
+#include <cfloat>
+#include <clocale>
+#include <cstdint>
+
+namespace
+{
+
+constexpr const wchar_t* Name = L"Wild";
+
+/// Changes what belongs to the whole process and to the thread.
+void ChangeProcess()
+{
+    SetCurrentDirectoryW(L"C:\\windows");
+    CoUninitialize();
+    CoInitializeEx(nullptr, COINIT_MULTITHREADED);
+    std::setlocale(LC_ALL, "");
+    SetErrorMode(SEM_NOALIGNMENTFAULTEXCEPT);
+    SetDllDirectoryW(L"C:\\windows");
+}
+
+class WildProvider final : public DiskProvider
+{
+public:
+    WildProvider() : DiskProvider(Name) {}
+
+    int Initialize(OrvixClientInfo* info) override
+    {
+        if (Defect::Is(L"changes-process"))
+        {
+            ChangeProcess();
+        }
+        return DiskProvider::Initialize(info);
+    }
+
+    int QueryStatus(OrvixFileList* list, unsigned long options) override
+    {
+        if (Defect::Is(L"changes-process"))
+        {
+            ChangeProcess();
+        }
+        if (Defect::Is(L"exit-in-status"))
+        {
+            ExitProcess(0);
+        }
+        if (Defect::Is(L"crash-in-status"))
+        {
+            Defect::Crash();
+        }
+        if (Defect::Is(L"hang-in-status"))
+        {
+            Defect::Hang();
+        }
+        if (Defect::Is(L"window-in-status") &&
+            MessageBoxW(nullptr, L"There is no repository. Create one?", L"Wild Provider", MB_YESNOCANCEL) != IDYES)
+        {
+            return OrvixProviderResult::Failure;
+        }
+        return DiskProvider::QueryStatus(list, options);
+    }
+};
+
+WildProvider provider;
+
+} // namespace
+
+extern "C" {
+__declspec(dllexport) std::int32_t GetOrvixVersion()
+{
+    return ORVIX_PLUGIN_CONTRACT_VERSION;
+}
+
+__declspec(dllexport) IOrvixProvider* GetIOrvixProvider()
+{
+    return &provider;
+}
+
+__declspec(dllexport) void ReleaseIOrvixProvider(IOrvixProvider*)
+{
+}
+
+__declspec(dllexport) const wchar_t* GetOrvixProviderName()
+{
+    return Name;
+}
+} // extern "C"
+
+BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
+{
+    if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"exit-at-load"))
+    {
+        ExitProcess(0);
+    }
+    if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"hang-at-load"))
+    {
+        Defect::Hang();
+    }
+    return TRUE;
+}

@@ -1,0 +1,159 @@
+// orvix.exe with a provider that does what libraries in the wild do.
+
+#include "Defect.h"
+#include "Display.h"
+#include "Environment.h"
+#include "ToolTest.h"
+#include "UniqueHandle.h"
+
+#include <gmock/gmock.h>
+
+namespace
+{
+
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::Not;
+
+class WildProvider : public ToolTest
+{
+protected:
+    // Exit codes.
+    static constexpr unsigned long BrokenSettings = 4;
+    static constexpr unsigned long ProviderEnded = 5;
+    static constexpr unsigned long TimedOut = 6;
+
+    OrvixTool::Result RunWild(Arguments arguments)
+    {
+        arguments.insert(arguments.end(), {L"--plugins", ORVIX_WILD_PLUGINS});
+        return Run(std::move(arguments));
+    }
+
+    OrvixTool::Result RunWith(const std::wstring& defect, Arguments arguments)
+    {
+        const Environment environment(Defect::Variable, defect);
+        return RunWild(std::move(arguments));
+    }
+
+    void Control(const std::wstring& name)
+    {
+        Write(name, "one\n");
+        ASSERT_EQ(RunWild({L"add", name}).code, Success);
+    }
+
+    void WriteSettings(std::string_view text)
+    {
+        std::filesystem::create_directories(Config());
+        WriteBytes(Config() / L"OrvixProviders.xml", text);
+    }
+};
+
+} // namespace
+
+TEST_F(WildProvider, ThatChangesTheProcessGetsTheFilesThatWereNamed)
+{
+    Control(L"one.txt");
+    const Environment environment(Defect::Variable, L"changes-process");
+    std::filesystem::create_directories(Scratch() / L"plugins");
+    std::filesystem::copy_file(std::filesystem::path(ORVIX_WILD_PLUGINS) / L"wild.dll",
+                               Scratch() / L"plugins" / L"wild.dll");
+    const auto result = RunExactly({L"checkout", L"ONE.txt", L"--unattended", L"--plugins", L"..\\plugins", L"--config",
+                                    L"..\\settings", L"--project", L"."});
+    EXPECT_EQ(result.code, Success) << result.errors;
+    EXPECT_THAT(result.output, HasSubstr("done    checked out  one.txt\n"));
+    EXPECT_TRUE(std::filesystem::exists(Scratch() / L"settings" / L"OrvixPrompts.xml"));
+    const auto walked = RunWild({L"status", L"."});
+    EXPECT_THAT(walked.output, HasSubstr("checked out  one.txt\n1 file"));
+}
+
+TEST_F(WildProvider, DoesNotGetWhatWouldDiscardChanges)
+{
+    Control(L"edited.txt");
+    Control(L"plain.txt");
+    Control(L"gone.txt");
+    ASSERT_EQ(RunWild({L"checkout", L"edited.txt"}).code, Success);
+    Write(L"edited.txt", "hours of work");
+    SetFileAttributesW(File(L"gone.txt").c_str(), FILE_ATTRIBUTE_NORMAL);
+    std::filesystem::remove(File(L"gone.txt"));
+
+    const auto walked = RunWild({L"get", L".", L"gone.txt"});
+    EXPECT_EQ(walked.code, Success) << walked.errors;
+    EXPECT_THAT(walked.output, AllOf(HasSubstr("done    checked in  gone.txt\n"), Not(HasSubstr("edited.txt")),
+                                     HasSubstr("2 files, 2 done, 1 left out for your changes (--force gets them)")));
+    const auto named = RunWild({L"get", L"edited.txt"});
+    EXPECT_EQ(named.code, Failed);
+    EXPECT_THAT(named.output, HasSubstr("refused  checked out, modified  edited.txt\n"));
+    EXPECT_THAT(named.errors, HasSubstr("edited.txt has your changes, which get would replace: use undo, or get "
+                                        "--force\n"));
+    EXPECT_EQ(ReadBytes(File(L"edited.txt")), "hours of work");
+
+    EXPECT_EQ(RunWild({L"get", L"edited.txt", L"--force"}).code, Success);
+    EXPECT_EQ(ReadBytes(File(L"edited.txt")), "one\n");
+}
+
+TEST_F(WildProvider, IsNotUsedWhileTheAdministratorsRulesCannotBeRead)
+{
+    Write(L"secret.key", "x");
+    WriteSettings("<?xml version=\"1.0\"?>\n<OrvixProviders><P><Name>Wild</P></OrvixProviders>");
+    const auto broken = RunWild({L"add", L"."});
+    EXPECT_EQ(broken.code, BrokenSettings);
+    EXPECT_THAT(broken.errors,
+                AllOf(HasSubstr("OrvixProviders.xml: "), HasSubstr("line 2, column "), HasSubstr("orvix doctor")));
+    EXPECT_EQ(RunWild({L"status", L"."}).code, Success);
+
+    WriteSettings("<?xml version=\"1.0\"?>\n<OrvixProviders/>");
+    {
+        const UniqueFile lock(CreateFileW((Config() / L"OrvixProviders.xml").c_str(), GENERIC_READ, 0, nullptr,
+                                          OPEN_EXISTING, 0, nullptr));
+        const auto locked = RunWild({L"checkout", L"."});
+        EXPECT_EQ(locked.code, BrokenSettings);
+        EXPECT_THAT(locked.errors, HasSubstr("the file cannot be opened"));
+    }
+    EXPECT_THAT(RunWild({L"status", L"."}).output, HasSubstr("not controlled  secret.key"));
+    EXPECT_EQ(RunWild({L"add", L"."}).code, Success);
+}
+
+TEST_F(WildProvider, ThatEndsTheProcessIsNamed)
+{
+    Write(L"a.txt", "x");
+    const auto ended = RunWith(L"exit-in-status", {L"status", L".", L"--json"});
+    EXPECT_EQ(ended.code, ProviderEnded);
+    EXPECT_EQ(ended.output, "");
+    EXPECT_THAT(ended.errors, HasSubstr("orvix: QueryStatus of Wild ends the process with exit code 0"));
+
+    const auto crashed = RunWith(L"crash-in-status", {L"add", L"."});
+    EXPECT_EQ(crashed.code, ProviderEnded);
+    EXPECT_THAT(crashed.errors, testing::ContainsRegex(
+                                    "orvix: QueryStatus of Wild crashes in .* at offset 0x.*, exception 0xC0000005"));
+
+    const auto atLoad = RunWith(L"exit-at-load", {L"providers"});
+    EXPECT_EQ(atLoad.code, ProviderEnded);
+    EXPECT_THAT(atLoad.errors, HasSubstr("orvix: the search for providers ends the process with exit code 0"));
+}
+
+TEST_F(WildProvider, ThatHangsIsEndedAfterTheTime)
+{
+    Write(L"a.txt", "x");
+    const auto result = RunWith(L"hang-in-status", {L"status", L".", L"--timeout", L"2"});
+    EXPECT_EQ(result.code, TimedOut);
+    EXPECT_THAT(result.errors, HasSubstr("orvix: QueryStatus of Wild has given no sign of life for 2 s and was ended"));
+}
+
+TEST_F(WildProvider, ThatShowsAWindowIsNamed)
+{
+    if (!HasDisplay())
+    {
+        GTEST_SKIP() << "no display";
+    }
+    Write(L"a.txt", "x");
+    const auto waiting = RunWith(L"window-in-status", {L"status", L".", L"--timeout", L"2"});
+    EXPECT_EQ(waiting.code, TimedOut);
+    EXPECT_THAT(waiting.errors,
+                AllOf(HasSubstr("QueryStatus of Wild shows the window \"Wild Provider\": There is no repository. "
+                                "Create one? (--on-window cancel presses Cancel)"),
+                      HasSubstr("for 2 s since it showed the window \"Wild Provider\"")));
+    const auto cancelled = RunWith(L"window-in-status", {L"status", L".", L"--on-window", L"cancel"});
+    EXPECT_EQ(cancelled.code, Failed);
+    EXPECT_THAT(cancelled.errors, AllOf(HasSubstr("(Cancel is pressed)"),
+                                        HasSubstr("the provider does not tell the state of the files")));
+}

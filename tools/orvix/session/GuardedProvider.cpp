@@ -1,0 +1,158 @@
+#include "GuardedProvider.h"
+
+#include "FilePath.h"
+#include "OrvixFileFlags.h"
+#include "OrvixFileList.h"
+#include "OrvixProviderResult.h"
+
+const wchar_t* GuardedProvider::GetName()
+{
+    return m_provider.GetName();
+}
+
+int GuardedProvider::ReservedA()
+{
+    return Guarded("ReservedA", [&] { return m_provider.ReservedA(); });
+}
+
+bool GuardedProvider::IsInitialized()
+{
+    return Guarded("IsInitialized", [&] { return m_provider.IsInitialized(); });
+}
+
+bool GuardedProvider::IsProjectOpen()
+{
+    return Guarded("IsProjectOpen", [&] { return m_provider.IsProjectOpen(); });
+}
+
+int GuardedProvider::Initialize(OrvixClientInfo* info)
+{
+    return Guarded("Initialize", [&] { return m_provider.Initialize(info); });
+}
+
+int GuardedProvider::Uninitialize()
+{
+    return Guarded("Uninitialize", [&] { return m_provider.Uninitialize(); });
+}
+
+int GuardedProvider::OpenProject(const wchar_t* localPath, const wchar_t* comment)
+{
+    return Guarded("OpenProject", [&] { return m_provider.OpenProject(localPath, comment); });
+}
+
+int GuardedProvider::CloseProject()
+{
+    return Guarded("CloseProject", [&] { return m_provider.CloseProject(); });
+}
+
+int GuardedProvider::ReservedB()
+{
+    return Guarded("ReservedB", [&] { return m_provider.ReservedB(); });
+}
+
+int GuardedProvider::ReservedC()
+{
+    return Guarded("ReservedC", [&] { return m_provider.ReservedC(); });
+}
+
+int GuardedProvider::CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options)
+{
+    return Guarded("CheckIn", [&] { return m_provider.CheckIn(list, comment, options); });
+}
+
+int GuardedProvider::CheckOut(OrvixFileList* list, const wchar_t* comment, unsigned long options)
+{
+    return Guarded("CheckOut", [&] { return m_provider.CheckOut(list, comment, options); });
+}
+
+int GuardedProvider::UndoCheckOut(OrvixFileList* list, unsigned long options)
+{
+    return Guarded("UndoCheckOut", [&] { return m_provider.UndoCheckOut(list, options); });
+}
+
+int GuardedProvider::GetLatest(OrvixFileList* list, unsigned long options)
+{
+    return Guarded("GetLatest", [&] { return m_provider.GetLatest(list, options); });
+}
+
+int GuardedProvider::ReservedD(void* argument, unsigned long* first, unsigned long* second)
+{
+    return Guarded("ReservedD", [&] { return m_provider.ReservedD(argument, first, second); });
+}
+
+int GuardedProvider::ReservedE()
+{
+    return Guarded("ReservedE", [&] { return m_provider.ReservedE(); });
+}
+
+int GuardedProvider::Add(OrvixFileList* list, const wchar_t* comment, unsigned long options)
+{
+    return Guarded("Add", [&] { return m_provider.Add(list, comment, options); });
+}
+
+int GuardedProvider::ShowHistory(OrvixFileList* list)
+{
+    return Guarded("ShowHistory", [&] { return m_provider.ShowHistory(list); });
+}
+
+int GuardedProvider::ShowProperties(OrvixFileList* list)
+{
+    return Guarded("ShowProperties", [&] { return m_provider.ShowProperties(list); });
+}
+
+int GuardedProvider::QueryStatus(OrvixFileList* list, unsigned long options)
+{
+    const int result = Guarded("QueryStatus", [&] { return m_provider.QueryStatus(list, options); });
+    m_knowsStatus = result == OrvixProviderResult::Success;
+    for (unsigned int i = 0; m_knowsStatus && i < list->NumActiveEntries(); ++i)
+    {
+        OrvixFileEntry* const entry = list->GetActiveFileEntry(i);
+        entry->SetFlagsOut(CorrectedFlags(*entry));
+    }
+    return result;
+}
+
+int GuardedProvider::ReservedF()
+{
+    return Guarded("ReservedF", [&] { return m_provider.ReservedF(); });
+}
+
+int GuardedProvider::ReservedG()
+{
+    return Guarded("ReservedG", [&] { return m_provider.ReservedG(); });
+}
+
+int GuardedProvider::ShowOptions()
+{
+    return Guarded("ShowOptions", [&] { return m_provider.ShowOptions(); });
+}
+
+int GuardedProvider::RunProviderClient()
+{
+    return Guarded("RunProviderClient", [&] { return m_provider.RunProviderClient(); });
+}
+
+int GuardedProvider::ReservedH()
+{
+    return Guarded("ReservedH", [&] { return m_provider.ReservedH(); });
+}
+
+bool GuardedProvider::ReservedI()
+{
+    return Guarded("ReservedI", [&] { return m_provider.ReservedI(); });
+}
+
+unsigned long GuardedProvider::CorrectedFlags(OrvixFileEntry& entry) const
+{
+    constexpr unsigned long EveryState = OrvixFileState::Controlled | OrvixFileState::CheckedOut |
+                                         OrvixFileState::CheckedOutByOther | OrvixFileState::OutOfDate |
+                                         OrvixFileState::Deleted | OrvixFileState::Modified;
+
+    const unsigned long flags = entry.GetFlagsOut();
+    if ((flags & EveryState) == EveryState)
+    {
+        return 0;
+    }
+    const bool withheld = (flags & m_withheldFrom) != 0 && PathExists(entry.GetFile());
+    return withheld ? flags & ~m_withheld : flags;
+}
