@@ -1,6 +1,8 @@
 // orvix doctor.
 
 #include "BuiltFile.h"
+#include "Defect.h"
+#include "Environment.h"
 #include "RegistryToolTest.h"
 
 #include <gmock/gmock.h>
@@ -376,6 +378,24 @@ TEST_F(DoctorTest, SaysWhatItLoadsWhenAsked)
     AddPlugin(L"good");
     EXPECT_EQ(Doctor().errors, "");
     EXPECT_EQ(Doctor({L"--verbose"}).errors, "orvix: loading " + Plugin(L"good.dll").string() + "\n");
+}
+
+TEST_F(DoctorTest, ALibraryThatEndsTheProcessOrHangsIsAFindingAndTheOthersAreExamined)
+{
+    const Environment environment(Defect::Variable, L"crash-at-load exit-at-load");
+    AddPlugin(L"good");
+    std::filesystem::copy_file(std::filesystem::path(ORVIX_DEFECTIVE_PLUGINS) / L"defective.dll", Plugin(L"crash.dll"));
+    std::filesystem::copy_file(std::filesystem::path(ORVIX_WILD_PLUGINS) / L"wild.dll", Plugin(L"exit.dll"));
+    const Json report = Report();
+    EXPECT_EQ(Candidate(report, "good.dll")["listed"], true);
+    EXPECT_THAT(CodesOf(Candidate(report, "crash.dll")), Not(IsEmpty())); // the system may make a failed load of it
+    EXPECT_THAT(TextOf(Candidate(report, "exit.dll"), "ends-process"),
+                HasSubstr("it ends the process with exit code 0 when it is loaded"));
+
+    const Environment hanging(Defect::Variable, L"hang-at-load");
+    const Json late = Report({L"--timeout", L"2"});
+    EXPECT_EQ(Candidate(late, "good.dll")["listed"], true);
+    EXPECT_THAT(TextOf(Candidate(late, "exit.dll"), "hangs"), HasSubstr("it does not return within 2 s"));
 }
 
 TEST_F(DoctorTest, JsonStaysOneObjectWhateverALibraryPrints)

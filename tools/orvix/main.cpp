@@ -1,3 +1,4 @@
+#include "CandidateExam.h"
 #include "ComApartment.h"
 #include "CommandLineParser.h"
 #include "CommandProcess.h"
@@ -64,6 +65,10 @@ int wmain(int count, wchar_t** arguments)
         if (const std::optional<int> code = ValidationProcess::RunAsChild(count, arguments))
         {
             return *code;
+        }
+        if (CandidateExams::RunAsChild(count, arguments))
+        {
+            return static_cast<int>(ExitCode::Success);
         }
     }
     const ConsoleCodePage codePage;

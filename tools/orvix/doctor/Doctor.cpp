@@ -1,7 +1,7 @@
 #include "Doctor.h"
 
+#include "CandidateExam.h"
 #include "HostSession.h"
-#include "LibraryModule.h"
 #include "LoadAnnouncer.h"
 #include "OrvixPromptTable.h"
 #include "OrvixProviderSource.h"
@@ -36,22 +36,23 @@ DoctorReport Doctor::Examine(const CommandLine& commandLine, Output& output)
 {
     constexpr std::uint32_t Everywhere = OrvixProviderSource::Plugins | OrvixProviderSource::InstalledMSSCCI;
 
-    RememberLibraryModule(GetModuleHandleW(L"OrvixCore.dll")); // plug-ins get the manifest of this library
-    SetThreadErrorMode(SEM_FAILCRITICALERRORS | SEM_NOOPENFILEERRORBOX, nullptr);
     const std::wstring folder = HostSession::ConfigFolder(commandLine) + L'\\';
     const LoadAnnouncer announcer(commandLine.verbose, output);
     DoctorReport report;
+    CandidateExams exams(report, announcer, *commandLine.timeout);
     SettingsExaminer settings;
     report.locations.push_back(settings.Examine(folder + OrvixProviderConfigManager::FileName));
     report.locations.push_back(ExaminePrompts(folder + PromptFileName));
+    PluginExaminer plugins(report, settings, exams);
     if ((commandLine.sources & OrvixProviderSource::Plugins) != 0)
     {
-        PluginExaminer(report, settings, announcer).Examine(HostSession::PluginFolder(commandLine));
+        plugins.Examine(HostSession::PluginFolder(commandLine));
     }
     if ((commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
     {
-        RegistrationExaminer(report, settings, announcer).Examine();
+        RegistrationExaminer(report, settings, exams).Examine();
     }
+    exams.Run();
     if (commandLine.sources == Everywhere)
     {
         settings.FindUnused(report.locations.front());

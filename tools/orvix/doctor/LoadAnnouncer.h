@@ -4,7 +4,7 @@
 
 #include <string>
 
-/// Names each library before it is loaded. A library that ends the process is the last one named.
+/// Names each library before it is loaded.
 class LoadAnnouncer
 {
 public:

@@ -25,67 +25,80 @@ void PluginExaminer::Examine(const std::wstring& folder)
     {
         location.AddProblem("no-folder", L"there is no such folder");
     }
-    const UniqueActivationContext context = MakeManifestContext(LibraryModule());
     for (; search.GetState() == PluginSearch::State::Found; search.Next())
     {
-        ExaminePlugin(search.Path(), context);
+        DoctorReport::Candidate& plugin = m_report.candidates.emplace_back();
+        plugin.kind = "plug-in";
+        plugin.location = search.Path();
+        m_exams.AddPlugin(m_settings.Path(), [this](DoctorReport::Candidate& candidate, const auto& about) {
+            candidate.name = about.name;
+            candidate.listed = about.listed;
+            candidate.contractVersion = about.contractVersion;
+            const std::wstring name = about.name.value_or(L"");
+            m_settings.Explain(candidate, about.configured ? m_settings.Configs().FindConfig(name.c_str()) : nullptr,
+                               about.switchedOff);
+        });
     }
 }
 
-void PluginExaminer::ExaminePlugin(const std::wstring& path, const UniqueActivationContext& context)
+CandidateExams::About PluginExaminer::ExaminePlugin(const std::wstring& path, const OrvixProviderConfigManager& configs,
+                                                    void (*report)(const DoctorReport::Subject& findings))
 {
     using Verdict = PluginCandidate::Verdict;
 
-    DoctorReport::Candidate& candidate = m_report.candidates.emplace_back();
-    candidate.kind = "plug-in";
-    candidate.location = path;
+    DoctorReport::Subject headers;
     if (path.size() <= PluginSearch::MaxPath)
     {
-        m_announcer.Announce(path);
-        LoadFindings::AddHeaders(candidate, path);
+        LoadFindings::AddHeaders(headers, path);
     }
-    const PluginCandidate judged = PluginCandidate::Judge(path, context, m_settings.Configs());
-    candidate.listed = judged.verdict == Verdict::Listed;
-    candidate.contractVersion = judged.version;
-    if (judged.entry && (candidate.listed || !judged.entry->name.empty()))
+    report(headers);
+    const UniqueActivationContext context = MakeManifestContext(LibraryModule());
+    const PluginCandidate judged = PluginCandidate::Judge(path, context, configs);
+    CandidateExams::About about;
+    about.listed = judged.verdict == Verdict::Listed;
+    about.contractVersion = judged.version;
+    about.configured = judged.entry && judged.entry->config != nullptr;
+    about.switchedOff = judged.verdict == Verdict::SwitchedOff;
+    if (judged.entry && (about.listed || !judged.entry->name.empty()))
     {
-        candidate.name = judged.entry->name;
+        about.name = judged.entry->name;
     }
-    AddVerdict(candidate, judged, context);
+    DoctorReport::Subject findings;
+    AddVerdict(findings, judged, path, context);
     for (const char* function : judged.FindMissingExports())
     {
-        candidate.AddProblem("missing-export", L"it does not export " + Wide(function));
+        findings.AddProblem("missing-export", L"it does not export " + Wide(function));
     }
-    if (candidate.listed && judged.entry->name.empty())
+    if (about.listed && judged.entry->name.empty())
     {
-        candidate.AddProblem("empty-name", L"its name is empty or null");
+        findings.AddProblem("empty-name", L"its name is empty or null");
     }
-    m_settings.Explain(candidate, judged.entry ? judged.entry->config : nullptr,
-                       judged.verdict == Verdict::SwitchedOff);
+    report(findings);
+    return about;
 }
 
-void PluginExaminer::AddVerdict(DoctorReport::Candidate& candidate, const PluginCandidate& judged,
-                                const UniqueActivationContext& context)
+void PluginExaminer::AddVerdict(DoctorReport::Subject& findings, const PluginCandidate& judged,
+                                const std::wstring& path, const UniqueActivationContext& context)
 {
     using Verdict = PluginCandidate::Verdict;
 
     switch (judged.verdict)
     {
     case Verdict::PathTooLong:
-        candidate.AddProblem("path-too-long", L"its path has " + std::to_wstring(candidate.location.size()) +
-                                                  L" characters, and the library takes at most " +
-                                                  std::to_wstring(PluginSearch::MaxPath));
+        findings.AddProblem("path-too-long", L"its path has " + std::to_wstring(path.size()) +
+                                                 L" characters, and the library takes at most " +
+                                                 std::to_wstring(PluginSearch::MaxPath));
         break;
     case Verdict::DoesNotLoad:
-        LoadFindings::AddLoadError(candidate, candidate.location, context, judged.loadError);
+        LoadFindings::AddLoadError(findings, path, context, judged.loadError);
         break;
     case Verdict::OtherVersion:
-        candidate.AddProblem("contract-version", L"it is made for version " + std::to_wstring(*judged.version) +
-                                                     L" of the contract, the library for " +
-                                                     std::to_wstring(ORVIX_PLUGIN_CONTRACT_VERSION));
+        findings.AddProblem("contract-version", L"it is made for version " + std::to_wstring(*judged.version) +
+                                                    L" of the contract, the library for " +
+                                                    std::to_wstring(ORVIX_PLUGIN_CONTRACT_VERSION));
         break;
     case Verdict::Throws:
-        candidate.AddProblem("throws", L"it throws an exception when it is asked for its version or its name");
+        findings.AddProblem("throws", L"it throws an exception when it is asked for its version or its name");
         break;
     case Verdict::Incomplete:
     case Verdict::SwitchedOff:

@@ -240,37 +240,40 @@ void RegistrationExaminer::ExamineKey(DoctorReport::Candidate& candidate, const 
     m_settings.Explain(candidate, judged.config, judged.verdict == Verdict::SwitchedOff);
     if (candidate.listed)
     {
-        ExamineLibrary(candidate, judged);
+        // Hosts load the library on first use, so a library that does not load is listed.
+        AddSettings(candidate, judged);
+        m_exams.AddLibrary(judged.serverPath, judged.searchPath);
     }
 }
 
-/// Hosts load the library on first use, so a library that does not load is listed.
-void RegistrationExaminer::ExamineLibrary(DoctorReport::Candidate& candidate,
-                                          const InstalledProviders::Candidate& judged)
+void RegistrationExaminer::ExamineLibrary(const std::wstring& serverPath, const std::wstring& searchPath,
+                                          void (*report)(const DoctorReport::Subject& findings))
 {
-    AddSettings(candidate, judged);
-    const DllDirectoryScope directory(judged.searchPath);
-    const std::wstring found = FindLibrary(judged.serverPath, judged.searchPath);
-    if (!found.empty())
+    DoctorReport::Subject headers;
+    const DllDirectoryScope directory(searchPath);
+    const std::wstring path = FindLibrary(serverPath, searchPath);
+    if (!path.empty())
     {
-        LoadFindings::AddHeaders(candidate, found);
+        LoadFindings::AddHeaders(headers, path);
     }
-    m_announcer.Announce(judged.serverPath);
+    report(headers);
+    DoctorReport::Subject findings;
     const UniqueActivationContext context = MakeManifestContext(LibraryModule());
-    const UniqueModule module = LoadLibraryIsolated(judged.serverPath.c_str(), context);
-    if (const DWORD error = GetLastError(); !module && !found.empty())
+    const UniqueModule module = LoadLibraryIsolated(serverPath.c_str(), context);
+    if (const DWORD error = GetLastError(); !module && !path.empty())
     {
-        LoadFindings::AddLoadError(candidate, found, context, error);
+        LoadFindings::AddLoadError(findings, path, context, error);
     }
     else if (!module)
     {
-        candidate.AddProblem("no-library", L"there is no library " + Quoted(judged.serverPath) +
-                                               L"; it is listed anyway, and every operation on it fails");
+        findings.AddProblem("no-library", L"there is no library " + Quoted(serverPath) +
+                                              L"; it is listed anyway, and every operation on it fails");
     }
     else
     {
-        AddMissingExports(candidate, module.Get());
+        AddMissingExports(findings, module.Get());
     }
+    report(findings);
 }
 
 void RegistrationExaminer::Examine32BitList()
