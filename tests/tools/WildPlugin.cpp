@@ -2,6 +2,8 @@
 
 #include "Defect.h"
 #include "DiskProvider.h"
+#include "IOrvixClientAccess.h"
+#include "OrvixClientInfo.h"
 #include "OrvixVersion.h"
 
 #include <windows.h>
@@ -39,7 +41,13 @@ public:
         {
             ChangeProcess();
         }
+        m_client = info->GetIOrvixClientAccess();
         return DiskProvider::Initialize(info);
+    }
+
+    int CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options) override
+    {
+        return DiskProvider::CheckIn(list, comment, Defect::Is(L"keeps-nothing") ? 0 : options);
     }
 
     int QueryStatus(OrvixFileList* list, unsigned long options) override
@@ -65,8 +73,26 @@ public:
         {
             return OrvixProviderResult::Failure;
         }
-        return DiskProvider::QueryStatus(list, options);
+        if (Defect::Is(L"talks"))
+        {
+            m_client->OutputText(L"looking", 0);
+        }
+        Defect::Report("QueryStatus", list->NumActiveEntries());
+        const int result = DiskProvider::QueryStatus(list, options);
+        return Defect::Is(L"every-state") ? ForEachEntry(list, SetEveryState) : result;
     }
+
+private:
+    /// As the library translates a status word of -1.
+    static bool SetEveryState(OrvixFileEntry& entry)
+    {
+        entry.SetFlagsOut(OrvixFileState::Controlled | OrvixFileState::CheckedOut | OrvixFileState::CheckedOutByOther |
+                          OrvixFileState::OutOfDate | OrvixFileState::Deleted | OrvixFileState::Modified |
+                          OrvixFilePermission::GetLatest);
+        return true;
+    }
+
+    IOrvixClientAccess* m_client = nullptr;
 };
 
 WildProvider provider;

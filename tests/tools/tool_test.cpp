@@ -432,6 +432,7 @@ TEST_F(Tool, AStoredNoCancelsTheOperation)
     const auto result = RunAttended({L"checkout", L"a.txt"});
     EXPECT_EQ(result.code, Failed);
     EXPECT_THAT(result.output, HasSubstr("cancelled  checked in  a.txt\n"));
+    EXPECT_THAT(result.errors, HasSubstr("orvix: the stored answer no cancels it. orvix prompts reset 1330796548 "));
 }
 
 TEST_F(Tool, UnattendedAnswersYesAndLeavesTheStoredAnswerAsItWas)
@@ -614,6 +615,12 @@ TEST_F(Tool, BadUsageIsExplainedAndDoesNothing)
         EXPECT_EQ(result.output, "");
     }
     EXPECT_THAT(State(L"a.txt"), HasSubstr("not controlled"));
+}
+
+TEST_F(Tool, AnUnknownCommandIsAnsweredWithTheNearestOne)
+{
+    EXPECT_THAT(RunExactly({L"chekin", L"a.txt"}).errors,
+                HasSubstr("orvix: there is no command chekin; the nearest one is checkin (see --help)\n"));
 }
 
 TEST_F(Tool, AFileThatIsNowhereIsRefusedByEveryCommand)

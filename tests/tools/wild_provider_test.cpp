@@ -8,6 +8,8 @@
 
 #include <gmock/gmock.h>
 
+#include <sstream>
+
 namespace
 {
 
@@ -89,6 +91,78 @@ TEST_F(WildProvider, DoesNotGetWhatWouldDiscardChanges)
 
     EXPECT_EQ(RunWild({L"get", L"edited.txt", L"--force"}).code, Success);
     EXPECT_EQ(ReadBytes(File(L"edited.txt")), "one\n");
+}
+
+TEST_F(WildProvider, ThatKeepsNothingCheckedOutHasCheckedIn)
+{
+    Control(L"a.txt");
+    ASSERT_EQ(RunWild({L"checkout", L"a.txt"}).code, Success);
+    Write(L"a.txt", "two\n");
+    const auto result = RunWith(L"keeps-nothing", {L"checkin", L"a.txt", L"--keep"});
+    EXPECT_EQ(result.code, Success);
+    EXPECT_THAT(result.output, HasSubstr("done    checked in  a.txt\n"));
+    EXPECT_THAT(result.errors, HasSubstr("orvix: 1 file was not kept checked out by the provider\n"));
+}
+
+TEST_F(WildProvider, BringsBackANamedFileThatIsMissingOnTheDisk)
+{
+    Control(L"gone.txt");
+    for (const wchar_t* command : {L"undo", L"get"})
+    {
+        SetFileAttributesW(File(L"gone.txt").c_str(), FILE_ATTRIBUTE_NORMAL);
+        std::filesystem::remove(File(L"gone.txt"));
+        EXPECT_THAT(RunWild({L"status", L"gone.txt"}).output, HasSubstr("missing on disk  gone.txt\n"));
+        EXPECT_EQ(RunWild({command, L"gone.txt"}).code, Success);
+        EXPECT_EQ(ReadBytes(File(L"gone.txt")), "one\n");
+    }
+}
+
+TEST_F(WildProvider, ThatKnowsNoStateHasNone)
+{
+    Write(L"a.txt", "x");
+    EXPECT_THAT(RunWith(L"every-state", {L"status", L"a.txt"}).output, HasSubstr("unknown  a.txt\n"));
+}
+
+TEST_F(WildProvider, SaysThingsOnTheErrorOutput)
+{
+    Write(L"a.txt", "x");
+    const auto text = RunWith(L"talks", {L"status", L"a.txt"});
+    EXPECT_THAT(text.errors, HasSubstr("looking\n"));
+    EXPECT_THAT(text.output, Not(HasSubstr("looking")));
+    const auto document = RunWith(L"talks", {L"status", L"a.txt", L"--json"});
+    EXPECT_THAT(document.output, HasSubstr("\"lines\": [],\n  \"messages\": [\n    \"looking\"\n  ]"));
+}
+
+TEST_F(WildProvider, IsAskedAfterAnOperationOnlyAboutItsFiles)
+{
+    for (const wchar_t* name : {L"a.txt", L"b.txt", L"c.txt"})
+    {
+        Control(name);
+    }
+    ASSERT_EQ(RunWild({L"checkout", L"b.txt"}).code, Success);
+    const std::filesystem::path journal = Scratch() / L"queries.txt";
+    const Environment file(L"ORVIX_DEFECT_FILE", journal.wstring());
+    EXPECT_EQ(RunWith(L"report-options", {L"checkin", L"."}).code, Success);
+    std::istringstream queries(ReadBytes(journal));
+    std::vector<std::string> lines;
+    for (std::string line; std::getline(queries, line);)
+    {
+        line.erase(line.find_last_not_of('\r') + 1);
+        lines.push_back(line);
+    }
+    ASSERT_GE(lines.size(), 2U);
+    EXPECT_EQ(lines[0], "QueryStatus 3");
+    EXPECT_EQ(lines[1], "QueryStatus 1");
+}
+
+TEST_F(WildProvider, ThatIsSwitchedOffIsNamedWithTheSetting)
+{
+    WriteSettings("<?xml version=\"1.0\"?>\n<OrvixProviders><P><Name>wild</Name><Enabled>false</Enabled></P>"
+                  "</OrvixProviders>");
+    const auto result = RunWild({L"providers"});
+    EXPECT_EQ(result.code, NotFound);
+    EXPECT_THAT(result.errors, HasSubstr("; provider element 1 of OrvixProviders.xml switches off each provider whose "
+                                         "name contains \"wild\"\n"));
 }
 
 TEST_F(WildProvider, IsNotUsedWhileTheAdministratorsRulesCannotBeRead)

@@ -35,8 +35,9 @@ struct Command
     unsigned int takes = 0;         ///< bits of `Argument`
     const char* pathHelp = nullptr; ///< what PATH is, where the command takes one
     std::uint32_t defaultSources = OrvixProviderSource::Plugins;
-    int timeout = 0;            ///< default of --timeout in seconds; 0: only when unattended
-    bool usesProviders = false; ///< runs in a child process, since it loads code of others
+    bool providerTextIsResult = false; ///< what the provider prints is the result
+    int timeout = 0;                   ///< default of --timeout in seconds; 0: only when unattended
+    bool usesProviders = false;        ///< runs in a child process, since it loads code of others
 
     /// Runs the command. Null for a command that is a group. Throws `ToolError`.
     ExitCode (*run)(const CommandLine& commandLine) = nullptr;

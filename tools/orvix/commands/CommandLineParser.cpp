@@ -9,6 +9,8 @@
 #include <iostream>
 #include <iterator>
 #include <map>
+#include <numeric>
+#include <utility>
 
 namespace
 {
@@ -97,6 +99,37 @@ std::uint32_t ParseSources(const std::string& text)
                                                 (text.empty() ? L"an empty text" : Unmarked(text)));
     }
     return found->bits;
+}
+
+/// How many letters must be added, removed or replaced to make one word of the other.
+std::size_t Distance(std::string_view from, std::string_view to)
+{
+    std::vector<std::size_t> row(to.size() + 1);
+    std::iota(row.begin(), row.end(), std::size_t{0});
+    for (std::size_t i = 0; i < from.size(); ++i)
+    {
+        std::size_t diagonal = std::exchange(row[0], i + 1);
+        for (std::size_t j = 0; j < to.size(); ++j)
+        {
+            const std::size_t replaced = diagonal + (from[i] == to[j] ? 0 : 1);
+            diagonal = row[j + 1];
+            row[j + 1] = std::min({replaced, diagonal + 1, row[j] + 1});
+        }
+    }
+    return row.back();
+}
+
+/// The command whose name is most like a word.
+const char* NearestCommand(const std::string& word)
+{
+    const auto commands = AllCommands();
+    const auto nearest = std::min_element(commands.begin(), commands.end(), [&](const auto& left, const auto& right) {
+        const auto distance = [&](const Command& command) {
+            return command.group != nullptr ? std::string::npos : Distance(word, command.name);
+        };
+        return distance(left) < distance(right);
+    });
+    return nearest->name;
 }
 
 constexpr const char* Footer =
@@ -287,6 +320,12 @@ std::optional<Invocation> Parser::Parse(int count, wchar_t** arguments)
     {
         std::wstring message = Wide(error.what());
         std::erase(message, static_cast<wchar_t>(Mark));
+        const std::vector<std::string> rest = m_app.remaining();
+        if (m_app.get_subcommands().empty() && !rest.empty() && !rest.front().starts_with('-'))
+        {
+            message = L"there is no command " + Unmarked(rest.front()) + L"; the nearest one is " +
+                      Wide(NearestCommand(rest.front()));
+        }
         throw ToolError(ExitCode::BadUsage, message + L" (see --help)");
     }
     const Command& command = ChosenCommand();
@@ -324,6 +363,7 @@ CommandLine Parser::MakeCommandLine(const Command& command) const
     result.command = Wide(command.group != nullptr ? command.group : command.name);
     result.folder = FullPath(L".");
     result.timeout = Timeout(command);
+    result.providerTextIsResult = command.providerTextIsResult;
     result.cancelsWindows = m_texts.onWindow == "cancel";
     result.prompt = Unmarked(m_texts.prompt);
     result.answer = Unmarked(m_texts.answer);

@@ -57,7 +57,12 @@ void FileCommand::AddFile(std::size_t index)
 {
     const FileCollector::File& file = m_collector.Files()[index];
     std::wstring filter;
-    if (!m_project.IsExcluded(file.path, filter))
+    const bool isExcluded = m_project.IsExcluded(file.path, filter);
+    if (!isExcluded && !m_project.Takes(file.path))
+    {
+        Report(Refused, {{"unknown"}, L"its name has characters that the provider's code page lacks"}, file.path);
+    }
+    else if (!isExcluded)
     {
         const auto clientPtr = static_cast<long long>(index);
         if (m_list.CreateEntry(file.path.c_str(), nullptr, FileMark::Chosen, clientPtr) == nullptr)

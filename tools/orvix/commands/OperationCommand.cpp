@@ -33,6 +33,10 @@ void OperationCommand::RunOnFiles()
     RegisterPrompts();
     StoreAnswers();
     Project().Provider().Withhold(m_rule.allowedBy, m_rule.protects);
+    if (!Project().Takes(Arguments().comment))
+    {
+        std::cerr << "orvix: the comment has characters that the provider's code page lacks; they are replaced\n";
+    }
     const bool ran = RunOperation(params);
     RequireStatus();
     const std::vector<std::optional<Result>> results = ResultsOfRun(ran);
@@ -103,6 +107,10 @@ bool OperationCommand::RunOperation(OrvixFileListDialogParams& params)
         Results().Progress({});
         std::cerr << "orvix: vetoed: " << Printable(veto.Reason()) << '\n';
     }
+    else if (result != OrvixOperationResult::Done)
+    {
+        ExplainCancel();
+    }
     return result == OrvixOperationResult::Done;
 }
 
@@ -160,6 +168,36 @@ bool OperationCommand::IsProtected(OrvixFileEntry& entry) const
     return m_rule.Protects(entry.GetFlagsOut()) && PathExists(entry.GetFile());
 }
 
+void OperationCommand::ExplainCancel()
+{
+    IOrvixServices& services = Project().Services();
+    const std::uint32_t action = services.GetPromptAction(m_rule.dialogPrompt);
+    if ((action & (OrvixPromptAction::Ask | OrvixPromptAction::Yes)) == 0)
+    {
+        const std::string id = std::to_string(m_rule.dialogPrompt);
+        Results().Progress({});
+        std::cerr << "orvix: the stored answer no cancels it. orvix prompts reset " << id
+                  << " makes it ask again; a locked answer needs orvix prompts unlock " << id << " first\n";
+    }
+}
+
+FileCommand::Result OperationCommand::ResultOf(OrvixFileEntry& entry, bool kept)
+{
+    const unsigned long flags = entry.GetFlagsOut();
+    if (!PathExists(entry.GetFile()))
+    {
+        return Failed;
+    }
+    if (m_rule.IsReached(flags, kept))
+    {
+        return Done;
+    }
+    // A provider that knows no check-outs keeps none.
+    const bool isStored = kept && Project().Provider().KeepsCheckedOut() && m_rule.IsReached(flags, false);
+    m_notKept += isStored ? 1 : 0;
+    return isStored ? Done : Failed;
+}
+
 void OperationCommand::ReportResults(const std::vector<std::optional<Result>>& results, bool kept)
 {
     for (unsigned int i = 0; i < List().NumEntries(); ++i)
@@ -178,12 +216,16 @@ void OperationCommand::ReportResults(const std::vector<std::optional<Result>>& r
         }
         else if (*results[i] == Done)
         {
-            const bool reached = m_rule.IsReached(entry->GetFlagsOut(), kept) && PathExists(entry->GetFile());
-            Report(reached ? Done : Failed, *entry);
+            Report(ResultOf(*entry, kept), *entry);
         }
         else
         {
             Report(*results[i], *entry);
         }
+    }
+    if (m_notKept > 0)
+    {
+        std::cerr << "orvix: " << m_notKept << (m_notKept == 1 ? " file was" : " files were")
+                  << " not kept checked out by the provider\n";
     }
 }

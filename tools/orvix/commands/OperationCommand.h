@@ -50,9 +50,16 @@ private:
     /// Whether the file has changes of the user that the command would discard.
     bool IsProtected(OrvixFileEntry& entry) const;
 
+    /// Says which stored answer has cancelled the operation, and how to change it, if one has.
+    void ExplainCancel();
+
+    /// The result of a file that the operation was to change. `kept`: it was to stay checked out.
+    Result ResultOf(OrvixFileEntry& entry, bool kept);
+
     void ReportResults(const std::vector<std::optional<Result>>& results, bool kept);
 
     OperationRule m_rule;
     std::optional<TemporaryAnswer> m_dialogAnswer;
     std::optional<TemporaryAnswer> m_keepAnswer;
+    unsigned int m_notKept = 0; // files that the provider did not keep checked out
 };

@@ -28,8 +28,10 @@ ExitCode RunInProject(const CommandLine& commandLine, Operation operation)
         }
         if (result < OrvixProviderResult::Success)
         {
-            throw ToolError(ExitCode::Failed,
-                            commandLine.command + L" failed in the provider " + project.ProviderName());
+            // The bridge to an MSSCCI library answers "not offered" and "failed" alike.
+            const bool mayHaveNone = commandLine.command == L"options" && host.IsInstalled(project.ProviderIndex());
+            throw ToolError(ExitCode::Failed, (mayHaveNone ? L"it has no options, or " : L"") + commandLine.command +
+                                                  L" failed in the provider " + project.ProviderName());
         }
         return ExitCode::Success;
     });

@@ -45,6 +45,11 @@ void JsonOutput::Print(std::wstring_view text)
     m_lines.push_back(Utf8(text));
 }
 
+void JsonOutput::PrintMessage(std::wstring_view text)
+{
+    m_messages.push_back(Utf8(text));
+}
+
 void JsonOutput::Show(const Listing& listing)
 {
     Json rows = Json::array();
@@ -57,6 +62,7 @@ void JsonOutput::Show(const Listing& listing)
     {
         summary[count.key] = count.count;
     }
-    const Json document = {{listing.key, std::move(rows)}, {"summary", std::move(summary)}, {"lines", m_lines}};
+    const Json document = {
+        {listing.key, std::move(rows)}, {"summary", std::move(summary)}, {"lines", m_lines}, {"messages", m_messages}};
     m_stream << document.dump(2) << '\n';
 }

@@ -15,6 +15,9 @@ public:
 
     /// Stores the text for the object's "lines".
     void Print(std::wstring_view text) override;
+
+    /// Stores the text for the object's "messages".
+    void PrintMessage(std::wstring_view text) override;
     void Progress(std::wstring_view) override {}
 
     /// Prints the object.
@@ -23,4 +26,5 @@ public:
 private:
     std::ostream& m_stream;
     std::vector<std::string> m_lines;
+    std::vector<std::string> m_messages;
 };

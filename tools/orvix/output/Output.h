@@ -13,8 +13,11 @@ public:
     Output& operator=(const Output&) = delete;
     virtual ~Output() = default;
 
-    /// Prints text of the provider or of a listener while the command runs. It may have several lines.
+    /// Prints a text that belongs to the result while the command runs, such as the history. It may have several lines.
     virtual void Print(std::wstring_view text) = 0;
+
+    /// Prints what a provider says while the command runs. It may have several lines.
+    virtual void PrintMessage(std::wstring_view text) = 0;
 
     /// Shows a person who waits what the command does now. The next output replaces it; an empty text removes it.
     virtual void Progress(std::wstring_view text) = 0;

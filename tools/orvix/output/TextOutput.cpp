@@ -3,6 +3,8 @@
 #include "Text.h"
 #include "TextTable.h"
 
+#include <iostream>
+
 namespace
 {
 
@@ -26,6 +28,12 @@ void TextOutput::Print(std::wstring_view text)
 {
     Progress({});
     m_stream << PrintableLines(text) << '\n' << std::flush;
+}
+
+void TextOutput::PrintMessage(std::wstring_view text)
+{
+    Progress({});
+    std::cerr << PrintableLines(text) << std::endl;
 }
 
 void TextOutput::Progress(std::wstring_view text)

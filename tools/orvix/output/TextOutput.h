@@ -17,6 +17,9 @@ public:
 
     void Print(std::wstring_view text) override;
 
+    /// Prints the text on the error output.
+    void PrintMessage(std::wstring_view text) override;
+
     /// Shows the text on a terminal only.
     void Progress(std::wstring_view text) override;
 

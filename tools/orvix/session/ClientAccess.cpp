@@ -9,7 +9,7 @@ void ClientAccess::OutputText(const wchar_t* text, int)
     if (text != nullptr)
     {
         ParentLink::Send(ParentLink::Alive);
-        m_output.Print(text);
+        m_textIsResult ? m_output.Print(text) : m_output.PrintMessage(text);
     }
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "CommandLine.h"
 #include "IOrvixClientAccess.h"
 #include "Output.h"
 
@@ -7,8 +8,11 @@
 class ClientAccess final : public IOrvixClientAccess
 {
 public:
-    /// `unattended`: nobody answers dialogs. `output` prints the text of providers and must outlive this object.
-    ClientAccess(bool unattended, Output& output) : m_unattended(unattended), m_output(output) {}
+    /// `output` prints the text of providers, and must outlive this object.
+    ClientAccess(const CommandLine& commandLine, Output& output)
+        : m_unattended(commandLine.unattended), m_textIsResult(commandLine.providerTextIsResult), m_output(output)
+    {
+    }
 
     void OutputText(const wchar_t* text, int kind) override;
     std::intptr_t RelayA(void*, void*, void*, void*) override { return 0; }
@@ -18,5 +22,6 @@ public:
 
 private:
     bool m_unattended;
+    bool m_textIsResult;
     Output& m_output;
 };

@@ -20,6 +20,7 @@ struct CommandLine
     std::wstring user;
     std::uint32_t sources = 0; ///< bits of `OrvixProviderSource`
     std::vector<std::wstring> vetoes;
+    bool providerTextIsResult = false; ///< what the provider prints is the result of the command
     bool unattended = false;
     std::optional<std::chrono::seconds> timeout; ///< 1 to 3600; empty for none
     bool cancelsWindows = false;                 ///< presses Cancel in windows of providers

@@ -3,6 +3,7 @@
 #include "FilePath.h"
 #include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
+#include "OrvixProviderOption.h"
 #include "OrvixProviderResult.h"
 
 const wchar_t* GuardedProvider::GetName()
@@ -57,6 +58,7 @@ int GuardedProvider::ReservedC()
 
 int GuardedProvider::CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
+    m_keepsCheckedOut = (options & OrvixProviderOption::KeepCheckedOut) != 0;
     return Guarded("CheckIn", [&] { return m_provider.CheckIn(list, comment, options); });
 }
 
@@ -87,6 +89,7 @@ int GuardedProvider::ReservedE()
 
 int GuardedProvider::Add(OrvixFileList* list, const wchar_t* comment, unsigned long options)
 {
+    m_keepsCheckedOut = (options & OrvixProviderOption::KeepCheckedOut) != 0;
     return Guarded("Add", [&] { return m_provider.Add(list, comment, options); });
 }
 
@@ -153,6 +156,14 @@ unsigned long GuardedProvider::CorrectedFlags(OrvixFileEntry& entry) const
     {
         return 0;
     }
-    const bool withheld = (flags & m_withheldFrom) != 0 && PathExists(entry.GetFile());
+    constexpr unsigned long Known = OrvixFileState::Controlled | OrvixFileState::Deleted;
+    const bool exists = PathExists(entry.GetFile());
+    if (!exists && (flags & Known) != 0 && (flags & OrvixFileState::NotControlled) == 0)
+    {
+        // A library says of such a file that it is deleted, or that it is as it was.
+        return (flags & ~OrvixFilePermission::Add) | OrvixFileState::Controlled | OrvixFilePermission::GetLatest |
+               OrvixFilePermission::UndoCheckOut;
+    }
+    const bool withheld = exists && (flags & m_withheldFrom) != 0;
     return withheld ? flags & ~m_withheld : flags;
 }

@@ -23,6 +23,9 @@ public:
         m_withheldFrom = states;
     }
 
+    /// Whether the last operation asked the provider to keep the files checked out.
+    bool KeepsCheckedOut() const { return m_keepsCheckedOut; }
+
     /// Whether the last `QueryStatus` succeeded.
     bool KnowsStatus() const { return m_knowsStatus; }
 
@@ -47,7 +50,8 @@ public:
     int ShowProperties(OrvixFileList* list) override;
 
     /// As the provider answers, except that a status word of -1, in which a library says that it does not know the
-    /// file, becomes no state at all instead of every state.
+    /// state, becomes no state at all instead of every state, and that a file of the project that is missing on the
+    /// disk can be brought back.
     int QueryStatus(OrvixFileList* list, unsigned long options) override;
     int ReservedF() override;
     int ReservedG() override;
@@ -70,4 +74,5 @@ private:
     unsigned long m_withheld = 0;
     unsigned long m_withheldFrom = 0;
     bool m_knowsStatus = false;
+    bool m_keepsCheckedOut = false;
 };

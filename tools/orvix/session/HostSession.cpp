@@ -2,7 +2,9 @@
 
 #include "FilePath.h"
 #include "GuardedCall.h"
+#include "InstalledProviders.h"
 #include "ModulePath.h"
+#include "OrvixProviderConfig.h"
 #include "OrvixProviderSource.h"
 #include "ToolError.h"
 
@@ -42,7 +44,7 @@ std::wstring WindowsUser()
 
 } // namespace
 
-HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_access(commandLine.unattended, output)
+HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_access(commandLine, output)
 {
     if ((commandLine.sources & OrvixProviderSource::Plugins) != 0)
     {
@@ -65,6 +67,13 @@ HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_acc
         throw std::bad_alloc();
     }
     GuardedCall("the search for providers", [&] { m_services->Initialize(&m_client, commandLine.sources); });
+    m_configs.LoadConfig((ConfigFolder(commandLine) + L'\\' + OrvixProviderConfigManager::FileName).c_str(),
+                         &m_settings);
+    m_firstInstalled = m_services->GetProviderCount();
+    if ((commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
+    {
+        FindFirstInstalled();
+    }
 }
 
 HostSession::~HostSession()
@@ -77,6 +86,41 @@ HostSession::~HostSession()
     {
         std::cerr << "orvix: the stored answers cannot be saved: out of memory\n";
     }
+}
+
+/// Plug-ins come first, and the libraries of the registry's list follow.
+void HostSession::FindFirstInstalled()
+{
+    const UniqueRegistryKey list = InstalledProviders::OpenList();
+    std::wstring keyPath;
+    for (DWORD index = 0; list; ++index)
+    {
+        const auto step = InstalledProviders::KeyPathAt(list.Get(), index, keyPath);
+        if (step == InstalledProviders::Step::End)
+        {
+            return;
+        }
+        const bool listed =
+            step == InstalledProviders::Step::Found &&
+            InstalledProviders::Judge(keyPath, m_configs).verdict == InstalledProviders::Verdict::Listed;
+        m_firstInstalled -= listed && m_firstInstalled > 0 ? 1 : 0;
+    }
+}
+
+/// The end of a message that there is no provider: which settings may be the reason.
+std::wstring HostSession::SwitchedOff() const
+{
+    std::wstring text;
+    for (const FileDiagnostics::Provider& provider : m_settings.providers)
+    {
+        if (!provider.config->m_enabled)
+        {
+            text += L"; provider element " + std::to_wstring(provider.item) + L" of " +
+                    OrvixProviderConfigManager::FileName + L" switches off each provider whose name contains \"" +
+                    provider.name + L"\"";
+        }
+    }
+    return text;
 }
 
 void HostSession::UsePlugins(const CommandLine& commandLine)
@@ -117,7 +161,7 @@ std::uint32_t HostSession::FindProvider(const std::wstring& nameOrIndex)
     const std::uint32_t count = m_services->GetProviderCount();
     if (count == 0)
     {
-        throw ToolError(ExitCode::NotFound, L"no provider in " + m_searched);
+        throw ToolError(ExitCode::NotFound, L"no provider in " + m_searched + SwitchedOff());
     }
     for (std::uint32_t index = 0; index < count; ++index)
     {

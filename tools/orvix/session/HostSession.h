@@ -2,7 +2,9 @@
 
 #include "ClientAccess.h"
 #include "CommandLine.h"
+#include "FileDiagnostics.h"
 #include "OrvixClientInfo.h"
+#include "OrvixProviderConfigManager.h"
 #include "OrvixServicesPointer.h"
 
 #include <string>
@@ -33,12 +35,20 @@ public:
     /// `ToolError` with `ExitCode::NotFound`.
     std::uint32_t FindProvider(const std::wstring& nameOrIndex);
 
+    /// Whether the provider is an installed MSSCCI library, which takes names and comments in the ANSI code page only.
+    bool IsInstalled(std::uint32_t provider) const { return provider >= m_firstInstalled; }
+
 private:
+    void FindFirstInstalled();
+    std::wstring SwitchedOff() const;
     void UsePlugins(const CommandLine& commandLine);
     void UseConfiguration(const CommandLine& commandLine);
 
     ClientAccess m_access;
     OrvixClientInfo m_client;
-    std::wstring m_searched; // where providers were searched, for messages
+    std::wstring m_searched;              // where providers were searched, for messages
+    OrvixProviderConfigManager m_configs; // as the services object reads it
+    FileDiagnostics m_settings;           // of OrvixProviders.xml
+    std::uint32_t m_firstInstalled = 0;   // index; the number of providers when there is none
     OrvixServicesPointer m_services;
 };

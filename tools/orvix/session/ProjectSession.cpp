@@ -54,3 +54,8 @@ bool ProjectSession::IsExcluded(const std::wstring& path, std::wstring& filter)
 {
     return Services().IsFileExcludedByProvider(m_index, path.c_str(), &filter);
 }
+
+bool ProjectSession::Takes(const std::wstring& text) const
+{
+    return !m_host.IsInstalled(m_index) || IsInAnsiCodePage(text);
+}

@@ -26,6 +26,10 @@ public:
     /// Full path of the project's folder.
     const std::wstring& Folder() const { return m_folder; }
 
+    /// Whether the provider takes a name or a comment without losing characters of it. An installed MSSCCI library
+    /// takes those of the ANSI code page.
+    bool Takes(const std::wstring& text) const;
+
     /// Whether the administrator's filters exclude a file from the provider. `filter` receives the name of the filter.
     bool IsExcluded(const std::wstring& path, std::wstring& filter);
 

@@ -41,6 +41,19 @@ std::wstring Wide(std::string_view text)
     return wide;
 }
 
+bool IsInAnsiCodePage(std::wstring_view text)
+{
+    const int length = static_cast<int>(text.size());
+    if (GetACP() == CP_UTF8)
+    {
+        return length == 0 || WideCharToMultiByte(CP_UTF8, WC_ERR_INVALID_CHARS, text.data(), length, nullptr, 0,
+                                                  nullptr, nullptr) != 0;
+    }
+    BOOL lost = FALSE;
+    WideCharToMultiByte(CP_ACP, WC_NO_BEST_FIT_CHARS, text.data(), length, nullptr, 0, nullptr, &lost);
+    return lost == FALSE;
+}
+
 std::string Printable(std::wstring_view text)
 {
     return WithoutControls(text, L"");

@@ -9,6 +9,9 @@ std::string Utf8(std::wstring_view text);
 /// UTF-8 to UTF-16. What is not valid becomes U+FFFD.
 std::wstring Wide(std::string_view text);
 
+/// Whether the ANSI code page has every character of a text.
+bool IsInAnsiCodePage(std::wstring_view text);
+
 /// Text from outside as UTF-8 that is safe on a terminal: each control character becomes U+FFFD.
 std::string Printable(std::wstring_view text);
 
