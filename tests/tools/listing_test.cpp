@@ -145,7 +145,8 @@ TEST_F(ListingTool, ProvidersAsJson)
 {
     EXPECT_EQ(Json({L"providers"}), json({{"providers", {{{"index", 0}, {"name", "Archive"}}}},
                                           {"summary", json::object()},
-                                          {"lines", json::array()}}));
+                                          {"lines", json::array()},
+                                          {"messages", json::array()}}));
 }
 
 TEST_F(ListingTool, StatusAsJson)
@@ -163,9 +164,11 @@ TEST_F(ListingTool, StatusAsJson)
                 {"cancelled", 0},
                 {"failed", 0},
                 {"leftOutForState", 0},
+                {"leftOutForChanges", 0},
                 {"leftOutByFilters", 0},
                 {"hiddenFolders", 0}}},
-              {"lines", json::array()}}));
+              {"lines", json::array()},
+              {"messages", json::array()}}));
 }
 
 TEST_F(ListingTool, AnOperationAsJson)

@@ -88,7 +88,8 @@ TEST_F(PromptsTool, ListAsJson)
                                                    {"locked", false},
                                                    {"text", "Sure?"}}}},
                                                 {"summary", {{"prompts", 1}, {"leftLocked", 0}}},
-                                                {"lines", json::array()}}));
+                                                {"lines", json::array()},
+                                                {"messages", json::array()}}));
 }
 
 TEST_F(PromptsTool, ListOfAFolderWithoutAFileIsEmpty)
