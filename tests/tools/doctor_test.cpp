@@ -393,9 +393,9 @@ TEST_F(DoctorTest, ALibraryThatEndsTheProcessOrHangsIsAFindingAndTheOthersAreExa
                 HasSubstr("it ends the process with exit code 0 when it is loaded"));
 
     const Environment hanging(Defect::Variable, L"hang-at-load");
-    const Json late = Report({L"--timeout", L"2"});
+    const Json late = Report({L"--timeout", L"10"});
     EXPECT_EQ(Candidate(late, "good.dll")["listed"], true);
-    EXPECT_THAT(TextOf(Candidate(late, "exit.dll"), "hangs"), HasSubstr("it does not return within 2 s"));
+    EXPECT_THAT(TextOf(Candidate(late, "exit.dll"), "hangs"), HasSubstr("it does not return within 10 s"));
 }
 
 TEST_F(DoctorTest, JsonStaysOneObjectWhateverALibraryPrints)
