@@ -4,6 +4,7 @@
 #include "Defect.h"
 #include "Environment.h"
 #include "RegistryToolTest.h"
+#include "Text.h"
 
 #include <gmock/gmock.h>
 #include <nlohmann/json.hpp>
@@ -398,6 +399,59 @@ TEST_F(DoctorTest, ALibraryThatEndsTheProcessOrHangsIsAFindingAndTheOthersAreExa
     EXPECT_THAT(TextOf(Candidate(late, "exit.dll"), "hangs"), HasSubstr("it does not return within 10 s"));
 }
 
+TEST_F(DoctorTest, FindsSettingsThatAreReadAndHaveAnotherEffectThanTheySeem)
+{
+    WriteSettings("\n<a><Name>x</Name><Name>depot</Name>\n<FixedProjectRoot>project</FixedProjectRoot>\n"
+                  "<AltProviderExecutable>C:\\gone.exe</AltProviderExecutable>\n"
+                  "<MSSCCProjectFile>sub\\file.ini</MSSCCProjectFile>\n"
+                  "<MSSCCDllSearchPath>libs</MSSCCDllSearchPath>\n<Filters>\n"
+                  "<f><Name>1</Name></f>\n"
+                  "<f><Name>2</Name><Type>include</Type><FileType/></f>\n"
+                  "<f><Name>3</Name><FileType>.tmp</FileType><FileType>*</FileType><FileType>bak</FileType></f>\n"
+                  "<f><Name>4</Name><Folder>C:/a/</Folder><Folder>sub\\</Folder><Folder>C:\\a</Folder>"
+                  "<Folder>C:\\a\\</Folder></f>\n"
+                  "</Filters></a>");
+    const Json place = Place(Report(), "settings file");
+    EXPECT_THAT(CodesOf(place),
+                ElementsAre("!repeated", "!no-root-folder", "!no-executable", "!no-search-path", "!bad-file-name",
+                            "!empty-filter", "!empty-type", "!file-type", "!file-type", "!folder-slash",
+                            "!folder-relative", "!folder-end", "!matches-nothing"));
+    std::vector<int> lines;
+    for (const Json& finding : place["findings"])
+    {
+        lines.push_back(finding["line"]);
+        EXPECT_GT(finding["column"], 0);
+        EXPECT_NE(finding["remedy"], "") << finding;
+    }
+    EXPECT_THAT(lines, ElementsAre(2, 3, 4, 6, 5, 8, 9, 10, 10, 11, 11, 11, 2));
+    EXPECT_EQ(TextOf(place, "folder-end"), "provider element 1 (\"depot\"), filter 4: Folder \"C:\\a\" also matches "
+                                           "neighbours whose names begin like it, such as \"C:\\a2\"");
+}
+
+TEST_F(DoctorTest, FindsNumbersOfPromptsThatAreNoneAndEmptyFiles)
+{
+    WritePrompts("<?xml version=\"1.0\"?>\n<OrvixPrompts><Prompt><Text>x</Text><ID>12a</ID><Locked>true</Locked>"
+                 "<ActionOpts/><Action>1</Action><Action>2</Action></Prompt></OrvixPrompts>");
+    WriteBytes(Config() / L"OrvixProviders.xml", "");
+    const Json report = Report();
+    EXPECT_THAT(CodesOf(Place(report, "prompt file")), ElementsAre("!not-a-number", "!not-a-number", "!repeated"));
+    EXPECT_THAT(CodesOf(Place(report, "settings file")), ElementsAre("!malformed"));
+    WriteSettings("");
+    EXPECT_THAT(CodesOf(Place(Report(), "settings file")), ElementsAre("empty-file"));
+}
+
+TEST_F(DoctorTest, FindsALibraryThatNeedsTheCurrentFolder)
+{
+    const std::filesystem::path needed = std::filesystem::path(ORVIX_RECORDING_MSSCCI) / L"needed";
+    std::filesystem::copy_file(needed / L"scc_dependency.dll", File(L"scc_dependency.dll"));
+    Install(L"1", L"Dependent", Library(L"recording_dependent.dll"));
+    Install(L"2", L"Whole", Complete());
+    const Json report = Report();
+    EXPECT_THAT(TextOf(Candidate(report, "1"), "current-folder"), HasSubstr("it needs scc_dependency.dll"));
+    EXPECT_EQ(Candidate(report, "2")["findings"], Json::array());
+    EXPECT_EQ(Wide(Candidate(report, "2")["library"].get<std::string>()), Complete());
+}
+
 TEST_F(DoctorTest, JsonStaysOneObjectWhateverALibraryPrints)
 {
     AddPlugin(L"talkative");
@@ -752,7 +806,7 @@ TEST_F(DoctorOnRegistrations, NameTheFunctionsThatALibraryLacks)
         missing.insert(finding["text"]);
     }
     EXPECT_EQ(missing.size(), 21u - 8u);
-    EXPECT_EQ(missing.count("it does not export SccHistory, so the operations that need it fail"), 1u);
+    EXPECT_EQ(missing.count("it does not export SccHistory, so showing the history fails"), 1u);
 }
 
 TEST_F(DoctorOnRegistrations, FindWhatIsOnlyInThe32BitView)
@@ -853,14 +907,14 @@ TEST_F(DoctorOnSettings, SayWhatAnUnknownValueCountsAs)
 {
     AddPlugin(L"good");
     const Json settings = ReportOnSettings("<a><Name>Fake</Name><Enabled>no</Enabled><Filters><f><Name>n</Name>"
-                                           "<Type>skip</Type></f></Filters></a>");
+                                           "<Type>skip</Type><FileType>tmp</FileType></f></Filters></a>");
     EXPECT_EQ(CodesOf(settings), (Codes{"!unknown-value", "!unknown-value"}));
     EXPECT_EQ(settings["findings"][0]["text"],
               "provider element 1 (\"Fake\"): Enabled is \"no\", which counts as \"true\"");
     EXPECT_EQ(settings["findings"][1]["text"],
               "provider element 1 (\"Fake\"), filter 1: Type is \"skip\", which counts as \"include\"");
     EXPECT_THAT(CodesOf(ReportOnSettings("<a><Name>Fake</Name><Enabled>True</Enabled><Filters><f><Name>n</Name>"
-                                         "<Type>INCLUDE</Type></f></Filters></a>")),
+                                         "<Type>INCLUDE</Type><FileType>tmp</FileType></f></Filters></a>")),
                 IsEmpty());
 }
 

@@ -53,6 +53,10 @@ void SendAbout(const CandidateExams::About& about)
     {
         line["name"] = Utf8(*about.name);
     }
+    if (about.library)
+    {
+        line["library"] = Utf8(*about.library);
+    }
     if (about.contractVersion)
     {
         line["contractVersion"] = *about.contractVersion;
@@ -66,11 +70,16 @@ CandidateExams::About ReadAbout(const std::string& text)
     CandidateExams::About about{.name = std::nullopt,
                                 .listed = line["listed"],
                                 .contractVersion = std::nullopt,
+                                .library = std::nullopt,
                                 .configured = line["configured"],
                                 .switchedOff = line["switchedOff"]};
     if (line.contains("name"))
     {
         about.name = Wide(line["name"].get<std::string>());
+    }
+    if (line.contains("library"))
+    {
+        about.library = Wide(line["library"].get<std::string>());
     }
     if (line.contains("contractVersion"))
     {
@@ -133,8 +142,9 @@ private:
         if (word == Found)
         {
             const Json finding = Json::parse(rest);
-            m_findings.findings.push_back(
-                {finding["problem"], finding["code"], Wide(finding["text"].get<std::string>())});
+            m_findings.findings.push_back({.isProblem = finding["problem"],
+                                           .code = finding["code"],
+                                           .text = Wide(finding["text"].get<std::string>())});
         }
         else if (word == Done)
         {
@@ -198,6 +208,7 @@ void CandidateExams::Run()
     {
         DoctorReport::Candidate& candidate = m_report.candidates[m_planned[i].candidate];
         candidate.findings.insert(candidate.findings.end(), exams[i]->Findings().begin(), exams[i]->Findings().end());
+        candidate.library = exams[i]->Result().library;
         if (m_planned[i].finish)
         {
             m_planned[i].finish(candidate, exams[i]->Result());
@@ -221,8 +232,7 @@ bool CandidateExams::RunAsChild(int count, wchar_t** arguments)
     }
     else
     {
-        RegistrationExaminer::ExamineLibrary(arguments[2], arguments[3], SendFindings);
-        SendAbout({});
+        SendAbout(RegistrationExaminer::ExamineLibrary(arguments[2], arguments[3], SendFindings));
     }
     return true;
 }

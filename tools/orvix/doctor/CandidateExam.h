@@ -14,14 +14,15 @@
 class CandidateExams
 {
 public:
-    /// What a child found out about a plug-in besides its findings.
+    /// What a child found out besides its findings. All but the path is about a plug-in.
     struct About
     {
         std::optional<std::wstring> name;
         bool listed = false;
         std::optional<std::int32_t> contractVersion;
-        bool configured = false;  ///< a provider element applies to it
-        bool switchedOff = false; ///< and switches it off
+        std::optional<std::wstring> library; ///< path of an MSSCCI library that was loaded
+        bool configured = false;             ///< a provider element applies to it
+        bool switchedOff = false;            ///< and switches it off
     };
 
     /// `limit`: for each library. The arguments must outlive this object.

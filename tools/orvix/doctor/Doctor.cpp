@@ -1,6 +1,7 @@
 #include "Doctor.h"
 
 #include "CandidateExam.h"
+#include "DeadSettings.h"
 #include "HostSession.h"
 #include "LoadAnnouncer.h"
 #include "OrvixPromptTable.h"
@@ -26,7 +27,13 @@ DoctorReport::Subject ExaminePrompts(const std::wstring& path)
         file.AddNote("other-root", L"the root element is \"" + diagnostics.root + L"\", not \"" + PromptFileRoot +
                                        L"\"; it is read anyway");
     }
-    XmlFileFindings::AddDiagnostics(file, diagnostics, L"prompt");
+    const std::optional<XmlElement> outline =
+        diagnostics.hasRoot ? XmlElement::Read(path) : std::optional<XmlElement>();
+    XmlFileFindings::AddDiagnostics(file, diagnostics, L"prompt", outline ? &*outline : nullptr);
+    if (outline)
+    {
+        DeadSettings::AddPrompts(file, *outline);
+    }
     return file;
 }
 
@@ -47,6 +54,11 @@ DoctorReport Doctor::Examine(const CommandLine& commandLine, Output& output)
     if ((commandLine.sources & OrvixProviderSource::Plugins) != 0)
     {
         plugins.Examine(HostSession::PluginFolder(commandLine));
+        if (commandLine.plugins.empty())
+        {
+            report.locations.back().AddNote("default-folder", L"no folder is named; hosts name their own, this one is "
+                                                              L"beside the program");
+        }
     }
     if ((commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
     {

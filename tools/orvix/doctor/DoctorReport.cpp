@@ -1,5 +1,6 @@
 #include "DoctorReport.h"
 
+#include "Remedies.h"
 #include "Text.h"
 
 #include <nlohmann/json.hpp>
@@ -23,7 +24,16 @@ void PrintFindings(std::ostream& stream, const DoctorReport::Subject& subject, c
     {
         const std::string severity = finding.isProblem ? style.Coloured("problem", Listing::Tone::Bad)
                                                        : style.Coloured("note", Listing::Tone::Quiet);
-        style.PrintLine(stream, "  " + severity + ": " + Printable(finding.text) + " [" + finding.code + "]");
+        const std::string place = finding.line == 0 ? ""
+                                                    : " (line " + std::to_string(finding.line) + ", column " +
+                                                          std::to_string(finding.column) + ")";
+        style.PrintLine(stream, "  " + severity + place + ": " + Printable(finding.text) + " [" + finding.code + "]");
+        const DoctorReport::Finding* const next = &finding + 1;
+        const bool isLastOfKind = &finding == &subject.findings.back() || next->code != finding.code;
+        if (const std::string_view remedy = RemedyFor(finding.code); isLastOfKind && !remedy.empty())
+        {
+            style.PrintLine(stream, "    " + std::string(remedy));
+        }
     }
 }
 
@@ -37,6 +47,10 @@ void PrintCandidate(std::ostream& stream, const DoctorReport::Candidate& candida
     {
         style.PrintLine(stream, "  contract version " + std::to_string(*candidate.contractVersion));
     }
+    if (candidate.library)
+    {
+        style.PrintLine(stream, "  library " + Printable(*candidate.library));
+    }
     PrintFindings(stream, candidate, style);
 }
 
@@ -47,7 +61,10 @@ Json ToJson(const DoctorReport::Subject& subject)
     {
         findings.push_back({{"code", finding.code},
                             {"severity", finding.isProblem ? "problem" : "note"},
-                            {"text", Utf8(finding.text)}});
+                            {"text", Utf8(finding.text)},
+                            {"remedy", RemedyFor(finding.code)},
+                            {"line", finding.line != 0 ? Json(finding.line) : Json()},
+                            {"column", finding.line != 0 ? Json(finding.column) : Json()}});
     }
     return {{"kind", subject.kind}, {"location", Utf8(subject.location)}, {"findings", std::move(findings)}};
 }
@@ -57,6 +74,7 @@ Json ToJson(const DoctorReport::Candidate& candidate)
     Json json = ToJson(static_cast<const DoctorReport::Subject&>(candidate));
     json["name"] = candidate.name ? Json(Utf8(*candidate.name)) : Json();
     json["listed"] = candidate.listed;
+    json["library"] = candidate.library ? Json(Utf8(*candidate.library)) : Json();
     json["contractVersion"] = candidate.contractVersion ? Json(*candidate.contractVersion) : Json();
     return json;
 }

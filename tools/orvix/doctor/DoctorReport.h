@@ -17,6 +17,8 @@ struct DoctorReport
         bool isProblem = false; ///< else a note: an explanation, or something harmless
         std::string code;       ///< stable, for scripts
         std::wstring text;
+        int line = 0; ///< in the file, from 1; 0 when the finding has no place
+        int column = 0;
     };
 
     /// Something that was examined.
@@ -26,8 +28,14 @@ struct DoctorReport
         std::wstring location; ///< path of a file, folder or key; for a value of the registry list its name
         std::vector<Finding> findings;
 
-        void AddProblem(const char* code, std::wstring text) { findings.push_back({true, code, std::move(text)}); }
-        void AddNote(const char* code, std::wstring text) { findings.push_back({false, code, std::move(text)}); }
+        void AddProblem(const char* code, std::wstring text) { Add(true, code, std::move(text)); }
+        void AddNote(const char* code, std::wstring text) { Add(false, code, std::move(text)); }
+
+    private:
+        void Add(bool isProblem, const char* code, std::wstring text)
+        {
+            findings.push_back({.isProblem = isProblem, .code = code, .text = std::move(text)});
+        }
     };
 
     /// Something that may be a provider.
@@ -36,6 +44,7 @@ struct DoctorReport
         std::optional<std::wstring> name; ///< of the provider, if it is known
         bool listed = false;
         std::optional<std::int32_t> contractVersion; ///< of a plug-in that could be asked
+        std::optional<std::wstring> library;         ///< path of an MSSCCI library that was found
     };
 
     std::vector<Subject> locations; ///< where the library reads: files, a folder, a key of the registry

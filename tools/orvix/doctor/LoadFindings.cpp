@@ -1,7 +1,9 @@
 #include "LoadFindings.h"
 
 #include "FilePath.h"
+#include "IsolatedLoad.h"
 #include "LibraryImage.h"
+#include "ModulePath.h"
 #include "Text.h"
 
 namespace
@@ -51,5 +53,28 @@ void LoadFindings::AddLoadError(DoctorReport::Subject& subject, const std::wstri
         subject.AddNote("missing-dependency", missing.neededBy + L" needs " + missing.name +
                                                   L", which does not load: " +
                                                   SystemMessage(missing.error, missing.name));
+    }
+}
+
+void LoadFindings::AddCurrentFolder(DoctorReport::Subject& subject, const std::wstring& path,
+                                    const UniqueActivationContext& context)
+{
+    const auto folderOf = [](const std::wstring& file) { return PathKey(file.substr(0, file.find_last_of(L'\\'))); };
+    const std::wstring current = PathKey(FullPath(L"."));
+    const std::optional<LibraryImage> image = LibraryImage::Read(path);
+    if (!image || current == folderOf(path) || current == folderOf(ModulePath(nullptr)))
+    {
+        return;
+    }
+    for (const std::string& import : image->imports)
+    {
+        const UniqueModule module = LoadLibraryIsolated(Wide(import).c_str(), context, DONT_RESOLVE_DLL_REFERENCES);
+        if (module && folderOf(ModulePath(module.Get())) == current)
+        {
+            subject.AddProblem("current-folder", L"it needs " + Wide(import) +
+                                                     L", which is found only in the current "
+                                                     L"folder of this process: " +
+                                                     current);
+        }
     }
 }

@@ -16,4 +16,7 @@ void AddHeaders(DoctorReport::Subject& subject, const std::wstring& path);
 void AddLoadError(DoctorReport::Subject& subject, const std::wstring& path, const UniqueActivationContext& context,
                   unsigned long error);
 
+/// Adds which libraries that the library of this path needs are found in the current folder alone.
+void AddCurrentFolder(DoctorReport::Subject& subject, const std::wstring& path, const UniqueActivationContext& context);
+
 } // namespace LoadFindings

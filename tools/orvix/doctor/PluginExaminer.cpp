@@ -73,6 +73,7 @@ CandidateExams::About PluginExaminer::ExaminePlugin(const std::wstring& path, co
     {
         findings.AddProblem("empty-name", L"its name is empty or null");
     }
+    LoadFindings::AddCurrentFolder(findings, path, context);
     report(findings);
     return about;
 }

@@ -121,6 +121,31 @@ void AddSettings(DoctorReport::Subject& subject, const InstalledProviders::Candi
     }
 }
 
+/// What a library cannot do without a function.
+struct FunctionUse
+{
+    const char* name;
+    const wchar_t* consequence;
+};
+
+constexpr FunctionUse FunctionUses[] = {
+    {SccFunctions::Initialize.name, L"so the provider does not start"},
+    {SccFunctions::Uninitialize.name, L"so ending a session fails"},
+    {SccFunctions::OpenProject.name, L"so no project can be opened"},
+    {SccFunctions::CloseProject.name, L"so closing a project fails"},
+    {SccFunctions::GetProjPath.name, L"so a project whose stored names the library refuses cannot be opened"},
+    {SccFunctions::Get.name, L"so getting the latest version fails"},
+    {SccFunctions::Checkout.name, L"so checking out fails"},
+    {SccFunctions::Uncheckout.name, L"so undoing a check-out fails"},
+    {SccFunctions::Checkin.name, L"so checking in fails"},
+    {SccFunctions::Add.name, L"so adding files fails"},
+    {SccFunctions::History.name, L"so showing the history fails"},
+    {SccFunctions::Properties.name, L"so showing properties fails"},
+    {SccFunctions::QueryInfo.name, L"so the state of files is not known, and every operation on files does nothing"},
+    {SccFunctions::RunScc.name, L"so starting the provider's own program fails"},
+    {SccFunctions::GetCommandOptions.name, L"so it has no options"},
+};
+
 void AddMissingExports(DoctorReport::Subject& subject, HMODULE module)
 {
     for (const char* function : SccFunctions::Names)
@@ -133,12 +158,14 @@ void AddMissingExports(DoctorReport::Subject& subject, HMODULE module)
         {
             subject.AddProblem("missing-export",
                                L"it does not export " + Wide(function) + L", without which no operation starts");
+            continue;
         }
-        else
-        {
-            subject.AddNote("not-offered",
-                            L"it does not export " + Wide(function) + L", so the operations that need it fail");
-        }
+        const auto* const use =
+            std::find_if(std::begin(FunctionUses), std::end(FunctionUses),
+                         [function](const FunctionUse& each) { return std::string_view(function) == each.name; });
+        subject.AddNote("not-offered", L"it does not export " + Wide(function) + L", " +
+                                           (use != std::end(FunctionUses) ? use->consequence
+                                                                          : L"which no operation of OrvixCore needs"));
     }
 }
 
@@ -242,12 +269,20 @@ void RegistrationExaminer::ExamineKey(DoctorReport::Candidate& candidate, const 
     {
         // Hosts load the library on first use, so a library that does not load is listed.
         AddSettings(candidate, judged);
+        const bool isReplaced = judged.config != nullptr && !judged.config->m_msSccDllFullPath.empty();
+        if (!isReplaced && judged.serverPath.find_first_of(L"\\/") == std::wstring::npos)
+        {
+            candidate.AddProblem("no-path-folder", L"the path " + Quoted(judged.serverPath) +
+                                                       L" names no folder, so each host searches for it in folders "
+                                                       L"of its own");
+        }
         m_exams.AddLibrary(judged.serverPath, judged.searchPath);
     }
 }
 
-void RegistrationExaminer::ExamineLibrary(const std::wstring& serverPath, const std::wstring& searchPath,
-                                          void (*report)(const DoctorReport::Subject& findings))
+CandidateExams::About RegistrationExaminer::ExamineLibrary(const std::wstring& serverPath,
+                                                           const std::wstring& searchPath,
+                                                           void (*report)(const DoctorReport::Subject& findings))
 {
     DoctorReport::Subject headers;
     const DllDirectoryScope directory(searchPath);
@@ -273,7 +308,14 @@ void RegistrationExaminer::ExamineLibrary(const std::wstring& serverPath, const 
     {
         AddMissingExports(findings, module.Get());
     }
+    LoadFindings::AddCurrentFolder(findings, path, context);
     report(findings);
+    CandidateExams::About about;
+    if (module)
+    {
+        about.library = ModulePath(module.Get());
+    }
+    return about;
 }
 
 void RegistrationExaminer::Examine32BitList()

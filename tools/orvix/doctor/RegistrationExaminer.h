@@ -23,8 +23,8 @@ public:
 
     /// Called in a child: loads the library as hosts do on first use. Both arguments as `CandidateExams::AddLibrary`
     /// takes them. `report` is called with new findings before the library is loaded and afterwards.
-    static void ExamineLibrary(const std::wstring& serverPath, const std::wstring& searchPath,
-                               void (*report)(const DoctorReport::Subject& findings));
+    static CandidateExams::About ExamineLibrary(const std::wstring& serverPath, const std::wstring& searchPath,
+                                                void (*report)(const DoctorReport::Subject& findings));
 
 private:
     void ExamineList();

@@ -1,5 +1,6 @@
 #include "SettingsExaminer.h"
 
+#include "DeadSettings.h"
 #include "XmlFileFindings.h"
 
 DoctorReport::Subject SettingsExaminer::Examine(const std::wstring& path)
@@ -8,7 +9,15 @@ DoctorReport::Subject SettingsExaminer::Examine(const std::wstring& path)
     m_path = path;
     m_configs.LoadConfig(path.c_str(), &m_diagnostics);
     XmlFileFindings::AddContent(file, m_diagnostics, OrvixProviderConfigManager::RootName);
-    XmlFileFindings::AddDiagnostics(file, m_diagnostics, L"provider element");
+    if (m_diagnostics.hasRoot)
+    {
+        m_outline = XmlElement::Read(path);
+    }
+    XmlFileFindings::AddDiagnostics(file, m_diagnostics, L"provider element", m_outline ? &*m_outline : nullptr);
+    if (m_outline)
+    {
+        DeadSettings::AddProviders(file, *m_outline);
+    }
     return file;
 }
 
@@ -53,6 +62,13 @@ void SettingsExaminer::FindUnused(DoctorReport::Subject& file) const
         {
             continue;
         }
+        const auto addPlace = [&] {
+            if (m_outline && provider.item <= m_outline->children.size())
+            {
+                file.findings.back().line = m_outline->children[provider.item - 1].line;
+                file.findings.back().column = m_outline->children[provider.item - 1].column;
+            }
+        };
         const std::wstring hasNoEffect = ElementOf(provider.config) + L" has no effect: ";
         const auto hidden = m_hiddenBy.find(provider.config);
         if (hidden != m_hiddenBy.end())
@@ -65,6 +81,7 @@ void SettingsExaminer::FindUnused(DoctorReport::Subject& file) const
         {
             file.AddProblem("matches-nothing", hasNoEffect + L"its Name occurs in the name of no provider");
         }
+        addPlace();
     }
 }
 

@@ -4,8 +4,10 @@
 #include "FileDiagnostics.h"
 #include "OrvixProviderConfig.h"
 #include "OrvixProviderConfigManager.h"
+#include "XmlOutline.h"
 
 #include <map>
+#include <optional>
 #include <set>
 #include <string>
 
@@ -38,6 +40,7 @@ private:
     std::wstring m_path;
     OrvixProviderConfigManager m_configs;
     FileDiagnostics m_diagnostics;
+    std::optional<XmlElement> m_outline; // of a file that is read
     std::set<const OrvixProviderConfig*> m_used;
     std::map<const OrvixProviderConfig*, const OrvixProviderConfig*> m_hiddenBy;
 };

@@ -38,10 +38,44 @@ void AddFault(DoctorReport::Subject& file)
     std::error_code ignored;
     const std::optional<XmlFault> fault =
         XmlFault::Find(file.location, std::filesystem::file_size(file.location, ignored));
+    if (std::filesystem::file_size(file.location, ignored) == 0)
+    {
+        file.AddProblem("malformed", L"the file is empty, so nothing in it applies");
+        return;
+    }
     file.AddProblem("malformed", L"the file is not well-formed and counts as empty: " +
                                      (fault ? L"line " + std::to_wstring(fault->line) + L", column " +
                                                   std::to_wstring(fault->column) + L": " + fault->reason
                                             : L"the position and the reason are not known"));
+    if (fault)
+    {
+        file.findings.back().line = fault->line;
+        file.findings.back().column = fault->column;
+    }
+}
+
+/// The element that a diagnostic is about; null when it is not found.
+const XmlElement* FindElement(const XmlElement& root, const FileDiagnostics::Diagnostic& diagnostic)
+{
+    if (diagnostic.item == 0 || diagnostic.item > root.children.size())
+    {
+        return nullptr;
+    }
+    const XmlElement* element = &root.children[diagnostic.item - 1];
+    if (diagnostic.filter != 0)
+    {
+        std::vector<const XmlElement*> filters;
+        for (const XmlElement* list : element->Find(L"Filters"))
+        {
+            for (const XmlElement& filter : list->children)
+            {
+                filters.push_back(&filter);
+            }
+        }
+        element = diagnostic.filter <= filters.size() ? filters[diagnostic.filter - 1] : element;
+    }
+    const std::vector<const XmlElement*> named = element->Find(diagnostic.element.c_str());
+    return named.empty() ? element : named.back();
 }
 
 void AddDiagnostic(DoctorReport::Subject& file, const FileDiagnostics::Diagnostic& diagnostic,
@@ -126,14 +160,14 @@ std::wstring XmlFileFindings::WhyUnread(const DoctorReport::Subject& file)
 {
     constexpr std::string_view Codes[] = {"unreadable-file", "no-xml-service",  "entities",
                                           "malformed",       "root-not-second", "no-root"};
-    const auto found =
-        std::find_first_of(file.findings.begin(), file.findings.end(), std::begin(Codes), std::end(Codes),
-                           [](const auto& finding, std::string_view code) { return finding.code == code; });
+    const auto found = std::find_first_of(
+        file.findings.begin(), file.findings.end(), std::begin(Codes), std::end(Codes),
+        [](const auto& finding, std::string_view code) { return finding.isProblem && finding.code == code; });
     return found != file.findings.end() ? found->text : L"";
 }
 
 void XmlFileFindings::AddDiagnostics(DoctorReport::Subject& file, const FileDiagnostics& diagnostics,
-                                     const wchar_t* item)
+                                     const wchar_t* item, const XmlElement* root)
 {
     std::map<unsigned int, std::wstring> names;
     for (const FileDiagnostics::Provider& provider : diagnostics.providers)
@@ -145,5 +179,10 @@ void XmlFileFindings::AddDiagnostics(DoctorReport::Subject& file, const FileDiag
         std::wstring where = item + std::wstring(L" ") + std::to_wstring(diagnostic.item) + names[diagnostic.item];
         where += diagnostic.filter != 0 ? L", filter " + std::to_wstring(diagnostic.filter) : L"";
         AddDiagnostic(file, diagnostic, where);
+        if (const XmlElement* element = root != nullptr ? FindElement(*root, diagnostic) : nullptr)
+        {
+            file.findings.back().line = element->line;
+            file.findings.back().column = element->column;
+        }
     }
 }

@@ -2,6 +2,7 @@
 
 #include "DoctorReport.h"
 #include "FileDiagnostics.h"
+#include "XmlOutline.h"
 
 /// Findings about OrvixProviders.xml and OrvixPrompts.xml. `file` has the path of the file as its location.
 namespace XmlFileFindings
@@ -14,7 +15,9 @@ void AddContent(DoctorReport::Subject& file, const FileDiagnostics& diagnostics,
 /// problem.
 std::wstring WhyUnread(const DoctorReport::Subject& file);
 
-/// Adds what the library ignores in the file. `item`: what an element below the root is called.
-void AddDiagnostics(DoctorReport::Subject& file, const FileDiagnostics& diagnostics, const wchar_t* item);
+/// Adds what the library ignores in the file. `item`: what an element below the root is called. `root`: the elements of
+/// the file; null when they are not known.
+void AddDiagnostics(DoctorReport::Subject& file, const FileDiagnostics& diagnostics, const wchar_t* item,
+                    const XmlElement* root);
 
 } // namespace XmlFileFindings
