@@ -2,6 +2,7 @@
 
 #include "BuiltFile.h"
 #include "Defect.h"
+#include "Display.h"
 #include "Environment.h"
 #include "FilePath.h"
 #include "ToolTest.h"
@@ -127,13 +128,13 @@ void ExpectExactly(const Defects& defects, const std::map<std::string, std::stri
 TEST_F(Validate, PassesTheSamplePluginInEveryRule)
 {
     const auto result = ValidatePlugin(BuiltFile(L"plugins\\archive.dll"), Success, {L"--dialogs"});
-    EXPECT_THAT(result.output, EndsWith("\n19 rules, 19 passed, 0 failed, 0 skipped\n"));
+    EXPECT_THAT(result.output, EndsWith("\n25 rules, 25 passed, 0 failed, 0 skipped\n"));
 }
 
 TEST_F(Validate, PassesTheSampleLibraryInEveryRule)
 {
     const auto result = ValidateLibrary(BuiltFile(L"archive_msscci.dll"), Success, {L"--dialogs"});
-    EXPECT_THAT(result.output, EndsWith("\n24 rules, 24 passed, 0 failed, 0 skipped\n"));
+    EXPECT_THAT(result.output, EndsWith("\n30 rules, 30 passed, 0 failed, 0 skipped\n"));
 }
 
 TEST_F(Validate, PassesWhatTheDefectsAreMadeOf)
@@ -153,7 +154,7 @@ TEST_P(ValidateDefectivePlugin, FailsTheRulesThatItBreaksAndNoOthers)
 INSTANTIATE_TEST_SUITE_P(
     All, ValidateDefectivePlugin,
     testing::Values(
-        Defects{{L"version", "version", "GetOrvixVersion returns 201"},
+        Defects{{L"version", "version", "GetOrvixVersion returns 201, not 200"},
                 {L"name", "name", "GetOrvixProviderName returns no name"},
                 {L"objects", "objects", "GetIOrvixProvider returns null"},
                 {L"state", "state", "IsProjectOpen is true after CloseProject"},
@@ -175,9 +176,15 @@ INSTANTIATE_TEST_SUITE_P(
         Defects{{L"reserved-false", "reserved", "ReservedI returns false"},
                 {L"status-contradiction", "status-bits", "QueryStatus says controlled and not controlled: 0x00000003"},
                 {L"reload", "reload", "it does not load: "}},
+        Defects{{L"stores-nothing", "stores", "after GetLatest of a deleted file the file has other bytes"},
+                {L"undoes-nothing", "checks-out", "after UndoCheckOut the file has other bytes"},
+                {L"status-lies", "status-truth", "after making a new file QueryStatus says 0x00000011"},
+                {L"destroys", "failures", "after a failed CheckIn the file has other bytes"},
+                {L"changes-folder", "process", "CheckOut changes the current folder"},
+                {L"leaks", "memory", "10 queries of the state take 20 MiB that are not freed"}},
         Defects{{L"starts", "starts", "Initialize returns -1"}},
         Defects{{L"exception", "reserved", "ReservedC throws an exception"}},
-        Defects{{L"crash", "reserved", "ReservedE crashes the process with exception 0xC0000005"}},
+        Defects{{L"crash", "reserved", "ReservedE crashes the process with exception 0xC0000005 in "}},
         Defects{{L"exit", "reserved", "ReservedG ends the process with exit code 7"}}));
 
 TEST_P(ValidateDefectiveLibrary, FailsTheRulesThatItBreaksAndNoOthers)
@@ -198,7 +205,7 @@ INSTANTIATE_TEST_SUITE_P(
                 {L"text-output", "text-output", "a line contains a line end"},
                 {L"handles", "handles", "10 sessions leave 10 handles open"}},
         Defects{{L"no-terminator", "texts", "the label of the auxiliary path has no terminator in its 32 bytes"},
-                {L"input-texts", "input-texts", "SccOpenProject writes to the project name or the local path"},
+                {L"input-texts", "input-texts", "SccOpenProject writes to the local path"},
                 {L"codes-kept", "codes", "SccAdd returns 42"},
                 {L"info-left-out", "info-bits", "SccQueryInfo does not write the word of a file"},
                 {L"text-without-kind", "text-output", "the kind 99 is unknown"}},
@@ -256,6 +263,30 @@ TEST_F(Validate, EndsAHangingOperationAtTheLimitAndGoesOn)
                 ElementsAre(Pair("null-arguments", "SccGetCommandOptions hangs: ended after 5 s")));
 }
 
+TEST_F(Validate, NamesTheWindowThatAnOperationWaitsFor)
+{
+    if (!HasDisplay())
+    {
+        GTEST_SKIP() << "no display";
+    }
+    const Environment environment(Defect::Variable, L"window");
+    const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--timeout", L"3"});
+    EXPECT_THAT(With("fail", result),
+                ElementsAre(Pair("reserved", "ReservedF shows the window \"Defective Provider\" (Who are you?) and "
+                                             "waits: ended after 3 s")));
+}
+
+TEST_F(Validate, CopiesAProjectForAProviderThatMakesNone)
+{
+    const Environment environment(Defect::Variable, L"needs-marker");
+    Write(L"template\\marker.txt", "x");
+    const auto result =
+        ValidatePlugin(Plugins / L"defective.dll", Success, {L"--project", File(L"template").wstring()});
+    EXPECT_TRUE(With("pass", result).contains("stores"));
+    EXPECT_THAT(ValidatePlugin(Plugins / L"defective.dll", NotFound, {L"--project", L"nowhere"}).errors,
+                StartsWith("orvix: no such project folder: "));
+}
+
 TEST_F(Validate, FailsALibraryThatCrashesWhenItIsLoaded)
 {
     const Environment environment(Defect::Variable, L"crash-at-load");
@@ -283,7 +314,7 @@ TEST_F(Validate, FailsOneRuleForWhatIsNoLibraryAndSkipsTheOthers)
     EXPECT_THAT(With("fail", result),
                 ElementsAre(Pair("loads", AllOf(StartsWith("it does not load: "), EndsWith("(error 193)")))));
     EXPECT_THAT(With("pass", result), IsEmpty());
-    EXPECT_THAT(result.output, EndsWith("\n19 rules, 0 passed, 1 failed, 18 skipped\n"));
+    EXPECT_THAT(result.output, EndsWith("\n25 rules, 0 passed, 1 failed, 24 skipped\n"));
 }
 
 TEST_F(Validate, FailsAPluginWhosePathNoHostFinds)
@@ -332,7 +363,7 @@ TEST_F(Validate, SkipsWhatNeedsAPrivateRegistrationWhereTheSystemRefusesIt)
         ASSERT_TRUE(skipped.contains("starts"));
         EXPECT_THAT(skipped.at("starts"),
                     AllOf(StartsWith("it cannot be registered for this process alone: "), EndsWith("(error 5)")));
-        EXPECT_THAT(result.output, HasSubstr("\n24 rules, 10 passed, 0 failed, 14 skipped\n"));
+        EXPECT_THAT(result.output, HasSubstr("\n30 rules, 10 passed, 0 failed, 20 skipped\n"));
     }
 }
 

@@ -1,7 +1,8 @@
 // An MSSCCI library that breaks one rule of the interface, which `Defect` names, and keeps all others. It remembers the
-// status of files while it is loaded and changes no file.
+// status of files while it is loaded, and their bytes in a `DiskStore`.
 
 #include "Defect.h"
+#include "DiskStore.h"
 #include "ImportHook.h"
 #include "MSSCCI.h"
 
@@ -26,6 +27,14 @@ constexpr LONG CheckedOut = SCC_STATUS_CONTROLLED | SCC_STATUS_CHECKEDOUT;
 std::optional<ImportHook> refusal; // of the program's private registration
 LPTEXTOUTPROC printer = nullptr;
 std::map<std::string, LONG> statuses;
+DiskStore disk;
+
+std::filesystem::path PathOf(LPCSTR name)
+{
+    std::wstring path(static_cast<std::size_t>(MultiByteToWideChar(CP_ACP, 0, name, -1, nullptr, 0)), L'\0');
+    MultiByteToWideChar(CP_ACP, 0, name, -1, path.data(), static_cast<int>(path.size()));
+    return path.c_str();
+}
 
 void Print(LPCSTR text, LONG kind)
 {
@@ -45,11 +54,13 @@ LSTATUS WINAPI RefuseValue(HKEY, LPCWSTR, DWORD, DWORD, const BYTE*, DWORD)
     return ERROR_ACCESS_DENIED;
 }
 
-SCCRTN Become(LONG count, LPCSTR* names, LONG status)
+template <typename Work>
+SCCRTN Become(LONG count, LPCSTR* names, LONG status, Work work)
 {
     for (LONG i = 0; i < count; ++i)
     {
         statuses[names[i]] = status;
+        work(names[i]);
     }
     return SCC_OK;
 }
@@ -92,12 +103,13 @@ SCCRTN SccUninitialize(LPVOID)
     return SCC_OK;
 }
 
-SCCRTN SccOpenProject(LPVOID, HWND, LPSTR, LPCSTR projectName, LPCSTR, LPSTR, LPCSTR, LPTEXTOUTPROC output, LONG)
+SCCRTN SccOpenProject(LPVOID, HWND, LPSTR, LPCSTR, LPCSTR localPath, LPSTR, LPCSTR, LPTEXTOUTPROC output, LONG)
 {
     printer = output;
+    disk.Open(PathOf(localPath));
     if (Defect::Is(L"input-texts"))
     {
-        std::strcpy(const_cast<LPSTR>(projectName), "mine");
+        std::strcpy(const_cast<LPSTR>(localPath), "mine");
     }
     return SCC_OK;
 }
@@ -107,8 +119,12 @@ SCCRTN SccCloseProject(LPVOID)
     return SCC_OK;
 }
 
-SCCRTN SccGet(LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS)
+SCCRTN SccGet(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
 {
+    for (LONG i = 0; i < count; ++i)
+    {
+        disk.Fetch(PathOf(names[i]));
+    }
     if (Defect::Is(L"text-without-kind"))
     {
         Print("got", UnknownKind);
@@ -126,12 +142,12 @@ SCCRTN SccGet(LPVOID, HWND, LONG, LPCSTR*, LONG, LPCMDOPTS)
 
 SCCRTN SccCheckout(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDOPTS)
 {
-    return Become(count, names, CheckedOut);
+    return Become(count, names, CheckedOut, [](LPCSTR file) { DiskStore::SetWritable(PathOf(file), true); });
 }
 
 SCCRTN SccUncheckout(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
 {
-    return Become(count, names, SCC_STATUS_CONTROLLED);
+    return Become(count, names, SCC_STATUS_CONTROLLED, [](LPCSTR file) { disk.Fetch(PathOf(file)); });
 }
 
 SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG options, LPCMDOPTS)
@@ -144,7 +160,7 @@ SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG options,
     {
         const_cast<LPSTR>(names[0])[0] = '#';
     }
-    return Become(count, names, SCC_STATUS_CONTROLLED);
+    return Become(count, names, SCC_STATUS_CONTROLLED, [](LPCSTR file) { disk.Store(PathOf(file), false); });
 }
 
 SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG* options, LPCMDOPTS)
@@ -153,7 +169,7 @@ SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG* options, LP
     {
         return UnknownResult;
     }
-    return Become(count, names, SCC_STATUS_CONTROLLED);
+    return Become(count, names, SCC_STATUS_CONTROLLED, [](LPCSTR file) { disk.Store(PathOf(file), false); });
 }
 
 SCCRTN SccQueryInfo(LPVOID, LONG count, LPCSTR* names, LPLONG status)

@@ -1,7 +1,8 @@
 // A provider plug-in that breaks one rule of the contract, which `Defect` names, and keeps all others. It remembers the
-// state of files while it is loaded and changes no file.
+// state of files while it is loaded, and their bytes in a `DiskStore`.
 
 #include "Defect.h"
+#include "DiskStore.h"
 #include "FakeProvider.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileFlags.h"
@@ -62,8 +63,14 @@ public:
 
     int OpenProject(const wchar_t* localPath, const wchar_t*) override
     {
+        if (Defect::Is(L"needs-marker") &&
+            GetFileAttributesW((std::wstring(localPath) + L"\\marker.txt").c_str()) == INVALID_FILE_ATTRIBUTES)
+        {
+            return Failure;
+        }
         m_open = true;
         m_wasOpen = true;
+        m_disk.Open(localPath);
         m_project = std::wstring(localPath) + L"\\";
         return Success;
     }
@@ -77,7 +84,7 @@ public:
     int Add(OrvixFileList* list, const wchar_t*, unsigned long options) override
     {
         Report("Add", options);
-        return Become(list, OrvixFileState::Controlled);
+        return Become(list, OrvixFileState::Controlled, [this](const wchar_t* file) { m_disk.Store(file, false); });
     }
 
     int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long options) override
@@ -91,7 +98,11 @@ public:
         {
             return UnknownResultOfBadInput;
         }
-        return Become(list, CheckedOut);
+        if (Defect::Is(L"changes-folder"))
+        {
+            SetCurrentDirectoryW(L"C:\\windows");
+        }
+        return Become(list, CheckedOut, [](const wchar_t* file) { DiskStore::SetWritable(file, true); });
     }
 
     int CheckIn(OrvixFileList* list, const wchar_t*, unsigned long options) override
@@ -101,19 +112,39 @@ public:
         {
             list->GetActiveFileEntry(0)->SetFlagsIn(0);
         }
-        return Become(list, OrvixFileState::Controlled);
+        const wchar_t* last = Last(list);
+        if (Defect::Is(L"destroys") && *last != L'\0' && !m_states.contains(last))
+        {
+            DeleteFileW(last);
+            return Failure;
+        }
+        return Become(list, OrvixFileState::Controlled, [this](const wchar_t* file) {
+            if (!Defect::Is(L"stores-nothing"))
+            {
+                m_disk.Store(file, false);
+            }
+        });
     }
 
     int UndoCheckOut(OrvixFileList* list, unsigned long options) override
     {
         Report("UndoCheckOut", options);
-        const int result = Become(list, OrvixFileState::Controlled);
+        const int result = Become(list, OrvixFileState::Controlled, [this](const wchar_t* file) {
+            if (!Defect::Is(L"undoes-nothing"))
+            {
+                m_disk.Fetch(file);
+            }
+        });
         return Defect::Is(L"results") && options != 0 ? UnknownResult : result;
     }
 
     int GetLatest(OrvixFileList* list, unsigned long options) override
     {
         Report("GetLatest", options);
+        for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
+        {
+            m_disk.Fetch(list->GetActiveFileEntry(i)->GetFile());
+        }
         return list->NumActiveEntries() == 0 && !Defect::Is(L"empty-list") ? Failure : Success;
     }
 
@@ -125,6 +156,10 @@ public:
 
     int QueryStatus(OrvixFileList* list, unsigned long) override
     {
+        if (Defect::Is(L"leaks"))
+        {
+            VirtualAlloc(nullptr, 2 << 20, MEM_COMMIT | MEM_RESERVE, PAGE_READWRITE);
+        }
         const unsigned int count = list->NumActiveEntries();
         for (unsigned int i = 0; i < count; ++i)
         {
@@ -178,6 +213,10 @@ public:
         {
             Defect::Hang();
         }
+        if (Defect::Is(L"window"))
+        {
+            MessageBoxW(nullptr, L"Who are you?", L"Defective Provider", MB_OK);
+        }
         return NotOffered;
     }
 
@@ -219,12 +258,14 @@ private:
         return count == 0 ? L"" : list->GetActiveFileEntry(count - 1)->GetFile();
     }
 
-    int Become(OrvixFileList* list, unsigned long state)
+    template <typename Work>
+    int Become(OrvixFileList* list, unsigned long state, Work work)
     {
         for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
         {
             OrvixFileEntry* entry = list->GetActiveFileEntry(i);
             m_states[entry->GetFile()] = state;
+            work(entry->GetFile());
         }
         return list->NumActiveEntries() == 0 ? Failure : Success;
     }
@@ -238,6 +279,10 @@ private:
         }
         const auto found = m_states.find(entry.GetFile());
         const unsigned long state = found == m_states.end() ? OrvixFileState::NotControlled : found->second;
+        if (Defect::Is(L"status-lies") && state == OrvixFileState::NotControlled)
+        {
+            return state | OrvixFileState::OutOfDate;
+        }
         if (Defect::Is(L"status-contradiction"))
         {
             return state | OrvixFileState::NotControlled | OrvixFileState::Controlled;
@@ -247,6 +292,7 @@ private:
 
     std::map<std::wstring, unsigned long> m_states;
     std::wstring m_project;
+    DiskStore m_disk;
     bool m_initialized = false;
     bool m_open = false;
     bool m_wasOpen = false;

@@ -1,19 +1,12 @@
 #pragma once
 
+#include "DiskStore.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileFlags.h"
 #include "OrvixProviderBase.h"
 #include "OrvixProviderOption.h"
 
-#include <windows.h>
-
-#include <filesystem>
-#include <fstream>
-#include <sstream>
-#include <string>
-
-/// The least provider that works: the folder .disk of the project holds the latest version of each file, under its
-/// name. A file is checked out while it may be written.
+/// The least provider that works, on a `DiskStore`. A file is checked out while it may be written.
 class DiskProvider : public OrvixProviderBase
 {
 public:
@@ -21,7 +14,7 @@ public:
 
     const wchar_t* GetName() override { return m_name; }
     bool IsInitialized() override { return m_initialized; }
-    bool IsProjectOpen() override { return !m_project.empty(); }
+    bool IsProjectOpen() override { return m_store.IsOpen(); }
 
     int Initialize(OrvixClientInfo*) override
     {
@@ -32,21 +25,17 @@ public:
     int Uninitialize() override
     {
         m_initialized = false;
-        m_project.clear();
-        return OrvixProviderResult::Success;
+        return CloseProject();
     }
 
     int OpenProject(const wchar_t* localPath, const wchar_t*) override
     {
-        m_project = localPath;
-        std::error_code error;
-        std::filesystem::create_directories(m_project / L".disk", error);
-        return error ? OrvixProviderResult::Failure : OrvixProviderResult::Success;
+        return m_store.Open(localPath) ? OrvixProviderResult::Success : OrvixProviderResult::Failure;
     }
 
     int CloseProject() override
     {
-        m_project.clear();
+        m_store.Close();
         return OrvixProviderResult::Success;
     }
 
@@ -55,9 +44,7 @@ public:
 
     int CheckOut(OrvixFileList* list, const wchar_t*, unsigned long) override
     {
-        return ForEach(list, [](const std::filesystem::path& file) {
-            return SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_NORMAL) != 0;
-        });
+        return ForEachEntry(list, [](auto& entry) { return DiskStore::SetWritable(entry.GetFile(), true); });
     }
 
     int UndoCheckOut(OrvixFileList* list, unsigned long) override { return Fetch(list); }
@@ -65,19 +52,13 @@ public:
 
     int QueryStatus(OrvixFileList* list, unsigned long) override
     {
-        return ForEachEntry(list, [this](OrvixFileEntry& entry) {
+        return ForEachEntry(list, [this](auto& entry) {
             entry.SetFlagsOut(FlagsOf(entry.GetFile()));
             return true;
         });
     }
 
 protected:
-    const std::filesystem::path& Project() const { return m_project; }
-    std::filesystem::path StoredFile(const std::filesystem::path& file) const
-    {
-        return m_project / L".disk" / file.filename();
-    }
-
     template <typename Work>
     static int ForEachEntry(OrvixFileList* list, Work work)
     {
@@ -89,68 +70,37 @@ protected:
         return succeeded ? OrvixProviderResult::Success : OrvixProviderResult::Failure;
     }
 
-    template <typename Work>
-    static int ForEach(OrvixFileList* list, Work work)
-    {
-        return ForEachEntry(list, [work](OrvixFileEntry& entry) { return work(entry.GetFile()); });
-    }
-
 private:
-    static std::string Bytes(const std::filesystem::path& file)
-    {
-        std::ostringstream bytes;
-        bytes << std::ifstream(file, std::ios::binary).rdbuf();
-        return bytes.str();
-    }
-
-    static bool IsWritable(const std::filesystem::path& file)
-    {
-        const DWORD attributes = GetFileAttributesW(file.c_str());
-        return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_READONLY) == 0;
-    }
-
-    static bool Replace(const std::filesystem::path& from, const std::filesystem::path& to, bool writable)
-    {
-        SetFileAttributesW(to.c_str(), FILE_ATTRIBUTE_NORMAL);
-        return CopyFileW(from.c_str(), to.c_str(), FALSE) &&
-               SetFileAttributesW(to.c_str(), writable ? FILE_ATTRIBUTE_NORMAL : FILE_ATTRIBUTE_READONLY);
-    }
-
     int Store(OrvixFileList* list, unsigned long options)
     {
-        const bool kept = (options & OrvixProviderOption::KeepCheckedOut) != 0;
-        return ForEach(list, [this, kept](const std::filesystem::path& file) {
-            return Replace(file, StoredFile(file), true) &&
-                   SetFileAttributesW(file.c_str(), kept ? FILE_ATTRIBUTE_NORMAL : FILE_ATTRIBUTE_READONLY);
-        });
+        const bool keep = (options & OrvixProviderOption::KeepCheckedOut) != 0;
+        return ForEachEntry(list, [&](auto& entry) { return m_store.Store(entry.GetFile(), keep); });
     }
 
     int Fetch(OrvixFileList* list)
     {
-        return ForEach(list,
-                       [this](const std::filesystem::path& file) { return Replace(StoredFile(file), file, false); });
+        return ForEachEntry(list, [this](auto& entry) { return m_store.Fetch(entry.GetFile()); });
     }
 
-    unsigned long FlagsOf(const std::filesystem::path& file) const
+    unsigned long FlagsOf(const wchar_t* file) const
     {
-        if (m_project.empty())
+        if (!m_store.IsOpen())
         {
             return OrvixFileState::NotControlled;
         }
-        if (!std::filesystem::exists(StoredFile(file)))
+        if (!m_store.Has(file))
         {
             return OrvixFileState::NotControlled | OrvixFilePermission::Add;
         }
-        const unsigned long state = IsWritable(file)
+        const unsigned long state = DiskStore::IsWritable(file)
                                         ? OrvixFileState::CheckedOut | OrvixFilePermission::CheckIn |
                                               OrvixFilePermission::UndoCheckOut | OrvixFilePermission::Compare
                                         : OrvixFilePermission::CheckOut;
-        const bool modified = Bytes(file) != Bytes(StoredFile(file));
         return state | OrvixFileState::Controlled | OrvixFilePermission::GetLatest | OrvixFilePermission::ShowHistory |
-               (modified ? OrvixFileState::Modified | OrvixFilePermission::Compare : 0);
+               (m_store.IsModified(file) ? OrvixFileState::Modified : 0);
     }
 
     const wchar_t* m_name;
-    std::filesystem::path m_project;
+    DiskStore m_store;
     bool m_initialized = false;
 };

@@ -124,7 +124,7 @@ std::vector<const ValidationRule*> RulesOf(unsigned int kind)
 template <typename Report>
 ExitCode CheckRules(const CommandLine& commandLine, const std::wstring& library, Report& report)
 {
-    const ValidationProcess process(library, commandLine.msscci, *commandLine.timeout);
+    ValidationProcess process(library, commandLine.msscci, *commandLine.timeout, commandLine.project);
     const std::vector<const ValidationRule*> rules =
         RulesOf(commandLine.msscci ? ValidationRule::MSSCCI : ValidationRule::Plugin);
     VerdictCounts counts;
@@ -151,6 +151,10 @@ ExitCode RunValidate(const CommandLine& commandLine)
     if (!PathExists(library) || IsFolder(library))
     {
         throw ToolError(ExitCode::NotFound, L"no such library: " + library);
+    }
+    if (!commandLine.project.empty() && !IsFolder(commandLine.project))
+    {
+        throw ToolError(ExitCode::NotFound, L"no such project folder: " + commandLine.project);
     }
     if (commandLine.json)
     {

@@ -39,7 +39,8 @@ void PluginRules::Version(ValidationSubject& subject)
         subject.Call(PluginCandidate::GetVersion, library.Need<std::int32_t()>(PluginCandidate::GetVersion));
     if (version != ORVIX_PLUGIN_CONTRACT_VERSION)
     {
-        Break(PluginCandidate::GetVersion, "returns " + std::to_string(version));
+        Break(PluginCandidate::GetVersion,
+              "returns " + std::to_string(version) + ", not " + std::to_string(ORVIX_PLUGIN_CONTRACT_VERSION));
     }
 }
 

@@ -5,9 +5,12 @@
 #include "ToolError.h"
 #include "ValidationScratch.h"
 #include "ValidationSubject.h"
+#include "WindowWatch.h"
 
 #include <windows.h>
 
+#include <filesystem>
+#include <iterator>
 #include <memory>
 #include <sstream>
 #include <string_view>
@@ -17,8 +20,8 @@ namespace
 
 using Verdict = ValidationResult::Verdict;
 
-constexpr wchar_t ChildArgument[] = L"--validate-rule"; // RULE KIND LIBRARY SCRATCH
-constexpr int NumChildArguments = 6;
+constexpr wchar_t ChildArgument[] = L"--validate-rule"; // RULE KIND LIBRARY SCRATCH HANGING
+constexpr int NumChildArguments = 7;
 constexpr wchar_t PluginKind[] = L"plugin";
 constexpr wchar_t MSSCCIKind[] = L"msscci";
 
@@ -27,13 +30,17 @@ constexpr std::chrono::milliseconds Poll(50); // between two looks at the proces
 /// The lines that a process wrote to its pipe.
 struct ProcessLines
 {
-    explicit ProcessLines(const std::string& text)
+    /// Takes what has arrived, which may end within a line. False when it holds no end of a line.
+    bool Take(const std::string& text)
     {
-        std::istringstream stream(text);
-        for (std::string line; std::getline(stream, line);)
+        m_text += text;
+        bool taken = false;
+        for (std::size_t end = 0; (end = m_text.find('\n')) != std::string::npos; m_text.erase(0, end + 1))
         {
-            Add(line);
+            Add(m_text.substr(0, end));
+            taken = true;
         }
+        return taken;
     }
 
     void Add(const std::string& line)
@@ -43,6 +50,10 @@ struct ProcessLines
         if (word == ParentLink::Step)
         {
             step = rest;
+        }
+        else if (word == ParentLink::Crash)
+        {
+            crash = rest;
         }
         else if (word == ValidationSubject::Note)
         {
@@ -64,8 +75,35 @@ struct ProcessLines
 
     std::string step = "the start"; ///< the last call of the library
     std::string note;
+    std::string crash;                      ///< where the process crashed
     std::optional<ValidationResult> result; ///< empty when the process ended before it had one
+
+private:
+    std::string m_text; // a line that has not arrived in full
 };
+
+/// `crash`: "MODULE at offset X, exception Y".
+std::string DescribeCrash(const std::string& crash)
+{
+    constexpr std::string_view Separator = ", exception ";
+    const std::size_t separator = crash.rfind(Separator);
+    return separator == std::string::npos
+               ? "crashes the process in " + crash
+               : "crashes the process with exception " + crash.substr(separator + Separator.size()) + " in " +
+                     crash.substr(0, separator);
+}
+
+/// Throws `ToolError` when it cannot be copied.
+void CopyProject(const std::wstring& from, const std::wstring& to)
+{
+    std::error_code error;
+    std::filesystem::copy(from, to, std::filesystem::copy_options::recursive, error);
+    if (error)
+    {
+        throw ToolError(ExitCode::Failed, L"the project cannot be copied: " +
+                                              SystemMessage(static_cast<unsigned long>(error.value()), from));
+    }
+}
 
 std::unique_ptr<ChildProcess> Start(const std::wstring& arguments, const std::wstring& folder)
 {
@@ -102,31 +140,66 @@ void CheckInThisProcess(const ValidationRule& rule, ValidationSubject& subject)
 
 } // namespace
 
-ValidationResult ValidationProcess::Check(const ValidationRule& rule) const
+ValidationResult ValidationProcess::Check(const ValidationRule& rule)
 {
     using Clock = std::chrono::steady_clock;
 
+    for (const char* always : {"loading", "unloading"}) // what every rule does
+    {
+        if (m_hanging.contains(always))
+        {
+            return {Verdict::Skip, std::string(always) + " hangs, as another rule has found"};
+        }
+    }
     const ValidationScratch scratch;
-    const std::unique_ptr<ChildProcess> child =
-        Start(std::wstring(ChildArgument) + L' ' + Wide(rule.name) + L' ' + (m_isMSSCCI ? MSSCCIKind : PluginKind) +
-                  L' ' + QuotedArgument(m_library) + L' ' + QuotedArgument(scratch.Path()),
-              scratch.Path());
-    const auto deadline = Clock::now() + m_limit;
+    if (!m_projectTemplate.empty())
+    {
+        CopyProject(m_projectTemplate, scratch.Path() + L"\\project");
+    }
+    std::string hanging;
+    for (const std::string& operation : m_hanging)
+    {
+        hanging += ' ' + operation;
+    }
+    const std::unique_ptr<ChildProcess> child = Start(
+        std::wstring(ChildArgument) + L' ' + Wide(rule.name) + L' ' + (m_isMSSCCI ? MSSCCIKind : PluginKind) + L' ' +
+            QuotedArgument(m_library) + L' ' + QuotedArgument(scratch.Path()) + L' ' + QuotedArgument(Wide(hanging)),
+        scratch.Path());
+    WindowWatch windows(*child);
+    std::optional<WindowWatch::Window> window;
+    ProcessLines lines;
+    auto lastLine = Clock::now();
     bool ended = false;
-    std::string text;
     do
     {
         ended = child->Wait(Poll);
-        text += child->Read();
-    } while (!ended && Clock::now() < deadline);
+        if (lines.Take(child->Read()))
+        {
+            lastLine = Clock::now();
+            window.reset();
+        }
+        if (const std::vector<WindowWatch::Window> found = windows.FindNew(); !found.empty())
+        {
+            window = found.back();
+        }
+    } while (!ended && !lines.result && Clock::now() - lastLine < m_limit);
+    lines.Take(child->Read());
     child->End();
-    const ProcessLines lines(text);
     if (lines.result)
     {
         return *lines.result;
     }
-    return {Verdict::Fail, ended ? lines.step + ' ' + DescribeProcessEnd(child->ExitCode())
-                                 : lines.step + " hangs: ended after " + std::to_string(m_limit.count()) + " s"};
+    if (ended)
+    {
+        return {Verdict::Fail,
+                lines.step + ' ' +
+                    (lines.crash.empty() ? DescribeProcessEnd(child->ExitCode()) : DescribeCrash(lines.crash))};
+    }
+    m_hanging.insert(ValidationSubject::OperationOf(lines.step));
+    const std::string after = ": ended after " + std::to_string(m_limit.count()) + " s";
+    return {Verdict::Fail, lines.step + (window ? " shows the window \"" + Printable(window->title) + "\" (" +
+                                                      Printable(window->text) + ") and waits" + after
+                                                : " hangs" + after)};
 }
 
 std::optional<int> ValidationProcess::RunAsChild(int count, wchar_t** arguments)
@@ -143,7 +216,9 @@ std::optional<int> ValidationProcess::RunAsChild(int count, wchar_t** arguments)
         return static_cast<int>(ExitCode::BadUsage);
     }
     RememberLibraryModule(GetModuleHandleW(L"OrvixCore.dll")); // the library gets the manifest of this module
-    ValidationSubject subject(arguments[4], isMSSCCI, arguments[5]);
+    std::istringstream hanging(Utf8(arguments[6]));
+    ValidationSubject subject(arguments[4], isMSSCCI, arguments[5],
+                              {std::istream_iterator<std::string>(hanging), std::istream_iterator<std::string>()});
     CheckInThisProcess(*rule, subject);
     // A library that is still loaded must not run its end code: hosts unload every library before they end.
     TerminateProcess(GetCurrentProcess(), 0);

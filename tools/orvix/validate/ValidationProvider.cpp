@@ -112,13 +112,11 @@ void ValidationProvider::Close()
 {
     if (m_provider->IsProjectOpen())
     {
-        ParentLink::Send(ParentLink::Step, "CloseProject");
-        m_provider->CloseProject();
+        CloseProject();
     }
     if (m_provider->IsInitialized())
     {
-        ParentLink::Send(ParentLink::Step, "Uninitialize");
-        m_provider->Uninitialize();
+        Uninitialize();
     }
 }
 
@@ -149,8 +147,12 @@ int ValidationProvider::Initialize()
 
 int ValidationProvider::OpenProject()
 {
-    return m_subject.Call("OpenProject",
-                          [this] { return m_provider->OpenProject(m_subject.Project().c_str(), L"validation"); });
+    return OpenProject(m_subject.Project());
+}
+
+int ValidationProvider::OpenProject(const std::wstring& folder)
+{
+    return m_subject.Call("OpenProject", [&] { return m_provider->OpenProject(folder.c_str(), L"validation"); });
 }
 
 int ValidationProvider::CloseProject()

@@ -6,7 +6,9 @@
 #include "OrvixServicesPointer.h"
 #include "ValidationLibrary.h"
 
+#include <atomic>
 #include <optional>
+#include <string>
 
 /// The provider under validation, as a host uses it: the object of a plug-in, or OrvixCore's own provider for an MSSCCI
 /// library. At the end it is closed, and the library is unloaded.
@@ -21,9 +23,13 @@ public:
 
     IOrvixProvider& Get() { return *m_provider; }
 
+    /// Whether the provider has printed from another thread than that of its calls.
+    bool HasPrintedFromOtherThread() const { return m_access.WasCalledFromOtherThread(); }
+
     // Each returns what the provider returns, and throws `RuleBroken` for an exception.
     int Initialize();
     int OpenProject();
+    int OpenProject(const std::wstring& folder);
     int CloseProject();
     int Uninitialize();
 
@@ -39,11 +45,19 @@ private:
     class SilentClient final : public IOrvixClientAccess
     {
     public:
-        void OutputText(const wchar_t*, int) override {}
+        void OutputText(const wchar_t*, int) override
+        {
+            m_fromOtherThread = m_fromOtherThread || GetCurrentThreadId() != m_thread;
+        }
+        bool WasCalledFromOtherThread() const { return m_fromOtherThread; }
         std::intptr_t RelayA(void*, void*, void*, void*) override { return 0; }
         std::uint32_t GetColor(std::int32_t) override { return 0; }
         bool IsUnattended() override { return true; }
         std::intptr_t RelayB(void*, void*, void*, void*) override { return 0; }
+
+    private:
+        DWORD m_thread = GetCurrentThreadId();
+        std::atomic<bool> m_fromOtherThread = false;
     };
 
     ValidationSubject& m_subject;

@@ -33,6 +33,26 @@ void Closed(ValidationSubject& subject);
 
 } // namespace StatusRules
 
+/// Whether a provider does its work, on a scratch project.
+namespace WorkRules
+{
+
+void Stores(ValidationSubject& subject);
+void ChecksOut(ValidationSubject& subject);
+void StatusTruth(ValidationSubject& subject);
+void Failures(ValidationSubject& subject);
+
+} // namespace WorkRules
+
+/// What a provider does to the process of its host.
+namespace ProcessRules
+{
+
+void State(ValidationSubject& subject);
+void Memory(ValidationSubject& subject);
+
+} // namespace ProcessRules
+
 /// For the four functions of a plug-in.
 namespace PluginRules
 {

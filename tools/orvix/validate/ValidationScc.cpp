@@ -67,11 +67,10 @@ void ValidationScc::Open(LPTEXTOUTPROC output)
 
 SCCRTN ValidationScc::TryToOpen(LPTEXTOUTPROC output)
 {
-    const auto projectName = m_projectName;
     const auto localPath = m_localPath;
     const SCCRTN result = Call(SccFunctions::OpenProject, m_context, nullptr, m_user.Get(), m_projectName.Get(),
                                m_localPath.Get(), m_auxPath.Get(), "validation", output, SCC_OP_CREATEIFNEW);
-    m_inputTextsUnchanged = m_inputTextsUnchanged && m_projectName == projectName && m_localPath == localPath;
+    m_inputTextsUnchanged = m_inputTextsUnchanged && m_localPath == localPath; // the project name may be written
     return result;
 }
 
@@ -79,7 +78,7 @@ void ValidationScc::CheckInputTexts() const
 {
     if (!m_inputTextsUnchanged)
     {
-        throw RuleBroken("SccOpenProject writes to the project name or the local path");
+        throw RuleBroken("SccOpenProject writes to the local path");
     }
 }
 

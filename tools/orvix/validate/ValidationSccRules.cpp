@@ -241,7 +241,8 @@ void SccRules::Version(ValidationSubject& subject)
                                       library.Need<decltype(SccGetVersion)>(SccFunctions::GetVersion.name));
     if (HIWORD(version) != 1 || LOWORD(version) > 3)
     {
-        throw RuleBroken("SccGetVersion returns " + Hexadecimal(static_cast<unsigned long>(version)));
+        throw RuleBroken("SccGetVersion returns " + Hexadecimal(static_cast<unsigned long>(version)) +
+                         ", not 0x00010000 to 0x00010003");
     }
 }
 

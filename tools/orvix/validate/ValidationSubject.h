@@ -3,6 +3,7 @@
 #include "ParentLink.h"
 #include "ValidationRule.h"
 
+#include <set>
 #include <string>
 #include <string_view>
 
@@ -12,8 +13,9 @@
 class ValidationSubject
 {
 public:
-    /// `scratch` is an empty folder.
-    ValidationSubject(std::wstring library, bool isMSSCCI, const std::wstring& scratch);
+    /// `scratch` is a folder that is empty or contains the project. `hanging`: operations that have hung in another
+    /// rule; a rule that comes to one of them is skipped.
+    ValidationSubject(std::wstring library, bool isMSSCCI, const std::wstring& scratch, std::set<std::string> hanging);
 
     /// Full path.
     const std::wstring& Library() const { return m_library; }
@@ -33,6 +35,7 @@ public:
     template <typename Work>
     auto Call(const std::string& what, Work work)
     {
+        SkipWhatHangs(what);
         ParentLink::Send(ParentLink::Step, what);
         try
         {
@@ -53,9 +56,16 @@ public:
     static constexpr std::string_view Fail = "fail";
     static constexpr std::string_view Skip = "skip";
 
+    /// The name of the operation in the announcement of a call.
+    static std::string OperationOf(const std::string& what) { return what.substr(0, what.find(' ')); }
+
 private:
+    /// Throws `RuleSkipped` for an operation that hangs.
+    void SkipWhatHangs(const std::string& what) const;
+
     std::wstring m_library;
     bool m_isMSSCCI;
     std::wstring m_project;
     std::wstring m_outside;
+    std::set<std::string> m_hanging;
 };

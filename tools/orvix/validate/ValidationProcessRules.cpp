@@ -1,0 +1,89 @@
+#include "OrvixProviderResult.h"
+#include "ProcessState.h"
+#include "ValidationFiles.h"
+#include "ValidationOperation.h"
+#include "ValidationRules.h"
+
+#include <windows.h>
+
+#include <psapi.h>
+
+#include <string>
+#include <vector>
+
+namespace
+{
+
+using OrvixProviderResult::Success;
+
+/// Throws `RuleBroken` when something has changed since `state`.
+void RequireUnchanged(const ProcessState& state, const std::string& operation)
+{
+    const std::vector<std::string> changes = state.FindChanges();
+    Require(changes.empty(), operation + " changes " + (changes.empty() ? "" : changes.front()));
+}
+
+/// Bytes that this process has committed.
+std::size_t CommittedBytes()
+{
+    PROCESS_MEMORY_COUNTERS counters{};
+    counters.cb = sizeof counters;
+    K32GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters);
+    return counters.PagefileUsage;
+}
+
+} // namespace
+
+void ProcessRules::State(ValidationSubject& subject)
+{
+    const ProcessState state;
+    ValidationProvider provider(subject);
+    RequireUnchanged(state, "loading");
+    if (provider.Initialize() != Success)
+    {
+        throw RuleSkipped("Initialize fails");
+    }
+    RequireUnchanged(state, "Initialize");
+    if (provider.OpenProject() != Success)
+    {
+        throw RuleSkipped("OpenProject fails for the scratch project");
+    }
+    RequireUnchanged(state, "OpenProject");
+    const std::vector<std::wstring> paths = ValidationFiles::MakeGood(subject);
+    for (const ValidationOperation& operation : ValidationOperation::Scenario(0))
+    {
+        ActiveFiles files(paths);
+        operation.Run(subject, provider, files.List());
+        RequireUnchanged(state, operation.name);
+        Require(!provider.HasPrintedFromOtherThread(),
+                std::string(operation.name) + " prints from another thread than that of the call");
+    }
+    provider.CloseProject();
+    RequireUnchanged(state, "CloseProject");
+    provider.Uninitialize();
+    RequireUnchanged(state, "Uninitialize");
+}
+
+void ProcessRules::Memory(ValidationSubject& subject)
+{
+    constexpr int WarmUp = 3;
+    constexpr int Queries = 10;
+    constexpr std::size_t Allowed = 1 << 20; // bytes for each query
+
+    ValidationProvider provider(subject);
+    provider.Begin();
+    const std::vector<std::wstring> paths = ValidationFiles::MakeGood(subject);
+    const auto query = [&](int times) {
+        for (int i = 0; i < times; ++i)
+        {
+            ActiveFiles files(paths);
+            ValidationOperation::QueryStatus().Run(subject, provider, files.List());
+        }
+    };
+    query(WarmUp);
+    const std::size_t before = CommittedBytes();
+    query(Queries);
+    const std::size_t after = CommittedBytes();
+    Require(after < before + Queries * Allowed, std::to_string(Queries) + " queries of the state take " +
+                                                    std::to_string((after - before) >> 20) + " MiB that are not freed");
+}
