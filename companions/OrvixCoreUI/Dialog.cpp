@@ -133,7 +133,11 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
     {
     case WM_INITDIALOG:
         OnOpen();
-        return TRUE;
+        if (FirstFocus() != 0)
+        {
+            SetFocus(Item(FirstFocus()));
+        }
+        return FirstFocus() == 0 ? TRUE : FALSE;
     case WM_COMMAND:
         OnCommand(LOWORD(wParam), HIWORD(wParam));
         return TRUE;
@@ -168,6 +172,7 @@ void Dialog::OnOpen()
 {
     ColorCheckBoxes();
     OnInit();
+    WatchKeys();
     m_layout = Layout(m_window, Rules());
     const SIZE size = (m_name != nullptr ? Settings::WindowSize(m_name) : std::nullopt).value_or(SIZE{});
     const LONG smallest = m_layout.SmallestWindow().y;
@@ -176,6 +181,27 @@ void Dialog::OnOpen()
     const LONG room = ShowWholeMessage();
     Resize(m_layout.ToPixels(size.cx), height + room);
     m_roomForMessage = m_layout.FromPixels(HeightOf(m_window) - height);
+}
+
+void Dialog::WatchKeys()
+{
+    for (HWND control = GetWindow(m_window, GW_CHILD); control != nullptr; control = GetWindow(control, GW_HWNDNEXT))
+    {
+        SetWindowSubclass(control, &ControlProcedure, 1, reinterpret_cast<DWORD_PTR>(this));
+    }
+}
+
+LRESULT CALLBACK Dialog::ControlProcedure(HWND control, UINT message, WPARAM wParam, LPARAM lParam, UINT_PTR,
+                                          DWORD_PTR dialog) noexcept
+{
+    auto& self = *reinterpret_cast<Dialog*>(dialog);
+    if (message == WM_KEYDOWN)
+    {
+        self.m_usedKey = false;
+        Completes([&] { self.m_usedKey = self.OnKey(wParam); });
+    }
+    const bool isOfUsedKey = (message == WM_KEYDOWN || message == WM_CHAR) && self.m_usedKey;
+    return isOfUsedKey ? 0 : DefSubclassProc(control, message, wParam, lParam);
 }
 
 void Dialog::ColorCheckBoxes() const

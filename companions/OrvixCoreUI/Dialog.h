@@ -37,6 +37,13 @@ protected:
     /// Fills the controls.
     virtual void OnInit() = 0;
 
+    /// The control that has the keyboard's focus first; 0 for the first one of the tab order.
+    virtual int FirstFocus() const { return 0; }
+
+    /// A key was pressed while a control of the dialog had the focus, before the control sees it. Returns whether the
+    /// dialog has used the key.
+    virtual bool OnKey(WPARAM) { return false; }
+
     /// A control was used, or the key that does the same.
     virtual void OnCommand(int control, int notification) = 0;
 
@@ -65,6 +72,9 @@ protected:
     /// Moves the keyboard's focus to a control.
     void Focus(int control) const { SendMessageW(m_window, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(Item(control)), 1); }
 
+    /// Enables or disables a control.
+    void Enable(int control, bool enabled) const { EnableWindow(Item(control), enabled ? TRUE : FALSE); }
+
     /// Hides a control and disables it, so that its access key has no effect.
     void Hide(int control) const;
 
@@ -72,7 +82,11 @@ private:
     static INT_PTR CALLBACK Procedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) noexcept;
     INT_PTR Handle(UINT message, WPARAM wParam, LPARAM lParam);
 
+    static LRESULT CALLBACK ControlProcedure(HWND control, UINT message, WPARAM wParam, LPARAM lParam, UINT_PTR id,
+                                             DWORD_PTR dialog) noexcept;
+
     void OnOpen();
+    void WatchKeys();
     void ColorCheckBoxes() const;
 
     /// Makes the message as high as it needs. Returns by how many pixels the dialog gets higher.
@@ -88,6 +102,7 @@ private:
     Palette m_palette;
     Layout m_layout;
     LONG m_roomForMessage = 0; // how much higher the window is for its message, at 96 dots per inch
+    bool m_usedKey = false;    // its character is still to come
     HWND m_window = nullptr;
     std::optional<std::int32_t> m_result;
 };

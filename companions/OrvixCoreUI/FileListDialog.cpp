@@ -38,6 +38,13 @@ std::wstring StateInWords(unsigned long flags)
     return words;
 }
 
+/// The length of the folder in a path with this last separator. A root keeps its separator.
+std::size_t LengthOfFolder(std::wstring_view path, std::size_t separator)
+{
+    const bool isRoot = separator == 2 && path[1] == L':';
+    return separator == std::wstring_view::npos ? 0 : separator + (isRoot ? 1 : 0);
+}
+
 /// Name, folder and state.
 std::vector<std::wstring> CellsOf(OrvixFileEntry& entry)
 {
@@ -45,7 +52,7 @@ std::vector<std::wstring> CellsOf(OrvixFileEntry& entry)
     const std::size_t separator = path.find_last_of(L"\\/");
     const bool hasFolder = separator != std::wstring_view::npos;
     return {std::wstring(path.substr(hasFolder ? separator + 1 : 0)),
-            std::wstring(path.substr(0, hasFolder ? separator : 0)), StateInWords(entry.GetFlagsOut())};
+            std::wstring(path.substr(0, LengthOfFolder(path, separator))), StateInWords(entry.GetFlagsOut())};
 }
 
 } // namespace
@@ -82,6 +89,22 @@ void FileListDialog::OnInit()
     InitBox(IDC_REMEMBER, Has(OrvixDialogOption::OfferRemember), OrvixDialogOption::RememberChecked);
 }
 
+bool FileListDialog::OnKey(WPARAM key)
+{
+    const bool isControl = GetKeyState(VK_CONTROL) < 0;
+    if (isControl && key == L'F')
+    {
+        Focus(IDC_FILTER);
+        return true;
+    }
+    if (isControl && key == VK_RETURN)
+    {
+        PostMessageW(Item(IDOK), BM_CLICK, 0, 0);
+        return true;
+    }
+    return false;
+}
+
 void FileListDialog::OnCommand(int control, int notification)
 {
     switch (control)
@@ -114,6 +137,7 @@ void FileListDialog::OnCommand(int control, int notification)
         End(OrvixDialogResult::Confirmed);
         return;
     case IDCANCEL:
+        SetChecked(IDC_REMEMBER, false); // only a confirmation is remembered
         StoreOptions();
         End(OrvixDialogResult::Cancelled);
         return;
@@ -172,6 +196,7 @@ void FileListDialog::ShowCount() const
     {
         SetText(IDC_COUNT, count.c_str());
     }
+    Enable(IDOK, m_files.NumChecked() > 0);
 }
 
 void FileListDialog::ShowRecentComments()
@@ -228,7 +253,8 @@ void FileListDialog::StoreOptions() const
 
 void FileListDialog::StoreChoice() const
 {
-    const std::wstring comment = GetText(IDC_COMMENT);
+    std::wstring comment = GetText(IDC_COMMENT);
+    comment.erase(comment.find_last_not_of(L" \t\r\n") + 1);
     m_params.SetComment(comment.c_str());
     Settings::AddRecentComment(comment);
     for (std::size_t row = 0; OrvixFileEntry * entry : m_entries)

@@ -3,6 +3,7 @@
 #include "Dialog.h"
 #include "OrvixDialogOption.h"
 #include "TableView.h"
+#include "resource.h"
 
 #include <string>
 #include <vector>
@@ -20,6 +21,10 @@ public:
 private:
     std::span<const Layout::Rule> Rules() const override;
     void OnInit() override;
+    int FirstFocus() const override { return IDC_LIST; }
+
+    /// Ctrl+F goes to the filter, and Ctrl+Enter confirms.
+    bool OnKey(WPARAM key) override;
     void OnCommand(int control, int notification) override;
     LRESULT OnNotify(const NMHDR& notification) override;
     bool OnContextMenu(HWND control, POINT point) override;

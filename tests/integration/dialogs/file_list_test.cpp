@@ -197,7 +197,6 @@ TEST_F(FileListDialog, IsOperatedByTabSpaceAndArrowsAlone)
     AddFile(L"b");
     AddFile(L"c");
     ShowFileList([](const DialogWindow& dialog) {
-        dialog.Press(VK_TAB);
         EXPECT_EQ(dialog.Focused(), List);
         dialog.Press(VK_SPACE);
         EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false, true, true}));
@@ -304,7 +303,7 @@ TEST_F(FileListDialog, TellsScreenReadersOfChangedCheckBoxes)
         StateChanges::Of(list);
         dialog.Press(VK_SPACE);
         EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{CHILDID_SELF}));
-        dialog.Click(L"Select none");
+        dialog.Click(L"Check none");
         EXPECT_EQ(StateChanges::Of(list), (std::vector<LONG>{CHILDID_SELF}));
         Cancel(dialog);
     });
@@ -353,7 +352,7 @@ TEST_F(FileListDialog, ConfirmsEveryEntryWhereNoneCanBeCleared)
     OrvixFileEntry& entry = AddFile(L"a", OrvixFileState::CheckedOut, false);
     EXPECT_EQ(ShowFileList(0,
                            [](const DialogWindow& dialog) {
-                               EXPECT_FALSE(dialog.Has(L"Select all"));
+                               EXPECT_FALSE(dialog.Has(L"Check all"));
                                dialog.Press(VK_RETURN);
                            }),
               OrvixDialogResult::Confirmed);
@@ -596,8 +595,34 @@ TEST_F(FileListDialog, ReturnsTheStateOfItsBoxesWhateverTheAnswer)
             dialog.PressAlt(L'r');
             dialog.Click(button);
         });
-        EXPECT_EQ(m_params.GetOptions(), Offered | OrvixDialogOption::RememberChecked);
+        const bool confirmed = std::wcscmp(button, L"OK") == 0; // a cancel is never remembered
+        EXPECT_EQ(m_params.GetOptions(), Offered | (confirmed ? OrvixDialogOption::RememberChecked : 0));
     }
+}
+
+TEST_F(FileListDialog, ConfirmsNothingWhenNoFileIsChecked)
+{
+    AddFile(L"C:\\a");
+    AddFile(L"b");
+    EXPECT_EQ(ShowFileList([](const DialogWindow& dialog) {
+                  EXPECT_EQ(dialog.Column(List, 1), (Texts{L"C:\\", L""}));
+                  EXPECT_TRUE(dialog.IsEnabled(L"OK"));
+                  dialog.PressAlt(L'n');
+                  EXPECT_FALSE(dialog.IsEnabled(L"OK"));
+                  Cancel(dialog);
+              }),
+              OrvixDialogResult::Cancelled);
+}
+
+TEST_F(FileListDialog, CutsBlankLinesAtTheEndOfTheComment)
+{
+    AddFile(L"a");
+    ShowFileList([](const DialogWindow& dialog) {
+        dialog.Focus(L"Comment:");
+        dialog.Type(L"one\r\rtwo\r \r\r");
+        dialog.Click(L"OK");
+    });
+    EXPECT_STREQ(m_params.GetComment(), L"one\r\n\r\ntwo");
 }
 
 /// Records the files and the arguments of a check-in.
@@ -754,11 +779,11 @@ TEST_F(LongFileList, IsVirtual)
 TEST_F(LongFileList, ConfirmsWhatIsCheckedAmongFilteredAndSortedRows)
 {
     ShowFileList([](const DialogWindow& dialog) {
-        dialog.Click(L"Select none");
+        dialog.Click(L"Check none");
         dialog.Focus(L"Filter:");
         dialog.Type(L"49999");
         EXPECT_EQ(dialog.Column(List, 0), (Texts{L"file49999"}));
-        dialog.Click(L"Select all");
+        dialog.Click(L"Check all");
         dialog.ClickHeading(List, 0);
         dialog.Click(L"OK");
     });

@@ -56,7 +56,7 @@ TEST_F(DialogWindows, LetTabReachEveryControl)
 {
     ShowFileList(Everything, [](const DialogWindow& dialog) {
         const Texts stops = dialog.TabStops();
-        EXPECT_EQ(stops, (Texts{L"Filter:", L"Files:", L"Select all", L"Select none", L"Comment:", L"Keep checked out",
+        EXPECT_EQ(stops, (Texts{L"Filter:", L"Files:", L"Check all", L"Check none", L"Comment:", L"Keep checked out",
                                 L"Remember my answer", L"OK", L"Cancel"}));
         Texts walked;
         for (std::size_t i = 0; i < stops.size(); ++i)
@@ -120,7 +120,7 @@ TEST_F(DialogWindows, LetTheirControlsFollowTheSize)
         const RECT list = dialog.Place(L"Files:");
         const RECT ok = dialog.Place(L"OK");
         const RECT comment = dialog.Place(L"Comment:");
-        const RECT all = dialog.Place(L"Select all");
+        const RECT all = dialog.Place(L"Check all");
         Enlarge(dialog, 100, 60);
         EXPECT_EQ(dialog.Place(L"Files:").right, list.right + 100);
         EXPECT_EQ(dialog.Place(L"Files:").bottom, list.bottom + 60);
@@ -130,8 +130,8 @@ TEST_F(DialogWindows, LetTheirControlsFollowTheSize)
         EXPECT_EQ(SizeOf(dialog.Place(L"OK")).cx, SizeOf(ok).cx);
         EXPECT_EQ(dialog.Place(L"Comment:").right, comment.right + 100);
         EXPECT_EQ(dialog.Place(L"Comment:").top, comment.top + 60);
-        EXPECT_EQ(dialog.Place(L"Select all").left, all.left);
-        EXPECT_EQ(dialog.Place(L"Select all").top, all.top + 60);
+        EXPECT_EQ(dialog.Place(L"Check all").left, all.left);
+        EXPECT_EQ(dialog.Place(L"Check all").top, all.top + 60);
         dialog.Press(VK_ESCAPE);
     });
 }
