@@ -490,6 +490,16 @@ TEST_F(DoctorOnPlugins, SaysThatTheFolderIsTooLongToBeSearched)
     EXPECT_THAT(CodesOf(Place(Report(), "plug-in folder")), ElementsAre("!path-too-long"));
 }
 
+TEST_F(DoctorOnPlugins, SayThatTheirFolderIsNamedByARelativePath)
+{
+    std::filesystem::create_directories(File(L"providers"));
+    UsePlugins(L"providers");
+    const Json place = Place(Report(), "plug-in folder");
+    EXPECT_EQ(std::filesystem::path(std::string(place["location"])), File(L"providers"));
+    ASSERT_EQ(CodesOf(place), Codes{"relative-folder"});
+    EXPECT_NE(place["findings"][0]["remedy"], "");
+}
+
 TEST_F(DoctorOnPlugins, NamesTheLimitThatAPathExceeds)
 {
     const std::size_t longest = 259 - (Plugins().wstring().size() + 1);

@@ -370,7 +370,9 @@ CommandLine Parser::MakeCommandLine(const Command& command) const
     result.paths = FullPaths(Unmarked(m_texts.paths));
     result.name = Unmarked(m_texts.name);
     result.sources = m_app.count("--sources") == 0 ? command.defaultSources : ParseSources(m_texts.sources);
-    result.plugins = FullPathOrEmpty(Unmarked(m_texts.plugins));
+    const std::wstring plugins = Unmarked(m_texts.plugins);
+    result.plugins = FullPathOrEmpty(plugins);
+    result.pluginsAreRelative = !plugins.empty() && !IsAbsolutePath(plugins);
     result.config = FullPathOrEmpty(Unmarked(m_texts.config));
     result.provider = Unmarked(m_texts.provider);
     result.project = FullPathOrEmpty(Unmarked(m_texts.project));

@@ -14,11 +14,6 @@ std::wstring Quoted(const std::wstring& text)
     return L'"' + text + L'"';
 }
 
-bool IsAbsolute(const std::wstring& path)
-{
-    return path.starts_with(L"\\\\") || (path.size() > 2 && path[1] == L':' && path[2] == L'\\');
-}
-
 /// Adds problems about one provider element.
 class ProviderChecks
 {
@@ -82,7 +77,7 @@ private:
     {
         for (const XmlElement* root : m_provider.Find(L"FixedProjectRoot"))
         {
-            if (!root->text.empty() && (!IsAbsolute(root->text) || !IsFolder(root->text)))
+            if (!root->text.empty() && (!IsAbsolutePath(root->text) || !IsFolder(root->text)))
             {
                 Add("no-root-folder", *root, m_where,
                     L"FixedProjectRoot " + Quoted(root->text) + L" is not the full path of a folder");
@@ -91,7 +86,7 @@ private:
         for (const XmlElement* program : m_provider.Find(L"AltProviderExecutable"))
         {
             if (!program->text.empty() &&
-                (!IsAbsolute(program->text) || !PathExists(program->text) || IsFolder(program->text)))
+                (!IsAbsolutePath(program->text) || !PathExists(program->text) || IsFolder(program->text)))
             {
                 Add("no-executable", *program, m_where,
                     L"AltProviderExecutable " + Quoted(program->text) + L" is not the full path of a file");
@@ -99,7 +94,7 @@ private:
         }
         for (const XmlElement* folder : m_provider.Find(L"MSSCCDllSearchPath"))
         {
-            if (!folder->text.empty() && !IsAbsolute(folder->text))
+            if (!folder->text.empty() && !IsAbsolutePath(folder->text))
             {
                 Add("no-search-path", *folder, m_where,
                     L"MSSCCDllSearchPath " + Quoted(folder->text) + L" is not a full path");
@@ -161,7 +156,7 @@ private:
             Add("folder-slash", folder, where,
                 L"Folder " + Quoted(folder.text) + L" matches no file: paths have backslashes");
         }
-        else if (!IsAbsolute(folder.text))
+        else if (!IsAbsolutePath(folder.text))
         {
             Add("folder-relative", folder, where,
                 L"Folder " + Quoted(folder.text) +

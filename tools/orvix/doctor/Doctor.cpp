@@ -59,6 +59,12 @@ DoctorReport Doctor::Examine(const CommandLine& commandLine, Output& output)
             report.locations.back().AddNote("default-folder", L"no folder is named; hosts name their own, this one is "
                                                               L"beside the program");
         }
+        if (commandLine.pluginsAreRelative)
+        {
+            report.locations.back().AddNote("relative-folder",
+                                            L"the folder is named by a relative path; a host that does so finds it "
+                                            L"from one current folder only");
+        }
     }
     if ((commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
     {

@@ -73,7 +73,10 @@ CandidateExams::About PluginExaminer::ExaminePlugin(const std::wstring& path, co
     {
         findings.AddProblem("empty-name", L"its name is empty or null");
     }
-    LoadFindings::AddCurrentFolder(findings, path, context);
+    if (judged.verdict != Verdict::DoesNotLoad || judged.loadError != ERROR_MOD_NOT_FOUND)
+    {
+        LoadFindings::AddCurrentFolder(findings, path, context);
+    }
     report(findings);
     return about;
 }

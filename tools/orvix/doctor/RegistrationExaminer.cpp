@@ -295,7 +295,8 @@ CandidateExams::About RegistrationExaminer::ExamineLibrary(const std::wstring& s
     DoctorReport::Subject findings;
     const UniqueActivationContext context = MakeManifestContext(LibraryModule());
     const UniqueModule module = LoadLibraryIsolated(serverPath.c_str(), context);
-    if (const DWORD error = GetLastError(); !module && !path.empty())
+    const DWORD error = GetLastError();
+    if (!module && !path.empty())
     {
         LoadFindings::AddLoadError(findings, path, context, error);
     }
@@ -308,7 +309,10 @@ CandidateExams::About RegistrationExaminer::ExamineLibrary(const std::wstring& s
     {
         AddMissingExports(findings, module.Get());
     }
-    LoadFindings::AddCurrentFolder(findings, path, context);
+    if (module || error != ERROR_MOD_NOT_FOUND)
+    {
+        LoadFindings::AddCurrentFolder(findings, path, context);
+    }
     report(findings);
     CandidateExams::About about;
     if (module)

@@ -16,6 +16,7 @@ struct CommandLine
     std::wstring provider; ///< name or index
     std::wstring project;
     std::wstring plugins;
+    bool pluginsAreRelative = false; ///< the user typed a relative path for them
     std::wstring config;
     std::wstring user;
     std::uint32_t sources = 0; ///< bits of `OrvixProviderSource`

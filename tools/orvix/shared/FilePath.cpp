@@ -26,6 +26,12 @@ std::wstring FullPath(const std::wstring& path)
     return full;
 }
 
+bool IsAbsolutePath(const std::wstring& path)
+{
+    const auto isSeparator = [&path](std::size_t i) { return path[i] == L'\\' || path[i] == L'/'; };
+    return path.size() > 2 && isSeparator(path[1] == L':' ? 2 : 0) && (path[1] == L':' || isSeparator(1));
+}
+
 std::wstring PathAsOnDisk(const std::wstring& full)
 {
     std::size_t start = full.find(L'\\');

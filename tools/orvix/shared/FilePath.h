@@ -6,6 +6,10 @@
 /// with `ExitCode::BadUsage` when the text is not a path.
 std::wstring FullPath(const std::wstring& path);
 
+/// Whether a path names the same file whatever the current folder is: it begins with a drive and a separator, or with a
+/// server.
+bool IsAbsolutePath(const std::wstring& path);
+
 /// A full path in the letter case of the disk, as far as it exists.
 std::wstring PathAsOnDisk(const std::wstring& full);
 
