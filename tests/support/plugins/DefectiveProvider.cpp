@@ -4,6 +4,8 @@
 #include "Defect.h"
 #include "DiskStore.h"
 #include "FakeProvider.h"
+#include "IOrvixClientAccess.h"
+#include "OrvixClientInfo.h"
 #include "OrvixFileEntry.h"
 #include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
@@ -14,6 +16,7 @@
 #include <map>
 #include <stdexcept>
 #include <string>
+#include <thread>
 
 namespace
 {
@@ -38,9 +41,10 @@ public:
     bool IsInitialized() override { return m_initialized; }
     bool IsProjectOpen() override { return m_open || (m_wasOpen && Defect::Is(L"state")); }
 
-    int Initialize(OrvixClientInfo*) override
+    int Initialize(OrvixClientInfo* info) override
     {
         ++m_starts;
+        m_client = info->GetIOrvixClientAccess();
         if (Defect::Is(L"handles"))
         {
             CreateEventW(nullptr, FALSE, FALSE, nullptr);
@@ -98,6 +102,10 @@ public:
         {
             return UnknownResultOfBadInput;
         }
+        if (Defect::Is(L"prints-from-thread"))
+        {
+            std::thread([this] { m_client->OutputText(L"taken", 0); }).join();
+        }
         if (Defect::Is(L"changes-folder"))
         {
             SetCurrentDirectoryW(L"C:\\windows");
@@ -111,6 +119,10 @@ public:
         if (Defect::Is(L"list-untouched") && list->NumActiveEntries() != 0)
         {
             list->GetActiveFileEntry(0)->SetFlagsIn(0);
+        }
+        if (Defect::Is(L"checkin-fails"))
+        {
+            return Failure;
         }
         const wchar_t* last = Last(list);
         if (Defect::Is(L"destroys") && *last != L'\0' && !m_states.contains(last))
@@ -293,6 +305,7 @@ private:
     std::map<std::wstring, unsigned long> m_states;
     std::wstring m_project;
     DiskStore m_disk;
+    IOrvixClientAccess* m_client = nullptr;
     bool m_initialized = false;
     bool m_open = false;
     bool m_wasOpen = false;
