@@ -1,5 +1,6 @@
 // Commands that a provider carries out by itself, with an installed MSSCCI library, and where providers come from.
 
+#include "BuiltFile.h"
 #include "RegistryToolTest.h"
 
 #include <gmock/gmock.h>
@@ -7,6 +8,7 @@
 namespace
 {
 
+using testing::AllOf;
 using testing::HasSubstr;
 
 class InstalledLibrary : public RegistryToolTest
@@ -98,4 +100,23 @@ TEST_F(InstalledLibrary, ThatIsGoneIsListedButDoesNotStart)
     const auto result = RunInstalled({L"open"});
     EXPECT_EQ(result.code, NotFound);
     EXPECT_EQ(result.errors, "orvix: the provider does not start: Talking\n");
+}
+
+TEST_F(InstalledLibrary, TakesNamesAndCommentsOfTheAnsiCodePageAndIsNotSpoiledByOthers)
+{
+    if (GetACP() == CP_UTF8)
+    {
+        GTEST_SKIP() << "the ANSI code page has every character";
+    }
+    ASSERT_EQ(Register(BuiltFile(L"archive_msscci.dll").make_preferred().wstring(), L"Files").code, Success);
+    Write(L"a.txt", "x");
+    Write(L"\u4E2D.txt", "x");
+    const auto result = RunInstalled({L"add", L".", L"--provider", L"Files", L"-m", L"\u4E2D"});
+    EXPECT_EQ(result.code, Failed);
+    EXPECT_THAT(
+        result.output,
+        AllOf(HasSubstr("refused  its name has characters that the provider's code page lacks  \xE4\xB8\xAD.txt\n"),
+              HasSubstr("  a.txt\n"), HasSubstr("2 files, 1 done, 1 refused")));
+    EXPECT_THAT(result.errors, HasSubstr("orvix: the comment has characters that the provider's code page lacks; they "
+                                         "are replaced\n"));
 }
