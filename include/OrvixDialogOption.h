@@ -1,5 +1,7 @@
 #pragma once
 
+#include "OrvixOperation.h"
+
 #include <cstdint>
 
 /// What a file-list dialog offers and returns: bits of `OrvixFileListDialogParams::GetOptions`.
@@ -13,6 +15,17 @@ inline constexpr std::uint32_t OfferGetLatest =
 inline constexpr std::uint32_t OptionChecked = 0x10;   ///< the option is checked; in and out
 inline constexpr std::uint32_t OfferRemember = 0x40;   ///< offers to remember the answers
 inline constexpr std::uint32_t RememberChecked = 0x80; ///< the answers are to be stored; in and out
+
+/// The bits that name an operation.
+inline constexpr std::uint32_t OperationMask = 0x3E00;
+
+/// Names the operation that the user confirms, a bit of `OrvixOperation`, to the dialog: its button then says what it
+/// does ("Check in 12 files"), and there is no field for a comment when the operation takes none. Of several operations
+/// the dialog names one. `RunFileListOperation` neither sets nor reads these bits.
+constexpr std::uint32_t ForOperation(std::uint32_t operation)
+{
+    return (operation << 8) & OperationMask;
+}
 
 } // namespace OrvixDialogOption
 

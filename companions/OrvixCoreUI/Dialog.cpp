@@ -1,13 +1,16 @@
 #include "Dialog.h"
 
 #include "ActivationContext.h"
+#include "ControlContext.h"
 #include "DpiAwareness.h"
 #include "ExceptionBarrier.h"
 #include "Module.h"
 #include "Settings.h"
+#include "Texts.h"
 #include "resource.h"
 
 #include <commctrl.h>
+#include <dwmapi.h>
 #include <uxtheme.h>
 #include <windowsx.h>
 
@@ -17,10 +20,25 @@
 namespace
 {
 
-bool IsCheckBox(HWND control)
+bool IsOfClass(HWND control, const wchar_t* name)
 {
-    return (SendMessageW(control, WM_GETDLGCODE, 0, 0) & DLGC_BUTTON) != 0 &&
-           (GetWindowLongW(control, GWL_STYLE) & BS_TYPEMASK) == BS_AUTOCHECKBOX;
+    wchar_t actual[32] = {};
+    GetClassNameW(control, actual, static_cast<int>(std::size(actual)));
+    return _wcsicmp(actual, name) == 0;
+}
+
+bool IsPushButton(HWND control)
+{
+    const LONG type = GetWindowLongW(control, GWL_STYLE) & BS_TYPEMASK;
+    return IsOfClass(control, WC_BUTTONW) && (type == BS_PUSHBUTTON || type == BS_DEFPUSHBUTTON);
+}
+
+/// The title bar has no colours of the host, but it can be dark.
+void DarkenTitle(HWND window)
+{
+    constexpr DWORD UseDarkMode = 20; // DWMWA_USE_IMMERSIVE_DARK_MODE, which older systems refuse
+    const BOOL dark = TRUE;
+    DwmSetWindowAttribute(window, UseDarkMode, &dark, sizeof dark);
 }
 
 LONG HeightOf(HWND window)
@@ -29,31 +47,6 @@ LONG HeightOf(HWND window)
     GetWindowRect(window, &rect);
     return rect.bottom - rect.top;
 }
-
-/// A control's device context, with the control's font selected.
-class ControlContext
-{
-public:
-    explicit ControlContext(HWND control)
-        : m_control(control), m_context(GetDC(control)),
-          m_previousFont(SelectObject(m_context, std::bit_cast<HFONT>(SendMessageW(control, WM_GETFONT, 0, 0))))
-    {
-    }
-    ControlContext(const ControlContext&) = delete;
-    ControlContext& operator=(const ControlContext&) = delete;
-    ~ControlContext()
-    {
-        SelectObject(m_context, m_previousFont);
-        ReleaseDC(m_control, m_context);
-    }
-
-    HDC Get() const { return m_context; }
-
-private:
-    HWND m_control;
-    HDC m_context;
-    HGDIOBJ m_previousFont;
-};
 
 /// The height that a static control needs to show its text in its width.
 LONG NeededHeight(HWND control, const std::wstring& text)
@@ -142,7 +135,7 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
         OnCommand(LOWORD(wParam), HIWORD(wParam));
         return TRUE;
     case WM_NOTIFY:
-        SetWindowLongPtrW(m_window, DWLP_MSGRESULT, OnNotify(*std::bit_cast<const NMHDR*>(lParam)));
+        SetWindowLongPtrW(m_window, DWLP_MSGRESULT, HandleNotification(*std::bit_cast<const NMHDR*>(lParam)));
         return TRUE;
     case WM_CONTEXTMENU:
         return OnContextMenu(std::bit_cast<HWND>(wParam), {GET_X_LPARAM(lParam), GET_Y_LPARAM(lParam)}) ? TRUE : FALSE;
@@ -161,6 +154,7 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
         return TRUE;
     }
     case WM_DESTROY:
+        OnClose();
         RememberSize();
         return TRUE;
     default:
@@ -168,22 +162,41 @@ INT_PTR Dialog::Handle(UINT message, WPARAM wParam, LPARAM lParam)
     }
 }
 
+LRESULT Dialog::HandleNotification(const NMHDR& notification)
+{
+    const auto* const header = &notification;
+    if (notification.code == NM_CUSTOMDRAW && m_palette.IsOwn() && IsPushButton(notification.hwndFrom))
+    {
+        return m_palette.DrawButton(*reinterpret_cast<const NMCUSTOMDRAW*>(header));
+    }
+    return OnNotify(notification);
+}
+
 void Dialog::OnOpen()
 {
-    ColorCheckBoxes();
+    ColorControls();
     OnInit();
-    WatchKeys();
+    const Room room = RoomForMessage();
+    if (room.needed > room.most)
+    {
+        MakeMessageScroll();
+    }
+    WatchControls();
     m_layout = Layout(m_window, Rules());
     const SIZE size = (m_name != nullptr ? Settings::WindowSize(m_name) : std::nullopt).value_or(SIZE{});
     const LONG smallest = m_layout.SmallestWindow().y;
     const RECT work = WorkArea();
     const LONG height = std::max(std::min<LONG>(m_layout.ToPixels(size.cy), work.bottom - work.top), smallest);
-    const LONG room = ShowWholeMessage();
-    Resize(m_layout.ToPixels(size.cx), height + room);
+    const LONG more = std::max<LONG>(std::min(room.needed, room.most), 0);
+    if (more > 0)
+    {
+        m_layout.MakeRoom(Item(IDC_MESSAGE), more);
+    }
+    Resize(m_layout.ToPixels(size.cx), height + more);
     m_roomForMessage = m_layout.FromPixels(HeightOf(m_window) - height);
 }
 
-void Dialog::WatchKeys()
+void Dialog::WatchControls()
 {
     for (HWND control = GetWindow(m_window, GW_CHILD); control != nullptr; control = GetWindow(control, GW_HWNDNEXT))
     {
@@ -200,41 +213,69 @@ LRESULT CALLBACK Dialog::ControlProcedure(HWND control, UINT message, WPARAM wPa
         self.m_usedKey = false;
         Completes([&] { self.m_usedKey = self.OnKey(wParam); });
     }
+    if (message == WM_MOUSEMOVE)
+    {
+        Completes([&] { self.OnMouseMove(GetDlgCtrlID(control)); });
+    }
+    // The headings of a list ask the list how to draw.
+    if (message == WM_NOTIFY && self.m_palette.IsOwn() && std::bit_cast<const NMHDR*>(lParam)->code == NM_CUSTOMDRAW)
+    {
+        return self.m_palette.DrawHeading(*std::bit_cast<const NMCUSTOMDRAW*>(lParam));
+    }
     const bool isOfUsedKey = (message == WM_KEYDOWN || message == WM_CHAR) && self.m_usedKey;
+    self.m_usedKey = self.m_usedKey && message != WM_CHAR; // a key has one character
     return isOfUsedKey ? 0 : DefSubclassProc(control, message, wParam, lParam);
 }
 
-void Dialog::ColorCheckBoxes() const
+void Dialog::ColorControls() const
 {
-    if (!m_palette.HasOwnText())
+    if (m_palette.IsDark())
     {
-        return;
+        DarkenTitle(m_window);
     }
     for (HWND control = GetWindow(m_window, GW_CHILD); control != nullptr; control = GetWindow(control, GW_HWNDNEXT))
     {
-        if (IsCheckBox(control))
+        const bool isCheckBox = IsOfClass(control, WC_BUTTONW) && !IsPushButton(control);
+        if ((isCheckBox && m_palette.HasOwnText()) || (IsOfClass(control, WC_COMBOBOXW) && m_palette.IsOwn()))
         {
-            SetWindowTheme(control, L" ", L" "); // a theme would draw their texts in its own colour
+            SetWindowTheme(control, L" ", L" ");
+        }
+        else if (m_palette.IsDark() && (IsOfClass(control, WC_LISTVIEWW) || IsOfClass(control, WC_EDITW)))
+        {
+            SetWindowTheme(control, L"DarkMode_Explorer", nullptr); // for the scroll bars
         }
     }
 }
 
-LONG Dialog::ShowWholeMessage()
+Dialog::Room Dialog::RoomForMessage() const
 {
     const HWND message = Item(IDC_MESSAGE);
     if (message == nullptr)
     {
-        return 0;
+        return {};
     }
     const RECT work = WorkArea();
-    const LONG most = (work.bottom - work.top) * 9 / 10 - HeightOf(m_window);
-    const LONG more = std::min(NeededHeight(message, GetText(IDC_MESSAGE)) - HeightOf(message), most);
-    if (more <= 0)
-    {
-        return 0;
-    }
-    m_layout.MakeRoom(message, more);
-    return more;
+    return {NeededHeight(message, GetText(IDC_MESSAGE)) - HeightOf(message),
+            (work.bottom - work.top) * 9 / 10 - HeightOf(m_window)};
+}
+
+void Dialog::MakeMessageScroll() const
+{
+    const HWND label = Item(IDC_MESSAGE);
+    RECT place{};
+    GetWindowRect(label, &place);
+    MapWindowPoints(nullptr, m_window, reinterpret_cast<POINT*>(&place), 2);
+    const std::wstring text = WithFieldLineEnds(GetText(IDC_MESSAGE));
+    const HWND field =
+        CreateWindowExW(0, WC_EDITW, text.c_str(),
+                        WS_CHILD | WS_VISIBLE | WS_TABSTOP | WS_VSCROLL | ES_MULTILINE | ES_READONLY | ES_AUTOVSCROLL,
+                        place.left, place.top, place.right - place.left, place.bottom - place.top, m_window,
+                        std::bit_cast<HMENU>(std::intptr_t{IDC_MESSAGE}), ThisModule(), nullptr);
+    SendMessageW(field, WM_SETFONT, static_cast<WPARAM>(SendMessageW(label, WM_GETFONT, 0, 0)), FALSE);
+    SetWindowPos(field, label, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE | SWP_NOACTIVATE);
+    SetWindowLongPtrW(label, GWLP_ID, -1);
+    SetWindowTextW(label, Text(IDS_MESSAGE).c_str());
+    SetWindowPos(label, nullptr, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOZORDER | SWP_NOACTIVATE); // only for screen readers
 }
 
 RECT Dialog::WorkArea() const

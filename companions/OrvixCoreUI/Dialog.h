@@ -11,7 +11,8 @@
 #include <string>
 
 /// A modal dialog from a template of this library. It can be resized, but not below the size of its template. When its
-/// message (IDC_MESSAGE) needs more room than the template has, the dialog is higher.
+/// message (IDC_MESSAGE) needs more room than the template has, the dialog is higher. A message for which the monitor
+/// is too small becomes a field that scrolls.
 class Dialog
 {
 public:
@@ -54,11 +55,20 @@ protected:
     /// Returns whether the control has a menu.
     virtual bool OnContextMenu(HWND, POINT) { return false; }
 
+    /// The mouse has moved over a control.
+    virtual void OnMouseMove(int) {}
+
     /// The dialog has a new size, and the controls have followed it.
     virtual void OnSize() {}
 
+    /// The dialog is about to be destroyed.
+    virtual void OnClose() {}
+
     /// Closes the dialog; `Run` returns `result`.
     void End(std::int32_t result);
+
+    /// The name under which settings of this dialog are remembered; null when they are not.
+    const wchar_t* SettingsName() const { return m_name; }
 
     const Palette& Colors() const { return m_palette; }
     HWND Window() const { return m_window; }
@@ -86,11 +96,22 @@ private:
                                              DWORD_PTR dialog) noexcept;
 
     void OnOpen();
-    void WatchKeys();
-    void ColorCheckBoxes() const;
+    LRESULT HandleNotification(const NMHDR& notification);
+    void WatchControls();
 
-    /// Makes the message as high as it needs. Returns by how many pixels the dialog gets higher.
-    LONG ShowWholeMessage();
+    /// Removes the theme where it would draw in the system's colours instead of the host's.
+    void ColorControls() const;
+
+    /// By how many pixels the message needs more room than it has; `most` is how many it gets.
+    struct Room
+    {
+        LONG needed;
+        LONG most;
+    };
+    Room RoomForMessage() const;
+
+    /// Replaces the label of the message by a field that scrolls, and names the field for screen readers.
+    void MakeMessageScroll() const;
     RECT WorkArea() const;
 
     /// Gives the dialog a size in pixels and keeps its centre, as far as the monitor allows.

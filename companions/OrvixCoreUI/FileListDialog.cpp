@@ -5,12 +5,18 @@
 #include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixFileListDialogParams.h"
+#include "OrvixOperation.h"
 #include "Settings.h"
 #include "Texts.h"
 #include "UpperCase.h"
 #include "resource.h"
 
+#include <shellapi.h>
+
+#include <algorithm>
+#include <iterator>
 #include <string_view>
+#include <utility>
 
 namespace
 {
@@ -29,6 +35,17 @@ constexpr Layout::Rule FileListRules[] = {{IDC_MESSAGE, Layout::GrowX},
                                           {IDC_REMEMBER, Layout::MoveY},
                                           {IDOK, Layout::MoveX | Layout::MoveY},
                                           {IDCANCEL, Layout::MoveX | Layout::MoveY}};
+
+/// What the OK button says for an operation.
+constexpr struct
+{
+    std::uint32_t operation; ///< of `OrvixOperation`
+    UINT words;
+} Actions[] = {{OrvixOperation::CheckIn, IDS_OK_CHECK_IN},
+               {OrvixOperation::Add, IDS_OK_ADD},
+               {OrvixOperation::GetLatest, IDS_OK_GET_LATEST},
+               {OrvixOperation::CheckOut, IDS_OK_CHECK_OUT},
+               {OrvixOperation::UndoCheckOut, IDS_OK_UNDO}};
 
 /// A file's state, as a cell shows it. The disk is not asked: with many files on a network share that takes long.
 std::wstring StateInWords(unsigned long flags)
@@ -82,7 +99,14 @@ void FileListDialog::OnInit()
     SendDlgItemMessageW(Window(), IDC_COMMENT, EM_SETLIMITTEXT, 0, 0); // no limit
     SetText(IDC_COMMENT, m_params.GetComment());
     FillList();
-    ShowRecentComments();
+    if (TakesComment())
+    {
+        ShowRecentComments();
+    }
+    else
+    {
+        HideComment();
+    }
     SetText(IDC_OPTION,
             Text(Has(OrvixDialogOption::OfferKeepCheckedOut) ? IDS_KEEP_CHECKED_OUT : IDS_GET_LATEST).c_str());
     InitBox(IDC_OPTION, OffersOption(), OrvixDialogOption::OptionChecked);
@@ -132,6 +156,10 @@ void FileListDialog::OnCommand(int control, int notification)
         }
         break;
     case IDOK:
+        if (m_files.NumChecked() == 0) // keys may reach a disabled button
+        {
+            return;
+        }
         StoreOptions();
         StoreChoice();
         End(OrvixDialogResult::Confirmed);
@@ -147,9 +175,25 @@ void FileListDialog::OnCommand(int control, int notification)
     ShowCount();
 }
 
+void FileListDialog::OnMouseMove(int control)
+{
+    if (control == IDC_LIST)
+    {
+        m_files.OnMouseMove();
+    }
+}
+
 LRESULT FileListDialog::OnNotify(const NMHDR& notification)
 {
+    const auto* const header = &notification;
     const LRESULT result = m_files.Handle(notification);
+    if (notification.code == NM_DBLCLK)
+    {
+        if (const auto row = m_files.RowOf(*reinterpret_cast<const NMITEMACTIVATE*>(header)))
+        {
+            ShowProperties(*row);
+        }
+    }
     if (notification.code == LVN_KEYDOWN || notification.code == NM_CLICK || notification.code == NM_DBLCLK)
     {
         ShowCount();
@@ -163,22 +207,33 @@ bool FileListDialog::OnContextMenu(HWND control, POINT point)
     {
         return false;
     }
-    m_files.ShowMenu(point);
+    if (m_files.ShowMenu(point, Text(IDS_PROPERTIES)))
+    {
+        if (const auto row = m_files.Selected())
+        {
+            ShowProperties(*row);
+        }
+    }
     return true;
 }
 
 void FileListDialog::FillList()
 {
-    m_files = TableView(Item(IDC_LIST), Colors(), EntriesCanBeCleared());
+    m_images = FileImages(GetDpiForWindow(Window()));
+    m_files = TableView(Item(IDC_LIST), Colors(), SettingsName(), EntriesCanBeCleared());
+    m_files.UseImages(m_images.List());
     m_files.AddColumn(Text(IDS_NAME), 28);
-    m_files.AddColumn(Text(IDS_FOLDER), 34);
+    m_files.AddColumn(Text(IDS_FOLDER), 34, TableView::Content::Path);
     m_files.AddColumn(Text(IDS_STATE), 38);
     for (OrvixFileEntry* entry : m_entries)
     {
-        m_files.AddRow(CellsOf(*entry),
-                       !EntriesCanBeCleared() || (entry->GetFlagsIn() & OrvixFileSelection::Selected) != 0);
+        std::vector<std::wstring> cells = CellsOf(*entry);
+        std::vector<int> images = {m_images.OfFile(cells.front()), -1, m_images.OfState(entry->GetFlagsOut())};
+        m_files.AddRow(std::move(cells),
+                       !EntriesCanBeCleared() || (entry->GetFlagsIn() & OrvixFileSelection::Selected) != 0,
+                       std::move(images));
     }
-    m_files.Refresh();
+    m_files.Open();
     if (!EntriesCanBeCleared())
     {
         Hide(IDC_SELECT_ALL);
@@ -196,7 +251,71 @@ void FileListDialog::ShowCount() const
     {
         SetText(IDC_COUNT, count.c_str());
     }
+    const std::wstring action = Action();
+    if (action != GetText(IDOK))
+    {
+        SetText(IDOK, action.c_str());
+    }
     Enable(IDOK, m_files.NumChecked() > 0);
+}
+
+std::wstring FileListDialog::Action() const
+{
+    const std::size_t number = m_files.NumChecked();
+    const std::wstring files = number == 1 ? Text(IDS_ONE_FILE) : FormatText(IDS_FILES, {number});
+    const auto* const named = std::find_if(std::begin(Actions), std::end(Actions), [this](const auto& action) {
+        return Has(OrvixDialogOption::ForOperation(action.operation));
+    });
+    return FormatText(named != std::end(Actions) ? named->words : IDS_OK_FILES,
+                      {reinterpret_cast<DWORD_PTR>(files.c_str())});
+}
+
+bool FileListDialog::TakesComment() const
+{
+    constexpr std::uint32_t WithComment =
+        OrvixDialogOption::ForOperation(OrvixOperation::CheckIn | OrvixOperation::Add | OrvixOperation::CheckOut);
+    return Has(WithComment) || !Has(OrvixDialogOption::OperationMask);
+}
+
+RECT FileListDialog::PlaceOf(int control) const
+{
+    RECT place{};
+    GetWindowRect(Item(control), &place);
+    MapWindowPoints(nullptr, Window(), reinterpret_cast<POINT*>(&place), 2);
+    return place;
+}
+
+/// The list takes the room of the comment.
+void FileListDialog::HideComment() const
+{
+    const LONG room = PlaceOf(IDC_OPTION).top - PlaceOf(IDC_COMMENT_LABEL).top;
+    for (const int control : {IDC_COMMENT_LABEL, IDC_COMMENT, IDC_RECENT_LABEL, IDC_RECENT})
+    {
+        Hide(control);
+    }
+    const RECT list = PlaceOf(IDC_LIST);
+    SetWindowPos(Item(IDC_LIST), nullptr, 0, 0, list.right - list.left, list.bottom - list.top + room,
+                 SWP_NOMOVE | SWP_NOZORDER);
+    for (const int control : {IDC_SELECT_ALL, IDC_SELECT_NONE, IDC_COUNT})
+    {
+        const RECT place = PlaceOf(control);
+        SetWindowPos(Item(control), nullptr, place.left, place.top + room, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
+    }
+}
+
+void FileListDialog::ShowProperties(std::size_t row) const
+{
+    SHELLEXECUTEINFOW request{};
+    request.cbSize = sizeof request;
+    request.fMask = SEE_MASK_INVOKEIDLIST | SEE_MASK_FLAG_NO_UI;
+    request.hwnd = Window();
+    request.lpVerb = L"properties";
+    request.lpFile = m_entries[row]->GetFile();
+    request.nShow = SW_SHOWNORMAL;
+    if (ShellExecuteExW(&request) == FALSE)
+    {
+        MessageBeep(MB_ICONWARNING); // the file is not on the disk
+    }
 }
 
 void FileListDialog::ShowRecentComments()
@@ -253,10 +372,10 @@ void FileListDialog::StoreOptions() const
 
 void FileListDialog::StoreChoice() const
 {
-    std::wstring comment = GetText(IDC_COMMENT);
-    comment.erase(comment.find_last_not_of(L" \t\r\n") + 1);
-    m_params.SetComment(comment.c_str());
-    Settings::AddRecentComment(comment);
+    if (TakesComment())
+    {
+        StoreComment();
+    }
     for (std::size_t row = 0; OrvixFileEntry * entry : m_entries)
     {
         const unsigned long flags = entry->GetFlagsOut();
@@ -264,6 +383,14 @@ void FileListDialog::StoreChoice() const
                                                   : flags & ~OrvixFileSelection::Confirmed);
         ++row;
     }
+}
+
+void FileListDialog::StoreComment() const
+{
+    std::wstring comment = GetText(IDC_COMMENT);
+    comment.erase(comment.find_last_not_of(L" \t\r\n") + 1);
+    m_params.SetComment(comment.c_str());
+    Settings::AddRecentComment(comment);
 }
 
 bool FileListDialog::Has(std::uint32_t options) const

@@ -18,6 +18,7 @@ public:
 private:
     std::span<const Layout::Rule> Rules() const override;
     void OnInit() override;
+    int FirstFocus() const override { return IDYES; } // also when the message is a field that scrolls
     void OnCommand(int control, int notification) override;
     void ArrangeButtons() const;
     bool Has(std::uint32_t option) const { return (m_options & option) != 0; }

@@ -63,14 +63,14 @@ std::span<const Layout::Rule> PromptEditorDialog::Rules() const
 
 void PromptEditorDialog::OnInit()
 {
-    m_list = TableView(Item(IDC_LIST), Colors(), false);
+    m_list = TableView(Item(IDC_LIST), Colors(), SettingsName(), false);
     m_list.AddColumn(Text(IDS_PROMPT), 70);
     m_list.AddColumn(Text(IDS_ANSWER), 30);
     for (unsigned int row = 0; row < m_actions.size(); ++row)
     {
         m_list.AddRow({OneLine(m_prompts.GetPromptText(row)), AnswerInWords(row)}, false);
     }
-    m_list.Refresh();
+    m_list.Open();
     ShowSelected();
 }
 

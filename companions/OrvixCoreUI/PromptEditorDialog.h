@@ -21,7 +21,9 @@ private:
     void OnCommand(int control, int notification) override;
     LRESULT OnNotify(const NMHDR& notification) override;
     bool OnContextMenu(HWND control, POINT point) override;
+    void OnMouseMove(int) override { m_list.OnMouseMove(); }
     void OnSize() override { m_list.FitColumns(); }
+    void OnClose() override { m_list.Close(); }
 
     std::wstring AnswerInWords(unsigned int row) const;
     bool IsOffered(unsigned int row, std::size_t answer) const;

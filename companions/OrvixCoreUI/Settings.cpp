@@ -43,6 +43,35 @@ void Settings::StoreWindowSize(const std::wstring& dialog, SIZE size)
     StoreNumber(dialog + L"Height", size.cy);
 }
 
+Settings::ListView Settings::StoredListView(const std::wstring& dialog, std::size_t columns)
+{
+    ListView view;
+    for (std::size_t column = 1; column <= columns; ++column)
+    {
+        if (const auto share = Number(dialog + L"Column" + std::to_wstring(column)))
+        {
+            view.shares.push_back(static_cast<int>(*share));
+        }
+    }
+    if (view.shares.size() != columns)
+    {
+        view.shares.clear();
+    }
+    view.sortColumn = static_cast<int>(Number(dialog + L"SortColumn").value_or(0));
+    view.descending = Number(dialog + L"SortDescending").value_or(0) == 1;
+    return view;
+}
+
+void Settings::StoreListView(const std::wstring& dialog, const ListView& view)
+{
+    for (std::size_t column = 0; column < view.shares.size(); ++column)
+    {
+        StoreNumber(dialog + L"Column" + std::to_wstring(column + 1), view.shares[column]);
+    }
+    StoreNumber(dialog + L"SortColumn", view.sortColumn);
+    StoreNumber(dialog + L"SortDescending", view.descending ? 1 : 0);
+}
+
 std::vector<std::wstring> Settings::RecentComments()
 {
     DWORD size = 0;

@@ -21,6 +21,18 @@ constexpr std::size_t MaxRecentComments = 20;
 std::optional<SIZE> WindowSize(const std::wstring& dialog);
 void StoreWindowSize(const std::wstring& dialog, SIZE size);
 
+/// How the user left a list.
+struct ListView
+{
+    std::vector<int> shares; ///< the widths of the columns, in thousandths of the whole; empty when none are stored
+    int sortColumn = 0;      ///< counted from 1; 0 for the order of the host
+    bool descending = false;
+};
+
+/// What is stored about the list of a dialog, which has `columns` columns.
+ListView StoredListView(const std::wstring& dialog, std::size_t columns);
+void StoreListView(const std::wstring& dialog, const ListView& view);
+
 /// The comments of confirmed dialogs, the latest first, at most `MaxRecentComments`.
 std::vector<std::wstring> RecentComments();
 

@@ -33,11 +33,23 @@
 #define IDS_COUNT_SHOWN 5
 #define IDS_SORT_BY 6
 
+#define IDS_PROPERTIES 7
+#define IDS_MESSAGE 8
+
 #define IDS_NAME 10
 #define IDS_FOLDER 11
 #define IDS_STATE 12
 #define IDS_PROMPT 13
 #define IDS_ANSWER 14
+
+#define IDS_ONE_FILE 20
+#define IDS_FILES 21
+#define IDS_OK_FILES 22
+#define IDS_OK_CHECK_IN 23
+#define IDS_OK_ADD 24
+#define IDS_OK_GET_LATEST 25
+#define IDS_OK_CHECK_OUT 26
+#define IDS_OK_UNDO 27
 
 #define IDS_ASK 30
 #define IDS_YES 31

@@ -79,6 +79,12 @@ const std::vector<std::string> PinnedNames = {
     PIN(OrvixDialogOption::OptionChecked, std::uint32_t{0x10}),
     PIN(OrvixDialogOption::OfferRemember, std::uint32_t{0x40}),
     PIN(OrvixDialogOption::RememberChecked, std::uint32_t{0x80}),
+    PIN(OrvixDialogOption::OperationMask, std::uint32_t{0x3E00}),
+    PIN(OrvixDialogOption::ForOperation(OrvixOperation::CheckIn), std::uint32_t{0x200}),
+    PIN(OrvixDialogOption::ForOperation(OrvixOperation::Add), std::uint32_t{0x400}),
+    PIN(OrvixDialogOption::ForOperation(OrvixOperation::GetLatest), std::uint32_t{0x800}),
+    PIN(OrvixDialogOption::ForOperation(OrvixOperation::CheckOut), std::uint32_t{0x1000}),
+    PIN(OrvixDialogOption::ForOperation(OrvixOperation::UndoCheckOut), std::uint32_t{0x2000}),
     PIN(OrvixDialogResult::Cancelled, std::int32_t{0}),
     PIN(OrvixDialogResult::Confirmed, std::int32_t{1}),
 

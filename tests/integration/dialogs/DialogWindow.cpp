@@ -38,7 +38,11 @@ std::wstring NameOf(HWND control)
 {
     const HWND label = GetWindow(control, GW_HWNDPREV);
     std::wstring name;
-    if (IsOfClass(control, L"Button") || IsOfClass(control, L"Static"))
+    if (GetDlgCtrlID(control) == IDOK)
+    {
+        name = L"OK";
+    }
+    else if (IsOfClass(control, L"Button") || IsOfClass(control, L"Static"))
     {
         name = TextOf(control);
     }
@@ -120,6 +124,20 @@ void DialogWindow::Type(const std::wstring& text) const
 void DialogWindow::PressAlt(wchar_t accessKey) const
 {
     Post(FocusWindow(), WM_SYSCHAR, accessKey, AltIsDown);
+}
+
+void DialogWindow::PressControl(WORD key) const
+{
+    const DWORD thread = GetWindowThreadProcessId(m_window, nullptr);
+    AttachThreadInput(GetCurrentThreadId(), thread, TRUE); // the threads share the state of the keys
+    BYTE keys[256] = {};
+    GetKeyboardState(keys);
+    keys[VK_CONTROL] = 0x80;
+    SetKeyboardState(keys);
+    Press(key);
+    keys[VK_CONTROL] = 0;
+    SetKeyboardState(keys);
+    AttachThreadInput(GetCurrentThreadId(), thread, FALSE);
 }
 
 void DialogWindow::PressAltDown() const
@@ -340,9 +358,56 @@ void DialogWindow::ChooseFromMenu(const std::wstring& name, int item) const
 void DialogWindow::ClickCheckBox(const std::wstring& list, int row) const
 {
     RECT icon{};
-    icon.left = LVIR_LABEL;
+    icon.left = LVIR_ICON; // the check box is before it
     SendMessageW(Control(list), LVM_GETITEMRECT, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&icon));
     ClickAt(Control(list), icon.left / 2, (icon.top + icon.bottom) / 2);
+}
+
+void DialogWindow::DoubleClickRow(const std::wstring& list, int row) const
+{
+    RECT label{};
+    label.left = LVIR_LABEL;
+    SendMessageW(Control(list), LVM_GETITEMRECT, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&label));
+    const LPARAM point = MAKELPARAM(label.left + 5, (label.top + label.bottom) / 2);
+    ClickAt(Control(list), label.left + 5, (label.top + label.bottom) / 2);
+    PostMessageW(Control(list), WM_LBUTTONDBLCLK, MK_LBUTTON, point);
+    Post(Control(list), WM_LBUTTONUP, 0, point);
+}
+
+void DialogWindow::PointAt(const std::wstring& list, int row, int column) const
+{
+    RECT cell{};
+    cell.left = LVIR_LABEL;
+    cell.top = column;
+    SendMessageW(Control(list), LVM_GETSUBITEMRECT, static_cast<WPARAM>(row), reinterpret_cast<LPARAM>(&cell));
+    POINT point{cell.left + 10, (cell.top + cell.bottom) / 2};
+    ClientToScreen(Control(list), &point);
+    SetCursorPos(point.x, point.y);
+}
+
+std::wstring DialogWindow::ToolTip() const
+{
+    struct Search
+    {
+        DWORD thread;
+        HWND found;
+    };
+    Search search{GetWindowThreadProcessId(m_window, nullptr), nullptr};
+    for (int i = 0; i < 40 && search.found == nullptr; ++i)
+    {
+        Sleep(50);
+        EnumThreadWindows(
+            search.thread,
+            [](HWND window, LPARAM parameter) -> BOOL {
+                if (IsWindowVisible(window) && IsOfClass(window, TOOLTIPS_CLASSW))
+                {
+                    std::bit_cast<Search*>(parameter)->found = window;
+                }
+                return TRUE;
+            },
+            reinterpret_cast<LPARAM>(&search));
+    }
+    return search.found != nullptr ? TextOf(search.found) : L"";
 }
 
 HWND DialogWindow::FocusWindow() const

@@ -7,6 +7,7 @@
 
 /// A dialog of this process, operated as a user does, by keyboard and mouse messages. The name of a control is what a
 /// screen reader says: the text of a button, the label before any other control, without the mark of the access key.
+/// Only the button that confirms is always called OK; its text says on what.
 /// Throws std::runtime_error when there is no such control.
 class DialogWindow
 {
@@ -21,6 +22,8 @@ public:
     void Press(WORD key) const;
     void Type(const std::wstring& text) const;
     void PressAlt(wchar_t accessKey) const;
+    /// Presses a key while the Ctrl key is down.
+    void PressControl(WORD key) const;
     /// Opens the drop-down list with the focus.
     void PressAltDown() const;
     std::wstring Focused() const;
@@ -71,6 +74,11 @@ public:
     /// Opens the context menu of a control by keyboard and chooses an item; the first is 1.
     void ChooseFromMenu(const std::wstring& name, int item) const;
     void ClickCheckBox(const std::wstring& list, int row) const;
+    void DoubleClickRow(const std::wstring& list, int row) const;
+    /// Moves the mouse over a cell.
+    void PointAt(const std::wstring& list, int row, int column) const;
+    /// The text of the tool tip that is shown; empty when none appears within a second or two.
+    std::wstring ToolTip() const;
 
 private:
     HWND FocusWindow() const;

@@ -8,6 +8,7 @@
 #include <commctrl.h>
 #include <windows.h>
 
+#include <algorithm>
 #include <atomic>
 #include <bit>
 #include <utility>
@@ -91,7 +92,9 @@ TEST_F(FileListDialog, IsHighEnoughForItsMessage)
         Heights heights{};
         m_params.SetMessage(message.c_str());
         ShowFileList([&](const DialogWindow& dialog) {
-            const RECT place = dialog.Place(message);
+            const bool scrolls = dialog.Has(L"Message:");
+            const RECT place = dialog.Place(scrolls ? L"Message:" : message);
+            EXPECT_EQ(dialog.Text(scrolls ? L"Message:" : message).substr(0, 1), L"1");
             const RECT list = dialog.Place(List);
             EXPECT_LE(place.bottom, dialog.Place(L"Filter:").top);
             RECT window{};
@@ -123,6 +126,209 @@ TEST_F(FileListDialog, IsHighEnoughForItsMessage)
     EXPECT_EQ(twenty.list, one.list);
     EXPECT_EQ(heightsWith(lines(1)).window, one.window) << "the room for a message is not remembered";
     EXPECT_EQ(heightsWith(lines(500)).list, one.list) << "a message gets no more room than the monitor has";
+}
+
+TEST_F(FileListDialog, ScrollsAMessageForWhichTheMonitorHasNoRoom)
+{
+    AddFile(L"a");
+    std::wstring message = L"first";
+    for (int i = 0; i < 300; ++i)
+    {
+        message += L"\nline";
+    }
+    m_params.SetMessage((message + L"\nlast").c_str());
+    ShowFileList([](const DialogWindow& dialog) {
+        const HWND field = dialog.Control(L"Message:");
+        EXPECT_EQ(dialog.Text(L"Message:").substr(0, 7), L"first\r\n");
+        EXPECT_TRUE(dialog.Text(L"Message:").ends_with(L"line\r\nlast"));
+        EXPECT_NE(GetWindowLongW(field, GWL_STYLE) & WS_VSCROLL, 0);
+        EXPECT_EQ(dialog.Focused(), List);
+        EXPECT_EQ(dialog.TabStops().front(), L"Message:");
+        dialog.Focus(L"Message:");
+        dialog.Press(VK_NEXT);
+        EXPECT_GT(SendMessageW(field, EM_GETFIRSTVISIBLELINE, 0, 0), 10);
+        RECT work{};
+        SystemParametersInfoW(SPI_GETWORKAREA, 0, &work, 0);
+        RECT window{};
+        GetWindowRect(dialog.Handle(), &window);
+        EXPECT_LE(window.bottom, work.bottom);
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, SaysWhatItsButtonDoesAndAsksForACommentWhereTheOperationTakesOne)
+{
+    AddFile(L"a");
+    AddFile(L"b");
+    struct Case
+    {
+        std::uint32_t operation;
+        const wchar_t* two;
+        const wchar_t* one;
+        bool comment;
+    };
+    const Case cases[] = {
+        {0, L"OK (2 files)", L"OK (1 file)", true},
+        {OrvixOperation::CheckIn, L"Check in 2 files", L"Check in 1 file", true},
+        {OrvixOperation::Add | OrvixOperation::Notify, L"Add 2 files", L"Add 1 file", true},
+        {OrvixOperation::GetLatest, L"Get 2 files", L"Get 1 file", false},
+        {OrvixOperation::CheckOut, L"Check out 2 files", L"Check out 1 file", true},
+        {OrvixOperation::UndoCheckOut, L"Undo check-out of 2 files", L"Undo check-out of 1 file", false}};
+    LONG heightWithComment = 0;
+    for (const Case& expected : cases)
+    {
+        m_params.SetComment(L"before");
+        const auto options =
+            OrvixDialogOption::EntriesCanBeCleared | OrvixDialogOption::ForOperation(expected.operation);
+        ShowFileList(options, [&](const DialogWindow& dialog) {
+            EXPECT_EQ(dialog.Text(L"OK"), expected.two);
+            dialog.ClickCheckBox(List, 1);
+            EXPECT_EQ(dialog.Text(L"OK"), expected.one);
+            EXPECT_EQ(dialog.Has(L"Comment:"), expected.comment);
+            EXPECT_EQ(dialog.Has(L"Recent comments:"), expected.comment);
+            const RECT list = dialog.Place(List);
+            EXPECT_LT(list.bottom, dialog.Place(L"Check all").top);
+            EXPECT_LT(dialog.Place(L"Check all").bottom, dialog.Place(L"OK").top);
+            if (expected.comment)
+            {
+                heightWithComment = list.bottom - list.top;
+                SetWindowTextW(dialog.Control(L"Comment:"), L"after");
+            }
+            else
+            {
+                EXPECT_GT(list.bottom - list.top, heightWithComment + 80);
+            }
+            dialog.Click(L"OK");
+        });
+        EXPECT_STREQ(m_params.GetComment(), expected.comment ? L"after" : L"before");
+        EXPECT_EQ(m_params.GetOptions(), options);
+    }
+}
+
+TEST_F(FileListDialog, FiltersAfterControlFAndConfirmsAfterControlEnter)
+{
+    AddFile(L"bridge");
+    AddFile(L"church");
+    m_params.SetComment(L"");
+    EXPECT_EQ(ShowFileList([](const DialogWindow& dialog) {
+                  dialog.Type(L"c");
+                  EXPECT_EQ(dialog.NumRows(List), 2) << "text that is typed at once filters nothing";
+                  dialog.PressControl('F');
+                  EXPECT_EQ(dialog.Focused(), L"Filter:");
+                  dialog.Type(L"chu");
+                  EXPECT_EQ(dialog.NumRows(List), 1);
+                  dialog.Focus(L"Comment:");
+                  dialog.Type(L"done");
+                  dialog.PressControl(VK_RETURN);
+              }),
+              OrvixDialogResult::Confirmed);
+    EXPECT_STREQ(m_params.GetComment(), L"done");
+}
+
+/// Asks the dialog for the text of a cell, as the list does while it draws.
+std::wstring DrawnText(const DialogWindow& dialog, int row, int column)
+{
+    const HWND list = dialog.Control(List);
+    NMLVCUSTOMDRAW drawing{};
+    drawing.nmcd.hdr = {list, static_cast<UINT_PTR>(GetDlgCtrlID(list)), static_cast<UINT>(NM_CUSTOMDRAW)};
+    const auto notify = [&](void* notification) {
+        SendMessageW(dialog.Handle(), WM_NOTIFY, drawing.nmcd.hdr.idFrom, std::bit_cast<LPARAM>(notification));
+    };
+    drawing.nmcd.dwDrawStage = CDDS_PREPAINT;
+    notify(&drawing);
+    NMLVDISPINFOW question{};
+    question.hdr = drawing.nmcd.hdr;
+    question.hdr.code = static_cast<UINT>(LVN_GETDISPINFOW);
+    question.item.mask = LVIF_TEXT;
+    question.item.iItem = row;
+    question.item.iSubItem = column;
+    notify(&question);
+    drawing.nmcd.dwDrawStage = CDDS_POSTPAINT;
+    notify(&drawing);
+    return question.item.pszText;
+}
+
+TEST_F(FileListDialog, ShortensPathsInTheMiddleAndShowsThemWholeInAToolTip)
+{
+    const std::wstring folder = L"C:\\country\\with\\a\\long\\name\\and\\a\\town\\with\\a\\longer\\one\\models";
+    AddFile((folder + L"\\bridge.model").c_str());
+    AddFile(L"C:\\town\\church.model");
+    ShowFileList([&](const DialogWindow& dialog) {
+        const std::wstring drawn = DrawnText(dialog, 0, 1);
+        EXPECT_LT(drawn.size(), folder.size());
+        EXPECT_EQ(drawn.substr(0, 3), L"C:\\");
+        EXPECT_NE(drawn.find(L"..."), std::wstring::npos);
+        EXPECT_TRUE(drawn.ends_with(L"\\models")) << "the end of a path says more than its middle";
+        EXPECT_EQ(DrawnText(dialog, 1, 1), L"C:\\town");
+        EXPECT_EQ(dialog.Cell(List, 0, 1), folder) << "screen readers get the whole path";
+
+        dialog.PointAt(List, 0, 1);
+        EXPECT_EQ(dialog.ToolTip(), folder);
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, ShowsTheIconOfEachFileAndOfItsState)
+{
+    AddFile(L"a.txt", OrvixFileState::Controlled);
+    AddFile(L"b.txt", OrvixFileState::Controlled | OrvixFileState::CheckedOut);
+    AddFile(L"c.txt", OrvixFileState::Controlled);
+    ShowFileList([](const DialogWindow& dialog) {
+        const HWND list = dialog.Control(List);
+        const auto image = [list](int row, int column) {
+            LVITEMW item{};
+            item.mask = LVIF_IMAGE;
+            item.iItem = row;
+            item.iSubItem = column;
+            SendMessageW(list, LVM_GETITEMW, 0, reinterpret_cast<LPARAM>(&item));
+            return item.iImage;
+        };
+        EXPECT_GE(image(0, 0), 0) << "an icon for the type of file";
+        EXPECT_EQ(image(1, 0), image(0, 0));
+        EXPECT_EQ(image(0, 1), I_IMAGENONE);
+        EXPECT_GE(image(0, 2), 0) << "an icon for the state";
+        EXPECT_NE(image(1, 2), image(0, 2));
+        EXPECT_EQ(image(2, 2), image(0, 2));
+        auto* const images = std::bit_cast<HIMAGELIST>(SendMessageW(list, LVM_GETIMAGELIST, LVSIL_SMALL, 0));
+        EXPECT_GT(ImageList_GetImageCount(images), std::max(image(0, 0), image(1, 2)));
+        Cancel(dialog);
+    });
+}
+
+TEST_F(FileListDialog, RemembersTheWidthsOfItsColumnsAndItsOrder)
+{
+    AddFile(L"x\\b");
+    AddFile(L"y\\a");
+    const auto width = [](const DialogWindow& dialog, int column) {
+        return SendMessageW(dialog.Control(List), LVM_GETCOLUMNWIDTH, static_cast<WPARAM>(column), 0);
+    };
+    LRESULT narrow = 0;
+    ShowFileList([&](const DialogWindow& dialog) {
+        narrow = width(dialog, 0) / 2;
+        SendMessageW(dialog.Control(List), LVM_SETCOLUMNWIDTH, 1, width(dialog, 1) + narrow);
+        SendMessageW(dialog.Control(List), LVM_SETCOLUMNWIDTH, 0, narrow);
+        dialog.ClickHeading(List, 1);
+        dialog.ClickHeading(List, 1);
+        Cancel(dialog);
+    });
+    ShowFileList([&](const DialogWindow& dialog) {
+        EXPECT_NEAR(static_cast<double>(width(dialog, 0)), static_cast<double>(narrow), 3);
+        EXPECT_EQ(dialog.Column(List, 1), (Texts{L"y", L"x"}));
+        dialog.ClickHeading(List, 1);
+        EXPECT_EQ(dialog.Column(List, 1), (Texts{L"x", L"y"})) << "the next click reverses the order";
+        Cancel(dialog);
+    });
+    // What no version has stored.
+    const DWORD odd = 0xFFFFFFFF;
+    for (const wchar_t* name : {L"FileListColumn1", L"FileListSortColumn"})
+    {
+        RegSetKeyValueW(HKEY_CURRENT_USER, L"Software\\OrvixCore\\Dialogs", name, REG_DWORD, &odd, sizeof odd);
+    }
+    ShowFileList([&](const DialogWindow& dialog) {
+        EXPECT_NEAR(static_cast<double>(width(dialog, 0)), 2.0 * static_cast<double>(narrow), 4);
+        EXPECT_EQ(dialog.Column(List, 1), (Texts{L"x", L"y"})) << "the order of the host";
+        Cancel(dialog);
+    });
 }
 
 TEST_F(FileListDialog, KeepsItsHeightAfterAMessageForWhichTheMonitorHasNoRoom)
@@ -520,6 +726,7 @@ TEST_F(FileListDialog, StoresARecentCommentOfAnyLength)
     {
         longComment += std::wstring(80, L'x') + L"\r\n";
     }
+    longComment += L"end";
     m_params.SetComment(longComment.c_str());
     ShowFileList([](const DialogWindow& dialog) { dialog.Click(L"OK"); });
     m_params.SetComment(L"");

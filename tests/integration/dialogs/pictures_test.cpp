@@ -1,6 +1,7 @@
 #include "DialogsTest.h"
 #include "Files.h"
 #include "OrvixDialogOption.h"
+#include "OrvixOperation.h"
 #include "OrvixPrompt.h"
 #include "Picture.h"
 #include "TempFolder.h"
@@ -64,8 +65,14 @@ TEST_F(DialogPictures, OfTheFileList)
     AddFile(L"C:\\town\\textures\\brick.tex", State::NotControlled);
     AddFile(L"C:\\town\\textures\\slate.tex", State::Controlled | State::CheckedOut | State::OutOfDate);
     ShowFileList(OrvixDialogOption::EntriesCanBeCleared | OrvixDialogOption::OfferKeepCheckedOut |
-                     OrvixDialogOption::OfferRemember,
+                     OrvixDialogOption::OfferRemember | OrvixDialogOption::ForOperation(OrvixOperation::CheckIn),
                  TakePicture(L"file-list.png"));
+    m_host.colors = {{COLOR_BTNFACE, RGB(32, 32, 32)},    {COLOR_BTNTEXT, RGB(235, 235, 235)},
+                     {COLOR_WINDOW, RGB(24, 24, 24)},     {COLOR_WINDOWTEXT, RGB(235, 235, 235)},
+                     {COLOR_HIGHLIGHT, RGB(38, 79, 120)}, {COLOR_HIGHLIGHTTEXT, RGB(255, 255, 255)},
+                     {COLOR_GRAYTEXT, RGB(130, 130, 130)}};
+    ShowFileList(OrvixDialogOption::EntriesCanBeCleared | OrvixDialogOption::ForOperation(OrvixOperation::UndoCheckOut),
+                 TakePicture(L"file-list-dark.png"));
 }
 
 TEST_F(DialogPictures, OfThePromptEditor)

@@ -142,6 +142,23 @@ TEST_F(PromptDialog, IsHighEnoughForItsMessage)
     const LONG ten = heightOf(L"1\n2\n3\n4\n5\n6\n7\n8\n9\n10");
     const LONG twenty = heightOf(L"1\n2\n3\n4\n5\n6\n7\n8\n9\n10\n11\n12\n13\n14\n15\n16\n17\n18\n19\n20");
     EXPECT_NEAR(twenty, 2 * ten, 2);
+
+    std::wstring lines;
+    for (int i = 0; i < 300; ++i)
+    {
+        lines += L"line\n";
+    }
+    ShowPrompt(
+        0,
+        [](const DialogWindow& dialog) {
+            EXPECT_EQ(dialog.Focused(), L"Yes") << "not the field that scrolls";
+            dialog.Focus(L"Message:");
+            dialog.Press(VK_NEXT);
+            EXPECT_GT(SendMessageW(dialog.Control(L"Message:"), EM_GETFIRSTVISIBLELINE, 0, 0), 10);
+            EXPECT_LE(dialog.Place(L"Message:").bottom, dialog.Place(L"Yes").top);
+            dialog.Press(VK_RETURN);
+        },
+        OrvixPromptID::None, nullptr, lines);
 }
 
 } // namespace

@@ -58,6 +58,8 @@ TEST_F(DialogWindows, LetTabReachEveryControl)
         const Texts stops = dialog.TabStops();
         EXPECT_EQ(stops, (Texts{L"Filter:", L"Files:", L"Check all", L"Check none", L"Comment:", L"Keep checked out",
                                 L"Remember my answer", L"OK", L"Cancel"}));
+        EXPECT_EQ(dialog.Focused(), L"Files:");
+        dialog.Focus(stops.front());
         Texts walked;
         for (std::size_t i = 0; i < stops.size(); ++i)
         {
@@ -293,6 +295,52 @@ TEST_F(DialogWindows, HaveTheHostsColours)
         EXPECT_EQ(GetTextColor(context), 0x00405060U);
         ReleaseDC(dialog.Handle(), context);
         EXPECT_EQ(SendMessageW(dialog.Control(L"Files:"), LVM_GETBKCOLOR, 0, 0), 0x00708090);
+        dialog.Press(VK_ESCAPE);
+    });
+}
+
+/// How many pixels of an area of a window have a colour.
+int NumPixels(HWND window, const RECT& area, COLORREF color)
+{
+    RedrawWindow(window, nullptr, nullptr, RDW_INVALIDATE | RDW_UPDATENOW);
+    const HDC context = GetDC(window);
+    int number = 0;
+    for (int y = area.top; y < area.bottom; ++y)
+    {
+        for (int x = area.left; x < area.right; ++x)
+        {
+            number += GetPixel(context, x, y) == color ? 1 : 0;
+        }
+    }
+    ReleaseDC(window, context);
+    return number;
+}
+
+TEST_F(DialogWindows, DrawButtonsHeadingsAndSelectedRowsInTheHostsColours)
+{
+    constexpr COLORREF Face = 0x00302010;
+    constexpr COLORREF Selected = 0x00604020;
+    m_host.colors = {{COLOR_BTNFACE, Face},          {COLOR_BTNTEXT, 0x00F0F0F0}, {COLOR_WINDOW, 0x00201008},
+                     {COLOR_WINDOWTEXT, 0x00F0F0F0}, {COLOR_HIGHLIGHT, Selected}, {COLOR_HIGHLIGHTTEXT, 0x0000FFFF},
+                     {COLOR_GRAYTEXT, 0x00808080}};
+    ShowFileList(Everything, [&](const DialogWindow& dialog) {
+        const auto inside = [](HWND window) {
+            RECT area{};
+            GetClientRect(window, &area);
+            return area;
+        };
+        const auto mostOf = [](const RECT& area) { return (area.right - area.left) * (area.bottom - area.top) / 2; };
+        const HWND button = dialog.Control(L"Check all");
+        EXPECT_GT(NumPixels(button, inside(button), Face), mostOf(inside(button)));
+
+        const HWND list = dialog.Control(L"Files:");
+        const auto headings = std::bit_cast<HWND>(SendMessageW(list, LVM_GETHEADER, 0, 0));
+        EXPECT_GT(NumPixels(headings, inside(headings), Face), mostOf(inside(headings)));
+
+        RECT row{};
+        row.left = LVIR_LABEL;
+        SendMessageW(list, LVM_GETITEMRECT, 0, reinterpret_cast<LPARAM>(&row));
+        EXPECT_GT(NumPixels(list, row, Selected), mostOf(row)) << "the first row is selected";
         dialog.Press(VK_ESCAPE);
     });
 }
