@@ -1,5 +1,6 @@
 // An OrvixCoreUI.dll whose file-list dialog is answered by the environment variable ORVIX_TEST_ANSWER. It holds some of
-// these words: "yes" confirms, "clear" clears the first file, "keep" checks the option, "remember" stores the answers.
+// these words: "yes" confirms, "clear" clears the first file, "keep" checks the option, "remember" stores the answers,
+// and "slowly" takes a while to answer.
 
 #include "IOrvixCoreUI.h"
 #include "OrvixDialogOption.h"
@@ -30,6 +31,7 @@ public:
         const std::wstring answer = buffer;
         const auto says = [&](const wchar_t* word) { return answer.find(word) != std::wstring::npos; };
 
+        Sleep(says(L"slowly") ? 2500 : 0);
         OrvixFileList* list = params->GetOrvixFileList();
         for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
         {

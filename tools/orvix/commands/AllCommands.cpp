@@ -75,7 +75,7 @@ constexpr Command Table[] = {
     },
     {
         .name = "undo",
-        .description = "Give checked-out files back unchanged",
+        .description = "Undo check-outs and discard the changes",
         .examples = "  orvix undo src\\a.txt",
         .takes = Argument::Paths | Argument::Json,
         .pathHelp = FilesHelp,

@@ -37,7 +37,8 @@ class WatchedChild
 {
 public:
     explicit WatchedChild(const CommandLine& commandLine)
-        : m_limit(commandLine.timeout), m_watchesWindows(commandLine.unattended || commandLine.cancelsWindows),
+        : m_limit(commandLine.timeout), m_isAttended(!commandLine.unattended),
+          m_watchesWindows(commandLine.unattended || commandLine.cancelsWindows),
           m_cancelsWindows(commandLine.cancelsWindows), m_child(TypedArguments(), L"", ChildProcess::Streams::Shared),
           m_windows(m_child)
     {
@@ -51,7 +52,8 @@ public:
             ended = m_child.Wait(Poll);
             TakeLines(m_child.Read());
             LookForWindows();
-            if (!ended && !m_result && m_limit && Clock::now() - m_lastSign > *m_limit)
+            const bool waitsForUser = m_isAttended && !m_isInCall; // who may look at a dialog of OrvixCore
+            if (!ended && !m_result && m_limit && !waitsForUser && Clock::now() - m_lastSign > *m_limit)
             {
                 EndLate();
             }
@@ -83,9 +85,11 @@ private:
         if (word == ParentLink::Step)
         {
             m_step = rest;
+            m_isInCall = true;
         }
         else if (word == ParentLink::Return)
         {
+            m_isInCall = false;
             m_step = "code that runs after " + m_step;
         }
         else if (word == ParentLink::Crash)
@@ -137,6 +141,7 @@ private:
     }
 
     std::optional<seconds> m_limit;
+    bool m_isAttended;
     bool m_watchesWindows;
     bool m_cancelsWindows;
     ChildProcess m_child;
@@ -144,6 +149,7 @@ private:
     Clock::time_point m_lastSign = Clock::now();
     std::string m_text; // a line that has not arrived in full
     std::string m_step = "the start";
+    bool m_isInCall = false; // of a provider
     std::string m_crash;
     std::wstring m_window; // the last one
     std::optional<ExitCode> m_result;

@@ -51,7 +51,7 @@ void OperationCommand::FillDialog(OrvixFileListDialogParams& params)
     params.SetMessage(m_rule.question);
     params.SetOrvixFileList(&List());
     params.SetComment(Arguments().comment.c_str());
-    params.SetOptions(OrvixDialogOption::OfferRemember |
+    params.SetOptions(OrvixDialogOption::OfferRemember | OrvixDialogOption::ForOperation(m_rule.operation) |
                       (m_rule.CanKeep() ? OrvixDialogOption::OfferKeepCheckedOut : 0) |
                       (Arguments().keep ? OrvixDialogOption::OptionChecked : 0));
     params.SetDialogPromptID(static_cast<std::int32_t>(m_rule.dialogPrompt));

@@ -86,7 +86,7 @@ inline constexpr OperationRule CheckOut = {
 
 inline constexpr OperationRule UndoCheckOut = {
     .title = L"Undo check-out",
-    .question = L"Give these files back unchanged?",
+    .question = L"Discard the changes in these files?",
     .operation = OrvixOperation::UndoCheckOut,
     .allowedBy = OrvixFilePermission::UndoCheckOut,
     .concerns = OrvixFileState::CheckedOut,
