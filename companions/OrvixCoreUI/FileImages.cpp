@@ -125,16 +125,33 @@ int FileImages::OfFile(const std::wstring& name)
     const auto [known, isNew] = m_byExtension.try_emplace(extension, -1);
     if (isNew)
     {
-        SHFILEINFOW info{};
-        const std::wstring example = L"file" + extension;
-        if (SHGetFileInfoW(example.c_str(), FILE_ATTRIBUTE_NORMAL, &info, sizeof info,
-                           SHGFI_ICON | SHGFI_SMALLICON | SHGFI_USEFILEATTRIBUTES) != 0)
-        {
-            known->second = ImageList_AddIcon(m_images.Get(), info.hIcon);
-            DestroyIcon(info.hIcon);
-        }
+        known->second = AddIcon(L"file" + extension, FILE_ATTRIBUTE_NORMAL);
     }
     return known->second;
+}
+
+int FileImages::OfFolder()
+{
+    constexpr const wchar_t* Folder = L"\\"; // no extension has this character
+    const auto [known, isNew] = m_byExtension.try_emplace(Folder, -1);
+    if (isNew)
+    {
+        known->second = AddIcon(L"folder", FILE_ATTRIBUTE_DIRECTORY);
+    }
+    return known->second;
+}
+
+int FileImages::AddIcon(const std::wstring& name, DWORD attributes)
+{
+    SHFILEINFOW info{};
+    if (SHGetFileInfoW(name.c_str(), attributes, &info, sizeof info,
+                       SHGFI_ICON | SHGFI_SMALLICON | SHGFI_USEFILEATTRIBUTES) == 0)
+    {
+        return -1;
+    }
+    const int number = ImageList_AddIcon(m_images.Get(), info.hIcon);
+    DestroyIcon(info.hIcon);
+    return number;
 }
 
 int FileImages::OfState(unsigned long state) const

@@ -33,10 +33,16 @@ public:
     /// has none.
     int OfFile(const std::wstring& name);
 
+    /// The number of the picture for a folder. -1 when the system has none.
+    int OfFolder();
+
     /// The number of the picture for a state, bits of `OrvixFileState`.
     int OfState(unsigned long state) const;
 
 private:
+    /// Adds the system's icon for a name and attributes (FILE_ATTRIBUTE_*), and returns its number.
+    int AddIcon(const std::wstring& name, DWORD attributes);
+
     UniqueHandle<ImageListPolicy> m_images;
     int m_firstState = 0;
     std::map<std::wstring, int> m_byExtension; // numbers of pictures

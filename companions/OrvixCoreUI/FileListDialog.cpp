@@ -228,7 +228,8 @@ void FileListDialog::FillList()
     for (OrvixFileEntry* entry : m_entries)
     {
         std::vector<std::wstring> cells = CellsOf(*entry);
-        std::vector<int> images = {m_images.OfFile(cells.front()), -1, m_images.OfState(entry->GetFlagsOut())};
+        std::vector<int> images = {m_images.OfFile(cells[0]), cells[1].empty() ? -1 : m_images.OfFolder(),
+                                   m_images.OfState(entry->GetFlagsOut())};
         m_files.AddRow(std::move(cells),
                        !EntriesCanBeCleared() || (entry->GetFlagsIn() & OrvixFileSelection::Selected) != 0,
                        std::move(images));

@@ -86,7 +86,11 @@ LRESULT Palette::DrawHeading(const NMCUSTOMDRAW& drawing) const
         RECT area{};
         GetClientRect(drawing.hdr.hwndFrom, &area);
         FillRect(drawing.hdc, &area, m_faceBrush.Get());
-        return CDRF_NOTIFYITEMDRAW;
+        return CDRF_NOTIFYITEMDRAW | CDRF_NOTIFYPOSTPAINT;
+    }
+    if (drawing.dwDrawStage == CDDS_POSTPAINT)
+    {
+        FillAfterHeadings(drawing.hdr.hwndFrom, drawing.hdc);
     }
     if (drawing.dwDrawStage != CDDS_ITEMPREPAINT)
     {
@@ -104,6 +108,21 @@ LRESULT Palette::DrawHeading(const NMCUSTOMDRAW& drawing) const
     }
     DrawFace(drawing.hdc, drawing.rc, text, 0, DT_LEFT | DT_NOPREFIX | DT_END_ELLIPSIS);
     return CDRF_SKIPDEFAULT;
+}
+
+/// The headings end before the scroll bar.
+void Palette::FillAfterHeadings(HWND headings, HDC context) const
+{
+    RECT area{};
+    RECT last{};
+    GetClientRect(headings, &area);
+    const LRESULT count = SendMessageW(headings, HDM_GETITEMCOUNT, 0, 0);
+    if (count > 0 &&
+        SendMessageW(headings, HDM_GETITEMRECT, static_cast<WPARAM>(count - 1), reinterpret_cast<LPARAM>(&last)) != 0)
+    {
+        area.left = last.right;
+        FillRect(context, &area, m_faceBrush.Get());
+    }
 }
 
 /// `states`: bits CDIS_*; `format`: of DrawTextW.

@@ -39,6 +39,7 @@ public:
     LRESULT DrawHeading(const NMCUSTOMDRAW& drawing) const;
 
 private:
+    void FillAfterHeadings(HWND headings, HDC context) const;
     void DrawFace(HDC context, RECT area, const wchar_t* text, UINT states, UINT format) const;
 
     COLORREF m_face;

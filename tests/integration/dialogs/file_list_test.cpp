@@ -4,9 +4,12 @@
 #include "OrvixOperation.h"
 #include "OrvixProviderOption.h"
 #include "OrvixProviderResult.h"
+#include "ReplacedImport.h"
 
 #include <commctrl.h>
 #include <windows.h>
+
+#include <shellapi.h>
 
 #include <algorithm>
 #include <atomic>
@@ -291,6 +294,40 @@ TEST_F(FileListDialog, ShowsTheIconOfEachFileAndOfItsState)
         EXPECT_EQ(image(2, 2), image(0, 2));
         auto* const images = std::bit_cast<HIMAGELIST>(SendMessageW(list, LVM_GETIMAGELIST, LVSIL_SMALL, 0));
         EXPECT_GT(ImageList_GetImageCount(images), std::max(image(0, 0), image(1, 2)));
+        Cancel(dialog);
+    });
+}
+
+/// What the dialog asks of the system's shell: a verb, a blank and a file.
+Texts& ShellRequests()
+{
+    static Texts requests;
+    return requests;
+}
+
+BOOL WINAPI RecordShellRequest(SHELLEXECUTEINFOW* request)
+{
+    ShellRequests().push_back(std::wstring(request->lpVerb) + L' ' + request->lpFile);
+    return TRUE;
+}
+
+TEST_F(FileListDialog, ShowsThePropertiesOfAFileAfterADoubleClickOrFromItsMenu)
+{
+    const ReplacedImport shell(L"OrvixCoreUI.dll", "ShellExecuteExW",
+                               std::bit_cast<std::uintptr_t>(&RecordShellRequest));
+    AddFile(L"C:\\town\\b");
+    AddFile(L"C:\\town\\a");
+    ShellRequests().clear();
+    ShowFileList([](const DialogWindow& dialog) {
+        dialog.ClickHeading(List, 0);
+        dialog.DoubleClickRow(List, 1);
+        EXPECT_EQ(ShellRequests(), (Texts{L"properties C:\\town\\b"}));
+        dialog.SelectRow(List, 0);
+        dialog.ChooseFromMenu(List, 4);
+        EXPECT_EQ(ShellRequests().back(), L"properties C:\\town\\a");
+        dialog.ClickCheckBox(List, 0);
+        EXPECT_EQ(dialog.CheckedRows(List), (std::vector{false, true}));
+        EXPECT_EQ(ShellRequests().size(), 2U);
         Cancel(dialog);
     });
 }

@@ -71,6 +71,7 @@ TEST_F(DialogPictures, OfTheFileList)
                      {COLOR_WINDOW, RGB(24, 24, 24)},     {COLOR_WINDOWTEXT, RGB(235, 235, 235)},
                      {COLOR_HIGHLIGHT, RGB(38, 79, 120)}, {COLOR_HIGHLIGHTTEXT, RGB(255, 255, 255)},
                      {COLOR_GRAYTEXT, RGB(130, 130, 130)}};
+    m_params.SetMessage(L"The changes in these files will be discarded.");
     ShowFileList(OrvixDialogOption::EntriesCanBeCleared | OrvixDialogOption::ForOperation(OrvixOperation::UndoCheckOut),
                  TakePicture(L"file-list-dark.png"));
 }
