@@ -24,7 +24,7 @@ function(orvix_install_debug_file target folder)
   install(FILES ${debug_file} DESTINATION ${folder} COMPONENT debug)
 endfunction()
 
-install(TARGETS OrvixCore OrvixCoreUI braeutil MSSCCI BuildOptions EXPORT OrvixCore
+install(TARGETS OrvixCore OrvixCoreUI braeutil MSSCCI Settings Waiting BuildOptions EXPORT OrvixCore
   RUNTIME DESTINATION bin
   ARCHIVE DESTINATION lib
   INCLUDES DESTINATION include)

@@ -1,0 +1,367 @@
+#include "Display.h"
+#include "OrvixWaitingWindow.h"
+#include "UniqueHandle.h"
+
+#include <gtest/gtest.h>
+
+#include <windows.h>
+
+#include <commctrl.h>
+
+#include <algorithm>
+#include <atomic>
+#include <bit>
+#include <chrono>
+#include <functional>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace
+{
+
+using std::chrono::milliseconds;
+using Result = OrvixWaitingWindow::Result;
+constexpr UINT Posted = WM_APP + 1;
+
+/// A window of a host, which notes what it is sent.
+class HostWindow
+{
+public:
+    HostWindow()
+    {
+        WNDCLASSW windowClass{};
+        windowClass.lpfnWndProc = &Procedure;
+        windowClass.hInstance = GetModuleHandleW(nullptr);
+        windowClass.lpszClassName = L"WaitingTestHost";
+        RegisterClassW(&windowClass);
+        m_window = CreateWindowExW(0, L"WaitingTestHost", L"Host", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 0, 0, 600, 400,
+                                   nullptr, nullptr, windowClass.hInstance, nullptr);
+        SetWindowLongPtrW(m_window, GWLP_USERDATA, std::bit_cast<LONG_PTR>(this));
+        SetFocus(m_window);
+        Handle();
+        paints.clear();
+        keys = 0;
+    }
+    HostWindow(const HostWindow&) = delete;
+    HostWindow& operator=(const HostWindow&) = delete;
+    ~HostWindow() { DestroyWindow(m_window); }
+
+    HWND Get() const { return m_window; }
+
+    /// Handles every message that waits.
+    static void Handle()
+    {
+        MSG message;
+        while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE) && message.message != WM_QUIT)
+        {
+            DispatchMessageW(&message);
+        }
+    }
+
+    /// The longest time between two paintings.
+    milliseconds LongestGap() const
+    {
+        milliseconds longest{};
+        for (std::size_t i = 1; i < paints.size(); ++i)
+        {
+            longest = std::max(longest, std::chrono::duration_cast<milliseconds>(paints[i] - paints[i - 1]));
+        }
+        return longest;
+    }
+
+    std::vector<std::chrono::steady_clock::time_point> paints;
+    int posted = 0;
+    int timers = 0;
+    int keys = 0;
+
+private:
+    static LRESULT CALLBACK Procedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam)
+    {
+        if (auto* host = std::bit_cast<HostWindow*>(GetWindowLongPtrW(window, GWLP_USERDATA)))
+        {
+            host->posted += message == Posted;
+            host->timers += message == WM_TIMER;
+            host->keys += message == WM_KEYDOWN;
+            if (message == WM_PAINT)
+            {
+                host->paints.push_back(std::chrono::steady_clock::now());
+            }
+        }
+        return DefWindowProcW(window, message, wParam, lParam);
+    }
+
+    HWND m_window = nullptr;
+};
+
+std::wstring TextOf(HWND window)
+{
+    wchar_t text[256] = L"";
+    SendMessageW(window, WM_GETTEXT, std::size(text), std::bit_cast<LPARAM>(&text[0]));
+    return text;
+}
+
+/// The waiting window, from another thread than the one that waits.
+struct Shown
+{
+    HWND window = nullptr;
+
+    std::vector<HWND> Children(const wchar_t* windowClass) const
+    {
+        std::vector<HWND> found;
+        for (HWND child = nullptr; (child = FindWindowExW(window, child, windowClass, nullptr)) != nullptr;)
+        {
+            found.push_back(child);
+        }
+        return found;
+    }
+    bool Says(const std::wstring& text) const
+    {
+        const std::vector<HWND> labels = Children(WC_STATICW);
+        return std::any_of(labels.begin(), labels.end(), [&](HWND label) { return TextOf(label) == text; });
+    }
+    HWND Button() const { return FindWindowExW(window, nullptr, WC_BUTTONW, nullptr); }
+    HWND Bar() const { return FindWindowExW(window, nullptr, PROGRESS_CLASSW, nullptr); }
+};
+
+/// Waits for a window with the title; none when it does not come.
+Shown Find(const wchar_t* title, milliseconds patience = milliseconds(5000))
+{
+    const auto end = std::chrono::steady_clock::now() + patience;
+    do
+    {
+        HWND window = FindWindowW(nullptr, title);
+        if (window != nullptr && IsWindowVisible(window))
+        {
+            return {window};
+        }
+        std::this_thread::sleep_for(milliseconds(10));
+    } while (std::chrono::steady_clock::now() < end);
+    return {};
+}
+
+/// A host that waits for work on another thread.
+class Waiting : public testing::Test
+{
+protected:
+    static constexpr const wchar_t* Title = L"Waiting test";
+
+    void SetUp() override
+    {
+        if (!HasDisplay())
+        {
+            GTEST_SKIP() << "no display";
+        }
+    }
+
+    using Work = std::function<void(OrvixWaitingWindow&)>;
+
+    /// Waits until the work is done, or the user ends it.
+    Result Wait(OrvixWaitingWindow& window, const Work& work)
+    {
+        ResetEvent(m_done.Get());
+        std::jthread thread([&] {
+            work(window);
+            SetEvent(m_done.Get());
+        });
+        const Result result = window.Wait(m_done.Get());
+        if (result == Result::Cancelled)
+        {
+            m_mayEnd = true;
+            EXPECT_EQ(window.Wait(m_done.Get()), Result::Done);
+        }
+        return result;
+    }
+    Result Wait(HWND parent, const Work& work)
+    {
+        OrvixWaitingWindow window(parent, Title, L"Cancel");
+        return Wait(window, work);
+    }
+
+    /// Work that lasts until the user has ended it.
+    void WorkUntilCancelled() const
+    {
+        for (int i = 0; i < 500 && !m_mayEnd; ++i)
+        {
+            std::this_thread::sleep_for(milliseconds(10));
+        }
+    }
+
+    UniqueKernelHandle m_done{CreateEventW(nullptr, TRUE, FALSE, nullptr)};
+    std::atomic<bool> m_mayEnd = false;
+};
+
+TEST_F(Waiting, ShowsNoWindowInTheFirstHalfSecond)
+{
+    const HostWindow host;
+    EXPECT_EQ(Wait(host.Get(),
+                   [&](OrvixWaitingWindow&) {
+                       EXPECT_EQ(Find(Title, milliseconds(250)).window, nullptr);
+                       EXPECT_TRUE(IsWindowEnabled(host.Get()));
+                   }),
+              Result::Done);
+}
+
+TEST_F(Waiting, ThenShowsTaskProgressAndTimeAndDisablesTheHost)
+{
+    const HostWindow host;
+    HWND other = CreateWindowExW(0, WC_STATICW, L"Tools", WS_POPUP | WS_VISIBLE, 0, 0, 50, 50, nullptr, nullptr,
+                                 nullptr, nullptr);
+    HWND disabled = CreateWindowExW(0, WC_STATICW, L"Old", WS_POPUP | WS_VISIBLE | WS_DISABLED, 0, 0, 50, 50, nullptr,
+                                    nullptr, nullptr, nullptr);
+    Wait(host.Get(), [&](OrvixWaitingWindow& window) {
+        window.SetTask(L"Pushing to origin");
+        window.SetProgress(L"Writing objects: 40%", 40);
+        const Shown shown = Find(Title);
+        ASSERT_NE(shown.window, nullptr);
+        EXPECT_EQ(GetWindow(shown.window, GW_OWNER), host.Get());
+        EXPECT_FALSE(IsWindowEnabled(host.Get()));
+        EXPECT_FALSE(IsWindowEnabled(other));
+        EXPECT_TRUE(shown.Says(L"Pushing to origin"));
+        EXPECT_TRUE(shown.Says(L"Writing objects: 40%"));
+        EXPECT_EQ(SendMessageW(shown.Bar(), PBM_GETPOS, 0, 0), 40);
+        EXPECT_EQ(TextOf(shown.Button()), L"Cancel");
+        window.SetProgress(L"Resolving", -1);
+        std::this_thread::sleep_for(milliseconds(1200));
+        EXPECT_TRUE(shown.Says(L"Resolving"));
+        EXPECT_TRUE(shown.Says(L"0:01") || shown.Says(L"0:02"));
+    });
+    EXPECT_EQ(FindWindowW(nullptr, Title), nullptr);
+    EXPECT_TRUE(IsWindowEnabled(host.Get()));
+    EXPECT_TRUE(IsWindowEnabled(other));
+    EXPECT_FALSE(IsWindowEnabled(disabled));
+    DestroyWindow(other);
+    DestroyWindow(disabled);
+}
+
+TEST_F(Waiting, PaintsTheHostAllTheTime)
+{
+    milliseconds shortest = milliseconds::max();
+    for (int attempt = 0; attempt < 3 && shortest > milliseconds(100); ++attempt)
+    {
+        HostWindow host;
+        Wait(host.Get(), [&](OrvixWaitingWindow&) {
+            for (int i = 0; i < 150; ++i)
+            {
+                InvalidateRect(host.Get(), nullptr, FALSE);
+                std::this_thread::sleep_for(milliseconds(10));
+            }
+        });
+        EXPECT_GT(host.paints.size(), 20u);
+        shortest = std::min(shortest, host.LongestGap());
+    }
+    EXPECT_LE(shortest.count(), 100);
+}
+
+TEST_F(Waiting, PaintsWithoutAWindowWhenThereIsNoParent)
+{
+    HostWindow host;
+    Wait(nullptr, [&](OrvixWaitingWindow&) {
+        for (int i = 0; i < 80; ++i)
+        {
+            InvalidateRect(host.Get(), nullptr, FALSE);
+            std::this_thread::sleep_for(milliseconds(10));
+        }
+        EXPECT_EQ(FindWindowW(nullptr, Title), nullptr);
+        EXPECT_TRUE(IsWindowEnabled(host.Get()));
+    });
+    EXPECT_GT(host.paints.size(), 10u);
+}
+
+TEST_F(Waiting, EndsByTheButton)
+{
+    const HostWindow host;
+    EXPECT_EQ(Wait(host.Get(),
+                   [&](OrvixWaitingWindow&) {
+                       const Shown shown = Find(Title);
+                       SendMessageW(shown.Button(), BM_CLICK, 0, 0);
+                       WorkUntilCancelled();
+                       std::this_thread::sleep_for(milliseconds(150));
+                       EXPECT_FALSE(IsWindowEnabled(shown.Button()));
+                       EXPECT_FALSE(IsWindowEnabled(host.Get())) << "the work has not ended yet";
+                   }),
+              Result::Cancelled);
+}
+
+TEST_F(Waiting, EndsByEscapeAndByTheSystemsClose)
+{
+    const HostWindow host;
+    EXPECT_EQ(Wait(host.Get(),
+                   [&](OrvixWaitingWindow&) {
+                       PostMessageW(Find(Title).Button(), WM_KEYDOWN, VK_ESCAPE, 0);
+                       WorkUntilCancelled();
+                   }),
+              Result::Cancelled);
+    m_mayEnd = false;
+    EXPECT_EQ(Wait(host.Get(),
+                   [&](OrvixWaitingWindow&) {
+                       PostMessageW(Find(Title).window, WM_SYSCOMMAND, SC_CLOSE, 0);
+                       WorkUntilCancelled();
+                   }),
+              Result::Cancelled);
+}
+
+TEST_F(Waiting, LeavesPostedMessagesAndTimersOfTheHostInItsQueue)
+{
+    HostWindow host;
+    SetTimer(host.Get(), 1, 20, nullptr);
+    Wait(host.Get(), [&](OrvixWaitingWindow&) {
+        PostMessageW(host.Get(), Posted, 0, 0);
+        Find(Title);
+        PostMessageW(host.Get(), Posted, 0, 0);
+        std::this_thread::sleep_for(milliseconds(200));
+    });
+    EXPECT_EQ(host.posted, 0);
+    EXPECT_EQ(host.timers, 0);
+    HostWindow::Handle();
+    EXPECT_EQ(host.posted, 2);
+    EXPECT_GT(host.timers, 0);
+}
+
+TEST_F(Waiting, AnswersMessagesThatOtherThreadsSend)
+{
+    HostWindow host;
+    Wait(host.Get(), [&](OrvixWaitingWindow&) {
+        SendMessageW(host.Get(), Posted, 0, 0);
+        Find(Title);
+        SendMessageW(host.Get(), Posted, 0, 0);
+    });
+    EXPECT_EQ(host.posted, 2);
+}
+
+TEST_F(Waiting, DropsWhatTheUserTypesWhileTheWindowIsShown)
+{
+    HostWindow host;
+    const auto type = [] {
+        INPUT keys[2]{};
+        keys[0].type = keys[1].type = INPUT_KEYBOARD;
+        keys[0].ki.wVk = keys[1].ki.wVk = 'A';
+        keys[1].ki.dwFlags = KEYEVENTF_KEYUP;
+        SendInput(2, keys, sizeof keys[0]);
+        std::this_thread::sleep_for(milliseconds(100));
+    };
+    Wait(host.Get(), [&](OrvixWaitingWindow&) { type(); });
+    EXPECT_EQ(host.keys, 0);
+    HostWindow::Handle();
+    EXPECT_EQ(host.keys, 1) << "typed in the first half second";
+
+    Wait(host.Get(), [&](OrvixWaitingWindow&) {
+        Find(Title);
+        type();
+    });
+    HostWindow::Handle();
+    EXPECT_EQ(host.keys, 1);
+    EXPECT_EQ(GetFocus(), host.Get());
+}
+
+TEST_F(Waiting, KeepsTheEndOfTheHost)
+{
+    const HostWindow host;
+    PostQuitMessage(7);
+    Wait(host.Get(), [&](OrvixWaitingWindow&) { Find(Title); });
+    MSG message;
+    ASSERT_TRUE(PeekMessageW(&message, nullptr, WM_QUIT, WM_QUIT, PM_REMOVE));
+    EXPECT_EQ(message.wParam, 7u);
+}
+
+} // namespace
