@@ -30,11 +30,12 @@ install(TARGETS OrvixCore OrvixCoreUI braeutil MSSCCI Settings Waiting BuildOpti
   INCLUDES DESTINATION include)
 install(TARGETS orvix RUNTIME DESTINATION bin)
 install(FILES $<TARGET_FILE:archive_msscci> DESTINATION bin)
-install(FILES $<TARGET_FILE:archive> DESTINATION bin/plugins)
+install(FILES $<TARGET_FILE:archive> $<TARGET_FILE:git> DESTINATION bin/plugins)
 foreach(target OrvixCore OrvixCoreUI braeutil orvix archive_msscci)
   orvix_install_debug_file(${target} bin)
 endforeach()
 orvix_install_debug_file(archive bin/plugins)
+orvix_install_debug_file(git bin/plugins)
 
 install(DIRECTORY include/ companions/braeutil/include/ DESTINATION include FILES_MATCHING PATTERN "*.h"
   PATTERN BraeDiagnostics.h EXCLUDE) # only the development build has it

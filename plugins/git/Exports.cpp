@@ -1,0 +1,49 @@
+// The four functions of the plug-in contract; git.def exports them under their plain names.
+
+#include "GitProvider.h"
+#include "OrvixVersion.h"
+
+#include <cstdint>
+#include <memory>
+
+namespace
+{
+
+/// The only provider of this module. A host may ask for it several times and expects the same session each time. It is
+/// deleted by the last release, or when the module is unloaded, since a host need not release it.
+std::unique_ptr<GitProvider> theProvider;
+int requests = 0;
+
+} // namespace
+
+extern "C" std::int32_t GetOrvixVersion()
+{
+    return ORVIX_PLUGIN_CONTRACT_VERSION;
+}
+
+extern "C" const wchar_t* GetOrvixProviderName()
+{
+    return GitProvider::Name;
+}
+
+/// Null when the host's heap is exhausted: the provider's operator new does not throw.
+extern "C" IOrvixProvider* GetIOrvixProvider()
+{
+    if (!theProvider)
+    {
+        theProvider.reset(new GitProvider);
+    }
+    if (theProvider)
+    {
+        ++requests;
+    }
+    return theProvider.get();
+}
+
+extern "C" void ReleaseIOrvixProvider(IOrvixProvider* provider)
+{
+    if (provider != nullptr && provider == theProvider.get() && --requests == 0)
+    {
+        theProvider.reset();
+    }
+}

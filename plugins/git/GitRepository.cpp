@@ -1,0 +1,594 @@
+#include "GitRepository.h"
+
+#include "GitFailure.h"
+#include "GitText.h"
+#include "LockFiles.h"
+
+#include <windows.h>
+
+#include <algorithm>
+#include <charconv>
+#include <filesystem>
+#include <iterator>
+
+namespace
+{
+
+constexpr wchar_t NotControlled[] = L" is not under Git's control";
+
+/// The full path without "." and "..", without a separator at its end; paths longer than 260 characters included.
+std::wstring FullPath(std::wstring path)
+{
+    constexpr std::wstring_view LongPrefix = L"\\\\?\\";
+    if (path.starts_with(LongPrefix) && !path.starts_with(L"\\\\?\\UNC\\"))
+    {
+        path.erase(0, LongPrefix.size());
+    }
+    std::wstring full;
+    for (DWORD size = MAX_PATH; full.size() < size;)
+    {
+        full.resize(size);
+        size = GetFullPathNameW(path.c_str(), size, full.data(), nullptr);
+        if (size < full.size())
+        {
+            full.resize(size);
+            break;
+        }
+    }
+    full.erase(full.find_last_not_of(L'\\') + 1);
+    return full;
+}
+
+/// The form in which functions of Windows take a path of any length.
+std::wstring LongForm(const std::wstring& full)
+{
+    return full.starts_with(L"\\\\") ? full : L"\\\\?\\" + full;
+}
+
+/// Paths as Git reads them from its input.
+std::string PathList(const std::vector<std::string>& paths)
+{
+    std::string list;
+    for (const std::string& path : paths)
+    {
+        list.append(path).push_back('\0');
+    }
+    return list;
+}
+
+/// A command on paths, which it reads from its input.
+GitCommand OnPaths(std::vector<std::wstring> arguments, const std::vector<std::string>& paths, std::wstring task)
+{
+    arguments.insert(arguments.end(), {L"--pathspec-from-file=-", L"--pathspec-file-nul"});
+    return {.arguments = std::move(arguments), .input = PathList(paths), .task = std::move(task)};
+}
+
+bool IsTrue(const std::wstring& value)
+{
+    const std::wstring folded = GitText::Fold(value);
+    return folded == L"TRUE" || folded == L"YES" || folded == L"ON" || folded == L"1";
+}
+
+/// A text file that exists for the scope.
+class CommentFile
+{
+public:
+    CommentFile(const std::wstring& folder, const std::wstring& text)
+        : m_name(L"ORVIX_COMMENT_" + std::to_wstring(GetCurrentProcessId())), m_path(LongForm(folder + L'\\' + m_name))
+    {
+        const std::string bytes = GitText::ToUtf8(text);
+        const OwnedHandle file = OwnFile(
+            CreateFileW(m_path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
+        DWORD written = 0;
+        if (!file || !WriteFile(file.get(), bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) ||
+            written != bytes.size())
+        {
+            const DWORD error = GetLastError();
+            throw GitFailure(L"The comment cannot be written to " + folder + L": " + GitText::SystemMessage(error));
+        }
+    }
+    CommentFile(const CommentFile&) = delete;
+    CommentFile& operator=(const CommentFile&) = delete;
+    ~CommentFile() { DeleteFileW(m_path.c_str()); }
+
+    const std::wstring& Name() const { return m_name; }
+
+private:
+    std::wstring m_name;
+    std::wstring m_path;
+};
+
+} // namespace
+
+void GitRepository::Open(const std::wstring& folder)
+{
+    Close();
+    const std::wstring start = FullPath(folder);
+    m_runner.SetSilence(GitRunner::DefaultSilence);
+    m_runner.SetFolder(start + L'\\');
+    const ProcessResult found =
+        m_runner.Run({.arguments = {L"rev-parse", L"--path-format=relative", L"--is-inside-work-tree", L"--show-cdup",
+                                    L"--git-dir", L"--git-common-dir"},
+                      .isQuery = true,
+                      .task = L"Opening " + start});
+    if (!found.Succeeded())
+    {
+        GitFailure failure(L"There is no repository of Git that can be used in " + start);
+        const Lines words = GitRunner::Words(found);
+        failure.lines.insert(failure.lines.end(), words.begin(), words.end());
+        throw failure;
+    }
+    const std::vector<std::string_view> answers = GitText::Split(found.output, '\n');
+    if (answers.size() < 4 || answers[0] != "true")
+    {
+        throw GitFailure(start + L" is inside a repository of Git, but not in a folder with its files");
+    }
+    const auto resolve = [&](std::string_view relative) {
+        return FullPath((std::filesystem::path(start) / GitText::FromUtf8(relative)).wstring());
+    };
+    const std::wstring top = resolve(answers[1]);
+    m_gitFolder = resolve(answers[2]);
+    m_commonFolder = resolve(answers[3]);
+
+    m_runner.SetFolder(top + L'\\');
+    const GitCommand commands[] = {
+        {.arguments = {L"config", L"-z", L"--get-regexp", L"^orvix\\."}, .isQuery = true, .task = L"Opening " + top},
+        {.arguments = {L"ls-files", L"-z", L"--", L":(attr:lockable)"}, .isQuery = true, .patterns = true}};
+    const std::vector<ProcessResult> results = m_runner.RunAll(commands);
+    ReadConfiguration(results[0].output);
+    m_locks.Reset(results[1].Succeeded() && !results[1].output.empty());
+    m_top = top;
+    m_locks.RefreshInBackground(m_runner);
+}
+
+void GitRepository::Close()
+{
+    m_top.clear();
+    m_pushes = false;
+    m_client.clear();
+    m_locks.Reset(false);
+    m_checkedOut.clear();
+    m_snapshot.reset();
+}
+
+/// Each setting is "key<line end>value", with a zero after it. A key without a value means true.
+void GitRepository::ReadConfiguration(const std::string& printed)
+{
+    for (const std::string_view setting : GitText::Split(printed, '\0'))
+    {
+        const std::size_t end = setting.find('\n');
+        const std::string_view key = setting.substr(0, end);
+        const std::wstring value = end != std::string_view::npos ? GitText::FromUtf8(setting.substr(end + 1)) : L"true";
+        if (key == "orvix.push")
+        {
+            m_pushes = IsTrue(value);
+        }
+        else if (key == "orvix.client")
+        {
+            m_client = value;
+        }
+        else if (key == "orvix.silentlimit")
+        {
+            unsigned seconds = 0;
+            const std::string digits = GitText::ToUtf8(value);
+            std::from_chars(digits.data(), digits.data() + digits.size(), seconds);
+            if (seconds != 0)
+            {
+                m_runner.SetSilence(std::chrono::seconds(seconds));
+            }
+        }
+    }
+}
+
+/// The path below the top folder as Git writes it; nothing for a file outside.
+std::optional<std::string> GitRepository::Relative(const std::wstring& path) const
+{
+    std::wstring full = FullPath(path);
+    const std::size_t length = m_top.size();
+    if (full.size() <= length + 1 || full[length] != L'\\' ||
+        CompareStringOrdinal(full.c_str(), static_cast<int>(length), m_top.c_str(), static_cast<int>(length), TRUE) !=
+            CSTR_EQUAL)
+    {
+        return std::nullopt;
+    }
+    full.erase(0, length + 1);
+    std::replace(full.begin(), full.end(), L'\\', L'/');
+    return GitText::ToUtf8(full);
+}
+
+/// The path below the top folder in Git's spelling, as far as it was seen.
+std::string GitRepository::Spelled(const std::wstring& path) const
+{
+    const std::optional<std::string> relative = Relative(path);
+    if (!relative)
+    {
+        throw GitFailure(path + L" is not in the folder of the repository, " + m_top);
+    }
+    const GitSnapshot::Entry* known = m_snapshot ? m_snapshot->Find(*relative) : nullptr;
+    return known != nullptr ? std::string(known->first) : *relative;
+}
+
+std::vector<std::string> GitRepository::Spelled(const Paths& paths) const
+{
+    std::vector<std::string> spelled;
+    spelled.reserve(paths.size());
+    for (const std::wstring& path : paths)
+    {
+        spelled.push_back(Spelled(path));
+    }
+    return spelled;
+}
+
+std::wstring GitRepository::Full(const std::string& path) const
+{
+    std::wstring full = m_top + L'\\' + GitText::FromUtf8(path);
+    std::replace(full.begin(), full.end(), L'/', L'\\');
+    return full;
+}
+
+void GitRepository::TakeSnapshot()
+{
+    const GitCommand commands[] = {
+        {.arguments = {L"status", L"--porcelain=v2", L"-z", L"--branch", L"--untracked-files=all", L"--no-renames",
+                       L"--ignore-submodules=dirty"},
+         .isQuery = true,
+         .task = L"Reading the state of the files"},
+        {.arguments = {L"ls-files", L"-z"}, .isQuery = true}};
+    std::vector<ProcessResult> results = m_runner.RunAll(commands);
+    for (const ProcessResult& result : results)
+    {
+        if (!result.Succeeded())
+        {
+            throw GitFailure(GitRunner::Words(result));
+        }
+    }
+    m_snapshot = std::make_unique<GitSnapshot>(results[0].output, std::move(results[1].output));
+    if (m_snapshot->Status().behind > 0)
+    {
+        ProcessResult changes =
+            m_runner.Run({.arguments = {L"diff", L"--name-only", L"-z", L"--no-renames", L"HEAD...@{upstream}"},
+                          .isQuery = true,
+                          .task = L"Reading the changes of the upstream"});
+        m_snapshot->SetOutOfDate(changes.Succeeded() ? std::move(changes.output) : std::string());
+    }
+}
+
+std::vector<GitFileState> GitRepository::Status(const Paths& paths)
+{
+    m_locks.RefreshInBackground(m_runner);
+    TakeSnapshot();
+    std::vector<GitFileState> states(paths.size());
+    for (std::size_t i = 0; i < paths.size(); ++i)
+    {
+        const std::optional<std::string> relative = Relative(paths[i]);
+        const GitSnapshot::Entry* entry = relative ? m_snapshot->Find(*relative) : nullptr;
+        if (entry == nullptr)
+        {
+            continue;
+        }
+        const auto& [path, item] = *entry;
+        const GitLocks::Lock* lock = m_locks.Find(path);
+        GitFileState& state = states[i];
+        state.isControlled = item.isTracked;
+        state.canAdd = !item.isTracked;
+        if (item.isTracked)
+        {
+            state.isDeleted = item.changed != nullptr && item.changed->IsDeleted();
+            state.isModified = item.changed != nullptr && !state.isDeleted;
+            state.isConflicted = item.changed != nullptr && item.changed->kind == GitStatus::File::Kind::Conflicted;
+            state.isLockedByOther = lock != nullptr && !lock->isOurs;
+            state.isCheckedOut = item.changed != nullptr || (lock != nullptr && lock->isOurs) ||
+                                 m_checkedOut.contains(std::string(path));
+            state.isOutOfDate = m_snapshot->IsOutOfDate(path);
+        }
+    }
+    return states;
+}
+
+/// Runs a command that changes the repository. When it is ended in the middle, its lock files go.
+ProcessResult GitRepository::Change(const GitCommand& command) const
+{
+    const LockFiles locks(m_gitFolder, m_commonFolder);
+    try
+    {
+        return m_runner.Run(command);
+    }
+    catch (const GitFailure&)
+    {
+        locks.DeleteNew();
+        throw;
+    }
+}
+
+void GitRepository::ChangeOrThrow(const GitCommand& command) const
+{
+    if (const ProcessResult result = Change(command); !result.Succeeded())
+    {
+        throw GitFailure(GitRunner::Words(result));
+    }
+}
+
+void GitRepository::Add(const Paths& paths)
+{
+    GitCommand command = OnPaths({L"add", L"--verbose"}, Spelled(paths), L"Adding files");
+    command.linesToCome = paths.size();
+    ChangeOrThrow(command);
+}
+
+GitRepository::Lines GitRepository::CheckIn(const Paths& paths, const std::wstring& comment, bool keepCheckedOut)
+{
+    if (comment.find_first_not_of(L" \t\r\n") == std::wstring::npos)
+    {
+        throw GitFailure(L"A commit needs a comment");
+    }
+    const std::vector<std::string> files = Spelled(paths);
+    {
+        // Git's folder may be anywhere: the comment is written there, and named relative to the top folder.
+        const CommentFile file(m_gitFolder, comment);
+        const std::wstring relative =
+            std::filesystem::path(m_gitFolder).lexically_relative(m_top).generic_wstring() + L'/' + file.Name();
+        ChangeOrThrow(OnPaths({L"commit", L"--quiet", L"--only", L"-F", relative}, files, L"Committing files"));
+    }
+    Lines report;
+    if (m_pushes)
+    {
+        const ProcessResult push = Change({.arguments = {L"push", L"--progress"}, .task = L"Pushing"});
+        if (!push.Succeeded())
+        {
+            report = GitRunner::Words(push);
+            report.insert(report.begin(), L"The commit is made, but it is not pushed:");
+            return report; // the locks stay: nobody else has the new version yet
+        }
+    }
+    if (!keepCheckedOut)
+    {
+        report = GiveLocksBack(files);
+        for (const std::string& file : files)
+        {
+            m_checkedOut.erase(file);
+        }
+    }
+    m_locks.Refresh(m_runner);
+    return report;
+}
+
+/// The files among these that Git's attributes call lockable.
+std::unordered_set<std::string> GitRepository::Lockable(const std::vector<std::string>& paths) const
+{
+    const std::string printed = m_runner.RunOrThrow({.arguments = {L"check-attr", L"-z", L"--stdin", L"lockable"},
+                                                     .input = PathList(paths),
+                                                     .isQuery = true,
+                                                     .task = L"Reading attributes"});
+    const std::vector<std::string_view> fields = GitText::Split(printed, '\0'); // path, attribute, value
+    std::unordered_set<std::string> lockable;
+    for (std::size_t i = 0; i + 2 < fields.size(); i += 3)
+    {
+        if (fields[i + 2] != "unspecified" && fields[i + 2] != "unset" && fields[i + 2] != "false")
+        {
+            lockable.emplace(fields[i]);
+        }
+    }
+    return lockable;
+}
+
+void GitRepository::CheckOut(const Paths& paths)
+{
+    TakeSnapshot();
+    const std::vector<std::string> files = Spelled(paths);
+    const std::unordered_set<std::string> lockable = Lockable(files);
+    if (!lockable.empty())
+    {
+        if (!m_locks.AreInUse())
+        {
+            m_locks.Reset(true);
+        }
+        m_locks.Refresh(m_runner);
+    }
+    Lines failures;
+    for (const std::string& file : files)
+    {
+        const GitSnapshot::Entry* entry = m_snapshot->Find(file);
+        const std::wstring full = LongForm(Full(file));
+        const DWORD attributes = GetFileAttributesW(full.c_str());
+        if (entry == nullptr || !entry->second.isTracked)
+        {
+            failures.push_back(Full(file) + NotControlled);
+            continue;
+        }
+        if (attributes == INVALID_FILE_ATTRIBUTES)
+        {
+            failures.push_back(Full(file) + L" is not on the disk");
+            continue;
+        }
+        try
+        {
+            if (lockable.contains(file))
+            {
+                m_locks.Take(m_runner, file);
+            }
+        }
+        catch (const GitFailure& failure)
+        {
+            failures.insert(failures.end(), failure.lines.begin(), failure.lines.end());
+            continue;
+        }
+        if (!SetFileAttributesW(full.c_str(), attributes & ~static_cast<DWORD>(FILE_ATTRIBUTE_READONLY)))
+        {
+            failures.push_back(Full(file) + L" cannot be made writable: " + GitText::SystemMessage(GetLastError()));
+            continue;
+        }
+        m_checkedOut.insert(file);
+    }
+    if (!failures.empty())
+    {
+        throw GitFailure(std::move(failures));
+    }
+}
+
+GitRepository::Lines GitRepository::GiveLocksBack(const std::vector<std::string>& paths)
+{
+    Lines failures;
+    for (const std::string& path : paths)
+    {
+        try
+        {
+            m_locks.GiveBack(m_runner, path);
+        }
+        catch (const GitFailure& failure)
+        {
+            failures.insert(failures.end(), failure.lines.begin(), failure.lines.end());
+        }
+    }
+    return failures;
+}
+
+void GitRepository::UndoCheckOut(const Paths& paths)
+{
+    TakeSnapshot();
+    std::vector<std::string> files;
+    std::vector<std::string> changed;
+    std::vector<std::string> added;
+    Lines failures;
+    for (const std::wstring& path : paths)
+    {
+        const std::string file = Spelled(path);
+        const GitSnapshot::Entry* entry = m_snapshot->Find(file);
+        if (entry == nullptr || !entry->second.isTracked)
+        {
+            failures.push_back(path + NotControlled);
+            continue;
+        }
+        files.push_back(file);
+        const GitStatus::File* change = entry->second.changed;
+        if (change != nullptr)
+        {
+            const bool isNew = change->kind == GitStatus::File::Kind::Changed && change->IsAdded();
+            (isNew ? added : changed).push_back(file);
+        }
+    }
+    if (!changed.empty())
+    {
+        ChangeOrThrow(OnPaths({L"restore", L"--source=HEAD", L"--staged", L"--worktree"}, changed,
+                              L"Bringing back the committed versions"));
+    }
+    if (!added.empty())
+    {
+        ChangeOrThrow(OnPaths({L"reset", L"--quiet"}, added, L"Taking added files out of the index"));
+    }
+    for (const std::string& file : files)
+    {
+        m_checkedOut.erase(file);
+    }
+    const Lines locked = GiveLocksBack(files);
+    failures.insert(failures.end(), locked.begin(), locked.end());
+    if (!failures.empty())
+    {
+        throw GitFailure(std::move(failures));
+    }
+}
+
+bool GitRepository::HasUpstream() const
+{
+    return m_runner
+        .Run({.arguments = {L"rev-parse", L"--verify", L"--quiet", L"@{upstream}"},
+              .isQuery = true,
+              .task = L"Looking for the upstream"})
+        .Succeeded();
+}
+
+void GitRepository::GetLatest(const Paths& paths)
+{
+    const std::vector<std::string> files = Spelled(paths);
+    if (HasUpstream())
+    {
+        ChangeOrThrow({.arguments = {L"fetch", L"--progress"}, .task = L"Fetching"});
+        ChangeOrThrow(
+            {.arguments = {L"merge", L"--quiet", L"--ff-only", L"@{upstream}"}, .task = L"Moving the branch forward"});
+    }
+    const std::string deleted = m_runner.RunOrThrow(
+        {.arguments = {L"ls-files", L"-z", L"--deleted"}, .isQuery = true, .task = L"Looking for missing files"});
+    const std::vector<std::string_view> missing = GitText::Split(deleted, '\0');
+    const std::unordered_set<std::string_view> isMissing(missing.begin(), missing.end());
+    std::vector<std::string> restored;
+    std::copy_if(files.begin(), files.end(), std::back_inserter(restored),
+                 [&](const std::string& file) { return isMissing.contains(file); });
+    if (!restored.empty())
+    {
+        ChangeOrThrow(OnPaths({L"restore", L"--worktree"}, restored, L"Bringing back missing files"));
+    }
+    m_locks.Refresh(m_runner);
+}
+
+GitRepository::Lines GitRepository::History(const Paths& paths) const
+{
+    Lines lines;
+    for (const std::wstring& path : paths)
+    {
+        const std::string printed =
+            m_runner.RunOrThrow({.arguments = {L"-c", L"i18n.logOutputEncoding=UTF-8", L"log", L"--follow", L"--stdin",
+                                               L"--date=iso", L"--format=%h  %ad  %an  %s"},
+                                 .input = "--\n" + Spelled(path) + '\n',
+                                 .isQuery = true,
+                                 .task = L"Reading the history of " + path});
+        const Lines versions = GitText::Lines(printed);
+        lines.push_back(versions.empty() ? path + NotControlled : path);
+        for (const std::wstring& version : versions)
+        {
+            lines.push_back(L"  " + version);
+        }
+    }
+    return lines;
+}
+
+GitRepository::Lines GitRepository::Properties(const std::wstring& path)
+{
+    TakeSnapshot();
+    const std::string file = Spelled(path);
+    const GitSnapshot::Entry* entry = m_snapshot->Find(file);
+    if (entry == nullptr || !entry->second.isTracked)
+    {
+        throw GitFailure(path + NotControlled);
+    }
+    const GitStatus& status = m_snapshot->Status();
+    const GitCommand commands[] = {
+        {.arguments = {L"check-attr", L"-z", L"--stdin", L"--all"}, .input = file + '\0', .isQuery = true},
+        {.arguments = {L"-c", L"i18n.logOutputEncoding=UTF-8", L"log", L"-1", L"--stdin", L"--date=iso",
+                       L"--format=%h  %ad  %an  %s"},
+         .input = "--\n" + file + '\n',
+         .isQuery = true,
+         .task = L"Reading the properties of " + path}};
+    const std::vector<ProcessResult> results = m_runner.RunAll(commands);
+
+    const GitStatus::File* change = entry->second.changed;
+    Lines lines{path, L"  state        " + (change != nullptr ? GitStatus::Word(*change) : L"as committed")};
+    const Lines commit = GitText::Lines(results[1].Succeeded() ? results[1].output : "");
+    lines.push_back(L"  last commit  " + (commit.empty() ? L"none" : commit.front()));
+    lines.push_back(L"  branch       " + status.branch);
+    lines.push_back(L"  upstream     " + (status.upstream.empty()
+                                              ? L"none"
+                                              : status.upstream + L", " + std::to_wstring(status.ahead) + L" ahead, " +
+                                                    std::to_wstring(status.behind) + L" behind"));
+    const std::vector<std::string_view> fields = GitText::Split(results[0].output, '\0');
+    for (std::size_t i = 0; i + 2 < fields.size(); i += 3)
+    {
+        lines.push_back(L"  attribute    " + GitText::FromUtf8(fields[i + 1]) + L": " +
+                        GitText::FromUtf8(fields[i + 2]));
+    }
+    if (const GitLocks::Lock* lock = m_locks.Find(file))
+    {
+        lines.push_back(L"  locked by    " + (lock->isOurs ? L"you" : lock->owner));
+    }
+    return lines;
+}
+
+void GitRepository::RunClient() const
+{
+    const bool isGui = m_client.empty();
+    const std::wstring& program = isGui ? m_runner.Program() : m_client;
+    if (!std::filesystem::path(program).is_absolute())
+    {
+        throw GitFailure(L"The setting orvix.client of Git does not name a program by its full path: " + program);
+    }
+    Process::StartAlone(program, isGui ? std::vector<std::wstring>{L"gui"} : std::vector<std::wstring>{},
+                        m_top + L'\\');
+}

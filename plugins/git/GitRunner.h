@@ -1,0 +1,69 @@
+#pragma once
+
+#include "Process.h"
+
+#include <windows.h>
+
+#include <chrono>
+#include <span>
+#include <string>
+#include <vector>
+
+class OrvixWaitingWindow;
+
+/// A command of Git.
+struct GitCommand
+{
+    std::vector<std::wstring> arguments{}; ///< without "git"; paths are never here
+    std::string input{};                   ///< mostly the paths, each with a zero after it
+    bool isQuery = false;                  ///< it takes no lock that is not needed
+    bool patterns = false;                 ///< path arguments are patterns, not literal names
+    std::wstring task{};                   ///< what the waiting window says
+    std::size_t linesToCome = 0;           ///< lines of output that it prints on its way; 0: it prints its own progress
+};
+
+/// Runs commands of Git for one operation of the provider: on threads of their own, while the waiting window paints the
+/// host. Every failure to run throws `GitFailure`: the user has cancelled it, or it was silent for too long.
+class GitRunner
+{
+public:
+    /// How long a command may print nothing, unless the configuration says otherwise.
+    static constexpr std::chrono::seconds DefaultSilence{300};
+
+    /// Prepares to run `program`.
+    void SetUp(std::wstring program);
+
+    const std::wstring& Program() const { return m_program; }
+    void SetFolder(std::wstring folder) { m_folder = std::move(folder); }
+    void SetSilence(std::chrono::seconds silence) { m_silence = silence; }
+
+    /// The window of the operation that begins; null at its end. Not owned. When `unattended`, no program asks the user
+    /// for anything.
+    void SetWindow(OrvixWaitingWindow* window, bool unattended)
+    {
+        m_window = window;
+        m_unattended = unattended;
+    }
+
+    /// Runs a command; it may fail.
+    ProcessResult Run(const GitCommand& command) const;
+
+    /// Runs a command; throws `GitFailure` with Git's words when it fails. Returns its output.
+    std::string RunOrThrow(const GitCommand& command) const;
+
+    /// Runs commands side by side; the results in their order.
+    std::vector<ProcessResult> RunAll(std::span<const GitCommand> commands) const;
+
+    /// How a command is started.
+    ProcessCommand MakeProcess(const GitCommand& command) const;
+
+    /// Git's words about a command that has failed.
+    static std::vector<std::wstring> Words(const ProcessResult& result);
+
+private:
+    std::wstring m_program;
+    std::wstring m_folder;
+    bool m_unattended = false;
+    std::chrono::milliseconds m_silence = DefaultSilence;
+    OrvixWaitingWindow* m_window = nullptr;
+};

@@ -1,0 +1,56 @@
+#include "LockFiles.h"
+
+#include <filesystem>
+#include <system_error>
+
+namespace
+{
+
+constexpr int Attempts = 20; // a program that was ended needs a moment to close its files
+constexpr DWORD Pause = 50;  // milliseconds
+
+} // namespace
+
+LockFiles::LockFiles(const std::wstring& gitFolder, const std::wstring& commonFolder)
+    : m_gitFolder(gitFolder), m_commonFolder(commonFolder)
+{
+    GetSystemTimeAsFileTime(&m_begin);
+}
+
+void LockFiles::DeleteNew() const noexcept
+{
+    try
+    {
+        DeleteIn(m_gitFolder, false);
+        DeleteIn(m_commonFolder, false);
+        DeleteIn(m_commonFolder + L"\\refs", true);
+    }
+    catch (...)
+    {
+        return; // Git's own message about the lock file says what to do
+    }
+}
+
+void LockFiles::DeleteIn(const std::wstring& folder, bool withSubfolders) const
+{
+    std::error_code error;
+    for (std::filesystem::recursive_directory_iterator entry(folder, error), end; !error && entry != end;
+         entry.increment(error))
+    {
+        if (!withSubfolders)
+        {
+            entry.disable_recursion_pending();
+        }
+        WIN32_FILE_ATTRIBUTE_DATA data{};
+        if (entry->path().extension() != L".lock" ||
+            !GetFileAttributesExW(entry->path().c_str(), GetFileExInfoStandard, &data) ||
+            CompareFileTime(&data.ftCreationTime, &m_begin) < 0)
+        {
+            continue;
+        }
+        for (int i = 0; i < Attempts && !DeleteFileW(entry->path().c_str()); ++i)
+        {
+            Sleep(Pause);
+        }
+    }
+}

@@ -1,0 +1,21 @@
+#!/bin/bash
+# The Unix half of the bridge: runs the machine's Git as the Windows half says in the folder of the call.
+call=$ORVIX_GIT_CALL
+unset ORVIX_GIT_CALL
+mapfile -d '' -t arguments <"$call/arguments"
+mkfifo "$call/alive"
+setsid git "${arguments[@]}" <"$call/input" >"$call/output" 2>"$call/errors" &
+git=$!
+# The Windows half writes a line when it is asked to end. When it has ended, the file comes to its end, however that was.
+{
+    read -r _ && kill -TERM -- "-$git"
+    cat >/dev/null
+    kill -KILL -- "-$git"
+    rm -rf "$call"
+} <"$call/alive" 2>/dev/null &
+watcher=$!
+wait "$git"
+code=$?
+kill "$watcher" 2>/dev/null && wait "$watcher" 2>/dev/null
+rm -f "$call/alive"
+[ ! -d "$call" ] || { echo "$code" >"$call/code.new" && mv "$call/code.new" "$call/code"; }
