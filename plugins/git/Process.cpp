@@ -210,7 +210,7 @@ public:
             return;
         }
         m_ignores = SetConsoleCtrlHandler(nullptr, TRUE) != FALSE; // it reaches this process, too
-        GenerateConsoleCtrlEvent(CTRL_C_EVENT, 0);
+        m_isSent = m_ignores && GenerateConsoleCtrlEvent(CTRL_C_EVENT, 0) != FALSE;
         FreeConsole();
         for (std::size_t i = 0; i < handles.size(); ++i)
         {
@@ -219,6 +219,10 @@ public:
     }
     Interrupt(const Interrupt&) = delete;
     Interrupt& operator=(const Interrupt&) = delete;
+
+    /// True when the program has been asked.
+    bool IsSent() const { return m_isSent; }
+
     ~Interrupt()
     {
         if (m_ignores)
@@ -230,6 +234,7 @@ public:
 private:
     static constexpr std::array<DWORD, 3> Names{STD_INPUT_HANDLE, STD_OUTPUT_HANDLE, STD_ERROR_HANDLE};
     bool m_ignores = false;
+    bool m_isSent = false;
 };
 
 } // namespace
@@ -363,8 +368,8 @@ void Process::Running::End(ProcessResult::End reason)
 {
     m_ended = true;
     m_result.end = reason;
-    m_endBy = Clock::now() + Patience;
     m_interrupt = std::make_unique<Interrupt>(m_processId);
+    m_endBy = Clock::now() + (m_interrupt->IsSent() ? Patience : milliseconds(0));
 }
 
 /// True when nothing is to be expected any more.

@@ -1,0 +1,427 @@
+// One user, one repository: what each operation does, checked by plain commands of Git.
+
+#include "GitTest.h"
+
+#include <windows.h>
+
+#include <algorithm>
+
+namespace
+{
+
+constexpr unsigned long Tracked = State::Controlled | Permission::GetLatest | Permission::ShowHistory;
+constexpr unsigned long Clean = Tracked | Permission::CheckOut;
+constexpr unsigned long Edited =
+    Tracked | State::CheckedOut | Permission::CheckIn | Permission::UndoCheckOut | Permission::Compare;
+constexpr unsigned long Modified = Edited | State::Modified;
+constexpr unsigned long Deleted = Edited | State::Deleted;
+constexpr unsigned long CanAdd = State::NotControlled | Permission::Add;
+
+/// Names that some program treats in a special way.
+const Texts NastyNames{
+    L"with space.txt", L"-dash.txt",
+    L"--all",          L"[brackets].txt",
+    L"{a,b}.txt",      L"'single'.txt",
+    L"#hash ~.txt",    L"Gr\u00FC\u00DFe \u65E5\u672C.txt",
+    L"dollar $HOME",   L"percent%PATH%",
+    L"a&b^c.txt",      L"!bang.txt",
+    L"@{upstream}",    L"deep/er/f\u00FCr.txt",
+};
+
+class GitProvider : public GitTest
+{
+protected:
+    void SetUp() override { ASSERT_EQ(m_user.Open(m_git.Folder()), Success); }
+
+    /// The names that a command of Git prints.
+    Texts Names(Texts arguments) const
+    {
+        const std::string printed = m_git(arguments);
+        Texts names;
+        for (std::size_t begin = 0; begin < printed.size();)
+        {
+            const std::size_t end = std::min(printed.find('\0', begin), printed.size());
+            wchar_t name[1024];
+            const int length = MultiByteToWideChar(CP_UTF8, 0, printed.data() + begin, static_cast<int>(end - begin),
+                                                   name, static_cast<int>(std::size(name)));
+            names.emplace_back(name, static_cast<std::size_t>(length));
+            begin = end + 1;
+        }
+        return names;
+    }
+
+    /// The last commit: its files, and its message.
+    Texts Committed() const
+    {
+        return Names({L"diff-tree", L"-r", L"-z", L"--root", L"--no-commit-id", L"--name-only", L"HEAD"});
+    }
+    std::string Message() const { return m_git({L"log", L"-1", L"--format=%B"}); }
+    std::string Porcelain() const { return m_git({L"status", L"--porcelain"}); }
+
+    PlainGit m_git = MakeRepository(L"my town");
+    GitUser m_user;
+};
+
+TEST_F(GitProvider, SaysTheStateOfEveryKindOfFile)
+{
+    const std::wstring clean = m_git.Commit(L"clean.txt", "1\n");
+    const std::wstring modified = m_git.Commit(L"sub/modified.txt", "1\n");
+    const std::wstring staged = m_git.Commit(L"staged.txt", "1\n");
+    const std::wstring deleted = m_git.Commit(L"deleted.txt", "1\n");
+    const std::wstring removed = m_git.Commit(L"removed.txt", "1\n");
+    m_git.Commit(L".gitignore", "*.tmp\n");
+    m_git.Write(L"sub/modified.txt", "2\n");
+    m_git.Write(L"staged.txt", "2\n");
+    m_git({L"add", L"staged.txt"});
+    std::filesystem::remove(deleted);
+    m_git({L"rm", L"--quiet", L"removed.txt"});
+    const std::wstring added = m_git.Write(L"added.txt", "1\n");
+    m_git({L"add", L"added.txt"});
+    const std::wstring other = m_git.Write(L"new folder/other.txt", "1\n");
+    const std::wstring ignored = m_git.Write(L"ignored.tmp", "1\n");
+
+    EXPECT_EQ(
+        m_user.Query({clean, modified, staged, deleted, removed, added, other, ignored, m_git.File(L"none.txt"),
+                      L"C:\\elsewhere.txt", m_git.Folder()}),
+        (std::vector<unsigned long>{Clean, Modified, Modified, Deleted, Deleted, Modified, CanAdd, State::NotControlled,
+                                    State::NotControlled, State::NotControlled, State::NotControlled}));
+    EXPECT_EQ(m_user.client.lines, Texts());
+}
+
+TEST_F(GitProvider, TakesPathsInEveryFormOfWindows)
+{
+    m_git.Commit(L"sub/File.txt", "1\n");
+    const std::wstring folder = m_git.Folder();
+    std::wstring forward = folder + L"/sub/File.txt";
+    std::replace(forward.begin(), forward.end(), L'\\', L'/');
+    for (const std::wstring& path : {folder + L"\\sub\\FILE.TXT", folder + L"\\.\\other\\..\\sub\\File.txt",
+                                     L"\\\\?\\" + folder + L"\\sub\\File.txt", forward})
+    {
+        EXPECT_EQ(m_user.Query(path), Clean) << std::string(path.begin(), path.end());
+    }
+}
+
+TEST_F(GitProvider, WithoutAProjectControlsNothing)
+{
+    const std::wstring file = m_git.Commit(L"a.txt", "1\n");
+    EXPECT_EQ(m_user.Provider().CloseProject(), Success);
+    EXPECT_FALSE(m_user.Provider().IsProjectOpen());
+    EXPECT_EQ(m_user.Query(file), State::NotControlled);
+    EXPECT_EQ(m_user.CheckIn({file}, L"x"), Failure);
+    EXPECT_EQ(m_user.Provider().CloseProject(), Failure);
+}
+
+TEST_F(GitProvider, OpensAnyFolderOfARepository)
+{
+    const std::wstring file = m_git.Commit(L"deep/er/a.txt", "1\n");
+    ASSERT_EQ(m_user.Open(m_git.Folder() + L"\\deep\\er\\"), Success);
+    EXPECT_EQ(m_user.Query(file), Clean);
+}
+
+TEST_F(GitProvider, SaysWhyAFolderCannotBeOpened)
+{
+    std::filesystem::create_directory(m_folder.Text() + L"\\plain");
+    m_user.client.lines.clear();
+    EXPECT_EQ(m_user.Open(m_folder.Text() + L"\\plain"), Failure);
+    EXPECT_FALSE(m_user.Provider().IsProjectOpen());
+    EXPECT_TRUE(m_user.client.Shows(L"There is no repository of Git that can be used in"));
+    EXPECT_TRUE(m_user.client.Shows(L"fatal: not a git repository"));
+
+    EXPECT_EQ(m_user.Open(m_folder.Text() + L"\\none"), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"cannot be started in"));
+
+    m_user.client.lines.clear();
+    EXPECT_EQ(m_user.Open(m_git.Folder() + L"\\.git"), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"not in a folder with its files"));
+}
+
+TEST_F(GitProvider, PassesOnWhatGitSaysOfAForeignOwner)
+{
+    SetEnvironmentVariableW(L"GIT_TEST_ASSUME_DIFFERENT_OWNER", L"1");
+    m_user.client.lines.clear();
+    EXPECT_EQ(m_user.Open(m_git.Folder()), Failure);
+    SetEnvironmentVariableW(L"GIT_TEST_ASSUME_DIFFERENT_OWNER", nullptr);
+    EXPECT_TRUE(m_user.client.Shows(L"dubious ownership"));
+    EXPECT_TRUE(m_user.client.Shows(L"safe.directory"));
+}
+
+TEST_F(GitProvider, AddsAndCommitsFilesWithNamesOfAllKinds)
+{
+    Texts files;
+    for (const std::wstring& name : NastyNames)
+    {
+        files.push_back(m_git.Write(name, "1\n"));
+    }
+    ASSERT_EQ(m_user.Add(files), Success);
+    EXPECT_EQ(m_user.Query(files), std::vector<unsigned long>(files.size(), Modified));
+    Texts sorted = NastyNames;
+    Texts staged = Names({L"ls-files", L"-z"});
+    std::sort(sorted.begin(), sorted.end());
+    std::sort(staged.begin(), staged.end());
+    EXPECT_EQ(staged, sorted);
+
+    ASSERT_EQ(m_user.CheckIn(files, L"Gr\u00FC\u00DFe\n\nTwo \"lines\"."), Success);
+    EXPECT_EQ(Message(), "Gr\xC3\xBC\xC3\x9F"
+                         "e\n\nTwo \"lines\".\n\n");
+    Texts committed = Committed();
+    std::sort(committed.begin(), committed.end());
+    EXPECT_EQ(committed, sorted);
+    EXPECT_EQ(m_user.Query(files), std::vector<unsigned long>(files.size(), Clean));
+    EXPECT_EQ(m_git({L"fsck", L"--strict"}), "");
+    EXPECT_EQ(Porcelain(), "");
+}
+
+TEST_F(GitProvider, WorksOnPathsLongerThan260Characters)
+{
+    const std::wstring name = std::wstring(100, L'a') + L"/" + std::wstring(100, L'b') + L"/" + std::wstring(100, L'c');
+    const std::wstring file = m_git.Write(name, "1\n");
+    ASSERT_GT(file.size(), 300u);
+    ASSERT_EQ(m_user.Add({file}), Success);
+    ASSERT_EQ(m_user.CheckIn({file}, L"Long"), Success);
+    EXPECT_EQ(Committed(), Texts{name});
+    ASSERT_EQ(m_user.CheckOut({file}), Success);
+    EXPECT_EQ(m_user.Query(file), Edited);
+    m_git.Write(name, "2\n");
+    ASSERT_EQ(m_user.Undo({file}), Success);
+    EXPECT_EQ(m_git.Read(name), "1\n");
+}
+
+TEST_F(GitProvider, CommitsExactlyTheActiveFiles)
+{
+    const std::wstring first = m_git.Commit(L"first.txt", "1\n");
+    m_git.Commit(L"second.txt", "1\n");
+    m_git.Commit(L"third.txt", "1\n");
+    for (const wchar_t* name : {L"first.txt", L"second.txt", L"third.txt"})
+    {
+        m_git.Write(name, "2\n");
+    }
+    m_git({L"add", L"second.txt"});
+    ASSERT_EQ(m_user.CheckIn({first}, L"One"), Success);
+    EXPECT_EQ(Committed(), Texts{L"first.txt"});
+    EXPECT_EQ(Porcelain(), "M  second.txt\n M third.txt\n");
+    EXPECT_FALSE(m_git.Has(L".git/ORVIX_COMMENT_" + std::to_wstring(GetCurrentProcessId())));
+}
+
+TEST_F(GitProvider, CommitsADeletedAndARenamedFile)
+{
+    const std::wstring gone = m_git.Commit(L"gone.txt", "1\n");
+    const std::wstring old = m_git.Commit(L"old.txt", "a long enough line to be found again\n");
+    std::filesystem::remove(gone);
+    const std::wstring renamed = m_git.File(L"renamed.txt");
+    std::filesystem::rename(old, renamed);
+    ASSERT_EQ(m_user.Add({renamed}), Success);
+    ASSERT_EQ(m_user.CheckIn({gone, old, renamed}, L"Tidied up"), Success);
+    EXPECT_EQ(m_git({L"diff-tree", L"-r", L"-M", L"--name-status", L"--no-commit-id", L"HEAD"}),
+              "D\tgone.txt\nR100\told.txt\trenamed.txt\n");
+
+    ASSERT_EQ(m_user.History({renamed}), Success);
+    ASSERT_EQ(m_user.client.lines.size(), 3u);
+    EXPECT_EQ(m_user.client.lines[0], renamed);
+    EXPECT_TRUE(m_user.client.lines[1].ends_with(L"Ada  Tidied up"));
+    EXPECT_TRUE(m_user.client.lines[2].ends_with(L"Ada  By hand"));
+}
+
+TEST_F(GitProvider, RefusesACommitWithItsReason)
+{
+    const std::wstring file = m_git.Commit(L"a.txt", "1\n");
+    const std::string head = m_git({L"rev-parse", L"HEAD"});
+    const auto expectRefused = [&](const wchar_t* comment, const wchar_t* reason) {
+        EXPECT_EQ(m_user.CheckIn({file}, comment), Failure);
+        EXPECT_TRUE(m_user.client.Shows(reason)) << testing::PrintToString(m_user.client.lines);
+        EXPECT_EQ(m_git({L"rev-parse", L"HEAD"}), head);
+        EXPECT_FALSE(m_git.Has(L".git/index.lock"));
+    };
+    expectRefused(L"Nothing changed", L"nothing to commit");
+    m_git.Write(L"a.txt", "2\n");
+    expectRefused(L"", L"A commit needs a comment");
+    expectRefused(nullptr, L"A commit needs a comment");
+    expectRefused(L" \r\n", L"A commit needs a comment");
+
+    m_git({L"config", L"user.useConfigOnly", L"true"});
+    m_git({L"config", L"--unset", L"user.email"});
+    expectRefused(L"Who am I", L"Please tell me who you are");
+    m_git({L"config", L"user.email", L"ada@example.org"});
+
+    AddHook(m_git, L"pre-commit", "echo 'the hook says no' >&2\nexit 1\n");
+    expectRefused(L"Hooked", L"the hook says no");
+}
+
+TEST_F(GitProvider, RefusesAnUntrackedFileAndALockFileOfAnother)
+{
+    const std::wstring file = m_git.Commit(L"a.txt", "1\n");
+    const std::wstring other = m_git.Write(L"other.txt", "1\n");
+    m_git.Write(L"a.txt", "2\n");
+    EXPECT_EQ(m_user.CheckIn({file, other}, L"Both"), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"other.txt' did not match any file"));
+    EXPECT_EQ(Porcelain(), " M a.txt\n?? other.txt\n");
+
+    m_git.Write(L".git/index.lock", "");
+    EXPECT_EQ(m_user.CheckIn({file}, L"Locked"), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"index.lock': File exists"));
+    EXPECT_TRUE(m_git.Has(L".git/index.lock")) << "it may belong to a program that runs";
+    EXPECT_EQ(m_user.Query(file), Modified) << "a query needs no lock";
+}
+
+TEST_F(GitProvider, RefusesFilesThatGitIgnores)
+{
+    m_git.Commit(L".gitignore", "*.tmp\n");
+    const std::wstring ignored = m_git.Write(L"a.tmp", "1\n");
+    EXPECT_EQ(m_user.Add({ignored}), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"ignored by one of your .gitignore files"));
+    EXPECT_EQ(Porcelain(), "");
+}
+
+TEST_F(GitProvider, ChecksOutForThisSession)
+{
+    const std::wstring file = m_git.Commit(L"a.txt", "1\n");
+    SetFileAttributesW(file.c_str(), FILE_ATTRIBUTE_READONLY);
+    ASSERT_EQ(m_user.CheckOut({file}), Success);
+    EXPECT_EQ(GetFileAttributesW(file.c_str()) & FILE_ATTRIBUTE_READONLY, 0u);
+    EXPECT_EQ(m_user.Query(file), Edited);
+    ASSERT_EQ(m_user.Undo({file}), Success);
+    EXPECT_EQ(m_user.Query(file), Clean);
+
+    const std::wstring other = m_git.Write(L"other.txt", "1\n");
+    EXPECT_EQ(m_user.CheckOut({other, m_git.File(L"none.txt"), file}), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"other.txt is not under Git's control"));
+    EXPECT_TRUE(m_user.client.Shows(L"none.txt is not under Git's control"));
+    EXPECT_EQ(m_user.Query(file), Edited) << "the others are checked out";
+
+    m_git.Write(L"a.txt", "2\n");
+    ASSERT_EQ(m_user.CheckIn({file}, L"Kept", Option::KeepCheckedOut | Option::NoDialog), Success);
+    EXPECT_EQ(m_user.Query(file), Edited);
+    m_git.Write(L"a.txt", "3\n");
+    ASSERT_EQ(m_user.CheckIn({file}, L"Given back"), Success);
+    EXPECT_EQ(m_user.Query(file), Clean);
+}
+
+TEST_F(GitProvider, UndoesEveryKindOfChange)
+{
+    const std::wstring modified = m_git.Commit(L"modified.txt", "1\n");
+    const std::wstring staged = m_git.Commit(L"staged.txt", "1\n");
+    const std::wstring deleted = m_git.Commit(L"deleted.txt", "1\n");
+    const std::wstring removed = m_git.Commit(L"removed.txt", "1\n");
+    m_git.Commit(L"other.txt", "1\n");
+    m_git.Write(L"modified.txt", "2\n");
+    m_git.Write(L"other.txt", "2\n");
+    m_git.Write(L"staged.txt", "2\n");
+    m_git({L"add", L"staged.txt"});
+    std::filesystem::remove(deleted);
+    m_git({L"rm", L"--quiet", L"removed.txt"});
+    const std::wstring added = m_git.Write(L"added.txt", "new\n");
+    m_git({L"add", L"added.txt"});
+
+    ASSERT_EQ(m_user.Undo({modified, staged, deleted, removed, added}), Success);
+    EXPECT_EQ(Porcelain(), " M other.txt\n?? added.txt\n");
+    EXPECT_EQ(m_git.Read(L"added.txt"), "new\n");
+    EXPECT_EQ(m_git.Read(L"removed.txt"), "1\n");
+
+    EXPECT_EQ(m_user.Undo({added, modified}), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"added.txt is not under Git's control"));
+}
+
+TEST_F(GitProvider, WorksBeforeTheFirstCommit)
+{
+    const std::wstring file = m_git.Write(L"a.txt", "1\n");
+    EXPECT_EQ(m_user.Query(file), CanAdd);
+    ASSERT_EQ(m_user.Add({file}), Success);
+    EXPECT_EQ(m_user.Query(file), Modified);
+    ASSERT_EQ(m_user.Undo({file}), Success);
+    EXPECT_EQ(m_user.Query(file), CanAdd);
+    ASSERT_EQ(m_user.Add({file}), Success);
+    EXPECT_EQ(m_user.History({file}), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"does not have any commits yet"));
+    ASSERT_EQ(m_user.CheckIn({file}, L"First"), Success);
+    EXPECT_EQ(m_user.Query(file), Clean);
+}
+
+TEST_F(GitProvider, GetsMissingFilesWithoutAnUpstream)
+{
+    const std::wstring missing = m_git.Commit(L"missing.txt", "1\n");
+    const std::wstring modified = m_git.Commit(L"modified.txt", "1\n");
+    const std::wstring elsewhere = m_git.Commit(L"elsewhere.txt", "1\n");
+    std::filesystem::remove(missing);
+    std::filesystem::remove(elsewhere);
+    m_git.Write(L"modified.txt", "2\n");
+    ASSERT_EQ(m_user.Get({missing, modified}), Success);
+    EXPECT_EQ(m_git.Read(L"missing.txt"), "1\n");
+    EXPECT_EQ(m_git.Read(L"modified.txt"), "2\n");
+    EXPECT_FALSE(m_git.Has(L"elsewhere.txt"));
+}
+
+TEST_F(GitProvider, ShowsPropertiesOfTheFirstFile)
+{
+    m_git.Commit(L".gitattributes", "*.psd -text\n");
+    const std::wstring file = m_git.Commit(L"a.psd", "1\n", L"A picture");
+    ASSERT_EQ(m_user.Properties({file, m_git.File(L".gitattributes")}), Success);
+    EXPECT_EQ(m_user.client.lines.front(), file);
+    EXPECT_TRUE(m_user.client.Shows(L"as committed"));
+    EXPECT_TRUE(m_user.client.Shows(L"Ada  A picture"));
+    EXPECT_TRUE(m_user.client.Shows(L"branch       main"));
+    EXPECT_TRUE(m_user.client.Shows(L"upstream     none"));
+    EXPECT_TRUE(m_user.client.Shows(L"text: unset"));
+    m_git.Write(L"a.psd", "2\n");
+    m_user.Properties({file});
+    EXPECT_TRUE(m_user.client.Shows(L"state        modified"));
+}
+
+TEST_F(GitProvider, KeepsFilesOfASubmoduleApartUntilItIsOpened)
+{
+    MakeRepository(L"part").Commit(L"inner.txt", "1\n");
+    m_git({L"submodule", L"--quiet", L"add", Address(L"part"), L"part"});
+    m_git({L"commit", L"--quiet", L"-m", L"Part"});
+    const std::wstring inner = m_git.File(L"part/inner.txt");
+    m_git.Write(L"part/inner.txt", "2\n");
+    EXPECT_EQ(m_user.Query(inner), State::NotControlled);
+
+    ASSERT_EQ(m_user.Open(m_git.Folder() + L"\\part"), Success);
+    EXPECT_EQ(m_user.Query(inner), Modified);
+    PlainGit part(m_git.Folder() + L"\\part");
+    part({L"config", L"user.name", L"Ada"});
+    part({L"config", L"user.email", L"ada@example.org"});
+    ASSERT_EQ(m_user.CheckIn({inner}, L"Inside"), Success);
+    EXPECT_EQ(part({L"log", L"-1", L"--format=%s"}), "Inside\n");
+}
+
+TEST_F(GitProvider, WorksInASecondWorkingFolder)
+{
+    m_git.Commit(L"a.txt", "1\n");
+    m_git({L"worktree", L"add", L"--quiet", L"../second", L"-b", L"side"});
+    const PlainGit second(m_folder.Text() + L"\\second");
+    ASSERT_EQ(m_user.Open(second.Folder()), Success);
+    const std::wstring file = second.Write(L"a.txt", "2\n");
+    EXPECT_EQ(m_user.Query(file), Modified);
+    ASSERT_EQ(m_user.CheckIn({file}, L"On the side"), Success);
+    EXPECT_EQ(second({L"log", L"-1", L"--format=%s"}), "On the side\n");
+    EXPECT_EQ(m_git({L"log", L"-1", L"--format=%s"}), "By hand\n");
+    EXPECT_EQ(Porcelain(), "");
+}
+
+TEST_F(GitProvider, OffersNoOptionsAndStartsTheUsersClient)
+{
+    EXPECT_EQ(m_user.Provider().ShowOptions(), NotOffered);
+    m_git({L"config", L"orvix.client", L"client.exe"});
+    ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
+    m_user.client.lines.clear();
+    EXPECT_EQ(m_user.Provider().RunProviderClient(), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"orvix.client"));
+    m_git({L"config", L"orvix.client", GIT_PROBE});
+    ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
+    EXPECT_EQ(m_user.Provider().RunProviderClient(), Success);
+}
+
+TEST_F(GitProvider, EndsACommandThatIsSilentForTooLong)
+{
+    const std::wstring file = m_git.Commit(L"a.txt", "1\n");
+    m_git.Write(L"a.txt", "2\n");
+    m_git({L"config", L"orvix.silentLimit", L"2"});
+    AddHook(m_git, L"pre-commit", "sleep 60\n");
+    ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
+    EXPECT_EQ(m_user.CheckIn({file}, L"Slow"), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"git commit printed nothing for 2 seconds and was ended"));
+    EXPECT_FALSE(m_git.Has(L".git/index.lock"));
+    m_git({L"config", L"--unset", L"core.hooksPath"});
+    EXPECT_EQ(m_user.CheckIn({file}, L"Now"), Success);
+}
+
+} // namespace
