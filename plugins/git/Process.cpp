@@ -9,6 +9,7 @@
 #include <algorithm>
 #include <array>
 #include <atomic>
+#include <cstdint>
 
 namespace
 {
@@ -33,8 +34,10 @@ struct Pipe
     explicit Pipe(bool programWrites)
     {
         static std::atomic<unsigned> number;
-        const std::wstring name =
-            L"\\\\.\\pipe\\orvix-git-" + std::to_wstring(GetCurrentProcessId()) + L"-" + std::to_wstring(++number);
+        // The address tells the modules of a process apart that contain this code.
+        const std::wstring name = L"\\\\.\\pipe\\orvix-git-" + std::to_wstring(GetCurrentProcessId()) + L"-" +
+                                  std::to_wstring(reinterpret_cast<std::uintptr_t>(&number)) + L"-" +
+                                  std::to_wstring(++number);
         ours = OwnFile(CreateNamedPipeW(name.c_str(),
                                         (programWrites ? PIPE_ACCESS_INBOUND : PIPE_ACCESS_OUTBOUND) |
                                             FILE_FLAG_OVERLAPPED | FILE_FLAG_FIRST_PIPE_INSTANCE,

@@ -61,7 +61,7 @@ WorkFolder::~WorkFolder()
     std::filesystem::remove_all(folder, error);
 }
 
-std::string PlainGit::operator()(const Texts& arguments, const std::string& input) const
+ProcessCommand PlainGit::MakeProcess(const Texts& arguments, const std::string& input) const
 {
     ProcessCommand command;
     command.program = Program();
@@ -69,7 +69,12 @@ std::string PlainGit::operator()(const Texts& arguments, const std::string& inpu
     command.folder = m_folder;
     command.input = input;
     command.silence = std::chrono::minutes(2);
-    const ProcessResult result = Process::Run(std::move(command), nullptr);
+    return command;
+}
+
+std::string PlainGit::operator()(const Texts& arguments, const std::string& input) const
+{
+    const ProcessResult result = Process::Run(MakeProcess(arguments, input), nullptr);
     EXPECT_TRUE(result.Succeeded()) << result.errors << result.output;
     return result.output;
 }

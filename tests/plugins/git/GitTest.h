@@ -10,6 +10,7 @@
 #include "OrvixProviderOption.h"
 #include "OrvixProviderResult.h"
 #include "OrvixServicesPointer.h"
+#include "Process.h"
 #include "TempFolder.h"
 
 #include <gtest/gtest.h>
@@ -71,6 +72,9 @@ public:
 
     /// Runs Git, which must succeed; returns its output.
     std::string operator()(const Texts& arguments, const std::string& input = {}) const;
+
+    /// How a call is started.
+    ProcessCommand MakeProcess(const Texts& arguments, const std::string& input = {}) const;
 
     /// The full path of a file in the folder.
     std::wstring File(std::wstring_view file) const;

@@ -14,7 +14,7 @@ git=$!
     rm -rf "$call"
 } <"$call/alive" 2>/dev/null &
 watcher=$!
-wait "$git"
+wait "$git" 2>/dev/null
 code=$?
 kill "$watcher" 2>/dev/null && wait "$watcher" 2>/dev/null
 rm -f "$call/alive"
