@@ -12,13 +12,6 @@
 namespace
 {
 
-/// The Git that the tests use: under Wine the bridge to the machine's own.
-std::wstring Program()
-{
-    const std::wstring bridge = GIT_BRIDGE;
-    return bridge.empty() ? GitProgram::Find(L"") : bridge;
-}
-
 /// The temporary folder as the Git of the tests has it.
 std::wstring NativeTemporaryFolder()
 {
@@ -59,6 +52,12 @@ WorkFolder::~WorkFolder()
         }
     }
     std::filesystem::remove_all(folder, error);
+}
+
+std::wstring PlainGit::Program()
+{
+    const std::wstring bridge = GIT_BRIDGE; // under Wine, to the machine's own Git
+    return bridge.empty() ? GitProgram::Find(L"") : bridge;
 }
 
 ProcessCommand PlainGit::MakeProcess(const Texts& arguments, const std::string& input) const
@@ -116,8 +115,8 @@ GitUser::GitUser(HWND__* parent)
 {
     client.unattended = parent == nullptr;
     WriteBytes(m_config.Path() / L"OrvixProviders.xml",
-               "<OrvixProviders><Provider><Name>Git</Name><AltProviderExecutable>" + GitText::ToUtf8(Program()) +
-                   "</AltProviderExecutable></Provider></OrvixProviders>");
+               "<OrvixProviders><Provider><Name>Git</Name><AltProviderExecutable>" +
+                   GitText::ToUtf8(PlainGit::Program()) + "</AltProviderExecutable></Provider></OrvixProviders>");
     m_info.SetConfigFilePath(m_config.Text().c_str());
     m_info.SetProviderPluginPath((std::filesystem::path(GIT_PLUGIN).parent_path().wstring() + L'\\').c_str());
     m_info.SetIOrvixClientAccess(&client);

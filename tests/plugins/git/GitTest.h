@@ -73,6 +73,9 @@ public:
     /// Runs Git, which must succeed; returns its output.
     std::string operator()(const Texts& arguments, const std::string& input = {}) const;
 
+    /// The full path of the program.
+    static std::wstring Program();
+
     /// How a call is started.
     ProcessCommand MakeProcess(const Texts& arguments, const std::string& input = {}) const;
 
