@@ -40,7 +40,7 @@ struct FontPolicy
 using UniqueFont = UniqueHandle<FontPolicy>;
 
 /// The template of a dialog without controls, in the form that Windows takes.
-struct EmptyDialog
+struct alignas(DWORD) EmptyDialog
 {
     DLGTEMPLATE header;
     WORD menu = 0;

@@ -72,7 +72,14 @@ void GitLocks::RefreshInBackground(const GitRunner& runner)
     if (!m_question && now - m_asked >= Freshness)
     {
         m_asked = now;
-        m_question = std::make_unique<Process>(runner.MakeProcess(Question()));
+        try
+        {
+            m_question = std::make_unique<Process>(runner.MakeProcess(Question()));
+        }
+        catch (const GitFailure&)
+        {
+            return; // the locks last seen count
+        }
     }
 }
 

@@ -524,12 +524,11 @@ GitRepository::Lines GitRepository::History(const Paths& paths) const
     Lines lines;
     for (const std::wstring& path : paths)
     {
-        const std::string printed =
-            m_runner.RunOrThrow({.arguments = {L"-c", L"i18n.logOutputEncoding=UTF-8", L"log", L"--follow", L"--stdin",
-                                               L"--date=iso", L"--format=%h  %ad  %an  %s"},
-                                 .input = "--\n" + Spelled(path) + '\n',
-                                 .isQuery = true,
-                                 .task = L"Reading the history of " + path});
+        const std::string printed = m_runner.RunOrThrow(
+            {.arguments = {L"log", L"--follow", L"--stdin", L"--date=iso", L"--format=%h  %ad  %an  %s"},
+             .input = "--\n" + Spelled(path) + '\n',
+             .isQuery = true,
+             .task = L"Reading the history of " + path});
         const Lines versions = GitText::Lines(printed);
         lines.push_back(versions.empty() ? path + NotControlled : path);
         for (const std::wstring& version : versions)
@@ -552,8 +551,7 @@ GitRepository::Lines GitRepository::Properties(const std::wstring& path)
     const GitStatus& status = m_snapshot->Status();
     const GitCommand commands[] = {
         {.arguments = {L"check-attr", L"-z", L"--stdin", L"--all"}, .input = file + '\0', .isQuery = true},
-        {.arguments = {L"-c", L"i18n.logOutputEncoding=UTF-8", L"log", L"-1", L"--stdin", L"--date=iso",
-                       L"--format=%h  %ad  %an  %s"},
+        {.arguments = {L"log", L"-1", L"--stdin", L"--date=iso", L"--format=%h  %ad  %an  %s"},
          .input = "--\n" + file + '\n',
          .isQuery = true,
          .task = L"Reading the properties of " + path}};

@@ -47,7 +47,12 @@ std::vector<ProcessCommand::Variable> Environment(const GitCommand& command, boo
 
 std::vector<std::wstring> Arguments(const GitCommand& command, bool unattended)
 {
-    std::vector<std::wstring> arguments{L"-c", L"color.ui=false", L"-c", L"core.longpaths=true"};
+    std::vector<std::wstring> arguments;
+    for (const wchar_t* setting : {L"color.ui=false", L"core.longpaths=true", L"core.quotePath=false",
+                                   L"i18n.commitEncoding=UTF-8", L"i18n.logOutputEncoding=UTF-8"})
+    {
+        arguments.insert(arguments.end(), {L"-c", setting});
+    }
     if (unattended)
     {
         arguments.insert(arguments.end(), {L"-c", L"core.askPass="});

@@ -5,7 +5,6 @@
 #include <windows.h>
 
 #include <algorithm>
-#include <chrono>
 
 namespace
 {
@@ -409,22 +408,6 @@ TEST_F(GitProvider, OffersNoOptionsAndStartsTheUsersClient)
     m_git({L"config", L"orvix.client", GIT_PROBE});
     ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
     EXPECT_EQ(m_user.Provider().RunProviderClient(), Success);
-}
-
-TEST_F(GitProvider, KeepsTheContractOfPlugins)
-{
-    m_git.Commit(L"a.txt", "1\n");
-    ProcessCommand command;
-    command.program = ORVIX_TOOL;
-    command.arguments = {L"validate", GIT_PLUGIN, L"--template", m_git.Folder(), L"--timeout", L"60"};
-    command.folder = m_folder.Text();
-    command.silence = std::chrono::minutes(2);
-    const std::wstring git = std::filesystem::path(PlainGit::Program()).parent_path().wstring();
-    const std::wstring bin = std::filesystem::path(ORVIX_TOOL).parent_path().wstring();
-    command.environment = {{L"PATH", git + L';' + bin}};
-    const ProcessResult result = Process::Run(std::move(command), nullptr);
-    EXPECT_TRUE(result.Succeeded()) << result.output << result.errors;
-    EXPECT_NE(result.output.find(" 0 failed, 1 skipped"), std::string::npos) << result.output;
 }
 
 TEST_F(GitProvider, EndsACommandThatIsSilentForTooLong)

@@ -14,7 +14,7 @@
 namespace
 {
 
-constexpr DWORD Pause = 2; // milliseconds
+constexpr DWORD Pause = 4; // milliseconds
 
 struct HeapPolicy
 {
