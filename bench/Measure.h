@@ -41,6 +41,7 @@ public:
 
 void BenchDialogs(MeasureTable& table);
 void BenchFilters(MeasureTable& table);
+void BenchGit(MeasureTable& table);
 void BenchInitialize(MeasureTable& table);
 void BenchLists(MeasureTable& table);
 void BenchMsscci(MeasureTable& table);

@@ -22,6 +22,7 @@ constexpr Group Groups[] = {
     {"filters", BenchFilters},
     {"notifications", BenchNotifications},
     {"dialogs", BenchDialogs},
+    {"git", BenchGit},
 };
 
 } // namespace
