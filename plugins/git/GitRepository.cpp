@@ -274,8 +274,11 @@ std::vector<GitFileState> GitRepository::Status(const Paths& paths)
         if (item.isTracked)
         {
             state.isDeleted = item.changed != nullptr && item.changed->IsDeleted();
-            state.isModified = item.changed != nullptr && !state.isDeleted;
             state.isConflicted = item.changed != nullptr && item.changed->kind == GitStatus::File::Kind::Conflicted;
+            // What was added has no committed version that it could differ from.
+            const bool isAsAdded = item.changed != nullptr && !state.isConflicted && item.changed->IsAdded() &&
+                                   item.changed->onDisk != 'M';
+            state.isModified = item.changed != nullptr && !state.isDeleted && !isAsAdded;
             state.isLockedByOther = lock != nullptr && !lock->isOurs;
             state.isCheckedOut = item.changed != nullptr || (lock != nullptr && lock->isOurs) ||
                                  m_checkedOut.contains(std::string(path));

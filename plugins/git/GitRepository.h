@@ -15,7 +15,7 @@ struct GitFileState
 {
     bool isControlled = false;
     bool canAdd = false;     ///< not controlled and not excluded by Git's ignore rules
-    bool isModified = false; ///< on the disk or in the index, against the last commit
+    bool isModified = false; ///< against the last commit; an added file against the index
     bool isDeleted = false;
     bool isConflicted = false;
     bool isCheckedOut = false; ///< changed, locked by the user, or checked out in this session

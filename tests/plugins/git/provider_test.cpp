@@ -83,7 +83,7 @@ TEST_F(GitProvider, SaysTheStateOfEveryKindOfFile)
     EXPECT_EQ(
         m_user.Query({clean, modified, staged, deleted, removed, added, other, ignored, m_git.File(L"none.txt"),
                       L"C:\\elsewhere.txt", m_git.Folder()}),
-        (std::vector<unsigned long>{Clean, Modified, Modified, Deleted, Deleted, Modified, CanAdd, State::NotControlled,
+        (std::vector<unsigned long>{Clean, Modified, Modified, Deleted, Deleted, Edited, CanAdd, State::NotControlled,
                                     State::NotControlled, State::NotControlled, State::NotControlled}));
     EXPECT_EQ(m_user.client.lines, Texts());
 }
@@ -153,7 +153,7 @@ TEST_F(GitProvider, AddsAndCommitsFilesWithNamesOfAllKinds)
         files.push_back(m_git.Write(name, "1\n"));
     }
     ASSERT_EQ(m_user.Add(files), Success);
-    EXPECT_EQ(m_user.Query(files), std::vector<unsigned long>(files.size(), Modified));
+    EXPECT_EQ(m_user.Query(files), std::vector<unsigned long>(files.size(), Edited));
     Texts sorted = NastyNames;
     Texts staged = Names({L"ls-files", L"-z"});
     std::sort(sorted.begin(), sorted.end());
@@ -325,6 +325,8 @@ TEST_F(GitProvider, WorksBeforeTheFirstCommit)
     const std::wstring file = m_git.Write(L"a.txt", "1\n");
     EXPECT_EQ(m_user.Query(file), CanAdd);
     ASSERT_EQ(m_user.Add({file}), Success);
+    EXPECT_EQ(m_user.Query(file), Edited);
+    m_git.Write(L"a.txt", "changed since\n");
     EXPECT_EQ(m_user.Query(file), Modified);
     ASSERT_EQ(m_user.Undo({file}), Success);
     EXPECT_EQ(m_user.Query(file), CanAdd);
