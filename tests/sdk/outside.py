@@ -143,7 +143,7 @@ def check_programs(folder, sdk):
     sample = sample / "bin/plugins"
     if not re.search(r"^\d+ rules, .*\b0 failed", rules, re.M):
         raise Failure(f"the template plug-in breaks its contract:\n{rules}")
-    if found != "Archive\n":
+    if found != "Archive\nGit\n":
         raise Failure(f"the template host finds:\n{found}")
     check_host(host, plugin, "Depot", folder)
     check_host(host, sample, "Archive", folder)
