@@ -271,7 +271,9 @@ private:
     void WriteOn();
     void End(ProcessResult::End reason);
     bool Complete();
-    void Note() { m_lastSign = Clock::now(); }
+    Clock::time_point Deadline() const;
+    void OnSign(HANDLE handle);
+    void OnDeadline();
 
     ProcessCommand m_command;
     Listener m_listener;
@@ -390,17 +392,23 @@ bool Process::Running::Complete()
     return true;
 }
 
+/// When something is to be done although nothing happens.
+Clock::time_point Process::Running::Deadline() const
+{
+    if (m_exited)
+    {
+        return m_lastSign + Stragglers;
+    }
+    return m_ended ? m_endBy : m_lastSign + m_command.silence;
+}
+
 bool Process::Running::Step(unsigned long timeout, HANDLE cancel)
 {
     if (Complete())
     {
         return false;
     }
-    const Clock::time_point now = Clock::now();
-    const Clock::time_point deadline = m_exited  ? m_lastSign + Stragglers
-                                       : m_ended ? m_endBy
-                                                 : m_lastSign + m_command.silence;
-    const auto rest = std::chrono::ceil<milliseconds>(deadline - now).count();
+    const auto rest = std::chrono::ceil<milliseconds>(Deadline() - Clock::now()).count();
     const auto wait = static_cast<DWORD>(std::clamp<long long>(rest, 0, timeout));
 
     std::array<HANDLE, 5> handles{};
@@ -426,51 +434,64 @@ bool Process::Running::Step(unsigned long timeout, HANDLE cancel)
         }
     }
     const DWORD woken = WaitForMultipleObjects(count, handles.data(), FALSE, wait);
-    if (woken < WAIT_OBJECT_0 + count)
+    if (woken >= WAIT_OBJECT_0 + count)
     {
-        HANDLE handle = handles[woken - WAIT_OBJECT_0];
-        if (handle == cancel)
-        {
-            End(ProcessResult::End::Cancelled);
-            return true;
-        }
-        Note();
-        if (handle == m_process.get())
-        {
-            m_exited = true;
-            GetExitCodeProcess(m_process.get(), &m_result.exitCode);
-            if (m_ended)
-            {
-                TerminateJobObject(m_job.get(), 1); // with the programs that it has started
-            }
-        }
-        else if (handle == m_input->Event())
-        {
-            m_written += m_input->Finish();
-            if (m_input->IsOpen())
-            {
-                WriteOn();
-            }
-        }
-        else
-        {
-            Receive(handle == m_output->transfer.Event() ? *m_output : *m_errors);
-        }
-        return !Complete();
+        OnDeadline();
     }
-    if (Clock::now() >= deadline && !m_exited)
+    else if (HANDLE handle = handles[woken - WAIT_OBJECT_0]; handle == cancel)
     {
-        if (!m_ended)
-        {
-            End(ProcessResult::End::Silent);
-        }
-        else
-        {
-            TerminateJobObject(m_job.get(), 1);
-            m_endBy = Clock::now() + Patience;
-        }
+        End(ProcessResult::End::Cancelled);
+    }
+    else
+    {
+        OnSign(handle);
     }
     return !Complete();
+}
+
+/// Something has happened: the program has ended, or a stream goes on.
+void Process::Running::OnSign(HANDLE handle)
+{
+    m_lastSign = Clock::now();
+    if (handle == m_process.get())
+    {
+        m_exited = true;
+        GetExitCodeProcess(m_process.get(), &m_result.exitCode);
+        if (m_ended)
+        {
+            TerminateJobObject(m_job.get(), 1); // with the programs that it has started
+        }
+    }
+    else if (handle == m_input->Event())
+    {
+        m_written += m_input->Finish();
+        if (m_input->IsOpen())
+        {
+            WriteOn();
+        }
+    }
+    else
+    {
+        Receive(handle == m_output->transfer.Event() ? *m_output : *m_errors);
+    }
+}
+
+/// Nothing has happened. Ends a program that was silent for too long, or that does not end when it is asked to.
+void Process::Running::OnDeadline()
+{
+    if (m_exited || Clock::now() < Deadline())
+    {
+        return;
+    }
+    if (m_ended)
+    {
+        TerminateJobObject(m_job.get(), 1);
+        m_endBy = Clock::now() + Patience;
+    }
+    else
+    {
+        End(ProcessResult::End::Silent);
+    }
 }
 
 Process::Process(ProcessCommand command, Listener listener)
