@@ -45,7 +45,14 @@ void GitLocks::Refresh(const GitRunner& runner)
     }
     m_question.reset();
     m_asked = std::chrono::steady_clock::now();
-    Read(runner.Run(Question()));
+    try
+    {
+        Read(runner.Run(Question()));
+    }
+    catch (const GitFailure&)
+    {
+        return; // the locks last seen count
+    }
 }
 
 void GitLocks::RefreshInBackground(const GitRunner& runner)

@@ -16,7 +16,11 @@ namespace
 
 constexpr wchar_t NotControlled[] = L" is not under Git's control";
 
-/// The full path without "." and "..", without a separator at its end; paths longer than 260 characters included.
+// From here on "git add" is slow: it compares each path with each file that it finds.
+constexpr std::size_t ManyFiles = 1000;
+
+/// The full path without "." and "..", without a separator at its end; paths longer than 260 characters included. Empty
+/// when it is no path.
 std::wstring FullPath(std::wstring path)
 {
     constexpr std::wstring_view LongPrefix = L"\\\\?\\";
@@ -45,13 +49,13 @@ std::wstring LongForm(const std::wstring& full)
     return full.starts_with(L"\\\\") ? full : L"\\\\?\\" + full;
 }
 
-/// Paths as Git reads them from its input.
-std::string PathList(const std::vector<std::string>& paths)
+/// Paths as Git reads them from its input, each with a prefix.
+std::string PathList(const std::vector<std::string>& paths, std::string_view prefix = {})
 {
     std::string list;
     for (const std::string& path : paths)
     {
-        list.append(path).push_back('\0');
+        list.append(prefix).append(path).push_back('\0');
     }
     return list;
 }
@@ -60,7 +64,7 @@ std::string PathList(const std::vector<std::string>& paths)
 GitCommand OnPaths(std::vector<std::wstring> arguments, const std::vector<std::string>& paths, std::wstring task)
 {
     arguments.insert(arguments.end(), {L"--pathspec-from-file=-", L"--pathspec-file-nul"});
-    return {.arguments = std::move(arguments), .input = PathList(paths), .task = std::move(task)};
+    return {.arguments = std::move(arguments), .input = PathList(paths, LiteralPath), .task = std::move(task)};
 }
 
 bool IsTrue(const std::wstring& value)
@@ -104,6 +108,10 @@ void GitRepository::Open(const std::wstring& folder)
 {
     Close();
     const std::wstring start = FullPath(folder);
+    if (start.empty())
+    {
+        throw GitFailure(L"The path of the project is empty or too long");
+    }
     m_runner.SetSilence(GitRunner::DefaultSilence);
     m_runner.SetFolder(start + L'\\');
     const ProcessResult found =
@@ -124,7 +132,7 @@ void GitRepository::Open(const std::wstring& folder)
         throw GitFailure(start + L" is inside a repository of Git, but not in a folder with its files");
     }
     const auto resolve = [&](std::string_view relative) {
-        return FullPath((std::filesystem::path(start) / GitText::FromUtf8(relative)).wstring());
+        return FullPath((std::filesystem::path(start + L'\\') / GitText::FromUtf8(relative)).wstring());
     };
     const std::wstring top = resolve(answers[1]);
     m_gitFolder = resolve(answers[2]);
@@ -133,7 +141,7 @@ void GitRepository::Open(const std::wstring& folder)
     m_runner.SetFolder(top + L'\\');
     const GitCommand commands[] = {
         {.arguments = {L"config", L"-z", L"--get-regexp", L"^orvix\\."}, .isQuery = true, .task = L"Opening " + top},
-        {.arguments = {L"ls-files", L"-z", L"--", L":(attr:lockable)"}, .isQuery = true, .patterns = true}};
+        {.arguments = {L"ls-files", L"-z", L"--", L":(attr:lockable)"}, .isQuery = true}};
     const std::vector<ProcessResult> results = m_runner.RunAll(commands);
     ReadConfiguration(results[0].output);
     m_locks.Reset(results[1].Succeeded() && !results[1].output.empty());
@@ -215,6 +223,21 @@ std::vector<std::string> GitRepository::Spelled(const Paths& paths) const
     for (const std::wstring& path : paths)
     {
         spelled.push_back(Spelled(path));
+    }
+    return spelled;
+}
+
+/// The same for files that may have been renamed since they were seen: to a name in another letter case.
+std::vector<std::string> GitRepository::SpelledNow(const Paths& paths)
+{
+    const std::vector<std::string> spelled = Spelled(paths);
+    for (std::size_t i = 0; i < paths.size(); ++i)
+    {
+        if (spelled[i] != Relative(paths[i]))
+        {
+            TakeSnapshot();
+            return Spelled(paths);
+        }
     }
     return spelled;
 }
@@ -313,9 +336,32 @@ void GitRepository::ChangeOrThrow(const GitCommand& command) const
 
 void GitRepository::Add(const Paths& paths)
 {
-    GitCommand command = OnPaths({L"add", L"--verbose"}, Spelled(paths), L"Adding files");
-    command.linesToCome = paths.size();
+    const bool areMany = paths.size() >= ManyFiles;
+    if (areMany)
+    {
+        TakeSnapshot();
+    }
+    const std::vector<std::string> files = SpelledNow(paths);
+    if (areMany && AddMany(files))
+    {
+        return;
+    }
+    GitCommand command = OnPaths({L"add", L"--verbose"}, files, L"Adding files");
+    command.linesToCome = files.size();
     ChangeOrThrow(command);
+}
+
+/// Adds files in a time that grows with their number alone. False when one of them is a special case, such as a file
+/// that Git ignores: then nothing has changed.
+bool GitRepository::AddMany(const std::vector<std::string>& files) const
+{
+    const bool areKnown = std::all_of(files.begin(), files.end(),
+                                      [&](const std::string& file) { return m_snapshot->Find(file) != nullptr; });
+    return areKnown && Change({.arguments = {L"update-index", L"--add", L"--verbose", L"-z", L"--stdin"},
+                               .input = PathList(files),
+                               .task = L"Adding files",
+                               .linesToCome = files.size()})
+                           .Succeeded();
 }
 
 GitRepository::Lines GitRepository::CheckIn(const Paths& paths, const std::wstring& comment, bool keepCheckedOut)
@@ -324,24 +370,20 @@ GitRepository::Lines GitRepository::CheckIn(const Paths& paths, const std::wstri
     {
         throw GitFailure(L"A commit needs a comment");
     }
-    const std::vector<std::string> files = Spelled(paths);
+    const std::vector<std::string> files = SpelledNow(paths);
     {
-        // Git's folder may be anywhere: the comment is written there, and named relative to the top folder.
+        // Git's folder may be anywhere: the comment is written there. On another drive it has no relative path.
         const CommentFile file(m_gitFolder, comment);
-        const std::wstring relative =
-            std::filesystem::path(m_gitFolder).lexically_relative(m_top).generic_wstring() + L'/' + file.Name();
-        ChangeOrThrow(OnPaths({L"commit", L"--quiet", L"--only", L"-F", relative}, files, L"Committing files"));
+        const std::filesystem::path folder(m_gitFolder);
+        const std::filesystem::path relative = folder.lexically_relative(m_top);
+        const std::filesystem::path named = (relative.empty() ? folder : relative) / file.Name();
+        ChangeOrThrow(
+            OnPaths({L"commit", L"--quiet", L"--only", L"-F", named.generic_wstring()}, files, L"Committing files"));
     }
-    Lines report;
-    if (m_pushes)
+    Lines report = m_pushes ? Push() : Lines();
+    if (!report.empty())
     {
-        const ProcessResult push = Change({.arguments = {L"push", L"--progress"}, .task = L"Pushing"});
-        if (!push.Succeeded())
-        {
-            report = GitRunner::Words(push);
-            report.insert(report.begin(), L"The commit is made, but it is not pushed:");
-            return report; // the locks stay: nobody else has the new version yet
-        }
+        return report; // the locks stay: nobody else has the new version yet
     }
     if (!keepCheckedOut)
     {
@@ -353,6 +395,27 @@ GitRepository::Lines GitRepository::CheckIn(const Paths& paths, const std::wstri
     }
     m_locks.Refresh(m_runner);
     return report;
+}
+
+/// Pushes what is committed. Returns why it is not pushed, and nothing when it is: the commit stays.
+GitRepository::Lines GitRepository::Push() const
+{
+    Lines words;
+    try
+    {
+        const ProcessResult push = Change({.arguments = {L"push", L"--progress"}, .task = L"Pushing"});
+        if (push.Succeeded())
+        {
+            return {};
+        }
+        words = GitRunner::Words(push);
+    }
+    catch (const GitFailure& failure)
+    {
+        words = failure.lines;
+    }
+    words.insert(words.begin(), L"The commit is made, but it is not pushed:");
+    return words;
 }
 
 /// The files among these that Git's attributes call lockable.
@@ -413,6 +476,10 @@ void GitRepository::CheckOut(const Paths& paths)
         catch (const GitFailure& failure)
         {
             failures.insert(failures.end(), failure.lines.begin(), failure.lines.end());
+            if (m_runner.IsCancelled())
+            {
+                break;
+            }
             continue;
         }
         if (!SetFileAttributesW(full.c_str(), attributes & ~static_cast<DWORD>(FILE_ATTRIBUTE_READONLY)))
@@ -440,6 +507,10 @@ GitRepository::Lines GitRepository::GiveLocksBack(const std::vector<std::string>
         catch (const GitFailure& failure)
         {
             failures.insert(failures.end(), failure.lines.begin(), failure.lines.end());
+            if (m_runner.IsCancelled())
+            {
+                break;
+            }
         }
     }
     return failures;
@@ -501,7 +572,7 @@ bool GitRepository::HasUpstream() const
 
 void GitRepository::GetLatest(const Paths& paths)
 {
-    const std::vector<std::string> files = Spelled(paths);
+    const std::vector<std::string> files = SpelledNow(paths);
     if (HasUpstream())
     {
         ChangeOrThrow({.arguments = {L"fetch", L"--progress"}, .task = L"Fetching"});
@@ -527,11 +598,12 @@ GitRepository::Lines GitRepository::History(const Paths& paths) const
     Lines lines;
     for (const std::wstring& path : paths)
     {
-        const std::string printed = m_runner.RunOrThrow(
-            {.arguments = {L"log", L"--follow", L"--stdin", L"--date=iso", L"--format=%h  %ad  %an  %s"},
-             .input = "--\n" + Spelled(path) + '\n',
-             .isQuery = true,
-             .task = L"Reading the history of " + path});
+        const std::string printed =
+            m_runner.RunOrThrow({.arguments = {L"log", L"--follow", L"--stdin", L"--no-show-signature", L"--date=iso",
+                                               L"--format=%h  %ad  %an  %s"},
+                                 .input = "--\n" + std::string(LiteralPath) + Spelled(path) + '\n',
+                                 .isQuery = true,
+                                 .task = L"Reading the history of " + path});
         const Lines versions = GitText::Lines(printed);
         lines.push_back(versions.empty() ? path + NotControlled : path);
         for (const std::wstring& version : versions)
@@ -554,8 +626,8 @@ GitRepository::Lines GitRepository::Properties(const std::wstring& path)
     const GitStatus& status = m_snapshot->Status();
     const GitCommand commands[] = {
         {.arguments = {L"check-attr", L"-z", L"--stdin", L"--all"}, .input = file + '\0', .isQuery = true},
-        {.arguments = {L"log", L"-1", L"--stdin", L"--date=iso", L"--format=%h  %ad  %an  %s"},
-         .input = "--\n" + file + '\n',
+        {.arguments = {L"log", L"-1", L"--stdin", L"--no-show-signature", L"--date=iso", L"--format=%h  %ad  %an  %s"},
+         .input = "--\n" + std::string(LiteralPath) + file + '\n',
          .isQuery = true,
          .task = L"Reading the properties of " + path}};
     const std::vector<ProcessResult> results = m_runner.RunAll(commands);

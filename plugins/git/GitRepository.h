@@ -63,10 +63,13 @@ private:
     std::optional<std::string> Relative(const std::wstring& path) const;
     std::string Spelled(const std::wstring& path) const;
     std::vector<std::string> Spelled(const Paths& paths) const;
+    std::vector<std::string> SpelledNow(const Paths& paths);
     std::wstring Full(const std::string& path) const;
     void TakeSnapshot();
     ProcessResult Change(const GitCommand& command) const;
     void ChangeOrThrow(const GitCommand& command) const;
+    bool AddMany(const std::vector<std::string>& files) const;
+    Lines Push() const;
     std::unordered_set<std::string> Lockable(const std::vector<std::string>& paths) const;
     Lines GiveLocksBack(const std::vector<std::string>& paths);
     bool HasUpstream() const;

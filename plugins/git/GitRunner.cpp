@@ -13,6 +13,8 @@
 namespace
 {
 
+constexpr wchar_t Cancelled[] = L"cancelled";
+
 /// What differs from the host's environment. Git asks nothing on a terminal, uses no pager, and speaks English.
 std::vector<ProcessCommand::Variable> Environment(const GitCommand& command, bool unattended)
 {
@@ -24,15 +26,15 @@ std::vector<ProcessCommand::Variable> Environment(const GitCommand& command, boo
         {L"GIT_EDITOR", L":"},
         {L"GIT_SEQUENCE_EDITOR", L":"},
         {L"GIT_MERGE_AUTOEDIT", L"no"},
-        {L"GIT_LITERAL_PATHSPECS", command.patterns ? L"0" : L"1"},
         {L"GIT_OPTIONAL_LOCKS", command.isQuery ? L"0" : L"1"},
         // Never the terminal, which nobody sees.
         {L"SSH_ASKPASS_REQUIRE", L"force"},
     };
     // A host that Git itself has started would otherwise work on that repository.
-    for (const wchar_t* name : {L"GIT_DIR", L"GIT_WORK_TREE", L"GIT_INDEX_FILE", L"GIT_OBJECT_DIRECTORY",
-                                L"GIT_ALTERNATE_OBJECT_DIRECTORIES", L"GIT_COMMON_DIR", L"GIT_NAMESPACE", L"GIT_PREFIX",
-                                L"GIT_GLOB_PATHSPECS", L"GIT_NOGLOB_PATHSPECS", L"GIT_ICASE_PATHSPECS"})
+    for (const wchar_t* name :
+         {L"GIT_DIR", L"GIT_WORK_TREE", L"GIT_INDEX_FILE", L"GIT_OBJECT_DIRECTORY", L"GIT_ALTERNATE_OBJECT_DIRECTORIES",
+          L"GIT_COMMON_DIR", L"GIT_NAMESPACE", L"GIT_PREFIX", L"GIT_LITERAL_PATHSPECS", L"GIT_GLOB_PATHSPECS",
+          L"GIT_NOGLOB_PATHSPECS", L"GIT_ICASE_PATHSPECS"})
     {
         variables.emplace_back(name, std::nullopt);
     }
@@ -156,6 +158,11 @@ ProcessCommand GitRunner::MakeProcess(const GitCommand& command) const
 
 std::vector<ProcessResult> GitRunner::RunAll(std::span<const GitCommand> commands) const
 {
+    if (IsCancelled())
+    {
+        throw GitFailure(Cancelled);
+    }
+    ShowTask(commands);
     std::vector<ProcessResult> results(commands.size());
     std::vector<std::exception_ptr> failures(commands.size());
     std::vector<OwnedHandle> ended;
@@ -182,21 +189,9 @@ std::vector<ProcessResult> GitRunner::RunAll(std::span<const GitCommand> command
                 SetEvent(end);
             });
         }
-        if (m_window != nullptr)
+        for (const OwnedHandle& end : ended)
         {
-            const auto named = std::find_if(commands.begin(), commands.end(),
-                                            [](const GitCommand& command) { return !command.task.empty(); });
-            m_window->SetTask(named != commands.end() ? named->task.c_str() : L"");
-            m_window->SetProgress(L"", -1);
-            for (const OwnedHandle& end : ended)
-            {
-                if (m_window->Wait(end.get()) == OrvixWaitingWindow::Result::Cancelled)
-                {
-                    SetEvent(cancel.get());
-                    m_window->SetProgress(L"Cancelling", -1);
-                    m_window->Wait(end.get());
-                }
-            }
+            WaitFor(end.get(), cancel.get());
         }
     }
     for (std::size_t i = 0; i < commands.size(); ++i)
@@ -205,20 +200,54 @@ std::vector<ProcessResult> GitRunner::RunAll(std::span<const GitCommand> command
         {
             std::rethrow_exception(failures[i]);
         }
-        if (results[i].end == ProcessResult::End::Cancelled)
-        {
-            throw GitFailure(L"cancelled");
-        }
-        if (results[i].end == ProcessResult::End::Silent)
-        {
-            const auto seconds = std::chrono::duration_cast<std::chrono::seconds>(m_silence).count();
-            std::vector<std::wstring> lines = Words(results[i]);
-            lines.push_back(L"git " + commands[i].arguments.front() + L" printed nothing for " +
-                            std::to_wstring(seconds) + L" seconds and was ended");
-            throw GitFailure(std::move(lines));
-        }
+        RequireEnd(commands[i], results[i]);
     }
     return results;
+}
+
+/// Shows what runs: the first task that the commands name.
+void GitRunner::ShowTask(std::span<const GitCommand> commands) const
+{
+    if (m_window != nullptr)
+    {
+        const auto named = std::find_if(commands.begin(), commands.end(),
+                                        [](const GitCommand& command) { return !command.task.empty(); });
+        m_window->SetTask(named != commands.end() ? named->task.c_str() : L"");
+        m_window->SetProgress(L"", -1);
+    }
+}
+
+/// Waits for the end of a command. Signals `cancel` when the user wants no more of it.
+void GitRunner::WaitFor(HANDLE end, HANDLE cancel) const
+{
+    if (m_window != nullptr && m_window->Wait(end) == OrvixWaitingWindow::Result::Cancelled)
+    {
+        SetEvent(cancel);
+        m_window->SetProgress(L"Cancelling", -1);
+        m_window->Wait(end);
+    }
+}
+
+/// Throws when a command was ended.
+void GitRunner::RequireEnd(const GitCommand& command, const ProcessResult& result) const
+{
+    if (result.end == ProcessResult::End::Cancelled)
+    {
+        throw GitFailure(Cancelled);
+    }
+    if (result.end == ProcessResult::End::Silent)
+    {
+        const auto seconds = std::chrono::duration_cast<std::chrono::seconds>(m_silence).count();
+        std::vector<std::wstring> lines = Words(result);
+        lines.push_back(L"git " + command.arguments.front() + L" printed nothing for " + std::to_wstring(seconds) +
+                        L" seconds and was ended");
+        throw GitFailure(std::move(lines));
+    }
+}
+
+bool GitRunner::IsCancelled() const
+{
+    return m_window != nullptr && m_window->IsCancelled();
 }
 
 ProcessResult GitRunner::Run(const GitCommand& command) const
@@ -238,7 +267,12 @@ std::string GitRunner::RunOrThrow(const GitCommand& command) const
 
 std::vector<std::wstring> GitRunner::Words(const ProcessResult& result)
 {
-    std::vector<std::wstring> lines = GitText::Lines(result.errors);
+    std::string errors = result.errors;
+    for (std::size_t mark = 0; (mark = errors.find(LiteralPath, mark)) != std::string::npos;)
+    {
+        errors.erase(mark, LiteralPath.size());
+    }
+    std::vector<std::wstring> lines = GitText::Lines(errors);
     // What "git commit" has to say is in its output.
     if (lines.empty())
     {

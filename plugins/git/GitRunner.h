@@ -7,9 +7,14 @@
 #include <chrono>
 #include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 class OrvixWaitingWindow;
+
+/// Stands before a path in Git's input: the path is a name, not a pattern. The variable GIT_LITERAL_PATHSPECS says the
+/// same of all paths, but hooks inherit it, and their own patterns would find nothing.
+inline constexpr std::string_view LiteralPath = ":(literal)";
 
 /// A command of Git.
 struct GitCommand
@@ -17,13 +22,13 @@ struct GitCommand
     std::vector<std::wstring> arguments{}; ///< without "git"; paths are never here
     std::string input{};                   ///< mostly the paths, each with a zero after it
     bool isQuery = false;                  ///< it takes no lock that is not needed
-    bool patterns = false;                 ///< path arguments are patterns, not literal names
     std::wstring task{};                   ///< what the waiting window says
     std::size_t linesToCome = 0;           ///< lines of output that it prints on its way; 0: it prints its own progress
 };
 
 /// Runs commands of Git for one operation of the provider: on threads of their own, while the waiting window paints the
-/// host. Every failure to run throws `GitFailure`: the user has cancelled it, or it was silent for too long.
+/// host. Every failure to run throws `GitFailure`: the user has cancelled it, or it was silent for too long. When the
+/// user has cancelled, no further command of the operation starts.
 class GitRunner
 {
 public:
@@ -45,6 +50,9 @@ public:
         m_unattended = unattended;
     }
 
+    /// True when the user has cancelled the operation that runs.
+    bool IsCancelled() const;
+
     /// Runs a command; it may fail.
     ProcessResult Run(const GitCommand& command) const;
 
@@ -61,6 +69,10 @@ public:
     static std::vector<std::wstring> Words(const ProcessResult& result);
 
 private:
+    void ShowTask(std::span<const GitCommand> commands) const;
+    void WaitFor(HANDLE end, HANDLE cancel) const;
+    void RequireEnd(const GitCommand& command, const ProcessResult& result) const;
+
     std::wstring m_program;
     std::wstring m_folder;
     bool m_unattended = false;

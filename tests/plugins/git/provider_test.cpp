@@ -133,6 +133,9 @@ TEST_F(GitProvider, SaysWhyAFolderCannotBeOpened)
     m_user.client.lines.clear();
     EXPECT_EQ(m_user.Open(m_git.Folder() + L"\\.git"), Failure);
     EXPECT_TRUE(m_user.client.Shows(L"not in a folder with its files"));
+
+    EXPECT_EQ(m_user.Open(L""), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"empty or too long"));
 }
 
 TEST_F(GitProvider, PassesOnWhatGitSaysOfAForeignOwner)
@@ -246,13 +249,21 @@ TEST_F(GitProvider, RefusesACommitWithItsReason)
     expectRefused(L"Hooked", L"the hook says no");
 }
 
+TEST_F(GitProvider, LeavesHooksTheirOwnPatterns)
+{
+    const std::wstring file = m_git.Commit(L"a.txt", "1\n");
+    m_git.Write(L"a.txt", "2\n");
+    AddHook(m_git, L"pre-commit", "git ls-files --error-unmatch '*.txt'\n");
+    EXPECT_EQ(m_user.CheckIn({file}, L"Seen by the hook"), Success) << testing::PrintToString(m_user.client.lines);
+}
+
 TEST_F(GitProvider, RefusesAnUntrackedFileAndALockFileOfAnother)
 {
     const std::wstring file = m_git.Commit(L"a.txt", "1\n");
     const std::wstring other = m_git.Write(L"other.txt", "1\n");
     m_git.Write(L"a.txt", "2\n");
     EXPECT_EQ(m_user.CheckIn({file, other}, L"Both"), Failure);
-    EXPECT_TRUE(m_user.client.Shows(L"other.txt' did not match any file"));
+    EXPECT_TRUE(m_user.client.Shows(L"pathspec 'other.txt' did not match any file"));
     EXPECT_EQ(Porcelain(), " M a.txt\n?? other.txt\n");
 
     m_git.Write(L".git/index.lock", "");
@@ -269,6 +280,57 @@ TEST_F(GitProvider, RefusesFilesThatGitIgnores)
     EXPECT_EQ(m_user.Add({ignored}), Failure);
     EXPECT_TRUE(m_user.client.Shows(L"ignored by one of your .gitignore files"));
     EXPECT_EQ(Porcelain(), "");
+}
+
+TEST_F(GitProvider, AddsManyFilesAndSaysWhichOneItCannotAdd)
+{
+    m_git.Commit(L".gitignore", "*.tmp\n");
+    m_git({L"-c", L"alias.fill=!mkdir many && for i in $(seq 1500); do echo $i > \"many/[$i].txt\"; done", L"fill"});
+    Texts files;
+    for (int i = 1; i <= 1500; ++i)
+    {
+        files.push_back(m_git.File(L"many/[" + std::to_wstring(i) + L"].txt"));
+    }
+    files.push_back(m_git.Write(L"ignored.tmp", "1\n"));
+    EXPECT_EQ(m_user.Add(files), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"ignored by one of your .gitignore files"));
+    files.pop_back();
+    ASSERT_EQ(m_user.Add(files), Success) << testing::PrintToString(m_user.client.lines);
+    EXPECT_EQ(Names({L"ls-files", L"-z"}).size(), 1501u);
+    EXPECT_EQ(m_git({L"diff"}), "") << "the index has what is on the disk";
+}
+
+TEST_F(GitProvider, ConvertsLineEndingsAndRunsFiltersAsGitDoes)
+{
+    m_git({L"config", L"filter.shout.clean", L"tr a-z A-Z"});
+    m_git({L"config", L"filter.shout.smudge", L"tr A-Z a-z"});
+    m_git.Commit(L".gitattributes", "*.txt text eol=crlf\n*.shout filter=shout\n");
+    const std::wstring text = m_git.Write(L"a.txt", "one\r\ntwo\r\n");
+    const std::wstring shout = m_git.Write(L"a.shout", "quiet\n");
+    ASSERT_EQ(m_user.Add({text, shout}), Success);
+    ASSERT_EQ(m_user.CheckIn({text, shout}, L"Converted"), Success);
+    EXPECT_EQ(m_git({L"cat-file", L"blob", L"HEAD:a.txt"}), "one\ntwo\n");
+    EXPECT_EQ(m_git({L"cat-file", L"blob", L"HEAD:a.shout"}), "QUIET\n");
+    EXPECT_EQ(m_user.Query({text, shout}), (std::vector<unsigned long>{Clean, Clean}));
+
+    m_git.Write(L"a.txt", "damaged");
+    m_git.Write(L"a.shout", "damaged");
+    ASSERT_EQ(m_user.Undo({text, shout}), Success);
+    EXPECT_EQ(m_git.Read(L"a.txt"), "one\r\ntwo\r\n");
+    EXPECT_EQ(m_git.Read(L"a.shout"), "quiet\n");
+}
+
+TEST_F(GitProvider, CommitsANameThatChangesOnlyItsLetterCase)
+{
+    m_git({L"config", L"core.ignoreCase", L"false"});
+    const std::wstring old = m_git.Commit(L"Readme.txt", "a long enough line to be found again\n");
+    EXPECT_EQ(m_user.Query(old), Clean) << "the name is known";
+    m_git({L"-c", L"alias.rename=!mv Readme.txt README.TXT", L"rename"});
+    const std::wstring renamed = m_git.File(L"README.TXT");
+    ASSERT_EQ(m_user.Add({renamed}), Success);
+    ASSERT_EQ(m_user.CheckIn({old, renamed}, L"Louder"), Success) << testing::PrintToString(m_user.client.lines);
+    EXPECT_EQ(m_git({L"diff-tree", L"-r", L"-M", L"--name-status", L"--no-commit-id", L"HEAD"}),
+              "R100\tReadme.txt\tREADME.TXT\n");
 }
 
 TEST_F(GitProvider, ChecksOutForThisSession)

@@ -138,6 +138,19 @@ TEST_F(GitSharing, ACheckInIsPushedWhenTheConfigurationSaysSo)
     EXPECT_EQ(Bare()({L"--git-dir=bare.git", L"log", L"-1", L"--format=%s"}), "By Ada\n");
 }
 
+TEST_F(GitSharing, APushThatHangsIsReportedAndTheCommitStays)
+{
+    m_bobsGit({L"config", L"orvix.push", L"true"});
+    m_bobsGit({L"config", L"orvix.silentLimit", L"2"});
+    AddHook(m_bobsGit, L"pre-push", "sleep 60\n");
+    ASSERT_EQ(m_bob.Open(m_bobsGit.Folder()), Success);
+    m_bobsGit.Write(L"town.txt", "2\n");
+    EXPECT_EQ(m_bob.CheckIn({m_town}, L"Hangs"), Success) << "the commit is made";
+    EXPECT_TRUE(m_bob.client.Shows(L"The commit is made, but it is not pushed:"));
+    EXPECT_TRUE(m_bob.client.Shows(L"git push printed nothing for 2 seconds and was ended"));
+    EXPECT_EQ(m_bobsGit({L"log", L"-1", L"--format=%s"}), "Hangs\n");
+}
+
 TEST_F(GitSharing, WithoutTheSettingNothingIsPushed)
 {
     m_bobsGit.Write(L"town.txt", "2\n");
@@ -215,12 +228,10 @@ class GitLocking : public GitSharing
 protected:
     void SetUp() override
     {
-        m_adasGit.Write(L".gitattributes", "*.psd lockable\n");
-        m_adasGit({L"add", L".gitattributes"});
         AdaPushes(L".gitattributes", "*.psd lockable\n");
         m_bobsGit({L"pull", L"--quiet"});
-        m_adasGit({L"config", L"lfs.url", m_server.Address(L"ada")});
-        m_bobsGit({L"config", L"lfs.url", m_server.Address(L"bob")});
+        m_adasGit.Configure("[lfs]\n\turl = " + GitText::ToUtf8(m_server.Address(L"ada")) + '\n');
+        m_bobsGit.Configure("[lfs]\n\turl = " + GitText::ToUtf8(m_server.Address(L"bob")) + '\n');
         GitSharing::SetUp();
     }
 
