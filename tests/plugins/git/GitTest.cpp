@@ -60,6 +60,12 @@ std::wstring PlainGit::Program()
     return bridge.empty() ? GitProgram::Find(L"") : bridge;
 }
 
+std::wstring PlainGit::ConsoleProgram()
+{
+    const std::wstring bridge = GIT_CONSOLE_BRIDGE;
+    return bridge.empty() ? Program() : bridge;
+}
+
 ProcessCommand PlainGit::MakeProcess(const Texts& arguments, const std::string& input) const
 {
     ProcessCommand command;
@@ -103,6 +109,11 @@ bool PlainGit::Has(std::wstring_view file) const
     return GetFileAttributesW((L"\\\\?\\" + File(file)).c_str()) != INVALID_FILE_ATTRIBUTES;
 }
 
+void PlainGit::Configure(std::string_view settings) const
+{
+    Write(L".git/config", Read(L".git/config").append(settings));
+}
+
 std::wstring PlainGit::Commit(std::wstring_view file, std::string_view bytes, const wchar_t* comment) const
 {
     std::wstring path = Write(file, bytes);
@@ -114,9 +125,10 @@ std::wstring PlainGit::Commit(std::wstring_view file, std::string_view bytes, co
 GitUser::GitUser(HWND__* parent)
 {
     client.unattended = parent == nullptr;
+    const std::wstring program = client.unattended ? PlainGit::Program() : PlainGit::ConsoleProgram();
     WriteBytes(m_config.Path() / L"OrvixProviders.xml",
-               "<OrvixProviders><Provider><Name>Git</Name><AltProviderExecutable>" +
-                   GitText::ToUtf8(PlainGit::Program()) + "</AltProviderExecutable></Provider></OrvixProviders>");
+               "<OrvixProviders><Provider><Name>Git</Name><AltProviderExecutable>" + GitText::ToUtf8(program) +
+                   "</AltProviderExecutable></Provider></OrvixProviders>");
     m_info.SetConfigFilePath(m_config.Text().c_str());
     m_info.SetProviderPluginPath((std::filesystem::path(GIT_PLUGIN).parent_path().wstring() + L'\\').c_str());
     m_info.SetIOrvixClientAccess(&client);
@@ -223,8 +235,7 @@ PlainGit GitTest::MakeRepository(const std::wstring& name) const
     const PlainGit parent(m_folder.Text());
     parent({L"init", L"--quiet", L"--initial-branch=main", name});
     PlainGit repository(m_folder.Text() + L'\\' + name);
-    repository({L"config", L"user.name", L"Ada"});
-    repository({L"config", L"user.email", L"ada@example.org"});
+    repository.Configure("[user]\n\tname = Ada\n\temail = ada@example.org\n");
     return repository;
 }
 
@@ -233,8 +244,8 @@ PlainGit GitTest::Clone(const std::wstring& from, const std::wstring& name) cons
     const PlainGit parent(m_folder.Text());
     parent({L"clone", L"--quiet", from, name});
     PlainGit repository(m_folder.Text() + L'\\' + name);
-    repository({L"config", L"user.name", name});
-    repository({L"config", L"user.email", name + L"@example.org"});
+    const std::string user = GitText::ToUtf8(name);
+    repository.Configure("[user]\n\tname = " + user + "\n\temail = " + user + "@example.org\n");
     return repository;
 }
 

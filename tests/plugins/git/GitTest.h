@@ -76,6 +76,9 @@ public:
     /// The full path of the program.
     static std::wstring Program();
 
+    /// The same for a Git that can be asked to end.
+    static std::wstring ConsoleProgram();
+
     /// How a call is started.
     ProcessCommand MakeProcess(const Texts& arguments, const std::string& input = {}) const;
 
@@ -86,6 +89,9 @@ public:
     std::wstring Write(std::wstring_view file, std::string_view bytes) const;
     std::string Read(std::wstring_view file) const;
     bool Has(std::wstring_view file) const;
+
+    /// Adds settings to the repository's file of them, which is quicker than to run Git for each.
+    void Configure(std::string_view settings) const;
 
     /// Makes a file and commits it with Git.
     std::wstring Commit(std::wstring_view file, std::string_view bytes, const wchar_t* comment = L"By hand") const;

@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
-"""A server for the locks of Git LFS, on the loopback, for as long as its process lives. It speaks the published protocol.
-The first part of an address is the user: http://127.0.0.1:PORT/ada. Prints its port, then each request."""
+"""A server for the locks of Git LFS, on the loopback, for as long as its process lives. It speaks the published
+protocol. The first part of an address is the user: http://127.0.0.1:PORT/ada. Prints its port, then each request."""
 
 import json
 import threading

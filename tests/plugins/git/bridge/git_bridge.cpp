@@ -104,7 +104,7 @@ int wmain(int count, wchar_t** arguments)
     SetConsoleCtrlHandler(&OnControl, TRUE);
 
     std::string code;
-    while (code.empty())
+    while (!code.ends_with('\n')) // a part of it may be written
     {
         if (alive == INVALID_HANDLE_VALUE)
         {
@@ -118,7 +118,6 @@ int wmain(int count, wchar_t** arguments)
             Sleep(Pause);
         }
     }
-    std::error_code ignored;
-    std::filesystem::remove_all(call, ignored);
+    DeleteFileW((call / L"code").c_str()); // the Unix half then deletes the rest
     return std::atoi(code.c_str());
 }
