@@ -230,7 +230,7 @@ std::vector<std::string> GitRepository::Spelled(const Paths& paths) const
 /// The same for files that may have been renamed since they were seen: to a name in another letter case.
 std::vector<std::string> GitRepository::SpelledNow(const Paths& paths)
 {
-    const std::vector<std::string> spelled = Spelled(paths);
+    std::vector<std::string> spelled = Spelled(paths);
     for (std::size_t i = 0; i < paths.size(); ++i)
     {
         if (spelled[i] != Relative(paths[i]))

@@ -23,6 +23,7 @@ public:
     GitSnapshot(std::string_view status, std::string tracked);
     GitSnapshot(const GitSnapshot&) = delete;
     GitSnapshot& operator=(const GitSnapshot&) = delete;
+    ~GitSnapshot() = default;
 
     const GitStatus& Status() const { return m_status; }
 

@@ -246,6 +246,8 @@ class Process::Running
 {
 public:
     Running(ProcessCommand command, Listener listener);
+    Running(const Running&) = delete;
+    Running& operator=(const Running&) = delete;
     ~Running();
 
     bool Step(unsigned long timeout, HANDLE cancel);

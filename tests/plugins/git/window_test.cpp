@@ -139,7 +139,7 @@ private:
             if (HWND window = FindWaitingWindow())
             {
                 sawWindow = true;
-                hostWasDisabled = hostWasDisabled || !IsWindowEnabled(host);
+                hostWasDisabled = hostWasDisabled || IsWindowEnabled(host) == FALSE;
                 std::wstring text = ProgressText(window);
                 if (!text.empty() && (progress.empty() || progress.back() != text))
                 {
