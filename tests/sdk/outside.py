@@ -50,6 +50,36 @@ def write_examples(folder):
             file.write_text(example.text, encoding="utf-8")
 
 
+HELPERS = {
+    "CMakeLists.txt": """
+        cmake_minimum_required(VERSION 3.25)
+        project(helpers LANGUAGES CXX)
+        find_package(OrvixCore 0.1 REQUIRED)
+        add_executable(helpers helpers.cpp)
+        target_link_libraries(helpers PRIVATE OrvixCore::Settings OrvixCore::Waiting OrvixCore::BuildOptions)
+        """,
+    "helpers.cpp": """
+        #include <OrvixProviderSettings.h>
+        #include <OrvixWaitingWindow.h>
+        #include <windows.h>
+        int main()
+        {
+            const OrvixProviderSettings settings(L"C:\\\\none", L"Depot");
+            OrvixWaitingWindow window(nullptr, L"Depot", L"Cancel");
+            return !settings.AreFound() && !window.IsCancelled() ? 0 : 1;
+        }
+        """,
+}
+
+
+def write_helpers(folder):
+    """A program that uses nothing but the static libraries of the SDK."""
+    folder.mkdir()
+    for name, text in HELPERS.items():
+        (folder / name).write_text(text, encoding="utf-8")
+    return folder
+
+
 def build(source, sdk):
     """Builds a project against the installed tree; its build folder."""
     folder = source / "build"
@@ -138,13 +168,15 @@ def check_programs(folder, sdk):
                 pool.submit(build, share / "samples/archive", sdk),
                 pool.submit(build, folder / "plugin", sdk),
                 pool.submit(build, folder / "host", sdk),
+                pool.submit(build, write_helpers(folder / "helpers"), sdk),
                 pool.submit(follow_readme, share / "templates/host", sdk, folder)]
-        (my_plugin, rules), sample, plugin, host, (my_host, found) = (job.result() for job in jobs)
+        (my_plugin, rules), sample, plugin, host, helpers, (my_host, found) = (job.result() for job in jobs)
     sample = sample / "bin/plugins"
     if not re.search(r"^\d+ rules, .*\b0 failed", rules, re.M):
         raise Failure(f"the template plug-in breaks its contract:\n{rules}")
     if found != "Archive\nGit\n":
         raise Failure(f"the template host finds:\n{found}")
+    run(WINE, helpers / "helpers.exe")
     check_host(host, plugin, "Depot", folder)
     check_host(host, sample, "Archive", folder)
     check_template_host(my_host, my_plugin, "My provider", folder)
