@@ -29,6 +29,7 @@ constexpr const char* NewBytes = "the new text, which is longer\r\n";
 
 constexpr unsigned long Out = OrvixFileState::CheckedOut;
 constexpr unsigned long In = OrvixFileState::Controlled;
+constexpr unsigned long Contradiction = OrvixFileState::Controlled | OrvixFileState::NotControlled;
 
 std::string Bytes(const std::wstring& path)
 {
@@ -77,12 +78,18 @@ public:
         Require(result == Success, std::string(operation.name) + " returns " + std::to_string(result));
     }
 
+    /// Throws `RuleSkipped` when the state is none, which the rule of the status bits reports.
     unsigned long State()
     {
         ActiveFiles files({m_path});
         const int result = ValidationOperation::QueryStatus().Run(m_subject, m_provider, files.List());
         Require(result == Success, "QueryStatus returns " + std::to_string(result));
-        return files.Flags().front();
+        const unsigned long flags = files.Flags().front();
+        if (flags == ActiveFiles::Unwritten || (flags & Contradiction) == Contradiction)
+        {
+            throw RuleSkipped("QueryStatus tells no state: " + Hexadecimal(flags));
+        }
+        return flags;
     }
 
     /// Throws `RuleBroken` unless the file has all states of `has` and none of `hasNot`.
