@@ -1,4 +1,5 @@
-# What every target of the tree has in common.
+# What every target of the tree has in common. Projects of their own in the tree include it too.
+cmake_path(GET CMAKE_CURRENT_LIST_DIR PARENT_PATH orvix_root)
 set(CMAKE_CXX_STANDARD 20)
 set(CMAKE_CXX_STANDARD_REQUIRED ON)
 set(CMAKE_CXX_EXTENSIONS OFF)
@@ -35,7 +36,7 @@ if(MSVC)
   target_link_options(orvix_build INTERFACE /DEBUG $<$<NOT:$<CONFIG:Debug>>:/OPT:REF,ICF>)
 else()
   target_compile_options(orvix_build INTERFACE -Wall -Wextra -Wshadow -Wconversion -Werror
-    $<$<CONFIG:Release>:-g1 -fdebug-prefix-map=${PROJECT_SOURCE_DIR}=.>)
+    $<$<CONFIG:Release>:-g1 -fdebug-prefix-map=${orvix_root}=.>)
 endif()
 
 # orvix_precompile(<target>): the target takes the common headers precompiled. With GCC only: definitions of a single
@@ -51,7 +52,7 @@ endfunction()
 if(MINGW)
   file(CONFIGURE OUTPUT ${PROJECT_BINARY_DIR}/precompiled.cpp CONTENT "")
   add_library(orvix_precompiled OBJECT ${PROJECT_BINARY_DIR}/precompiled.cpp)
-  target_precompile_headers(orvix_precompiled PRIVATE ${PROJECT_SOURCE_DIR}/cmake/Precompiled.h)
+  target_precompile_headers(orvix_precompiled PRIVATE ${orvix_root}/cmake/Precompiled.h)
   target_link_libraries(orvix_precompiled PRIVATE orvix_build)
 endif()
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
@@ -83,10 +84,11 @@ public:
     }
     void Text(std::string_view text)
     {
-        const std::size_t size = Checked(text.size());
-        Number(static_cast<std::uint32_t>(size));
-        Bytes(text.data(), size);
-        Bytes("", 1);
+        const auto size = static_cast<std::uint32_t>(Checked(text.size()));
+        std::byte* const place = Advance(sizeof size + size + 1);
+        std::memcpy(place, &size, sizeof size);
+        std::copy_n(text.data(), size, reinterpret_cast<char*>(place) + sizeof size);
+        place[sizeof size + size] = std::byte{0};
     }
 
     void Text(std::wstring_view text)

@@ -11,7 +11,7 @@
 namespace
 {
 
-constexpr DWORD Milliseconds = 60'000;
+constexpr DWORD Milliseconds = 110'000;
 
 UniqueFile NewFile(const std::filesystem::path& path)
 {

@@ -17,7 +17,7 @@ public:
 
     static constexpr unsigned long TimedOut = 0xDEAD;
 
-    /// Runs the program with these arguments in a folder, for at most 60 seconds. `scratch` is a folder for its
+    /// Runs the program with these arguments in a folder, for at most 110 seconds. `scratch` is a folder for its
     /// output.
     static Result Run(const std::filesystem::path& program, const std::filesystem::path& scratch,
                       const std::filesystem::path& folder, const std::vector<std::wstring>& arguments);

@@ -1,0 +1,223 @@
+#include "CurrentFolder.h"
+#include "IsolationTest.h"
+#include "TempFolder.h"
+
+#include <gmock/gmock.h>
+
+#include <functional>
+#include <map>
+#include <sstream>
+
+using testing::HasSubstr;
+
+namespace
+{
+
+/// The library itself, and its proxy.
+std::vector<std::filesystem::path> BothWays()
+{
+    return {ORVIX_MISBEHAVING_SCC, IsolationTest::Proxy()};
+}
+
+/// What a library did, as text.
+class Transcript
+{
+public:
+    template <typename Value>
+    Transcript& operator<<(const Value& value)
+    {
+        m_text << value << '\n';
+        return *this;
+    }
+    std::string Text() const { return m_text.str(); }
+
+private:
+    std::ostringstream m_text;
+};
+
+BOOL List(LPVOID data, BOOL add, LONG status, LPSTR name)
+{
+    auto& transcript = *static_cast<Transcript*>(data);
+    transcript << "listed" << add << status << (name != nullptr ? name : "(null)");
+    return status < 1;
+}
+
+/// Runs without the lines that name a process.
+std::string Printed(std::vector<std::string> lines)
+{
+    std::string text;
+    for (const std::string& line : lines)
+    {
+        text += line.starts_with("process ") ? "" : line + '\n';
+    }
+    return text;
+}
+
+class BothWaysTest : public IsolationTest
+{
+protected:
+    /// Calls every function in every way that a host may.
+    static std::string Run(const std::filesystem::path& file)
+    {
+        Transcript seen;
+        const SccLibrary library(file);
+        const auto window = reinterpret_cast<HWND>(0x1234);
+        seen << library.getVersion();
+        {
+            Session session(library, window);
+            seen << session.result << session.name.data() << session.label.data() << session.capabilities
+                 << session.checkoutLength << session.commentLength;
+            seen << session.Open() << session.user.data() << session.auxPath.data();
+
+            std::array<char, SCC_PRJPATH_SIZE> projectName = {"old"};
+            std::array<char, MAX_PATH> localPath = {};
+            BOOL isNew = TRUE;
+            seen << library.getProjPath(session.context, window, session.user.data(), projectName.data(),
+                                        localPath.data(), session.auxPath.data(), TRUE, &isNew)
+                 << projectName.data() << localPath.data() << isNew;
+
+            LPCMDOPTS block = nullptr;
+            seen << library.getCommandOptions(session.context, window, SCC_COMMAND_GET, nullptr);
+            seen << library.getCommandOptions(session.context, window, SCC_COMMAND_GET, &block) << (block != nullptr);
+
+            std::array<LPCSTR, 3> names = {"C:\\project\\a.txt", "C:\\project\\b \xE4.txt", ""};
+            std::array<LONG, 3> words = {1, -2, 3};
+            seen << library.get(session.context, window, 3, names.data(), SCC_GET_RECURSIVE, block)
+                 << library.get(session.context, window, 0, nullptr, 0, nullptr)
+                 << library.checkout(session.context, window, 2, names.data(), "why", 0, block)
+                 << library.checkout(session.context, window, 2, names.data(), nullptr, 0, nullptr)
+                 << library.uncheckout(session.context, window, 1, names.data(), 0, nullptr)
+                 << library.checkin(session.context, window, 1, names.data(), "line\r\nline", SCC_KEEP_CHECKEDOUT,
+                                    nullptr)
+                 << library.add(session.context, window, 3, names.data(), "", words.data(), nullptr)
+                 << library.history(session.context, window, 1, names.data(), 0, nullptr)
+                 << library.properties(session.context, window, names[1])
+                 << library.runScc(session.context, nullptr, 0, nullptr)
+                 << library.setOption(session.context, SCC_OPT_SHARESUBPROJ, 1) << library.beginBatch()
+                 << library.endBatch();
+            seen << library.queryInfo(session.context, 3, names.data(), words.data()) << words[0] << words[1];
+            seen << library.populateList(session.context, SCC_COMMAND_ADD, 3, names.data(), List, &seen, words.data(),
+                                         SCC_PL_DIR);
+            seen << library.populateList(session.context, SCC_COMMAND_ADD, 3, names.data(), nullptr, &seen,
+                                         words.data(), 0);
+
+            LONG count = 1;
+            LPCSTR* added = names.data();
+            seen << library.addFromScc(session.context, window, &count, &added) << count << added[0] << added[1];
+            seen << library.addFromScc(session.context, window, nullptr, nullptr);
+            seen << library.closeProject(session.context) << session.Uninitialize();
+        }
+        return seen.Text() + Printed(Lines());
+    }
+};
+
+} // namespace
+
+TEST_F(BothWaysTest, EveryFunctionSeesAndReturnsTheSame)
+{
+    const std::string direct = Run(BothWays()[0]);
+    EXPECT_EQ(Run(BothWays()[1]), direct);
+    EXPECT_THAT(
+        direct,
+        HasSubstr("SccCheckin(context, 4660, 1, [\"C:\\project\\a.txt\"], \"line\r\nline\", 4096, no block, )"));
+    EXPECT_THAT(direct, HasSubstr("the host says 0"));
+    EXPECT_THAT(direct, HasSubstr("Anna\naaaaaaaaaa"));
+    EXPECT_EQ(Processes(), 0);
+}
+
+TEST_F(BothWaysTest, ALibraryThatRefusesToStartIsAskedAgain)
+{
+    for (const std::filesystem::path& file : BothWays())
+    {
+        Misbehave(L"fail");
+        const SccLibrary library(file);
+        EXPECT_EQ(Session(library).result, SCC_E_INITIALIZEFAILED);
+        EXPECT_EQ(Session(library).result, SCC_E_INITIALIZEFAILED);
+    }
+    EXPECT_EQ(Processes(), 0);
+}
+
+TEST_F(BothWaysTest, TextArrivesFromThreadsAndBetweenCalls)
+{
+    Misbehave(L"threads-SccGet");
+    for (const std::filesystem::path& file : BothWays())
+    {
+        const SccLibrary library(file);
+        Session session(library);
+        ASSERT_EQ(session.Open(), SCC_OK);
+        ASSERT_EQ(session.Get(), SCC_OK);
+        EXPECT_THAT(Lines(), testing::Contains("from a thread"));
+        Sleep(1500);
+        EXPECT_THAT(Lines(), testing::ElementsAre("between calls"));
+    }
+}
+
+TEST_F(BothWaysTest, ACallTakesAHundredThousandFiles)
+{
+    constexpr LONG Count = 100000;
+    const std::string text = "C:\\project\\" + std::string(200, 'x') + ".txt";
+    std::vector<LPCSTR> names(Count, text.c_str());
+    for (const std::filesystem::path& file : BothWays())
+    {
+        const SccLibrary library(file);
+        Session session(library);
+        std::vector<LONG> status(Count);
+        ASSERT_EQ(library.queryInfo(session.context, Count, names.data(), status.data()), SCC_OK);
+        EXPECT_EQ(status, std::vector<LONG>(Count, static_cast<LONG>(text.size())));
+    }
+}
+
+TEST_F(BothWaysTest, TheLibraryHasTheHostsFolderAndCodePage)
+{
+    Misbehave(L"state-SccGet");
+    const TempFolder first;
+    const TempFolder second;
+    std::vector<std::vector<std::string>> seen;
+    for (const std::filesystem::path& file : BothWays())
+    {
+        const CurrentFolder current(first.Path());
+        const SccLibrary library(file);
+        Session session(library);
+        ASSERT_EQ(session.Open(), SCC_OK);
+        session.Get();
+        const CurrentFolder next(second.Path());
+        session.Get();
+        seen.push_back(Lines());
+        std::erase_if(seen.back(), [](const std::string& line) { return !line.starts_with("folder "); });
+    }
+    EXPECT_EQ(seen[0].size(), 2u);
+    EXPECT_EQ(seen[1], seen[0]);
+}
+
+TEST_F(BothWaysTest, TwoContextsAreApart)
+{
+    for (const std::filesystem::path& file : BothWays())
+    {
+        const SccLibrary library(file);
+        Session one(library);
+        Session two(library);
+        ASSERT_EQ(one.Open(), SCC_OK);
+        ASSERT_EQ(two.Open(), SCC_OK);
+        EXPECT_EQ(one.Uninitialize(), SCC_OK);
+        EXPECT_EQ(two.Get(), SCC_OK);
+    }
+    const SccLibrary library(Proxy());
+    Session one(library);
+    Session two(library);
+    EXPECT_EQ(Processes(), 2);
+}
+
+TEST_F(BothWaysTest, BlocksOfTheLibraryComeBack)
+{
+    for (const std::filesystem::path& file : BothWays())
+    {
+        const SccLibrary library(file);
+        Session session(library);
+        session.Open();
+        LPCMDOPTS block = nullptr;
+        library.getCommandOptions(session.context, nullptr, SCC_COMMAND_GET, &block);
+        Lines();
+        session.Get(block);
+        EXPECT_THAT(Text(), HasSubstr("0, block, )"));
+    }
+}

@@ -1,0 +1,479 @@
+#include "Display.h"
+#include "IsolationTest.h"
+#include "TempFolder.h"
+
+#include <gmock/gmock.h>
+
+#include <cfloat>
+#include <chrono>
+#include <clocale>
+#include <cstdlib>
+#include <filesystem>
+#include <functional>
+#include <tuple>
+
+using testing::AnyOf;
+using testing::Contains;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+namespace
+{
+
+using namespace std::chrono_literals;
+using Clock = std::chrono::steady_clock;
+
+/// A call of one function of the interface on a started context, and its name.
+struct Function
+{
+    const char* name;
+    SCCRTN (*call)(const SccLibrary& library, LPVOID context);
+};
+
+LPCSTR file = "C:\\project\\a.txt";
+std::array<char, SCC_PRJPATH_SIZE> text = {};
+LONG word = 0;
+BOOL isNew = FALSE;
+LPCMDOPTS block = nullptr;
+LPCSTR* added = nullptr;
+
+BOOL KeepGoing(LPVOID, BOOL, LONG, LPSTR)
+{
+    return TRUE;
+}
+
+// SccGetVersion, SccInitialize, SccOpenProject and SccUninitialize have tests of their own.
+constexpr Function Functions[] = {
+    {"SccCloseProject", [](const SccLibrary& library, LPVOID context) { return library.closeProject(context); }},
+    {"SccGetProjPath",
+     [](const SccLibrary& library, LPVOID context) {
+         return library.getProjPath(context, nullptr, text.data(), text.data(), text.data(), text.data(), TRUE, &isNew);
+     }},
+    {"SccGet",
+     [](const SccLibrary& library, LPVOID context) { return library.get(context, nullptr, 1, &file, 0, nullptr); }},
+    {"SccCheckout", [](const SccLibrary& library,
+                       LPVOID context) { return library.checkout(context, nullptr, 1, &file, "", 0, nullptr); }},
+    {"SccUncheckout", [](const SccLibrary& library,
+                         LPVOID context) { return library.uncheckout(context, nullptr, 1, &file, 0, nullptr); }},
+    {"SccCheckin", [](const SccLibrary& library,
+                      LPVOID context) { return library.checkin(context, nullptr, 1, &file, "", 0, nullptr); }},
+    {"SccAdd", [](const SccLibrary& library,
+                  LPVOID context) { return library.add(context, nullptr, 1, &file, "", &word, nullptr); }},
+    {"SccBeginBatch", [](const SccLibrary& library, LPVOID) { return library.beginBatch(); }},
+    {"SccEndBatch", [](const SccLibrary& library, LPVOID) { return library.endBatch(); }},
+    {"SccHistory",
+     [](const SccLibrary& library, LPVOID context) { return library.history(context, nullptr, 1, &file, 0, nullptr); }},
+    {"SccProperties",
+     [](const SccLibrary& library, LPVOID context) { return library.properties(context, nullptr, file); }},
+    {"SccQueryInfo",
+     [](const SccLibrary& library, LPVOID context) { return library.queryInfo(context, 1, &file, &word); }},
+    {"SccPopulateList",
+     [](const SccLibrary& library, LPVOID context) {
+         return library.populateList(context, SCC_COMMAND_GET, 1, &file, KeepGoing, nullptr, &word, 0);
+     }},
+    {"SccRunScc", [](const SccLibrary& library, LPVOID context) { return library.runScc(context, nullptr, 1, &file); }},
+    {"SccGetCommandOptions",
+     [](const SccLibrary& library, LPVOID context) {
+         return library.getCommandOptions(context, nullptr, SCC_COMMAND_GET, &block);
+     }},
+    {"SccAddFromScc",
+     [](const SccLibrary& library, LPVOID context) { return library.addFromScc(context, nullptr, &word, &added); }},
+    {"SccSetOption", [](const SccLibrary& library, LPVOID context) { return library.setOption(context, 6, 1); }},
+};
+
+/// A way to die, and what the host's user reads about it.
+struct Death
+{
+    const char* defect;
+    const char* said;
+};
+
+constexpr Death Deaths[] = {{"crash", "crashed in FUNCTION: access violation (0xC0000005) in "},
+                            {"exit", "ended its process in FUNCTION, with exit code 3"},
+                            {"kill", "ended its process in FUNCTION, with exit code 9"},
+                            {"hang", "hangs in FUNCTION and was ended: no answer and no window for 2 seconds"}};
+
+std::string Replace(std::string sentence, const std::string& what, const std::string& by)
+{
+    return sentence.replace(sentence.find(what), what.size(), by);
+}
+
+std::wstring Wide(const std::string& ascii)
+{
+    return {ascii.begin(), ascii.end()};
+}
+
+class MisbehaviourTest : public IsolationTest
+{
+protected:
+    /// A fresh process works, after the library behaves again.
+    void ExpectWorks() const
+    {
+        Misbehave(L"");
+        Session session(m_library);
+        EXPECT_EQ(session.result, SCC_OK);
+        EXPECT_EQ(session.Open(), SCC_OK);
+        EXPECT_EQ(session.Get(), SCC_OK);
+        EXPECT_EQ(session.Uninitialize(), SCC_OK);
+        EXPECT_EQ(Processes(), 0);
+    }
+
+    const SccLibrary m_library{Proxy()};
+};
+
+class EveryFunction : public MisbehaviourTest, public testing::WithParamInterface<std::tuple<Function, Death>>
+{
+};
+
+std::string NameOf(const testing::TestParamInfo<std::tuple<Function, Death>>& info)
+{
+    return std::string(std::get<Function>(info.param).name) + '_' + std::get<Death>(info.param).defect;
+}
+
+} // namespace
+
+TEST_P(EveryFunction, MayEndTheProcessAndTheHostGoesOn)
+{
+    const auto& [function, death] = GetParam();
+    Misbehave(Wide(std::string(death.defect) + '-' + function.name));
+    {
+        Session session(m_library);
+        ASSERT_EQ(session.Open(), SCC_OK);
+        const Clock::time_point start = Clock::now();
+        EXPECT_EQ(function.call(m_library, session.context), SCC_E_NONSPECIFICERROR);
+        EXPECT_LT(Clock::now() - start, 20s);
+        EXPECT_THAT(Text(), HasSubstr("error: Isolated " + Replace(death.said, "FUNCTION", function.name)));
+        EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
+        EXPECT_EQ(function.call(m_library, session.context), SCC_E_NONSPECIFICERROR);
+        EXPECT_EQ(session.Open(), SCC_E_NONSPECIFICERROR);
+        EXPECT_EQ(session.Uninitialize(), SCC_E_NONSPECIFICERROR);
+        EXPECT_EQ(Text(), "") << "it is said once";
+    }
+    ExpectWorks();
+}
+
+INSTANTIATE_TEST_SUITE_P(, EveryFunction, testing::Combine(testing::ValuesIn(Functions), testing::ValuesIn(Deaths)),
+                         NameOf);
+
+namespace
+{
+
+class EveryDeath : public MisbehaviourTest, public testing::WithParamInterface<Death>
+{
+protected:
+    void MisbehaveIn(const char* function) const { Misbehave(Wide(std::string(GetParam().defect) + '-' + function)); }
+};
+
+} // namespace
+
+TEST_P(EveryDeath, MayComeBeforeTheStart)
+{
+    MisbehaveIn("SccGetVersion");
+    EXPECT_EQ(m_library.getVersion(), 0);
+    MisbehaveIn("SccInitialize");
+    EXPECT_EQ(Session(m_library).result, SCC_E_NONSPECIFICERROR);
+    ExpectWorks();
+}
+
+TEST_P(EveryDeath, MayComeWhenTheProjectIsOpened)
+{
+    MisbehaveIn("SccOpenProject");
+    Session session(m_library);
+    EXPECT_EQ(session.Open(), SCC_E_NONSPECIFICERROR);
+    EXPECT_THAT(Text(), HasSubstr(Replace(GetParam().said, "FUNCTION", "SccOpenProject")));
+    EXPECT_EQ(session.Uninitialize(), SCC_E_NONSPECIFICERROR);
+    ExpectWorks();
+}
+
+TEST_P(EveryDeath, MayComeAtTheEnd)
+{
+    MisbehaveIn("SccUninitialize");
+    Session session(m_library);
+    ASSERT_EQ(session.Open(), SCC_OK);
+    EXPECT_EQ(session.Uninitialize(), SCC_E_NONSPECIFICERROR);
+    EXPECT_THAT(Text(), HasSubstr(Replace(GetParam().said, "FUNCTION", "SccUninitialize")));
+    ExpectWorks();
+}
+
+INSTANTIATE_TEST_SUITE_P(, EveryDeath, testing::ValuesIn(Deaths),
+                         [](const auto& death) { return std::string(death.param.defect); });
+
+TEST_F(MisbehaviourTest, AnIdleProcessMayBeKilled)
+{
+    Session session(m_library);
+    ASSERT_EQ(session.Open(), SCC_OK);
+    const std::vector<std::string> lines = Lines();
+    const auto line =
+        std::find_if(lines.begin(), lines.end(), [](const std::string& one) { return one.starts_with("process "); });
+    ASSERT_NE(line, lines.end());
+    const UniqueKernelHandle process(
+        OpenProcess(PROCESS_TERMINATE, FALSE, static_cast<DWORD>(std::stoul(line->substr(8)))));
+    ASSERT_TRUE(TerminateProcess(process.Get(), 5));
+    EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
+    EXPECT_THAT(Text(), HasSubstr("ended its process in SccGet, with exit code 5"));
+    EXPECT_EQ(session.Uninitialize(), SCC_E_NONSPECIFICERROR);
+    ExpectWorks();
+}
+
+TEST_F(MisbehaviourTest, OtherCrashesHaveTheirNames)
+{
+    const std::pair<const wchar_t*, const char*> crashes[] = {
+        {L"overflow-SccGet", "SccGet"}, // Wine ends the process without a word
+        {L"thread-crash-SccGet", "access violation (0xC0000005) in "},
+        {L"abort-SccGet", "SccGet"}};
+    for (const auto& [defect, said] : crashes)
+    {
+        Misbehave(defect);
+        Session session(m_library);
+        session.Open();
+        Lines();
+        EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
+        EXPECT_THAT(Text(), HasSubstr(said));
+    }
+    ExpectWorks();
+}
+
+TEST_F(MisbehaviourTest, AnExceptionIsTheFailureThatOrvixCoreMakesOfIt)
+{
+    Misbehave(L"throw-SccGet");
+    Session session(m_library);
+    session.Open();
+    EXPECT_EQ(session.Get(), SCC_E_INITIALIZEFAILED);
+    EXPECT_EQ(m_library.closeProject(session.context), SCC_OK) << "the process lives on";
+}
+
+TEST_F(MisbehaviourTest, ALibraryMayCrashOrRefuseWhenItIsLoaded)
+{
+    for (const wchar_t* defect : {L"crash-load", L"refuse-load"})
+    {
+        Misbehave(defect);
+        EXPECT_EQ(m_library.getVersion(), 0);
+        EXPECT_LT(Session(m_library).result, SCC_OK);
+    }
+    ExpectWorks();
+}
+
+TEST_F(MisbehaviourTest, ACrashInOneContextSparesTheOthers)
+{
+    Session good(m_library);
+    ASSERT_EQ(good.Open(), SCC_OK);
+    Misbehave(L"crash-SccGet");
+    Session bad(m_library);
+    ASSERT_EQ(bad.Open(), SCC_OK);
+    EXPECT_EQ(bad.Get(), SCC_E_NONSPECIFICERROR);
+    EXPECT_EQ(good.Get(), SCC_OK);
+}
+
+TEST_F(MisbehaviourTest, ALibraryThatTalksIsNotEnded)
+{
+    Misbehave(L"talk-SccGet");
+    Session session(m_library);
+    session.Open();
+    const Clock::time_point start = Clock::now();
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_GE(Clock::now() - start, 2900ms);
+}
+
+TEST_F(MisbehaviourTest, TheHostsProcessStaysAsItIs)
+{
+    Misbehave(L"change-SccGet");
+    Session session(m_library);
+    session.Open();
+    const std::filesystem::path folder = std::filesystem::current_path();
+    const std::string locale = std::setlocale(LC_ALL, nullptr);
+    const DWORD dllDirectory = GetDllDirectoryW(0, nullptr);
+    unsigned before = 0;
+    _controlfp_s(&before, 0, 0);
+    EXPECT_EQ(session.Get(), SCC_OK);
+    unsigned after = 0;
+    _controlfp_s(&after, 0, 0);
+    EXPECT_EQ(after, before);
+    EXPECT_EQ(std::filesystem::current_path(), folder);
+    EXPECT_EQ(std::setlocale(LC_ALL, nullptr), locale);
+    EXPECT_EQ(GetDllDirectoryW(0, nullptr), dllDirectory);
+    EXPECT_EQ(session.Get(), SCC_OK);
+}
+
+TEST_F(MisbehaviourTest, ManyCrashesLeaveNothingBehind)
+{
+    // ORVIX_CRASHES=1000 makes it a long test.
+    const char* const wanted = std::getenv("ORVIX_CRASHES");
+    const int crashes = wanted != nullptr ? std::atoi(wanted) : 10;
+    const TempFolder temporary; // of this process and those that it starts
+    SetEnvironmentVariableW(L"TMP", temporary.Text().c_str());
+    SetEnvironmentVariableW(L"TEMP", temporary.Text().c_str());
+    const auto files = [&] {
+        const std::filesystem::path library = Proxy().parent_path();
+        return std::distance(std::filesystem::directory_iterator(temporary.Path()), {}) +
+               std::distance(std::filesystem::directory_iterator(library), {});
+    };
+    Misbehave(L"crash-SccGet");
+    DWORD handlesBefore = 0;
+    std::ptrdiff_t filesBefore = 0;
+    for (int i = 0; i <= crashes; ++i)
+    {
+        Session session(m_library);
+        ASSERT_EQ(session.Open(), SCC_OK) << i;
+        ASSERT_EQ(session.Get(), SCC_E_NONSPECIFICERROR) << i;
+        Lines();
+        session.Uninitialize();
+        if (i == 0) // what is made once
+        {
+            GetProcessHandleCount(GetCurrentProcess(), &handlesBefore);
+            filesBefore = files();
+        }
+    }
+    DWORD handles = 0;
+    GetProcessHandleCount(GetCurrentProcess(), &handles);
+    EXPECT_EQ(handles, handlesBefore);
+    EXPECT_EQ(files(), filesBefore);
+    EXPECT_EQ(Processes(), 0);
+    ExpectWorks();
+}
+
+// Windows
+
+namespace
+{
+
+constexpr UINT Question = WM_APP;
+
+/// A window of the host, which counts its messages and calls the library when a timer fires.
+class HostWindow
+{
+public:
+    explicit HostWindow(const SccLibrary& library) : m_library(library)
+    {
+        WNDCLASSW windowClass{};
+        windowClass.lpszClassName = L"IsolationHost";
+        windowClass.lpfnWndProc = Procedure;
+        RegisterClassW(&windowClass);
+        m_window = CreateWindowExW(0, L"IsolationHost", L"", WS_POPUP | WS_VISIBLE, 0, 0, 100, 100, nullptr, nullptr,
+                                   nullptr, this);
+        SetWindowLongPtrW(m_window, GWLP_USERDATA, reinterpret_cast<LONG_PTR>(this));
+    }
+    HostWindow(const HostWindow&) = delete;
+    HostWindow& operator=(const HostWindow&) = delete;
+    ~HostWindow() { DestroyWindow(m_window); }
+
+    HWND Get() const { return m_window; }
+
+    int timers = 0;
+    int questions = 0;
+    int clicks = 0;
+    SCCRTN inner = SCC_OK; ///< the result of a call of the library within another one
+    LPVOID context = nullptr;
+
+private:
+    static LRESULT CALLBACK Procedure(HWND window, UINT message, WPARAM first, LPARAM second)
+    {
+        auto* const self = reinterpret_cast<HostWindow*>(GetWindowLongPtrW(window, GWLP_USERDATA));
+        if (self == nullptr)
+        {
+            return DefWindowProcW(window, message, first, second);
+        }
+        self->timers += message == WM_TIMER;
+        self->questions += message == Question;
+        self->clicks += message == WM_LBUTTONDOWN;
+        if (message == WM_TIMER)
+        {
+            self->inner = self->m_library.closeProject(self->context);
+        }
+        return message == Question ? 42 : DefWindowProcW(window, message, first, second);
+    }
+
+    const SccLibrary& m_library;
+    HWND m_window = nullptr;
+};
+
+class MisbehaviourInWindows : public MisbehaviourTest
+{
+protected:
+    void SetUp() override
+    {
+        MisbehaviourTest::SetUp();
+        if (!HasDisplay())
+        {
+            GTEST_SKIP() << "no display to show windows on";
+        }
+    }
+};
+
+} // namespace
+
+TEST_F(MisbehaviourInWindows, TheHostsWindowsLiveDuringASlowCallAndDoNotReenterTheLibrary)
+{
+    Misbehave(L"slow-SccGet");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    window.context = session.context;
+    SetTimer(window.Get(), 1, 50, nullptr);
+    PostMessageW(window.Get(), WM_LBUTTONDOWN, 0, 0);
+    EXPECT_EQ(session.Get(), SCC_OK);
+    KillTimer(window.Get(), 1);
+    EXPECT_GT(window.timers, 3);
+    EXPECT_EQ(window.clicks, 0);
+    EXPECT_EQ(window.inner, SCC_E_NONSPECIFICERROR);
+    EXPECT_EQ(session.Get(), SCC_OK);
+}
+
+TEST_F(MisbehaviourTest, ThreadsWaitForEachOther)
+{
+    Misbehave(L"slow-SccGet");
+    Session session(m_library);
+    session.Open();
+    SCCRTN result = SCC_E_NONSPECIFICERROR;
+    std::thread other([&] { result = session.Get(); });
+    EXPECT_EQ(session.Get(), SCC_OK);
+    other.join();
+    EXPECT_EQ(result, SCC_OK);
+}
+
+TEST_F(MisbehaviourInWindows, TheLibraryReachesTheHostsWindow)
+{
+    Misbehave(L"message-SccGet");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_EQ(window.questions, 1);
+    EXPECT_THAT(Text(), HasSubstr("the window answers 42"));
+}
+
+TEST_F(MisbehaviourInWindows, AWindowThatACrashedDialogDisabledGetsInputAgain)
+{
+    Misbehave(L"window-SccGet crash-in-window");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
+    EXPECT_TRUE(IsWindowEnabled(window.Get()));
+}
+
+TEST_F(MisbehaviourInWindows, TheQuitMessageReachesTheHostsLoop)
+{
+    Misbehave(L"slow-SccGet");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    PostQuitMessage(7);
+    EXPECT_EQ(session.Get(), SCC_OK);
+    MSG message{};
+    while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE) && message.message != WM_QUIT)
+    {
+    }
+    EXPECT_EQ(message.message, static_cast<UINT>(WM_QUIT));
+    EXPECT_EQ(message.wParam, 7u);
+}
+
+TEST_F(MisbehaviourInWindows, ALibraryThatShowsAWindowIsNotEnded)
+{
+    Misbehave(L"window-SccGet");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    const Clock::time_point start = Clock::now();
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_GE(Clock::now() - start, 2900ms);
+}
