@@ -43,6 +43,7 @@ void BenchDialogs(MeasureTable& table);
 void BenchFilters(MeasureTable& table);
 void BenchGit(MeasureTable& table);
 void BenchInitialize(MeasureTable& table);
+void BenchIsolation(MeasureTable& table);
 void BenchLists(MeasureTable& table);
 void BenchMsscci(MeasureTable& table);
 void BenchNotifications(MeasureTable& table);

@@ -15,6 +15,7 @@ struct Group
 
 constexpr Group Groups[] = {
     {"msscci", BenchMsscci},
+    {"isolation", BenchIsolation},
     {"initialize", BenchInitialize},
     {"lists", BenchLists},
     {"operations", BenchOperations},
