@@ -819,6 +819,24 @@ TEST_F(DoctorOnRegistrations, NameTheFunctionsThatALibraryLacks)
     EXPECT_EQ(missing.count("it does not export SccHistory, so showing the history fails"), 1u);
 }
 
+TEST_F(DoctorOnRegistrations, AskAnIsolatedLibraryWhetherItLoads)
+{
+    const TempFolder folder;
+    for (const wchar_t* file : {L"scc_proxy.dll", L"scc_host64.exe"})
+    {
+        std::filesystem::copy_file(BuiltFile(file), folder.Path() / file);
+    }
+    const std::filesystem::path settings = folder.Path() / L"scc_proxy.ini";
+    const std::string section = "[Isolation]\nName=Isolated\nLibrary=";
+    Install(L"value", L"Isolated", (folder.Path() / L"scc_proxy.dll").wstring());
+
+    WriteBytes(settings, section + std::filesystem::path(ORVIX_TALKING_MSSCCI).string());
+    EXPECT_EQ(CodesOf(Candidate(Report(), "value")), Codes{"isolated"});
+
+    WriteBytes(settings, section + "C:\\gone.dll");
+    EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"isolated", "!isolated-library-fails"}));
+}
+
 TEST_F(DoctorOnRegistrations, FindWhatIsOnlyInThe32BitView)
 {
     TemporaryRegistryKey list32(List32);

@@ -5,6 +5,8 @@
 
 #include <gmock/gmock.h>
 
+#include <fstream>
+
 namespace
 {
 
@@ -124,7 +126,7 @@ TEST_F(Registration, RefusesAPathThatWouldNotFitIntoTheLibrarysBuffer)
                 HasSubstr("orvix: no such library: "));
 }
 
-TEST_F(Registration, RefusesWhatIsNo64BitMSSCCILibrary)
+TEST_F(Registration, RefusesWhatIsNoMSSCCILibrary)
 {
     const std::filesystem::path fakes(ORVIX_FAKE_PLUGINS);
     Write(L"text.dll", "no library");
@@ -140,7 +142,7 @@ TEST_F(Registration, RefusesWhatIsNo64BitMSSCCILibrary)
     };
     if (std::filesystem::exists(fakes / L"wrongbitness.dll"))
     {
-        bad.emplace_back(fakes / L"wrongbitness.dll", "not a 64-bit library: ");
+        bad.emplace_back(fakes / L"wrongbitness.dll", "no MSSCCI library, it has no SccGetVersion: ");
     }
     for (const auto& [path, message] : bad)
     {
@@ -236,4 +238,64 @@ TEST_F(Registration, ThatFailsKeepsThePathThatWasThere)
     SetAccess(List().Path(), ReadAndDelete);
     EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").code, Failed);
     EXPECT_EQ(Path(L"Talking"), copy.wstring());
+}
+
+namespace
+{
+
+/// The folder of an isolated library.
+std::filesystem::path IsolatedPath(const wchar_t* name)
+{
+    return std::filesystem::path(L"C:\\ProgramData\\OrvixCore Isolation") / name;
+}
+
+} // namespace
+
+TEST_F(Registration, OfAnIsolatedLibraryMakesAFolderWithItsProxy)
+{
+    const auto result =
+        RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talk/ing", L"--isolated", L"--patience", L"77"});
+    EXPECT_EQ(result.code, Success) << result.errors;
+    EXPECT_EQ(result.output, "registered Talk/ing: " + Library() + "\nit runs isolated, in a process of its own\n");
+    const std::filesystem::path folder = IsolatedPath(L"TALK%2FING");
+    EXPECT_EQ(Path(L"Talk/ing"), (folder / L"scc_proxy.dll").wstring());
+    EXPECT_TRUE(std::filesystem::exists(folder / L"scc_proxy.dll"));
+    EXPECT_TRUE(std::filesystem::exists(folder / L"scc_host64.exe"));
+    EXPECT_EQ(GetPrivateProfileIntW(L"Isolation", L"SecondsWithoutAnswer", 0, (folder / L"scc_proxy.ini").c_str()),
+              77u);
+    EXPECT_EQ(Providers().output, "Index  Provider\n0      Talk/ing\n");
+
+    EXPECT_EQ(Unregister(L"talk/ing").code, Success);
+    EXPECT_FALSE(std::filesystem::exists(folder));
+    EXPECT_EQ(Path(L"Talk/ing"), std::nullopt);
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryRemovesWhatLiesInItsFolder)
+{
+    const std::filesystem::path folder = IsolatedPath(L"TALKING");
+    std::filesystem::create_directories(folder);
+    std::ofstream(folder / L"version.dll") << "a library that must not be loaded";
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"}).code, Success);
+    EXPECT_FALSE(std::filesystem::exists(folder / L"version.dll"));
+    EXPECT_TRUE(std::filesystem::exists(folder / L"scc_proxy.dll"));
+
+    EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").output,
+              "replaced Talking: " + Library() + " instead of " + (folder / L"scc_proxy.dll").string() + "\n");
+    EXPECT_FALSE(std::filesystem::exists(folder)) << "it is not isolated any more";
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryIsRefusedAsAnyOther)
+{
+    const auto result = RunExactly({L"register", BuiltFile(L"orvix.exe").wstring(), L"Talking", L"--isolated"});
+    EXPECT_EQ(result.code, NotFound);
+    EXPECT_FALSE(std::filesystem::exists(IsolatedPath(L"TALKING")));
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryWorksInAHost)
+{
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"}).code, Success);
+    const auto direct =
+        RunExactly({L"open", L"--sources", L"msscci", L"--provider", L"Talking", L"--project", Scratch().wstring()});
+    EXPECT_EQ(direct.code, Success) << direct.errors;
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
 }

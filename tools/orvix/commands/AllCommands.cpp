@@ -201,9 +201,10 @@ constexpr Command Table[] = {
     {
         .name = "register",
         .description = "Register an MSSCCI library on this machine",
-        .examples = "  orvix register archive_msscci.dll \"Archive MSSCCI\"",
-        .takes = Argument::Path | Argument::Name,
-        .pathHelp = "The library, a 64-bit DLL",
+        .examples = "  orvix register archive_msscci.dll \"Archive MSSCCI\"\n"
+                    "  orvix register depot32.dll Depot --isolated --patience 600",
+        .takes = Argument::Path | Argument::Name | Argument::Isolation,
+        .pathHelp = "The library, a DLL; a 32-bit one is always isolated",
         .run = RegistrationCommands::Register,
     },
     {

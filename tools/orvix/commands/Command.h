@@ -22,6 +22,7 @@ inline constexpr unsigned int Prompt = 0x80;       ///< ID of a prompt
 inline constexpr unsigned int Answer = 0x100;      ///< ANSWER to a prompt
 inline constexpr unsigned int PromptOrAll = 0x200; ///< ID of a prompt, or --all
 inline constexpr unsigned int Force = 0x400;       ///< --force
+inline constexpr unsigned int Isolation = 0x800;   ///< --isolated and --patience
 
 } // namespace Argument
 

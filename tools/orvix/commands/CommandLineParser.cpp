@@ -168,6 +168,7 @@ private:
     void AddArguments(CLI::App& app, const Command& command);
     void AddPathArguments(CLI::App& app, const Command& command);
     void AddPromptArguments(CLI::App& app, const Command& command);
+    void AddIsolationOptions(CLI::App& app);
     void AddValidationOptions(CLI::App& app);
 
     const Command& ChosenCommand() const;
@@ -244,6 +245,10 @@ void Parser::AddArguments(CLI::App& app, const Command& command)
     {
         app.add_option("NAME", m_texts.name, "Its name as a provider")->required();
     }
+    if ((command.takes & Argument::Isolation) != 0)
+    {
+        AddIsolationOptions(app);
+    }
     if ((command.takes & Argument::Validation) != 0)
     {
         AddValidationOptions(app);
@@ -297,6 +302,14 @@ void Parser::AddPromptArguments(CLI::App& app, const Command& command)
         which->add_flag("--all", m_values.all, "Every prompt that is not locked");
         which->require_option(1);
     }
+}
+
+void Parser::AddIsolationOptions(CLI::App& app)
+{
+    app.add_flag("--isolated", m_values.isolated, "Run it in a process of its own");
+    app.add_option("--patience", m_values.patience,
+                   "Seconds until an isolated call without an answer or a window is ended (default: 300)")
+        ->check(CLI::Range(1, 86400));
 }
 
 void Parser::AddValidationOptions(CLI::App& app)

@@ -57,8 +57,19 @@ LSTATUS WriteText(const wchar_t* keyPath, const wchar_t* valueName, const std::w
                            static_cast<DWORD>((text.size() + 1) * sizeof(wchar_t)));
 }
 
-/// Throws `ToolError` when no host could use the library. None of the library's code runs.
-void CheckLibrary(const std::wstring& path)
+} // namespace
+
+Registration::Registration(const std::wstring& name) : m_name(name), m_keyPath(OwnKeys + name)
+{
+    const auto isForbidden = [](wchar_t c) { return c == L'\\' || c < 0x20 || (c >= 0x7F && c < 0xA0); };
+    if (name.empty() || name.size() > MaxName || std::any_of(name.begin(), name.end(), isForbidden))
+    {
+        throw ToolError(ExitCode::BadUsage, L"a provider's name has 1 to " + std::to_wstring(MaxName) +
+                                                L" characters, and no backslash or control character among them");
+    }
+}
+
+void Registration::CheckLibrary(const std::wstring& path)
 {
     if (path.size() > MaxPath)
     {
@@ -81,25 +92,19 @@ void CheckLibrary(const std::wstring& path)
     }
 }
 
-} // namespace
-
-Registration::Registration(const std::wstring& name) : m_name(name), m_keyPath(OwnKeys + name)
-{
-    const auto isForbidden = [](wchar_t c) { return c == L'\\' || c < 0x20 || (c >= 0x7F && c < 0xA0); };
-    if (name.empty() || name.size() > MaxName || std::any_of(name.begin(), name.end(), isForbidden))
-    {
-        throw ToolError(ExitCode::BadUsage, L"a provider's name has 1 to " + std::to_wstring(MaxName) +
-                                                L" characters, and no backslash or control character among them");
-    }
-}
-
 std::optional<std::wstring> Registration::Set(const std::wstring& library)
 {
     CheckLibrary(library);
+    return Set([&library] { return library; });
+}
+
+std::optional<std::wstring> Registration::Set(const std::function<std::wstring()>& make)
+{
     const std::vector<Entry> list = ReadList();
     RefuseForeign(list);
     const bool isListed = std::any_of(list.begin(), list.end(), [this](const Entry& entry) { return IsOwn(entry); });
     const Previous previous{ReadText(m_keyPath, ServerName), ReadText(m_keyPath, ServerPath)};
+    const std::wstring library = make();
     try
     {
         Write(library, isListed);

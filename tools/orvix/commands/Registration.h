@@ -1,5 +1,6 @@
 #pragma once
 
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
@@ -19,6 +20,13 @@ public:
     /// leaves the registry as it was: with `ExitCode::NotFound` when there is no such library, with `ExitCode::Failed`
     /// when the name belongs to another program.
     std::optional<std::wstring> Set(const std::wstring& library);
+
+    /// The same for a library that `make` makes once nothing else speaks against the registration.
+    std::optional<std::wstring> Set(const std::function<std::wstring()>& make);
+
+    /// Throws `ToolError` with `ExitCode::NotFound` when a 64-bit host cannot use the library, with
+    /// `ExitCode::BadUsage` when its path is too long. None of the library's code runs.
+    static void CheckLibrary(const std::wstring& path);
 
     /// Removes the registration. Throws `ToolError`: with `ExitCode::NotFound` when there is none, with
     /// `ExitCode::Failed` when it belongs to another program.

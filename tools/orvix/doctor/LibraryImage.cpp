@@ -11,12 +11,14 @@
 #include <filesystem>
 #include <fstream>
 #include <set>
+#include <string_view>
 
 namespace
 {
 
 constexpr std::size_t MaxName = 260;
 constexpr std::size_t MaxImports = 1000;
+constexpr DWORD MaxExports = 10000;
 
 /// Reads parts of a program file.
 class ImageReader
@@ -86,6 +88,27 @@ std::vector<std::string> ReadImports(ImageReader& reader, DWORD address)
         names.push_back(reader.ReadName(descriptor.Name));
     }
     return names;
+}
+
+bool HasExport(ImageReader& reader, DWORD address, std::string_view name)
+{
+    IMAGE_EXPORT_DIRECTORY directory = {};
+    const std::optional<std::uint64_t> table = reader.OffsetOf(address);
+    if (!table || !reader.Read(*table, directory))
+    {
+        return false;
+    }
+    const std::optional<std::uint64_t> names = reader.OffsetOf(directory.AddressOfNames);
+    const DWORD count = std::min<DWORD>(directory.NumberOfNames, MaxExports);
+    DWORD nameAddress = 0;
+    for (DWORD i = 0; names && i < count && reader.Read(*names + i * sizeof nameAddress, nameAddress); ++i)
+    {
+        if (reader.ReadName(nameAddress) == name)
+        {
+            return true;
+        }
+    }
+    return false;
 }
 
 bool IsInWindowsFolder(const std::wstring& path)
@@ -158,6 +181,22 @@ std::optional<LibraryImage> LibraryImage::Read(const std::wstring& path)
             ReadImports(reader, headers.OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_IMPORT].VirtualAddress);
     }
     return image;
+}
+
+bool LibraryImage::Is32BitWith(const std::wstring& path, std::string_view name)
+{
+    ImageReader reader(path);
+    IMAGE_DOS_HEADER start = {};
+    IMAGE_NT_HEADERS32 headers = {};
+    return reader.Read(0, start) && start.e_lfanew >= 0 &&
+           reader.Read(static_cast<std::uint64_t>(start.e_lfanew), headers) &&
+           headers.OptionalHeader.Magic == IMAGE_NT_OPTIONAL_HDR32_MAGIC &&
+           headers.OptionalHeader.NumberOfRvaAndSizes > IMAGE_DIRECTORY_ENTRY_EXPORT &&
+           reader.ReadSections(static_cast<std::uint64_t>(start.e_lfanew) +
+                                   offsetof(IMAGE_NT_HEADERS32, OptionalHeader) +
+                                   headers.FileHeader.SizeOfOptionalHeader,
+                               headers.FileHeader.NumberOfSections) &&
+           HasExport(reader, headers.OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_EXPORT].VirtualAddress, name);
 }
 
 bool LibraryImage::IsFor64Bit() const

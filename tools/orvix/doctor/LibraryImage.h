@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 /// The headers of a library file. The file is read, never loaded, and nothing in it is trusted.
@@ -12,6 +13,9 @@ struct LibraryImage
 {
     /// Reads the file of this path. Empty when it cannot be read or is not a Windows program file.
     static std::optional<LibraryImage> Read(const std::wstring& path);
+
+    /// Whether the file of this path is a 32-bit library that exports the function of this name.
+    static bool Is32BitWith(const std::wstring& path, std::string_view name);
 
     /// Whether a 64-bit (x64) process can load it.
     bool IsFor64Bit() const;

@@ -5,6 +5,7 @@
 #include "DllDirectoryScope.h"
 #include "FilePath.h"
 #include "IsolatedLoad.h"
+#include "IsolationFindings.h"
 #include "LibraryModule.h"
 #include "LoadFindings.h"
 #include "ModulePath.h"
@@ -308,6 +309,7 @@ CandidateExams::About RegistrationExaminer::ExamineLibrary(const std::wstring& s
     else
     {
         AddMissingExports(findings, module.Get());
+        IsolationFindings::Add(findings, ModulePath(module.Get()));
     }
     if (module || error != ERROR_MOD_NOT_FOUND)
     {
@@ -363,7 +365,8 @@ void RegistrationExaminer::Add32BitCandidate(const std::wstring& keyPath)
     else
     {
         candidate.AddProblem("only-32-bit", L"it is registered only in the 32-bit view of the registry, which a 64-bit "
-                                            L"host never sees");
+                                            L"host never sees; orvix register PATH NAME --isolated makes the library "
+                                            L"available to it");
     }
 }
 

@@ -41,6 +41,8 @@ struct CommandLine
 
     // Of register and unregister.
     std::wstring name;
+    bool isolated = false;
+    unsigned int patience = 300; ///< seconds, 1 to 86,400
 
     // Of validate.
     bool msscci = false;
