@@ -11,6 +11,12 @@ using namespace std::chrono_literals;
 // host.
 constexpr auto ShortCall = 200ms;
 
+// The small window itself waits for half a second before it appears.
+constexpr auto UntilWindow = 4500ms;
+
+// Between two looks at the library while the small window is shown.
+constexpr std::chrono::microseconds Moment = 100ms;
+
 // How often the library's windows are looked for in a long call.
 constexpr auto LookPeriod = 250ms;
 
@@ -22,8 +28,8 @@ bool IsInput(UINT message)
 
 } // namespace
 
-CallWait::CallWait(const LibraryProcess& process, std::chrono::milliseconds patience, std::wstring what)
-    : m_process(process), m_patience(patience), m_what(std::move(what))
+CallWait::CallWait(const LibraryProcess& process, HWND parent, std::chrono::milliseconds patience, Texts texts)
+    : m_process(process), m_patience(patience), m_parent(parent), m_texts(std::move(texts))
 {
 }
 
@@ -34,10 +40,11 @@ CallWait::Result CallWait::For(HANDLE event)
     {
         const bool isLong = Clock::now() - m_start >= ShortCall;
         const auto timeout = static_cast<DWORD>(std::chrono::milliseconds(isLong ? LookPeriod : ShortCall).count());
-        const bool takesAll = isLong && !m_isQuitting;
-        const DWORD result = m_hasWindows ? MsgWaitForMultipleObjects(2, handles, FALSE, timeout,
-                                                                      takesAll ? QS_ALLINPUT : QS_SENDMESSAGE)
-                                          : WaitForMultipleObjects(2, handles, FALSE, timeout);
+        const bool takesAll = isLong && !m_isQuitting && !m_window;
+        const DWORD result = m_window       ? WaitWithWindow(handles)
+                             : m_hasWindows ? MsgWaitForMultipleObjects(2, handles, FALSE, timeout,
+                                                                        takesAll ? QS_ALLINPUT : QS_SENDMESSAGE)
+                                            : WaitForMultipleObjects(2, handles, FALSE, timeout);
         switch (result)
         {
         case WAIT_OBJECT_0:
@@ -50,7 +57,11 @@ CallWait::Result CallWait::For(HANDLE event)
         default:
             return Result::Ended;
         }
-        if (m_hasWindows)
+        if (m_window && m_window->IsCancelled())
+        {
+            return Result::UserEnds;
+        }
+        if (m_hasWindows && !m_window)
         {
             Dispatch(takesAll);
         }
@@ -64,6 +75,28 @@ CallWait::Result CallWait::For(HANDLE event)
 std::chrono::seconds CallWait::Elapsed() const
 {
     return std::chrono::duration_cast<std::chrono::seconds>(Clock::now() - m_start);
+}
+
+DWORD CallWait::WaitWithWindow(const HANDLE* handles)
+{
+    LARGE_INTEGER moment{};
+    moment.QuadPart = -Moment.count() * 10; // from now, in units of 100 nanoseconds
+    SetWaitableTimer(m_moment.Get(), &moment, 0, nullptr, nullptr, FALSE);
+    m_window->Wait(m_moment.Get());
+    return WaitForMultipleObjects(2, handles, FALSE, 0);
+}
+
+void CallWait::ShowWindow()
+{
+    m_moment.Reset(CreateWaitableTimerW(nullptr, TRUE, nullptr));
+    if (!m_moment)
+    {
+        return; // no memory: the call goes on without the window
+    }
+    m_window = std::make_unique<OrvixWaitingWindow>(m_parent, m_texts.library.c_str(), L"End it");
+    m_window->SetTask(
+        (m_texts.library + L" has been working on " + m_texts.function + L" for more than five seconds.").c_str());
+    m_window->SetProgress(L"Ending it loses what it has not finished.", -1);
 }
 
 void CallWait::Dispatch(bool takesAll)
@@ -101,6 +134,12 @@ CallWait::Result CallWait::Look()
     if (m_process.ShowsWindow())
     {
         Restart();
+        m_lastWindow = now;
+        m_window.reset(); // the library's own window must not lie behind it
+    }
+    else if (!m_window && m_parent != nullptr && now - m_lastWindow >= UntilWindow)
+    {
+        ShowWindow();
     }
     return now - m_lastSign >= m_patience ? Result::Hangs : Result::Signalled;
 }

@@ -1,12 +1,16 @@
 #pragma once
 
 #include "LibraryProcess.h"
+#include "OrvixWaitingWindow.h"
+#include "UniqueHandle.h"
 
 #include <chrono>
+#include <memory>
 #include <string>
 
 /// Waits in a call of the host until the library's process answers. The host's windows are painted meanwhile and its
-/// messages are dispatched, except those of keyboard and mouse, which are dropped when the call is a long one.
+/// messages are dispatched, except those of keyboard and mouse, which are dropped when the call is a long one. After
+/// five seconds without a window of the library a small one says what runs, and its button ends the library.
 class CallWait
 {
 public:
@@ -18,8 +22,16 @@ public:
         UserEnds ///< the user does not want to wait any longer
     };
 
-    /// `what` names the library and the function for the user. The process must outlive this object.
-    CallWait(const LibraryProcess& process, std::chrono::milliseconds patience, std::wstring what);
+    /// What the user reads in the small window.
+    struct Texts
+    {
+        std::wstring library;
+        std::wstring function;
+    };
+
+    /// `parent` is the host's window; null for a call that has none, which never shows the small window. The process
+    /// must outlive this object.
+    CallWait(const LibraryProcess& process, HWND parent, std::chrono::milliseconds patience, Texts texts);
 
     /// Waits for the event.
     Result For(HANDLE event);
@@ -32,15 +44,22 @@ public:
 private:
     using Clock = std::chrono::steady_clock;
 
+    /// As WaitForMultipleObjects, for a moment, while the small window is shown.
+    DWORD WaitWithWindow(const HANDLE* handles);
+    void ShowWindow();
     void Dispatch(bool takesAll);
     Result Look();
 
     const LibraryProcess& m_process;
     std::chrono::milliseconds m_patience;
-    std::wstring m_what;
+    HWND m_parent;
+    Texts m_texts;
+    std::unique_ptr<OrvixWaitingWindow> m_window; ///< null while it is not wanted
+    UniqueKernelHandle m_moment;                  ///< a timer
     Clock::time_point m_start = Clock::now();
     Clock::time_point m_lastSign = m_start;
     Clock::time_point m_lastLook = m_start;
+    Clock::time_point m_lastWindow = m_start; ///< of the library
     bool m_isQuitting = false;
     bool m_hasWindows = IsGUIThread(FALSE) != FALSE;
 };

@@ -51,6 +51,7 @@ public:
           m_isEnabled(m_window != nullptr && IsWindowEnabled(m_window))
     {
     }
+    HWND Get() const { return m_window; }
     void Restore() const
     {
         if (m_isEnabled && !IsWindowEnabled(m_window))
@@ -157,7 +158,7 @@ MessageReader IsolatedLibrary::Exchange(MessageWriter& request)
     m_isSent = true;
     const ParentWindow parent(m_side.window);
     AllowSetForegroundWindow(m_process->Id());
-    CallWait wait(*m_process, m_settings.patience, m_settings.name + L": " + Wide(m_function));
+    CallWait wait(*m_process, parent.Get(), m_settings.patience, {m_settings.name, Wide(m_function)});
     SetEvent(m_process->Requested());
     CallWait::Result result = CallWait::Result::Signalled;
     while ((result = wait.For(m_process->Replied())) == CallWait::Result::Signalled)
@@ -330,7 +331,7 @@ SCCRTN IsolatedLibrary::End()
     Try(SccCalls::Uninitialize.name, [this] {
         MessageWriter request = Begin(MessageKind::Quit, 0);
         Exchange(request).End();
-        CallWait(*m_process, EndPatience, m_settings.name).For(m_process->Process());
+        CallWait(*m_process, nullptr, EndPatience, {m_settings.name, Wide(m_function)}).For(m_process->Process());
         return SCC_OK;
     });
     m_process->End();

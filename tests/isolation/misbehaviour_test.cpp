@@ -451,6 +451,33 @@ TEST_F(MisbehaviourInWindows, AWindowThatACrashedDialogDisabledGetsInputAgain)
     EXPECT_TRUE(IsWindowEnabled(window.Get()));
 }
 
+TEST_F(MisbehaviourInWindows, TheUserMayEndASlowCall)
+{
+    const IsolatedCopy patient(ORVIX_MISBEHAVING_SCC, std::chrono::seconds(60));
+    const SccLibrary library(patient.Proxy());
+    Misbehave(L"hang-SccGet");
+    HostWindow window(library);
+    Session session(library, window.Get());
+    session.Open();
+    Lines();
+    std::thread user([] {
+        HWND small = nullptr;
+        for (int i = 0; small == nullptr && i < 300; ++i)
+        {
+            Sleep(100);
+            small = FindWindowW(L"#32770", L"Isolated");
+        }
+        PostMessageW(small, WM_COMMAND, IDCANCEL, 0);
+    });
+    const Clock::time_point start = Clock::now();
+    EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
+    user.join();
+    EXPECT_GE(Clock::now() - start, 4900ms);
+    EXPECT_LT(Clock::now() - start, 40s);
+    EXPECT_THAT(Text(), HasSubstr("was ended by the user, "));
+    EXPECT_TRUE(IsWindowEnabled(window.Get()));
+}
+
 TEST_F(MisbehaviourInWindows, TheQuitMessageReachesTheHostsLoop)
 {
     Misbehave(L"slow-SccGet");
