@@ -11,8 +11,8 @@ using namespace std::chrono_literals;
 // host.
 constexpr auto ShortCall = 200ms;
 
-// The small window itself waits for half a second before it appears.
-constexpr auto UntilWindow = 4500ms;
+// Without a window of the library, until the small window appears.
+constexpr auto UntilWindow = 5s;
 
 // Between two looks at the library while the small window is shown.
 constexpr std::chrono::microseconds Moment = 100ms;
@@ -40,8 +40,8 @@ CallWait::Result CallWait::For(HANDLE event)
     {
         const bool isLong = Clock::now() - m_start >= ShortCall;
         const auto timeout = static_cast<DWORD>(std::chrono::milliseconds(isLong ? LookPeriod : ShortCall).count());
-        const bool takesAll = isLong && !m_isQuitting && !m_window;
-        const DWORD result = m_window       ? WaitWithWindow(handles)
+        const bool takesAll = isLong && !m_isQuitting && !m_isWindowDue;
+        const DWORD result = m_isWindowDue  ? WaitWithWindow(handles)
                              : m_hasWindows ? MsgWaitForMultipleObjects(2, handles, FALSE, timeout,
                                                                         takesAll ? QS_ALLINPUT : QS_SENDMESSAGE)
                                             : WaitForMultipleObjects(2, handles, FALSE, timeout);
@@ -57,11 +57,11 @@ CallWait::Result CallWait::For(HANDLE event)
         default:
             return Result::Ended;
         }
-        if (m_window && m_window->IsCancelled())
+        if (m_isWindowDue && m_window->IsCancelled())
         {
             return Result::UserEnds;
         }
-        if (m_hasWindows && !m_window)
+        if (m_hasWindows && !m_isWindowDue)
         {
             Dispatch(takesAll);
         }
@@ -86,16 +86,16 @@ DWORD CallWait::WaitWithWindow(const HANDLE* handles)
     return WaitForMultipleObjects(2, handles, FALSE, 0);
 }
 
-void CallWait::ShowWindow()
+/// Its time runs from now on.
+void CallWait::MakeWindow()
 {
     m_moment.Reset(CreateWaitableTimerW(nullptr, TRUE, nullptr));
     if (!m_moment)
     {
-        return; // no memory: the call goes on without the window
+        return; // the call goes on without the window
     }
     m_window = std::make_unique<OrvixWaitingWindow>(m_parent, m_texts.library.c_str(), L"End it");
-    m_window->SetTask(
-        (m_texts.library + L" has been working on " + m_texts.function + L" for more than five seconds.").c_str());
+    m_window->SetTask((m_texts.library + L" is working on " + m_texts.function + L'.').c_str());
     m_window->SetProgress(L"Ending it loses what it has not finished.", -1);
 }
 
@@ -137,9 +137,15 @@ CallWait::Result CallWait::Look()
         m_lastWindow = now;
         m_window.reset(); // the library's own window must not lie behind it
     }
-    else if (!m_window && m_parent != nullptr && now - m_lastWindow >= UntilWindow)
+    else if (!m_window && m_parent != nullptr)
     {
-        ShowWindow();
+        MakeWindow();
+    }
+    m_isWindowDue = m_window && now - m_lastWindow >= UntilWindow;
+    if (const unsigned int signs = m_process.Signs(); signs != m_signs)
+    {
+        m_signs = signs;
+        Restart();
     }
     return now - m_lastSign >= m_patience ? Result::Hangs : Result::Signalled;
 }

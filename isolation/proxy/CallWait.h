@@ -29,8 +29,8 @@ public:
         std::wstring function;
     };
 
-    /// `parent` is the host's window; null for a call that has none, which never shows the small window. The process
-    /// must outlive this object.
+    /// `parent` is a window of the host's that this thread owns; null when there is none, and then the small window
+    /// never shows. The process must outlive this object.
     CallWait(const LibraryProcess& process, HWND parent, std::chrono::milliseconds patience, Texts texts);
 
     /// Waits for the event.
@@ -46,7 +46,7 @@ private:
 
     /// As WaitForMultipleObjects, for a moment, while the small window is shown.
     DWORD WaitWithWindow(const HANDLE* handles);
-    void ShowWindow();
+    void MakeWindow();
     void Dispatch(bool takesAll);
     Result Look();
 
@@ -54,12 +54,14 @@ private:
     std::chrono::milliseconds m_patience;
     HWND m_parent;
     Texts m_texts;
-    std::unique_ptr<OrvixWaitingWindow> m_window; ///< null while it is not wanted
+    std::unique_ptr<OrvixWaitingWindow> m_window; ///< null in a short call, and while the library shows a window
+    bool m_isWindowDue = false;                   ///< it is shown
     UniqueKernelHandle m_moment;                  ///< a timer
     Clock::time_point m_start = Clock::now();
     Clock::time_point m_lastSign = m_start;
     Clock::time_point m_lastLook = m_start;
     Clock::time_point m_lastWindow = m_start; ///< of the library
+    unsigned int m_signs = m_process.Signs();
     bool m_isQuitting = false;
     bool m_hasWindows = IsGUIThread(FALSE) != FALSE;
 };

@@ -51,7 +51,13 @@ public:
           m_isEnabled(m_window != nullptr && IsWindowEnabled(m_window))
     {
     }
-    HWND Get() const { return m_window; }
+
+    /// Null for a window of another thread.
+    HWND OfThisThread() const
+    {
+        return GetWindowThreadProcessId(m_window, nullptr) == GetCurrentThreadId() ? m_window : nullptr;
+    }
+
     void Restore() const
     {
         if (m_isEnabled && !IsWindowEnabled(m_window))
@@ -143,7 +149,6 @@ void IsolatedLibrary::Start()
 
 MessageWriter IsolatedLibrary::Begin(MessageKind kind, std::uint32_t function)
 {
-    m_side.window = nullptr;
     m_functionNumber = function;
     MessageWriter request(m_process->Memory().Request(), {0, kind, ++m_number, function});
     const std::wstring folder = CurrentFolder();
@@ -158,7 +163,7 @@ MessageReader IsolatedLibrary::Exchange(MessageWriter& request)
     m_isSent = true;
     const ParentWindow parent(m_side.window);
     AllowSetForegroundWindow(m_process->Id());
-    CallWait wait(*m_process, parent.Get(), m_settings.patience, {m_settings.name, Wide(m_function)});
+    CallWait wait(*m_process, parent.OfThisThread(), m_settings.patience, {m_settings.name, Wide(m_function)});
     SetEvent(m_process->Requested());
     CallWait::Result result = CallWait::Result::Signalled;
     while ((result = wait.For(m_process->Replied())) == CallWait::Result::Signalled)
@@ -219,6 +224,15 @@ void IsolatedLibrary::FailMessage()
     else
     {
         Report(m_settings.name + L" was not called: the arguments of " + Wide(m_function) + L" are too long");
+    }
+}
+
+void IsolatedLibrary::Abandon()
+{
+    if (m_isSent)
+    {
+        m_process->End();
+        m_state = State::Lost;
     }
 }
 
@@ -288,6 +302,7 @@ void IsolatedLibrary::AnswerInBackground()
         catch (const std::exception&) // no message, or no memory: the library goes on
         {
         }
+        process->NoteSign();
         process->Memory().GetState().backgroundAnswer = static_cast<std::int32_t>(answer);
         SetEvent(process->BackgroundAnswered());
     }

@@ -107,6 +107,7 @@ private:
         }
         catch (const std::bad_alloc&)
         {
+            Abandon();
             return SCC_E_NONSPECIFICERROR;
         }
     }
@@ -140,6 +141,9 @@ private:
 
     /// The request was too large, or the reply breaks the rules.
     void FailMessage();
+
+    /// Memory ran out in a call. The library may still be at work on it.
+    void Abandon();
 
     /// Ends the process, which is of no use any more. `why` completes the sentence that the library's name begins.
     void Lose(const std::wstring& why);

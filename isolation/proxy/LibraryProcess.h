@@ -3,6 +3,7 @@
 #include "SharedMemory.h"
 #include "UniqueHandle.h"
 
+#include <atomic>
 #include <filesystem>
 #include <memory>
 #include <string>
@@ -38,6 +39,12 @@ public:
     /// True while the process shows a window.
     bool ShowsWindow() const;
 
+    /// Notes a sign of life that is no answer to a call. [any-thread]
+    void NoteSign() { ++m_signs; }
+
+    /// The number of such signs.
+    unsigned int Signs() const { return m_signs; }
+
 private:
     explicit LibraryProcess(UniqueKernelHandle section);
     bool Run(const std::filesystem::path& program);
@@ -51,4 +58,5 @@ private:
     UniqueKernelHandle m_job; // ends the process when it is closed
     UniqueKernelHandle m_process;
     DWORD m_id = 0;
+    std::atomic<unsigned int> m_signs = 0;
 };

@@ -16,7 +16,7 @@ struct HostSide
     std::atomic<LPTEXTOUTPROC> output = nullptr; ///< of the last SccOpenProject
     std::atomic<POPLISTFUNC> populate = nullptr; ///< of the last SccPopulateList
     std::atomic<LPVOID> populateData = nullptr;
-    HWND window = nullptr; ///< of the running call
+    HWND window = nullptr; ///< of the last call that has one among its arguments; it may be null there
     CommandBlocks blocks;
 
     // What SccAddFromScc returned last.
