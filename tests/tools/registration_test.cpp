@@ -275,6 +275,15 @@ TEST_F(Registration, OfAnIsolatedLibraryRemovesWhatLiesInItsFolder)
     const std::filesystem::path folder = IsolatedPath(L"TALKING");
     std::filesystem::create_directories(folder);
     std::ofstream(folder / L"version.dll") << "a library that must not be loaded";
+    std::filesystem::create_directories(folder / L"full");
+    std::ofstream(folder / L"full" / L"file") << "not to be removed";
+    const auto refused = RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"});
+    EXPECT_EQ(refused.code, Failed);
+    EXPECT_THAT(refused.errors, HasSubstr("the library cannot be isolated: "));
+    EXPECT_TRUE(std::filesystem::exists(folder / L"full" / L"file"));
+    EXPECT_EQ(Path(L"Talking"), std::nullopt);
+
+    std::filesystem::remove_all(folder / L"full");
     ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"}).code, Success);
     EXPECT_FALSE(std::filesystem::exists(folder / L"version.dll"));
     EXPECT_TRUE(std::filesystem::exists(folder / L"scc_proxy.dll"));

@@ -14,6 +14,7 @@
 
 #include <cstdio>
 #include <system_error>
+#include <vector>
 
 namespace
 {
@@ -55,6 +56,22 @@ std::wstring FolderName(const std::wstring& name)
     return folder;
 }
 
+bool IsLink(const std::filesystem::path& folder)
+{
+    const DWORD attributes = GetFileAttributesW(folder.c_str());
+    return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
+}
+
+std::vector<std::filesystem::path> FilesIn(const std::filesystem::path& folder, std::error_code& error)
+{
+    std::vector<std::filesystem::path> files;
+    for (std::filesystem::directory_iterator entry(folder, error), end; !error && entry != end; entry.increment(error))
+    {
+        files.push_back(entry->path());
+    }
+    return files;
+}
+
 [[noreturn]] void Fail(const std::wstring& what, const std::filesystem::path& file, DWORD error)
 {
     if (error == ERROR_ACCESS_DENIED)
@@ -80,11 +97,16 @@ void MakeFolder(const std::filesystem::path& folder)
     {
         return;
     }
-    // Another user may have made it before.
+    // Another user may have made it before, as a link to another folder too.
     const DWORD error = GetLastError();
     if (error != ERROR_ALREADY_EXISTS)
     {
         Fail(L"the library cannot be isolated", folder, error);
+    }
+    if (IsLink(folder))
+    {
+        throw ToolError(ExitCode::Failed,
+                        L"the library cannot be isolated, since this folder is a link: " + folder.wstring());
     }
     if (!SetFileSecurityW(folder.c_str(),
                           OWNER_SECURITY_INFORMATION | DACL_SECURITY_INFORMATION | PROTECTED_DACL_SECURITY_INFORMATION,
@@ -94,21 +116,20 @@ void MakeFolder(const std::filesystem::path& folder)
     }
 }
 
-/// Removes what is not needed in the folder: whoever made it before may have put other libraries there.
-void RemoveStrangers(const std::filesystem::path& folder)
+/// Removes what is in the folder. The proxy is the first, because it cannot be removed while a host uses it; then
+/// everything stays. Folders in it must be empty: no user who made them leads the removal to another place.
+void Empty(const std::filesystem::path& folder, const std::wstring& failure)
 {
     std::error_code error;
-    for (const auto& entry : std::filesystem::directory_iterator(folder, error))
+    std::filesystem::remove(folder / Proxy, error);
+    const auto files = error ? std::vector<std::filesystem::path>() : FilesIn(folder, error);
+    for (auto file = files.begin(); !error && file != files.end(); ++file)
     {
-        const std::wstring name = entry.path().filename();
-        if (name != Proxy && name != Program32 && name != Program64 && name != IsolationSettings::FileName)
-        {
-            std::filesystem::remove_all(entry.path(), error);
-        }
+        std::filesystem::remove(*file, error);
     }
     if (error)
     {
-        Fail(L"the library cannot be isolated", folder, static_cast<DWORD>(error.value()));
+        Fail(failure, folder, static_cast<DWORD>(error.value()));
     }
 }
 
@@ -133,7 +154,8 @@ std::wstring IsolatedFolder::Make(const std::wstring& library, int bits, std::ch
 {
     MakeFolder(m_path.parent_path());
     MakeFolder(m_path);
-    RemoveStrangers(m_path);
+    // Whoever made the folder before may have put libraries there, or files that he may still change.
+    Empty(m_path, L"the library cannot be isolated");
     IsolationSettings settings;
     settings.name = m_name;
     settings.library = library;
@@ -155,11 +177,19 @@ bool IsolatedFolder::Exists() const
 
 void IsolatedFolder::Remove() const
 {
-    std::error_code error;
-    std::filesystem::remove_all(m_path, error);
-    if (error)
+    constexpr wchar_t Failure[] = L"the files of the isolated library cannot be removed";
+    if (!Exists())
     {
-        Fail(L"the files of the isolated library cannot be removed", m_path, static_cast<DWORD>(error.value()));
+        return;
+    }
+    if (!IsLink(m_path))
+    {
+        Empty(m_path, Failure);
+    }
+    std::error_code error;
+    if (!std::filesystem::remove(m_path, error))
+    {
+        Fail(Failure, m_path, static_cast<DWORD>(error.value()));
     }
     std::filesystem::remove(m_path.parent_path(), error); // when it was the last one
 }
