@@ -11,9 +11,10 @@ class IsolatedCopy
 {
 public:
     explicit IsolatedCopy(const std::filesystem::path& library,
-                          std::chrono::seconds patience = IsolationSettings().patience)
+                          std::chrono::seconds patience = IsolationSettings().patience, int bits = 64)
     {
-        for (const wchar_t* file : {L"scc_proxy.dll", L"scc_host64.exe"})
+        const std::filesystem::path program = bits == 32 ? L"scc_host32.exe" : L"scc_host64.exe";
+        for (const std::filesystem::path& file : {std::filesystem::path(L"scc_proxy.dll"), program})
         {
             std::filesystem::copy_file(BuiltFile(file), m_folder.Path() / file);
         }
@@ -21,6 +22,7 @@ public:
         settings.name = L"Isolated";
         settings.library = library;
         settings.patience = patience;
+        settings.bits = bits;
         settings.Write(m_folder.Path());
     }
 

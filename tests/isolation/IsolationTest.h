@@ -2,11 +2,10 @@
 
 #include "Defect.h"
 #include "IsolatedCopy.h"
+#include "LibraryProcesses.h"
 #include "SccLibrary.h"
 
 #include <gtest/gtest.h>
-
-#include <tlhelp32.h>
 
 #include <array>
 #include <mutex>
@@ -23,6 +22,13 @@ public:
     {
         static const IsolatedCopy isolated(ORVIX_MISBEHAVING_SCC, std::chrono::seconds(2));
         return isolated.Proxy();
+    }
+
+    static LONG Output(LPCSTR text, LONG kind)
+    {
+        const std::lock_guard lock(s_mutex);
+        s_lines.push_back((kind == SCC_MSG_ERROR ? "error: " : "") + std::string(text != nullptr ? text : "(null)"));
+        return SCC_MSG_RTN_OK;
     }
 
 protected:
@@ -51,13 +57,6 @@ protected:
             text += line + '\n';
         }
         return text;
-    }
-
-    static LONG Output(LPCSTR text, LONG kind)
-    {
-        const std::lock_guard lock(s_mutex);
-        s_lines.push_back((kind == SCC_MSG_ERROR ? "error: " : "") + std::string(text != nullptr ? text : "(null)"));
-        return SCC_MSG_RTN_OK;
     }
 
     /// A context of the library, which ends with this object.
@@ -93,10 +92,12 @@ protected:
 
         LPVOID context = nullptr;
         SCCRTN result;
-        std::array<char, SCC_NAME_SIZE> name{"Depot"};
-        std::array<char, SCC_AUXLABEL_SIZE> label{"Aux"};
-        std::array<char, SCC_USER_SIZE> user{"Ben"};
-        std::array<char, SCC_PRJPATH_SIZE> auxPath{"path"};
+
+        // Larger than the interface demands, as those of OrvixCore are.
+        std::array<char, 512> name{"Depot"};
+        std::array<char, 512> label{"Aux"};
+        std::array<char, 512> user{"Ben"};
+        std::array<char, 512> auxPath{"path"};
         LONG capabilities = 0;
         LONG checkoutLength = 0;
         LONG commentLength = 0;
@@ -107,19 +108,7 @@ protected:
     };
 
     /// The number of running processes of isolated libraries that this process started.
-    static int Processes()
-    {
-        const UniqueFile snapshot(CreateToolhelp32Snapshot(TH32CS_SNAPPROCESS, 0));
-        PROCESSENTRY32W entry{};
-        entry.dwSize = sizeof entry;
-        int count = 0;
-        for (BOOL more = Process32FirstW(snapshot.Get(), &entry); more; more = Process32NextW(snapshot.Get(), &entry))
-        {
-            count += entry.th32ParentProcessID == GetCurrentProcessId() &&
-                     std::wstring(entry.szExeFile) == L"scc_host64.exe";
-        }
-        return count;
-    }
+    static std::size_t Processes() { return LibraryProcesses().size(); }
 
 private:
     static inline std::mutex s_mutex;

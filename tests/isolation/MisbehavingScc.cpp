@@ -120,15 +120,22 @@ void ShowWindowFor(DWORD milliseconds)
     DestroyWindow(window);
 }
 
-void PrintFromThreads(bool alsoLater)
+void PrintFromThreads()
 {
     std::thread([] { Print("from a thread"); }).join();
-    if (alsoLater)
+    std::thread([] {
+        Sleep(300);
+        Print("between calls");
+    }).detach();
+}
+
+/// Longer than the patience of the tests, with signs of life.
+void PrintForLong()
+{
+    for (int i = 0; i < 6; ++i)
     {
-        std::thread([] {
-            Sleep(300);
-            Print("between calls");
-        }).detach();
+        Sleep(500);
+        Print("still there");
     }
 }
 
@@ -185,13 +192,13 @@ void Misbehave(const char* function, HWND window)
     {
         Sleep(1500);
     }
-    if (is(L"talk")) // longer than the patience of the tests, with signs of life
+    if (is(L"talk"))
     {
-        for (int i = 0; i < 6; ++i)
-        {
-            Sleep(500);
-            Print("still there");
-        }
+        PrintForLong();
+    }
+    if (is(L"murmur"))
+    {
+        std::thread(PrintForLong).join();
     }
     if (is(L"window"))
     {
@@ -199,7 +206,7 @@ void Misbehave(const char* function, HWND window)
     }
     if (is(L"threads"))
     {
-        PrintFromThreads(true);
+        PrintFromThreads();
     }
     if (is(L"change"))
     {

@@ -281,7 +281,7 @@ TEST_F(Wire, CarriesTheFilesOfTheVersionControlSystem)
 namespace
 {
 
-constexpr int FuzzedMessages = 100000;
+constexpr int FuzzedMessages = 200000; // half of them requests, half replies
 
 /// Uses arguments as a library does: reads the texts and writes where it may.
 class User
