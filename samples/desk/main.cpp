@@ -1,0 +1,49 @@
+// A host with a window: the files of a project, their states, and the commands of source control.
+
+#include "Arguments.h"
+#include "Failure.h"
+#include "MainWindow.h"
+
+#include <objbase.h>
+#include <windows.h>
+
+#include <cstdlib>
+
+namespace
+{
+
+/// The single-threaded apartment in which the library reads and writes its files.
+class Apartment
+{
+public:
+    Apartment() { m_result = CoInitializeEx(nullptr, COINIT_APARTMENTTHREADED | COINIT_DISABLE_OLE1DDE); }
+    Apartment(const Apartment&) = delete;
+    Apartment& operator=(const Apartment&) = delete;
+    ~Apartment()
+    {
+        if (SUCCEEDED(m_result))
+        {
+            CoUninitialize();
+        }
+    }
+
+private:
+    HRESULT m_result;
+};
+
+} // namespace
+
+int WINAPI wWinMain(HINSTANCE, HINSTANCE, PWSTR, int)
+{
+    const Apartment apartment;
+    try
+    {
+        MainWindow window(ReadArguments(__argc, __wargv));
+        return window.Run();
+    }
+    catch (const Failure& failure)
+    {
+        MessageBoxW(nullptr, failure.text.c_str(), L"Desk cannot start", MB_ICONERROR);
+        return 2;
+    }
+}

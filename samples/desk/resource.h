@@ -1,0 +1,35 @@
+#pragma once
+
+#define IDR_DESK 100
+#define IDD_PROVIDERS 101
+
+#define ID_OPEN 201
+#define ID_NEW_WINDOW 202
+#define ID_EXIT 203
+
+#define ID_ADD 210
+#define ID_CHECK_OUT 211
+#define ID_CHECK_IN 212
+#define ID_UNDO 213
+#define ID_GET_LATEST 214
+#define ID_HISTORY 215
+#define ID_PROPERTIES 216
+
+#define ID_REFRESH 220
+#define ID_SUBFOLDERS 221
+#define ID_DARK 222
+
+#define ID_ANSWERS 230
+#define ID_PROVIDERS 231
+#define ID_FREEZE 232
+
+#define IDC_TOOLBAR 301
+#define IDC_FOLDERS 302
+#define IDC_FILES 303
+#define IDC_OUTPUT 304
+#define IDC_STATUS 305
+
+#define IDC_PROVIDER_LIST 320
+#define IDC_USE 321
+#define IDC_OPTIONS 322
+#define IDC_PROGRAM 323
