@@ -18,6 +18,12 @@ public:
     HWND Handle() const { return m_window; }
     bool IsOpen() const { return IsWindow(m_window) != FALSE; }
 
+    /// Waits until the dialog has handled every message that was posted before.
+    void Settle() const { m_settle(m_window); }
+
+    /// A window inside this one, such as the page of a property sheet.
+    DialogWindow Child(HWND window) const { return {window, m_settle}; }
+
     /// Presses a key. Keys go to the control with the focus.
     void Press(WORD key) const;
     void Type(const std::wstring& text) const;

@@ -1,7 +1,11 @@
 #include "Picture.h"
 
+#include "Files.h"
+
 #include <algorithm>
+#include <cstdlib>
 #include <stdexcept>
+#include <utility>
 
 #include <objidl.h>
 #include <propidl.h>
@@ -61,4 +65,23 @@ void SavePicture(HWND window, const std::filesystem::path& file)
     {
         throw std::runtime_error("the picture cannot be saved");
     }
+}
+
+std::string TakePicture(HWND window, const wchar_t* name, const std::filesystem::path& folder)
+{
+    const wchar_t* kept = _wgetenv(L"ORVIX_PICTURES");
+    const auto file = (kept == nullptr ? folder : std::filesystem::path(kept)) / name;
+    SendMessageW(window, WM_NCACTIVATE, TRUE, 0); // the first window of a process may look inactive
+    // The screen shows what is drawn some time later: when two pictures are equal, it is complete.
+    std::string picture;
+    std::string previous;
+    do
+    {
+        previous = std::exchange(picture, {});
+        std::filesystem::remove(file);
+        Sleep(200);
+        SavePicture(window, file);
+        picture = ReadBytes(file);
+    } while (picture != previous);
+    return picture;
 }

@@ -7,7 +7,6 @@
 #include <bit>
 #include <chrono>
 #include <exception>
-#include <optional>
 #include <utility>
 
 namespace
@@ -80,24 +79,9 @@ BOOL CALLBACK CompareTitle(HWND window, LPARAM parameter)
     return search.found == nullptr ? TRUE : FALSE;
 }
 
-std::optional<DialogWindow> Await(DWORD thread, const std::wstring& title)
-{
-    for (const auto end = Clock::now() + Patience; Clock::now() < end; Sleep(5))
-    {
-        Search search{title};
-        EnumThreadWindows(thread, &CompareTitle, reinterpret_cast<LPARAM>(&search));
-        if (search.found != nullptr)
-        {
-            Settle(search.found);
-            return DialogWindow(search.found, &Settle);
-        }
-    }
-    return std::nullopt;
-}
-
 void Handle(DWORD thread, const std::wstring& title, const std::function<void(const DialogWindow&)>& handle)
 {
-    const auto dialog = Await(thread, title);
+    const auto dialog = AwaitWindow(thread, title);
     ASSERT_TRUE(dialog) << "no dialog appears";
     try
     {
@@ -120,4 +104,19 @@ User::User(std::wstring title, std::function<void(const DialogWindow&)> handle)
 {
     MakeMarkWindow();
     m_thread = std::thread(Handle, GetCurrentThreadId(), std::move(title), std::move(handle));
+}
+
+std::optional<DialogWindow> AwaitWindow(DWORD thread, const std::wstring& title)
+{
+    for (const auto end = Clock::now() + Patience; Clock::now() < end; Sleep(5))
+    {
+        Search search{title};
+        EnumThreadWindows(thread, &CompareTitle, reinterpret_cast<LPARAM>(&search));
+        if (search.found != nullptr)
+        {
+            Settle(search.found);
+            return DialogWindow(search.found, &Settle);
+        }
+    }
+    return std::nullopt;
 }

@@ -3,6 +3,7 @@
 #include "DialogWindow.h"
 
 #include <functional>
+#include <optional>
 #include <string>
 #include <thread>
 
@@ -20,3 +21,7 @@ public:
 private:
     std::thread m_thread;
 };
+
+/// Waits for a visible window of a thread, by title; nothing when none appears. The thread is one for which a `User`
+/// has been made.
+std::optional<DialogWindow> AwaitWindow(DWORD thread, const std::wstring& title);

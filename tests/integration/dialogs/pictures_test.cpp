@@ -1,15 +1,11 @@
 #include "DialogsTest.h"
-#include "Files.h"
 #include "OrvixDialogOption.h"
 #include "OrvixOperation.h"
 #include "OrvixPrompt.h"
 #include "Picture.h"
 #include "TempFolder.h"
 
-#include <cstdlib>
-#include <filesystem>
 #include <string>
-#include <utility>
 
 namespace
 {
@@ -24,21 +20,8 @@ protected:
     /// The user saves a picture and closes the dialog.
     Handler TakePicture(const wchar_t* name) const
     {
-        const wchar_t* kept = _wgetenv(L"ORVIX_PICTURES");
-        const auto file = (kept == nullptr ? m_pictures.Path() : std::filesystem::path(kept)) / name;
-        return [file](const DialogWindow& dialog) {
-            SendMessageW(dialog.Handle(), WM_NCACTIVATE, TRUE, 0); // the first dialog of a process may look inactive
-            // The screen shows what is drawn some time later: when two pictures are equal, it is complete.
-            std::string picture;
-            std::string previous;
-            do
-            {
-                previous = std::exchange(picture, {});
-                std::filesystem::remove(file);
-                Sleep(200);
-                SavePicture(dialog.Handle(), file);
-                picture = ReadBytes(file);
-            } while (picture != previous);
+        return [this, name](const DialogWindow& dialog) {
+            const std::string picture = ::TakePicture(dialog.Handle(), name, m_pictures.Path());
             EXPECT_EQ(picture.substr(1, 3), "PNG");
             dialog.Press(VK_ESCAPE);
         };
