@@ -172,11 +172,6 @@ void Frame::Layout()
     m_files.FitColumns();
 }
 
-void Frame::SetHeading(const std::wstring& text) const
-{
-    SetWindowTextW(m_filesLabel, text.c_str());
-}
-
 void Frame::SetStatus(const std::wstring& text) const
 {
     SendMessageW(m_status, SB_SETTEXTW, 0, reinterpret_cast<LPARAM>(text.c_str()));

@@ -38,7 +38,6 @@ public:
     /// Handles NM_CUSTOMDRAW, to give the toolbar the colours of the theme.
     LRESULT PaintToolbar(NMHDR& notification) const;
 
-    void SetHeading(const std::wstring& text) const;
     void SetStatus(const std::wstring& text) const;
     void SetProvider(const std::wstring& text) const;
     void EnableButton(int command, bool enabled) const;

@@ -25,5 +25,6 @@ using UniqueHandleOf = std::unique_ptr<std::remove_pointer_t<Handle>, HandleClos
 using UniqueFont = UniqueHandleOf<HFONT, &DeleteObject>;
 using UniqueBrush = UniqueHandleOf<HBRUSH, &DeleteObject>;
 using UniqueIcon = UniqueHandleOf<HICON, &DestroyIcon>;
+using UniqueWindow = UniqueHandleOf<HWND, &DestroyWindow>;
 using UniqueImageList = UniqueHandleOf<HIMAGELIST, &ImageList_Destroy>;
 using UniqueSystemHandle = UniqueHandleOf<HANDLE, &CloseHandle>;

@@ -105,7 +105,8 @@ MainWindow::MainWindow(const Arguments& arguments)
 {
     const INITCOMMONCONTROLSEX classes{sizeof classes, ICC_WIN95_CLASSES};
     InitCommonControlsEx(&classes);
-    if (MakeWindow(this, &Procedure) == nullptr)
+    m_ownedWindow.reset(MakeWindow(this, &Procedure));
+    if (!m_ownedWindow)
     {
         throw Failure{L"The window cannot be made."};
     }
@@ -117,14 +118,6 @@ MainWindow::MainWindow(const Arguments& arguments)
     if (!arguments.project.empty())
     {
         PostMessageW(m_window, OpenFirst, 0, 0);
-    }
-}
-
-MainWindow::~MainWindow()
-{
-    if (m_window != nullptr)
-    {
-        DestroyWindow(m_window);
     }
 }
 
@@ -221,6 +214,10 @@ LRESULT MainWindow::Handle(UINT message, WPARAM wParam, LPARAM lParam)
     case WM_SETFOCUS:
         SetFocus(IsChild(m_window, m_focus) != FALSE ? m_focus : m_frame.Files().Window());
         return 0;
+    case WM_NEXTDLGCTL: // a control asks for the focus to move, as in a dialog
+        SetFocus(LOWORD(lParam) != 0 ? std::bit_cast<HWND>(wParam)
+                                     : GetNextDlgTabItem(m_window, GetFocus(), wParam != 0 ? TRUE : FALSE));
+        return 0;
     case WM_CLOSE:
         OnClose();
         return 0;
@@ -235,7 +232,9 @@ LRESULT MainWindow::Handle(UINT message, WPARAM wParam, LPARAM lParam)
 
 void MainWindow::OnCommand(int command)
 {
-    if (m_busy || (GetMenuState(GetMenu(m_window), static_cast<UINT>(command), MF_BYCOMMAND) & MF_GRAYED) != 0)
+    const UINT state = GetMenuState(GetMenu(m_window), static_cast<UINT>(command), MF_BYCOMMAND);
+    const bool isInMenu = state != static_cast<UINT>(-1);
+    if (m_busy || (isInMenu && (state & MF_GRAYED) != 0))
     {
         return;
     }
@@ -372,6 +371,8 @@ void MainWindow::OnDestroy()
 {
     m_project.reset();
     m_library.reset();
+    SetWindowLongPtrW(m_window, GWLP_USERDATA, 0); // the last messages do without this object
+    m_ownedWindow.release();                       // being destroyed
     m_window = nullptr;
     PostQuitMessage(0);
 }
@@ -381,7 +382,7 @@ void MainWindow::OnEnterKey()
 {
     if (GetFocus() == m_frame.Files().Window())
     {
-        RunCommand(ID_PROPERTIES);
+        PostMessageW(m_window, WM_COMMAND, ID_PROPERTIES, 0);
     }
     else if (GetFocus() == m_frame.Folders().Window())
     {
@@ -446,8 +447,7 @@ void MainWindow::Refresh()
         Progress progress(m_frame.ProgressBar());
         rows = m_project->Files(folder, m_deep, progress);
     }
-    m_frame.SetHeading(L"Fi&les in " + folder);
-    m_frame.SetStatus(std::to_wstring(rows.size()) + (rows.size() == 1 ? L" file" : L" files"));
+    m_frame.SetStatus(std::to_wstring(rows.size()) + (rows.size() == 1 ? L" file in " : L" files in ") + folder);
     m_frame.Files().Show(std::move(rows));
     EnableCommands();
 }

@@ -22,7 +22,7 @@ public:
     explicit MainWindow(const Arguments& arguments);
     MainWindow(const MainWindow&) = delete;
     MainWindow& operator=(const MainWindow&) = delete;
-    ~MainWindow();
+    ~MainWindow() = default;
 
     /// Handles messages until the user closes the window. Returns the exit code of the program.
     int Run();
@@ -69,4 +69,5 @@ private:
     bool m_deep = false;    // subfolders are shown, too
     bool m_busy = false;    // a command is at work: no other one begins, and the window stays
     bool m_closeAsked = false;
+    UniqueWindow m_ownedWindow; // the last member: the window ends before what it uses
 };

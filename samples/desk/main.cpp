@@ -7,7 +7,10 @@
 #include <objbase.h>
 #include <windows.h>
 
+#include <algorithm>
 #include <cstdlib>
+#include <span>
+#include <string_view>
 
 namespace
 {
@@ -43,7 +46,11 @@ int WINAPI wWinMain(HINSTANCE, HINSTANCE, PWSTR, int)
     }
     catch (const Failure& failure)
     {
-        MessageBoxW(nullptr, failure.text.c_str(), L"Desk cannot start", MB_ICONERROR);
+        const std::span<wchar_t*> arguments(__wargv, static_cast<std::size_t>(__argc));
+        if (std::find(arguments.begin(), arguments.end(), std::wstring_view(L"--unattended")) == arguments.end())
+        {
+            MessageBoxW(nullptr, failure.text.c_str(), L"Desk cannot start", MB_ICONERROR);
+        }
         return 2;
     }
 }

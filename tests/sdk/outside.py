@@ -166,12 +166,15 @@ def check_programs(folder, sdk):
     with ThreadPoolExecutor(os.cpu_count()) as pool:
         jobs = [pool.submit(follow_readme, share / "templates/plugin", sdk, folder),
                 pool.submit(build, share / "samples/archive", sdk),
+                pool.submit(build, share / "samples/desk", sdk),
                 pool.submit(build, folder / "plugin", sdk),
                 pool.submit(build, folder / "host", sdk),
                 pool.submit(build, write_helpers(folder / "helpers"), sdk),
                 pool.submit(follow_readme, share / "templates/host", sdk, folder)]
-        (my_plugin, rules), sample, plugin, host, helpers, (my_host, found) = (job.result() for job in jobs)
+        (my_plugin, rules), sample, desk, plugin, host, helpers, (my_host, found) = (job.result() for job in jobs)
     sample = sample / "bin/plugins"
+    if not all((desk / name).exists() for name in ("desk.exe", "OrvixCore.dll", "OrvixCoreUI.dll", "braeutil.dll")):
+        raise Failure("the sample host is not complete")
     if not re.search(r"^\d+ rules, .*\b0 failed", rules, re.M):
         raise Failure(f"the template plug-in breaks its contract:\n{rules}")
     if found != "Archive\nGit\n":
@@ -216,7 +219,7 @@ def main():
         write_examples(folder)
         check_programs(folder, sdk)
         check_who_is_served(folder, sdk)
-    print(f"two hosts and three plug-ins work outside the tree, and {count} modules have debug files")
+    print(f"three hosts and three plug-ins work outside the tree, and {count} modules have debug files")
 
 
 if __name__ == "__main__":
