@@ -28,12 +28,12 @@ install(TARGETS OrvixCore OrvixCoreUI braeutil MSSCCI Settings Waiting BuildOpti
   RUNTIME DESTINATION bin
   ARCHIVE DESTINATION lib
   INCLUDES DESTINATION include)
-install(TARGETS orvix scc_host64 RUNTIME DESTINATION bin)
+install(TARGETS orvix desk scc_host64 RUNTIME DESTINATION bin)
 install(FILES $<TARGET_FILE:scc_proxy> DESTINATION bin)
 install(PROGRAMS ${CMAKE_BINARY_DIR}/bin/scc_host32.exe DESTINATION bin)
 install(FILES $<TARGET_FILE:archive_msscci> DESTINATION bin)
 install(FILES $<TARGET_FILE:archive> $<TARGET_FILE:git> DESTINATION bin/plugins)
-foreach(target OrvixCore OrvixCoreUI braeutil orvix archive_msscci scc_proxy scc_host64)
+foreach(target OrvixCore OrvixCoreUI braeutil orvix desk archive_msscci scc_proxy scc_host64)
   orvix_install_debug_file(${target} bin)
 endforeach()
 orvix_install_debug_file(archive bin/plugins)
