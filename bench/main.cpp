@@ -14,15 +14,9 @@ struct Group
 };
 
 constexpr Group Groups[] = {
-    {"msscci", BenchMsscci},
-    {"isolation", BenchIsolation},
-    {"initialize", BenchInitialize},
-    {"lists", BenchLists},
-    {"operations", BenchOperations},
-    {"prompts", BenchPrompts},
-    {"filters", BenchFilters},
-    {"notifications", BenchNotifications},
-    {"dialogs", BenchDialogs},
+    {"msscci", BenchMsscci},   {"isolation", BenchIsolation},         {"initialize", BenchInitialize},
+    {"lists", BenchLists},     {"operations", BenchOperations},       {"prompts", BenchPrompts},
+    {"filters", BenchFilters}, {"notifications", BenchNotifications}, {"dialogs", BenchDialogs},
     {"git", BenchGit},
 };
 
