@@ -42,7 +42,7 @@ using UniqueFont = UniqueHandle<FontPolicy>;
 /// The template of a dialog without controls, in the form that Windows takes.
 struct alignas(DWORD) EmptyDialog
 {
-    DLGTEMPLATE header;
+    DLGTEMPLATE header{};
     WORD menu = 0;
     WORD windowClass = 0;
     WORD title = 0;
@@ -79,7 +79,10 @@ struct OrvixWaitingWindow::State
 
     ULONGLONG Age() const { return GetTickCount64() - start; }
     bool IsShown() const { return window != nullptr; }
-    bool IsOurs(HWND handle) const { return window != nullptr && (handle == window || IsChild(window, handle)); }
+    bool IsOurs(HWND handle) const
+    {
+        return window != nullptr && (handle == window || IsChild(window, handle) != FALSE);
+    }
 
     void Open();
     void Close();
@@ -163,8 +166,8 @@ void OrvixWaitingWindow::State::AddControls()
 
     RECT frame{0, 0, MulDiv(Width, static_cast<int>(dpi), USER_DEFAULT_SCREEN_DPI),
                MulDiv(Height, static_cast<int>(dpi), USER_DEFAULT_SCREEN_DPI)};
-    AdjustWindowRectExForDpi(&frame, GetWindowLongW(window, GWL_STYLE), FALSE, GetWindowLongW(window, GWL_EXSTYLE),
-                             dpi);
+    AdjustWindowRectExForDpi(&frame, static_cast<DWORD>(GetWindowLongW(window, GWL_STYLE)), FALSE,
+                             static_cast<DWORD>(GetWindowLongW(window, GWL_EXSTYLE)), dpi);
     RECT host{};
     GetWindowRect(parent, &host);
     const LONG width = frame.right - frame.left;
@@ -237,7 +240,7 @@ void OrvixWaitingWindow::State::Refresh()
     {
         SetDlgItemTextW(window, Elapsed, elapsed.c_str());
     }
-    EnableWindow(GetDlgItem(window, IDCANCEL), !pressed);
+    EnableWindow(GetDlgItem(window, IDCANCEL), pressed ? FALSE : TRUE);
 
     std::unique_lock lock(mutex);
     if (!std::exchange(changed, false))

@@ -40,7 +40,7 @@ std::wstring FindInstalled()
         {
             continue;
         }
-        const std::wstring program = folder + std::wstring(L"\\cmd\\git.exe");
+        std::wstring program = folder + std::wstring(L"\\cmd\\git.exe");
         if (IsAbsolute(program) && IsFile(program))
         {
             return program;
@@ -99,7 +99,7 @@ std::wstring GitProgram::FindInFolders(std::wstring_view folders)
         std::wstring folder(folders.substr(0, end));
         folders.remove_prefix(end == std::wstring_view::npos ? folders.size() : end + 1);
         std::erase(folder, L'"');
-        const std::wstring program = folder + L"\\git.exe";
+        std::wstring program = folder + L"\\git.exe";
         if (IsAbsolute(folder) && IsFile(program))
         {
             return program;

@@ -43,7 +43,7 @@ void LockFiles::DeleteIn(const std::wstring& folder, bool withSubfolders) const
         }
         WIN32_FILE_ATTRIBUTE_DATA data{};
         if (entry->path().extension() != L".lock" ||
-            !GetFileAttributesExW(entry->path().c_str(), GetFileExInfoStandard, &data) ||
+            GetFileAttributesExW(entry->path().c_str(), GetFileExInfoStandard, &data) == FALSE ||
             CompareFileTime(&data.ftCreationTime, &m_begin) < 0)
         {
             continue;

@@ -80,9 +80,9 @@ private:
     {
         if (auto* host = std::bit_cast<HostWindow*>(GetWindowLongPtrW(window, GWLP_USERDATA)))
         {
-            host->posted += message == Posted;
-            host->timers += message == WM_TIMER;
-            host->keys += message == WM_KEYDOWN;
+            host->posted += message == Posted ? 1 : 0;
+            host->timers += message == WM_TIMER ? 1 : 0;
+            host->keys += message == WM_KEYDOWN ? 1 : 0;
             if (message == WM_PAINT)
             {
                 host->paints.push_back(std::chrono::steady_clock::now());

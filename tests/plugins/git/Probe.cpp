@@ -31,7 +31,7 @@ void Flood()
         std::fwrite(block.data(), 1, block.size(), stderr);
     }
     char buffer[4096];
-    for (std::size_t count; (count = std::fread(buffer, 1, sizeof buffer, stdin)) != 0;)
+    for (std::size_t count = 0; (count = std::fread(buffer, 1, sizeof buffer, stdin)) != 0;)
     {
         std::fwrite(buffer, 1, count, stdout);
     }
