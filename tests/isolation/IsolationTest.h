@@ -80,7 +80,7 @@ protected:
 
         SCCRTN Open(LPTEXTOUTPROC output = Output)
         {
-            return m_library.openProject(context, m_window, user.data(), "project", "C:\\project", auxPath.data(),
+            return m_library.openProject(context, m_window, user.data(), project.data(), "C:\\project", auxPath.data(),
                                          "comment", output, SCC_OP_CREATEIFNEW);
         }
         SCCRTN Get(LPCMDOPTS block = nullptr)
@@ -97,6 +97,7 @@ protected:
         std::array<char, 512> name{"Depot"};
         std::array<char, 512> label{"Aux"};
         std::array<char, 512> user{"Ben"};
+        std::array<char, 512> project{"project"};
         std::array<char, 512> auxPath{"path"};
         LONG capabilities = 0;
         LONG checkoutLength = 0;

@@ -279,7 +279,7 @@ TEST_F(Registration, OfAnIsolatedLibraryRemovesWhatLiesInItsFolder)
     std::ofstream(folder / L"full" / L"file") << "not to be removed";
     const auto refused = RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"});
     EXPECT_EQ(refused.code, Failed);
-    EXPECT_THAT(refused.errors, HasSubstr("the library cannot be isolated: "));
+    EXPECT_THAT(refused.errors, HasSubstr("the library cannot be isolated: remove the folder "));
     EXPECT_TRUE(std::filesystem::exists(folder / L"full" / L"file"));
     EXPECT_EQ(Path(L"Talking"), std::nullopt);
 

@@ -125,7 +125,10 @@ void Empty(const std::filesystem::path& folder, const std::wstring& failure)
     const auto files = error ? std::vector<std::filesystem::path>() : FilesIn(folder, error);
     for (auto file = files.begin(); !error && file != files.end(); ++file)
     {
-        std::filesystem::remove(*file, error);
+        if (!std::filesystem::remove(*file, error) && IsFolder(file->wstring()))
+        {
+            throw ToolError(ExitCode::Failed, failure + L": remove the folder " + file->wstring() + L" first");
+        }
     }
     if (error)
     {
