@@ -1,5 +1,6 @@
 #include "FileView.h"
 
+#include <bit>
 #include <set>
 #include <utility>
 
@@ -8,7 +9,7 @@ void FileView::Create(HWND parent, int id)
     m_window = CreateWindowExW(WS_EX_CLIENTEDGE, WC_LISTVIEWW, L"",
                                WS_CHILD | WS_VISIBLE | WS_TABSTOP | LVS_REPORT | LVS_OWNERDATA | LVS_SHOWSELALWAYS |
                                    LVS_SHAREIMAGELISTS | LVS_NOSORTHEADER,
-                               0, 0, 0, 0, parent, reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), nullptr, nullptr);
+                               0, 0, 0, 0, parent, std::bit_cast<HMENU>(INT_PTR{id}), nullptr, nullptr);
     ListView_SetExtendedListViewStyle(m_window, LVS_EX_FULLROWSELECT | LVS_EX_DOUBLEBUFFER | LVS_EX_LABELTIP);
     for (int index = 0; std::wstring heading : {L"Name", L"State"})
     {

@@ -3,6 +3,7 @@
 #include "Icons.h"
 
 #include <algorithm>
+#include <bit>
 #include <filesystem>
 #include <vector>
 
@@ -42,7 +43,7 @@ void FolderTree::Create(HWND parent, int id)
     m_window = CreateWindowExW(WS_EX_CLIENTEDGE, WC_TREEVIEWW, L"",
                                WS_CHILD | WS_VISIBLE | WS_TABSTOP | TVS_HASBUTTONS | TVS_HASLINES | TVS_LINESATROOT |
                                    TVS_SHOWSELALWAYS,
-                               0, 0, 0, 0, parent, reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), nullptr, nullptr);
+                               0, 0, 0, 0, parent, std::bit_cast<HMENU>(INT_PTR{id}), nullptr, nullptr);
 }
 
 void FolderTree::ShowProject(const std::wstring& folder)

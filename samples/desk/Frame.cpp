@@ -3,6 +3,7 @@
 #include "resource.h"
 
 #include <algorithm>
+#include <bit>
 
 namespace
 {
@@ -49,7 +50,7 @@ void Frame::Create(HWND window, OutputPane& output)
     output.Create(window, IDC_OUTPUT);
     m_output = output.Window();
     m_status = CreateWindowExW(0, STATUSCLASSNAMEW, L"", WS_CHILD | WS_VISIBLE | SBARS_SIZEGRIP, 0, 0, 0, 0, window,
-                               reinterpret_cast<HMENU>(INT_PTR{IDC_STATUS}), nullptr, nullptr);
+                               std::bit_cast<HMENU>(INT_PTR{IDC_STATUS}), nullptr, nullptr);
     m_progressBar = CreateWindowExW(0, PROGRESS_CLASSW, L"", WS_CHILD, 0, 0, 0, 0, m_status, nullptr, nullptr, nullptr);
     UseResolution();
 }
@@ -58,7 +59,7 @@ void Frame::CreateToolbar()
 {
     m_toolbar = CreateWindowExW(0, TOOLBARCLASSNAMEW, L"Commands",
                                 WS_CHILD | WS_VISIBLE | TBSTYLE_FLAT | TBSTYLE_LIST | CCS_NODIVIDER | CCS_NORESIZE, 0,
-                                0, 0, 0, m_window, reinterpret_cast<HMENU>(INT_PTR{IDC_TOOLBAR}), nullptr, nullptr);
+                                0, 0, 0, m_window, std::bit_cast<HMENU>(INT_PTR{IDC_TOOLBAR}), nullptr, nullptr);
     SendMessageW(m_toolbar, TB_BUTTONSTRUCTSIZE, sizeof(TBBUTTON), 0);
     for (const Button& button : Buttons)
     {

@@ -2,6 +2,7 @@
 
 #include <commctrl.h>
 
+#include <bit>
 #include <utility>
 
 namespace
@@ -23,7 +24,7 @@ void OutputPane::Create(HWND owner, int id)
     m_window =
         CreateWindowExW(WS_EX_CLIENTEDGE, L"Edit", L"",
                         WS_CHILD | WS_VISIBLE | WS_TABSTOP | WS_VSCROLL | ES_MULTILINE | ES_READONLY | ES_AUTOVSCROLL,
-                        0, 0, 0, 0, owner, reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), nullptr, nullptr);
+                        0, 0, 0, 0, owner, std::bit_cast<HMENU>(INT_PTR{id}), nullptr, nullptr);
     SetWindowSubclass(m_window, &WithoutDialogKeys, 0, 0);
     SendMessageW(m_window, EM_SETLIMITTEXT, 0, 0); // no limit
     const std::lock_guard<std::mutex> lock(m_mutex);

@@ -2,10 +2,18 @@
 
 #include <commctrl.h>
 
+#include <utility>
+
 namespace
 {
 
 constexpr ULONGLONG Interval = 50; // milliseconds between two looks at the messages
+
+/// Messages that do not wait, as the first and the last number of a range.
+constexpr std::pair<UINT, UINT> Taken[] = {{WM_PAINT, WM_PAINT},
+                                           {WM_KEYFIRST, WM_KEYLAST},
+                                           {WM_NCMOUSEMOVE, WM_NCXBUTTONDBLCLK},
+                                           {WM_MOUSEFIRST, WM_MOUSELAST}};
 
 } // namespace
 
@@ -33,17 +41,28 @@ bool Progress::Step(std::size_t done, std::size_t total)
     return !m_stopped;
 }
 
-/// Draws the windows and takes what the user types. Messages that were posted, such as commands, wait for the main
+/// Draws the windows and takes what the user types and clicks. Other messages, such as commands, wait for the main
 /// loop.
 void Progress::HandleMessages()
 {
-    MSG message{};
-    while (!m_stopped && PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE | PM_QS_INPUT | PM_QS_PAINT) != FALSE)
+    for (const auto& [first, last] : Taken)
     {
-        if (message.message == WM_PAINT)
+        MSG message{};
+        while (!m_stopped && PeekMessageW(&message, nullptr, first, last, PM_REMOVE) != FALSE)
         {
-            DispatchMessageW(&message);
+            if (message.message == WM_PAINT)
+            {
+                DispatchMessageW(&message);
+            }
+            else if (message.message == WM_QUIT) // comes whatever is asked for
+            {
+                PostQuitMessage(static_cast<int>(message.wParam));
+                m_stopped = true;
+            }
+            else
+            {
+                m_stopped = message.message == WM_KEYDOWN && message.wParam == VK_ESCAPE;
+            }
         }
-        m_stopped = message.message == WM_KEYDOWN && message.wParam == VK_ESCAPE;
     }
 }
