@@ -159,7 +159,7 @@ TEST_F(ListingTool, StatusAsJson)
                 {{"state", {"not-controlled", "missing"}}, {"stateText", "no such file"}, {"file", "nowhere.txt"}}}},
               {"summary",
                {{"files", 2},
-                {"cleared", 0},
+                {"notTicked", 0},
                 {"refused", 1},
                 {"cancelled", 0},
                 {"failed", 0},

@@ -19,7 +19,7 @@ constexpr struct
     const char* words;
     Listing::Tone tone;
 } ResultTexts[] = {
-    {"done", "done", Listing::Tone::Good},      {"cleared", "cleared", Listing::Tone::Quiet},
+    {"done", "done", Listing::Tone::Good},      {"notTicked", "cleared", Listing::Tone::Quiet},
     {"refused", "refused", Listing::Tone::Bad}, {"cancelled", "cancelled", Listing::Tone::Bad},
     {"failed", "failed", Listing::Tone::Bad},
 };
