@@ -118,12 +118,12 @@ TEST_F(DeskParts, ProgressIsShownAndLetsThePostedMessagesWait)
         Progress progress(bar);
         EXPECT_TRUE(IsWindowVisible(bar));
         PostMessageW(m_window.get(), WM_CLOSE, 0, 0);
-        Sleep(60);
+        Sleep(200); // ticks may be coarse
         EXPECT_TRUE(progress.Step(30, 120));
         EXPECT_EQ(SendMessageW(bar, PBM_GETPOS, 0, 0), 25);
         EXPECT_TRUE(IsWindow(m_window.get()));
         PostMessageW(m_window.get(), WM_KEYDOWN, VK_ESCAPE, 1);
-        Sleep(60);
+        Sleep(200); // ticks may be coarse
         EXPECT_FALSE(progress.Step(60, 120));
     }
     EXPECT_FALSE(IsWindowVisible(bar));
