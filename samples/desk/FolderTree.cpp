@@ -34,8 +34,10 @@ std::vector<std::wstring> SubfoldersOf(const std::wstring& folder)
 bool IsHidden(const std::wstring& path)
 {
     const DWORD attributes = GetFileAttributesW(path.c_str());
+    constexpr DWORD FolderLink = FILE_ATTRIBUTE_DIRECTORY | FILE_ATTRIBUTE_REPARSE_POINT;
     return fs::path(path).filename().wstring().starts_with(L'.') ||
-           (attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_HIDDEN) != 0);
+           (attributes != INVALID_FILE_ATTRIBUTES &&
+            ((attributes & FILE_ATTRIBUTE_HIDDEN) != 0 || (attributes & FolderLink) == FolderLink));
 }
 
 void FolderTree::Create(HWND parent, int id)

@@ -148,7 +148,8 @@ bool Project::Run(const FileCommand& command, const std::vector<const FileRow*>&
     params.SetTitle(command.name);
     params.SetMessage(command.message);
     params.SetOrvixFileList(&list);
-    params.SetOptions(command.dialogOption | OrvixDialogOption::OfferRemember);
+    params.SetOptions(command.dialogOption | OrvixDialogOption::OfferRemember |
+                      OrvixDialogOption::ForOperation(command.operation));
     params.SetDialogPromptID(command.dialogPrompt);
     params.SetOptionPromptID(command.optionPrompt);
     return m_library.Services().RunFileListOperation(owner, &params, true, m_provider,

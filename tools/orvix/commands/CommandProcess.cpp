@@ -62,8 +62,10 @@ public:
         {
             throw ToolError(ExitCode::ProviderEnded, Wide(DescribeEnd()));
         }
-        m_child.Wait(EndTime);
-        m_child.LeaveDescendants();
+        if (m_child.Wait(EndTime))
+        {
+            m_child.LeaveDescendants();
+        } // else the job ends a library that hangs while it is unloaded
         return *m_result;
     }
 
@@ -104,7 +106,8 @@ private:
 
     void LookForWindows()
     {
-        if (!m_watchesWindows)
+        // The dialogs of OrvixCore are for the user.
+        if (!m_watchesWindows || (m_isAttended && !m_isInCall))
         {
             return;
         }

@@ -71,6 +71,7 @@ constexpr struct
     {"text-cut", "Shorten the text."},
     {"text-too-long", "Shorten the text."},
     {"throws", "Tell the author of the plug-in."},
+    {"too-large", "Shorten the file."},
     {"unknown-element", "Correct the name, or remove the element."},
     {"unknown-value", "Write one of the two values."},
     {"unreadable-file", "Look at the rights on the file, and at programs that keep it open."},

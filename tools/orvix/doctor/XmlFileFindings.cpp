@@ -158,7 +158,7 @@ void XmlFileFindings::AddContent(DoctorReport::Subject& file, const FileDiagnost
 
 std::wstring XmlFileFindings::WhyUnread(const DoctorReport::Subject& file)
 {
-    constexpr std::string_view Codes[] = {"unreadable-file", "no-xml-service",  "entities",
+    constexpr std::string_view Codes[] = {"unreadable-file", "no-xml-service",  "entities", "too-large",
                                           "malformed",       "root-not-second", "no-root"};
     const auto found = std::find_first_of(
         file.findings.begin(), file.findings.end(), std::begin(Codes), std::end(Codes),

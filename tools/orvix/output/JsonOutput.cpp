@@ -48,6 +48,7 @@ void JsonOutput::Print(std::wstring_view text)
 void JsonOutput::PrintMessage(std::wstring_view text)
 {
     m_messages.push_back(Utf8(text));
+    std::cerr << PrintableLines(text) << std::endl; // a command that fails writes no document
 }
 
 void JsonOutput::Show(const Listing& listing)

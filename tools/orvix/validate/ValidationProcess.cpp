@@ -195,7 +195,7 @@ ValidationResult ValidationProcess::Check(const ValidationRule& rule)
                 lines.step + ' ' +
                     (lines.crash.empty() ? DescribeProcessEnd(child->ExitCode()) : DescribeCrash(lines.crash))};
     }
-    m_hanging.insert(ValidationSubject::OperationOf(lines.step));
+    AddHanging(ValidationSubject::OperationOf(lines.step));
     const std::string after = ": ended after " + std::to_string(m_limit.count()) + " s";
     return {Verdict::Fail, lines.step + (window ? " shows the window \"" + Printable(window->title) + "\" (" +
                                                       Printable(window->text) + ") and waits" + after
