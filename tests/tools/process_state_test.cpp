@@ -37,3 +37,15 @@ TEST(ProcessState, ChangesAreFoundAndRestored)
     state.Restore();
     EXPECT_THAT(state.FindChanges(), IsEmpty());
 }
+
+TEST(ProcessState, NamesAStandardHandleThatWasClosed)
+{
+    const ComApartment apartment;
+    const HANDLE before = GetStdHandle(STD_INPUT_HANDLE);
+    const HANDLE event = CreateEventW(nullptr, FALSE, FALSE, nullptr);
+    SetStdHandle(STD_INPUT_HANDLE, event);
+    const ProcessState state;
+    CloseHandle(event);
+    EXPECT_THAT(state.FindChanges(), ElementsAre("a standard handle"));
+    SetStdHandle(STD_INPUT_HANDLE, before);
+}

@@ -4,6 +4,8 @@
 
 #include <nlohmann/json.hpp>
 
+#include <iostream>
+
 namespace
 {
 

@@ -202,6 +202,25 @@ ValidationResult ValidationProcess::Check(const ValidationRule& rule)
                                                 : " hangs" + after)};
 }
 
+/// An operation and the function that it calls hang together, however a rule calls them.
+void ValidationProcess::AddHanging(const std::string& operation)
+{
+    constexpr std::pair<std::string_view, std::string_view> Same[] = {
+        {"SccInitialize", "Initialize"},   {"SccUninitialize", "Uninitialize"},
+        {"SccOpenProject", "OpenProject"}, {"SccCloseProject", "CloseProject"},
+        {"SccQueryInfo", "QueryStatus"},   {"SccGet", "GetLatest"},
+        {"SccCheckout", "CheckOut"},       {"SccUncheckout", "UndoCheckOut"},
+        {"SccCheckin", "CheckIn"},         {"SccAdd", "Add"}};
+    m_hanging.insert(operation);
+    for (const auto& [function, name] : Same)
+    {
+        if (operation == function || operation == name)
+        {
+            m_hanging.insert({std::string(function), std::string(name)});
+        }
+    }
+}
+
 std::optional<int> ValidationProcess::RunAsChild(int count, wchar_t** arguments)
 {
     if (count != NumChildArguments || std::wstring_view(arguments[1]) != ChildArgument)

@@ -44,6 +44,8 @@ public:
     static std::optional<int> RunAsChild(int count, wchar_t** arguments);
 
 private:
+    void AddHanging(const std::string& operation);
+
     std::wstring m_library;
     bool m_isMSSCCI;
     std::chrono::seconds m_limit;

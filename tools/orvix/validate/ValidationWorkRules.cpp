@@ -78,6 +78,15 @@ public:
         Require(result == Success, std::string(operation.name) + " returns " + std::to_string(result));
     }
 
+    /// Runs an operation that another rule judges. Throws `RuleSkipped` when it fails or is not offered.
+    void Need(const ValidationOperation& operation)
+    {
+        if (TryToRun(operation) != Success)
+        {
+            throw RuleSkipped(std::string(operation.name) + " fails");
+        }
+    }
+
     /// Throws `RuleSkipped` when the state is none, which the rule of the status bits reports.
     unsigned long State()
     {
@@ -153,7 +162,7 @@ void WorkRules::Stores(ValidationSubject& subject)
     file.Run(ValidationOperation::Add());
     file.RequireState(In, Out | OrvixFileState::NotControlled, "Add");
     file.RequireBytes(OldBytes, "Add");
-    file.Run(ValidationOperation::CheckOut());
+    file.Need(ValidationOperation::CheckOut());
     subject.Write(L"stored.txt", NewBytes);
     file.Run(ValidationOperation::CheckIn());
     file.RequireState(In, Out | OrvixFileState::Modified, "CheckIn");
@@ -170,7 +179,7 @@ void WorkRules::ChecksOut(ValidationSubject& subject)
     ValidationProvider provider(subject);
     provider.Begin();
     WorkedFile file(subject, provider, subject.Write(L"taken.txt", OldBytes));
-    file.Run(ValidationOperation::Add());
+    file.Need(ValidationOperation::Add());
     file.Run(ValidationOperation::CheckOut());
     file.RequireState(In | Out, OrvixFileState::NotControlled, "CheckOut");
     Require(IsWritable(file.Path()), "after CheckOut the file is read-only");
@@ -193,9 +202,9 @@ void WorkRules::StatusTruth(ValidationSubject& subject)
     provider.Begin();
     WorkedFile file(subject, provider, subject.Write(L"asked.txt", OldBytes));
     file.RequireState(0, OfControlled, "making a new file");
-    file.Run(ValidationOperation::Add());
+    file.Need(ValidationOperation::Add());
     file.RequireState(In, Changed | OrvixFileState::NotControlled | OrvixFilePermission::Add, "Add");
-    file.Run(ValidationOperation::CheckOut());
+    file.Need(ValidationOperation::CheckOut());
     file.RequireState(In, Changed | OrvixFileState::NotControlled | OrvixFilePermission::Add, "CheckOut");
     WorkedFile missing(subject, provider, subject.Project() + L"\\never there.txt");
     missing.RequireState(0, OfControlled, "nothing, of a file that never existed,");
