@@ -80,11 +80,6 @@ const std::vector<std::string> PinnedNames = {
     PIN(OrvixDialogOption::OfferRemember, std::uint32_t{0x40}),
     PIN(OrvixDialogOption::RememberChecked, std::uint32_t{0x80}),
     PIN(OrvixDialogOption::OperationMask, std::uint32_t{0x3E00}),
-    PIN(OrvixDialogOption::ForOperation(OrvixOperation::CheckIn), std::uint32_t{0x200}),
-    PIN(OrvixDialogOption::ForOperation(OrvixOperation::Add), std::uint32_t{0x400}),
-    PIN(OrvixDialogOption::ForOperation(OrvixOperation::GetLatest), std::uint32_t{0x800}),
-    PIN(OrvixDialogOption::ForOperation(OrvixOperation::CheckOut), std::uint32_t{0x1000}),
-    PIN(OrvixDialogOption::ForOperation(OrvixOperation::UndoCheckOut), std::uint32_t{0x2000}),
     PIN(OrvixDialogResult::Cancelled, std::int32_t{0}),
     PIN(OrvixDialogResult::Confirmed, std::int32_t{1}),
 
@@ -127,6 +122,12 @@ const std::vector<std::string> PinnedNames = {
     PIN(OrvixListenerAnswer::Veto, std::uint32_t{1}),
     PIN(OrvixListenerAnswer::Stop, std::uint32_t{2}),
 };
+
+static_assert(OrvixDialogOption::ForOperation(OrvixOperation::CheckIn) == 0x200);
+static_assert(OrvixDialogOption::ForOperation(OrvixOperation::Add) == 0x400);
+static_assert(OrvixDialogOption::ForOperation(OrvixOperation::GetLatest) == 0x800);
+static_assert(OrvixDialogOption::ForOperation(OrvixOperation::CheckOut) == 0x1000);
+static_assert(OrvixDialogOption::ForOperation(OrvixOperation::UndoCheckOut) == 0x2000);
 
 /// The constants of all published headers, as "Namespace::Name".
 std::vector<std::string> NamesInHeaders()
