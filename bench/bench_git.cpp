@@ -13,6 +13,7 @@
 
 #include <chrono>
 #include <cstdio>
+#include <cstdlib>
 #include <filesystem>
 #include <memory>
 #include <string>
@@ -23,6 +24,16 @@ namespace
 
 constexpr int Many = 20000;
 constexpr int Some = 2000;
+
+/// Stops when something has failed: its time means nothing.
+void Require(bool success, const std::string& what)
+{
+    if (!success)
+    {
+        std::printf("Git: not measured, since this failed: %s\n", what.c_str());
+        std::exit(1);
+    }
+}
 
 /// A repository with many files, and Git by hand.
 class BenchRepository
@@ -57,7 +68,8 @@ public:
         command.folder = m_folder.Text();
         command.input = input;
         command.silence = std::chrono::minutes(5);
-        Process::Run(std::move(command), nullptr);
+        const ProcessResult result = Process::Run(std::move(command), nullptr);
+        Require(result.Succeeded(), "git by hand: " + result.errors + result.output);
     }
 
     std::unique_ptr<OrvixFileList> List(int count) const
@@ -104,7 +116,8 @@ public:
     bool Works() const { return m_works; }
     IOrvixProvider& Open(const BenchRepository& repository) const
     {
-        m_provider->OpenProject(repository.Folder().c_str(), L"");
+        Require(m_provider->OpenProject(repository.Folder().c_str(), L"") == OrvixProviderResult::Success,
+                "OpenProject");
         return *m_provider;
     }
 
@@ -115,12 +128,17 @@ private:
     bool m_works = false;
 };
 
+void Query(IOrvixProvider& provider, OrvixFileList& list)
+{
+    Require(provider.QueryStatus(&list, 0) == OrvixProviderResult::Success, "QueryStatus");
+}
+
 /// Milliseconds of a query per file.
 double QueryCostPerFile(const GitPlugin& plugin, const BenchRepository& repository, int count)
 {
     IOrvixProvider& provider = plugin.Open(repository);
     const auto list = repository.List(count);
-    return BestTime([&] { provider.QueryStatus(list.get(), 0); }) / count;
+    return BestTime([&] { Query(provider, *list); }) / count;
 }
 
 /// The folder of git.exe for this process: under Wine the bridge of the tests.
@@ -152,7 +170,7 @@ void BenchGit(MeasureTable& table)
         IOrvixProvider& provider = plugin.Open(many);
         const auto list = many.List(Many);
         table.Print(Compare(
-            "Git: QueryStatus, 20,000 files, against git status", 1.15, [&] { provider.QueryStatus(list.get(), 0); },
+            "Git: QueryStatus, 20,000 files, against git status", 1.15, [&] { Query(provider, *list); },
             [&] {
                 many.Git({L"status", L"--porcelain=v2", L"-z", L"--branch", L"--untracked-files=all", L"--no-renames"});
             }));
@@ -163,7 +181,8 @@ void BenchGit(MeasureTable& table)
     const auto list = some.List(Some);
     const std::string paths = BenchRepository::PathList(Some);
     table.Print(Compare(
-        "Git: CheckIn, 2,000 files, against git commit", 1.15, [&] { provider.CheckIn(list.get(), L"Bench", 0); },
+        "Git: CheckIn, 2,000 files, against git commit", 1.15,
+        [&] { Require(provider.CheckIn(list.get(), L"Bench", 0) == OrvixProviderResult::Success, "CheckIn"); },
         [&] {
             some.Git(
                 {L"commit", L"--quiet", L"--only", L"-m", L"Bench", L"--pathspec-from-file=-", L"--pathspec-file-nul"},
