@@ -114,7 +114,7 @@ private:
     static int Percent(const std::string& line)
     {
         const std::size_t sign = line.find('%');
-        if (sign == std::string::npos)
+        if (sign == std::string::npos || sign == 0)
         {
             return -1;
         }

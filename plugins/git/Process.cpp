@@ -197,12 +197,17 @@ private:
 };
 
 /// Presses Ctrl+C in the console of a program, which then cleans up. Only a process without a console of its own can do
-/// that; in a console program nothing happens.
+/// that; in a console program nothing happens. The console is the process's: one object at a time uses it, and another
+/// one does nothing.
 class Interrupt
 {
 public:
     explicit Interrupt(DWORD processId)
     {
+        if (!m_holds)
+        {
+            return;
+        }
         std::array<HANDLE, 3> handles{};
         for (std::size_t i = 0; i < handles.size(); ++i)
         {
@@ -232,10 +237,16 @@ public:
         {
             SetConsoleCtrlHandler(nullptr, FALSE);
         }
+        if (m_holds)
+        {
+            s_used = false;
+        }
     }
 
 private:
     static constexpr std::array<DWORD, 3> Names{STD_INPUT_HANDLE, STD_OUTPUT_HANDLE, STD_ERROR_HANDLE};
+    static inline std::atomic<bool> s_used = false;
+    bool m_holds = !s_used.exchange(true);
     bool m_ignores = false;
     bool m_isSent = false;
 };
@@ -340,7 +351,13 @@ void Process::Running::Start(HANDLE input, HANDLE output, HANDLE errors)
     m_process.reset(information.hProcess);
     m_processId = information.dwProcessId;
     const OwnedHandle thread(information.hThread);
-    AssignProcessToJobObject(m_job.get(), m_process.get());
+    if (!AssignProcessToJobObject(m_job.get(), m_process.get()))
+    {
+        const DWORD error = GetLastError();
+        TerminateProcess(m_process.get(), 1);
+        SetLastError(error);
+        ThrowLastError(m_command.program + L" cannot be put into a job");
+    }
     ResumeThread(thread.get());
 }
 
@@ -454,7 +471,11 @@ bool Process::Running::Step(unsigned long timeout, HANDLE cancel)
 /// Something has happened: the program has ended, or a stream goes on.
 void Process::Running::OnSign(HANDLE handle)
 {
-    m_lastSign = Clock::now();
+    // A program that was left in the background may print for ever.
+    if (!m_exited)
+    {
+        m_lastSign = Clock::now();
+    }
     if (handle == m_process.get())
     {
         m_exited = true;
