@@ -314,7 +314,7 @@ std::vector<GitFileState> GitRepository::Status(const Paths& paths)
 /// Runs a command that changes the repository. When it is ended in the middle, its lock files go.
 ProcessResult GitRepository::Change(const GitCommand& command) const
 {
-    const LockFiles locks(m_gitFolder, m_commonFolder);
+    const LockFiles locks(m_gitFolder, m_commonFolder, !command.keepsIndex);
     try
     {
         return m_runner.Run(command);
@@ -403,7 +403,8 @@ GitRepository::Lines GitRepository::Push() const
     Lines words;
     try
     {
-        const ProcessResult push = Change({.arguments = {L"push", L"--progress"}, .task = L"Pushing"});
+        const ProcessResult push =
+            Change({.arguments = {L"push", L"--progress"}, .task = L"Pushing", .keepsIndex = true});
         if (push.Succeeded())
         {
             return {};

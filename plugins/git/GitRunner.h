@@ -24,6 +24,7 @@ struct GitCommand
     bool isQuery = false;                  ///< it takes no lock that is not needed
     std::wstring task{};                   ///< what the waiting window says
     std::size_t linesToCome = 0;           ///< lines of output that it prints on its way; 0: it prints its own progress
+    bool keepsIndex = false;               ///< it never writes the index
 };
 
 /// Runs commands of Git for one operation of the provider: on threads of their own, while the waiting window paints the

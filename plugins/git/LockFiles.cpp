@@ -11,8 +11,8 @@ constexpr DWORD Pause = 50;  // milliseconds
 
 } // namespace
 
-LockFiles::LockFiles(const std::wstring& gitFolder, const std::wstring& commonFolder)
-    : m_gitFolder(gitFolder), m_commonFolder(commonFolder)
+LockFiles::LockFiles(const std::wstring& gitFolder, const std::wstring& commonFolder, bool withIndex)
+    : m_gitFolder(gitFolder), m_commonFolder(commonFolder), m_withIndex(withIndex)
 {
     GetSystemTimeAsFileTime(&m_begin);
 }
@@ -42,9 +42,10 @@ void LockFiles::DeleteIn(const std::wstring& folder, bool withSubfolders) const
             entry.disable_recursion_pending();
         }
         WIN32_FILE_ATTRIBUTE_DATA data{};
-        if (entry->path().extension() != L".lock" ||
+        // A new file may get the creation time of an older one with its name.
+        if (entry->path().extension() != L".lock" || (!m_withIndex && entry->path().filename() == L"index.lock") ||
             GetFileAttributesExW(entry->path().c_str(), GetFileExInfoStandard, &data) == FALSE ||
-            CompareFileTime(&data.ftCreationTime, &m_begin) < 0)
+            CompareFileTime(&data.ftLastWriteTime, &m_begin) < 0)
         {
             continue;
         }

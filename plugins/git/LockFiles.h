@@ -9,10 +9,11 @@
 class LockFiles
 {
 public:
-    /// Begins a change of the repository with these two folders of Git, which may be the same.
-    LockFiles(const std::wstring& gitFolder, const std::wstring& commonFolder);
+    /// Begins a change of the repository with these two folders of Git, which may be the same. Without `withIndex` a
+    /// lock file of the index belongs to another program, and stays.
+    LockFiles(const std::wstring& gitFolder, const std::wstring& commonFolder, bool withIndex);
 
-    /// Deletes the lock files that have been made since then. One that a program holds open stays.
+    /// Deletes the lock files that have been written since then. One that a program holds open stays.
     void DeleteNew() const noexcept;
 
 private:
@@ -20,5 +21,6 @@ private:
 
     const std::wstring& m_gitFolder;
     const std::wstring& m_commonFolder;
+    bool m_withIndex;
     FILETIME m_begin{};
 };

@@ -7,6 +7,7 @@
 #include "GitRunner.h"
 #include "GitSnapshot.h"
 #include "GitText.h"
+#include "LockFiles.h"
 #include "Process.h"
 #include "TempFolder.h"
 
@@ -18,6 +19,7 @@
 
 #include <chrono>
 #include <cstdlib>
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -200,6 +202,27 @@ TEST(ChildProcess, ThatCannotBeStartedSaysWhy)
     command.program = L"C:\\no such program.exe";
     EXPECT_NE(FailureOf([&] { Process::Run(command, nullptr); }).find(L"no such program.exe cannot be started"),
               std::wstring::npos);
+}
+
+TEST(LockFiles, DeletesThoseOfItsOwnCommand)
+{
+    const TempFolder folder;
+    const std::wstring git = folder.Text();
+    std::filesystem::create_directories(folder.Path() / L"refs" / L"heads");
+    const auto write = [&](const wchar_t* file, std::chrono::hours age) {
+        WriteBytes(folder.Path() / file, "");
+        std::filesystem::last_write_time(folder.Path() / file, std::filesystem::file_time_type::clock::now() - age);
+    };
+    const auto has = [&](const wchar_t* file) { return std::filesystem::exists(folder.Path() / file); };
+    write(L"config.lock", 1h);
+    write(L"index.lock", -1h);
+    write(L"refs/heads/main.lock", -1h);
+    LockFiles(git, git, false).DeleteNew();
+    EXPECT_TRUE(has(L"config.lock")) << "it is older";
+    EXPECT_TRUE(has(L"index.lock")) << "the command does not write the index";
+    EXPECT_FALSE(has(L"refs/heads/main.lock"));
+    LockFiles(git, git, true).DeleteNew();
+    EXPECT_FALSE(has(L"index.lock"));
 }
 
 TEST(GitProgram, IsFoundInAbsoluteFoldersOnly)
