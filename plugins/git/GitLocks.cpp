@@ -7,6 +7,7 @@ namespace
 {
 
 constexpr std::chrono::minutes Freshness(1);
+constexpr int StepsAtOnce = 100;
 
 GitCommand Question()
 {
@@ -61,18 +62,13 @@ void GitLocks::RefreshInBackground(const GitRunner& runner)
     {
         return;
     }
-    // Each step that finds something to do is short.
-    while (m_question)
+    // Each step is short. The last ones of a program move no bytes.
+    for (int i = 0; m_question && i < StepsAtOnce; ++i)
     {
-        const std::size_t before = m_question->Result().output.size() + m_question->Result().errors.size();
         if (!m_question->Step(0, nullptr))
         {
             Read(m_question->Result());
             m_question.reset();
-        }
-        else if (m_question->Result().output.size() + m_question->Result().errors.size() == before)
-        {
-            break;
         }
     }
     const auto now = std::chrono::steady_clock::now();
@@ -117,6 +113,7 @@ void GitLocks::GiveBack(const GitRunner& runner, const std::string& path)
     {
         runner.RunOrThrow(ForFile(L"unlock", path, L"Unlocking "));
         m_locks.erase(path);
+        m_question.reset(); // its answer may still have the lock
     }
 }
 

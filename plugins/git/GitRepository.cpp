@@ -146,7 +146,7 @@ void GitRepository::Open(const std::wstring& folder)
     ReadConfiguration(results[0].output);
     m_locks.Reset(results[1].Succeeded() && !results[1].output.empty());
     m_top = top;
-    m_locks.RefreshInBackground(m_runner);
+    m_locks.Refresh(m_runner);
 }
 
 void GitRepository::Close()

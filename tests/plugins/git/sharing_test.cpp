@@ -307,6 +307,14 @@ TEST_F(GitLocking, ALockOfAnEarlierSessionIsSeenWhenTheProjectOpens)
     EXPECT_TRUE(Becomes(Tracked | State::CheckedOutByOther));
 }
 
+TEST_F(GitLocking, ALockOfAnEarlierSessionIsGivenBackAtOnce)
+{
+    m_bobsGit({L"lfs", L"lock", L"river.psd"});
+    ASSERT_EQ(m_bob.Open(m_bobsGit.Folder()), Success);
+    ASSERT_EQ(m_bob.Undo({m_river}), Success);
+    EXPECT_EQ(Locks(), "");
+}
+
 TEST_F(GitLocking, ALockStaysUntilTheNewVersionIsPushed)
 {
     m_bobsGit({L"config", L"orvix.push", L"true"});
