@@ -543,7 +543,7 @@ void GitRepository::UndoCheckOut(const Paths& paths)
     }
     if (!changed.empty())
     {
-        ChangeOrThrow(OnPaths({L"restore", L"--source=HEAD", L"--staged", L"--worktree"}, changed,
+        ChangeOrThrow(OnPaths({L"restore", L"--progress", L"--source=HEAD", L"--staged", L"--worktree"}, changed,
                               L"Bringing back the committed versions"));
     }
     if (!added.empty())
@@ -562,7 +562,8 @@ void GitRepository::UndoCheckOut(const Paths& paths)
     }
 }
 
-bool GitRepository::HasUpstream() const
+/// Whether the upstream has a commit, as it was last fetched: that of an empty repository has none.
+bool GitRepository::HasUpstreamCommit() const
 {
     return m_runner
         .Run({.arguments = {L"rev-parse", L"--verify", L"--quiet", L"@{upstream}"},
@@ -573,12 +574,18 @@ bool GitRepository::HasUpstream() const
 
 void GitRepository::GetLatest(const Paths& paths)
 {
-    const std::vector<std::string> files = SpelledNow(paths);
-    if (HasUpstream())
+    TakeSnapshot();
+    const std::vector<std::string> files = Spelled(paths);
+    if (!m_snapshot->Status().upstream.empty())
     {
-        ChangeOrThrow({.arguments = {L"fetch", L"--progress"}, .task = L"Fetching"});
-        ChangeOrThrow(
-            {.arguments = {L"merge", L"--quiet", L"--ff-only", L"@{upstream}"}, .task = L"Moving the branch forward"});
+        ChangeOrThrow({.arguments = {L"fetch", L"--progress"}, .task = L"Fetching", .keepsIndex = true});
+        if (HasUpstreamCommit())
+        {
+            // A stash of the user's changes could end in a conflict: they stay as they are, and Git refuses.
+            ChangeOrThrow(
+                {.arguments = {L"merge", L"--progress", L"--no-stat", L"--no-autostash", L"--ff-only", L"@{upstream}"},
+                 .task = L"Moving the branch forward"});
+        }
     }
     const std::string deleted = m_runner.RunOrThrow(
         {.arguments = {L"ls-files", L"-z", L"--deleted"}, .isQuery = true, .task = L"Looking for missing files"});
@@ -589,7 +596,7 @@ void GitRepository::GetLatest(const Paths& paths)
                  [&](const std::string& file) { return isMissing.contains(file); });
     if (!restored.empty())
     {
-        ChangeOrThrow(OnPaths({L"restore", L"--worktree"}, restored, L"Bringing back missing files"));
+        ChangeOrThrow(OnPaths({L"restore", L"--progress", L"--worktree"}, restored, L"Bringing back missing files"));
     }
     m_locks.Refresh(m_runner);
 }

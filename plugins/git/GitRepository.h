@@ -72,7 +72,7 @@ private:
     Lines Push() const;
     std::unordered_set<std::string> Lockable(const std::vector<std::string>& paths) const;
     Lines GiveLocksBack(const std::vector<std::string>& paths);
-    bool HasUpstream() const;
+    bool HasUpstreamCommit() const;
 
     GitRunner& m_runner;
     std::wstring m_top;          ///< without a separator at its end

@@ -101,6 +101,33 @@ TEST_F(GitSharing, ChangesInTheWayAreNotOverwritten)
     EXPECT_FALSE(m_bobsGit.Has(L"river.psd"));
 }
 
+TEST_F(GitSharing, ChangesInTheWayAreNotStashed)
+{
+    AdaPushes(L"town.txt", "2\n");
+    m_bobsGit.Configure("[merge]\n\tautoStash = true\n");
+    m_bobsGit.Write(L"town.txt", "mine\n");
+    const std::string head = Head(m_bobsGit);
+    EXPECT_EQ(m_bob.Get({m_town}), Failure);
+    EXPECT_TRUE(m_bob.client.Shows(L"Your local changes to the following files would be overwritten"));
+    EXPECT_EQ(Head(m_bobsGit), head);
+    EXPECT_EQ(m_bobsGit.Read(L"town.txt"), "mine\n");
+    EXPECT_EQ(m_bobsGit({L"stash", L"list"}), "");
+}
+
+TEST_F(GitSharing, ACloneOfAnEmptyRepositoryGetsItsFirstVersion)
+{
+    const PlainGit parent(m_folder.Text());
+    parent({L"init", L"--quiet", L"--bare", L"--initial-branch=main", L"empty.git"});
+    const PlainGit clone = Clone(L"empty.git", L"carl");
+    ASSERT_EQ(m_bob.Open(clone.Folder()), Success);
+    const std::wstring file = clone.File(L"town.txt");
+    EXPECT_EQ(m_bob.Get({file}), Success) << testing::PrintToString(m_bob.client.lines);
+    m_adasGit({L"push", L"--quiet", Address(L"empty.git"), L"main"});
+    EXPECT_EQ(m_bob.Get({file}), Success) << testing::PrintToString(m_bob.client.lines);
+    EXPECT_EQ(Head(clone), Head(m_adasGit));
+    EXPECT_EQ(clone.Read(L"town.txt"), "1\n");
+}
+
 TEST_F(GitSharing, ABranchThatHasDivergedIsLeftAsItIs)
 {
     AdaPushes(L"town.txt", "2\n");
