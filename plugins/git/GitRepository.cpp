@@ -227,9 +227,14 @@ std::vector<std::string> GitRepository::Spelled(const Paths& paths) const
     return spelled;
 }
 
-/// The same for files that may have been renamed since they were seen: to a name in another letter case.
+/// The same for files that were not seen yet, or may have been renamed since: to a name in another letter case.
 std::vector<std::string> GitRepository::SpelledNow(const Paths& paths)
 {
+    if (!m_snapshot)
+    {
+        TakeSnapshot();
+        return Spelled(paths);
+    }
     std::vector<std::string> spelled = Spelled(paths);
     for (std::size_t i = 0; i < paths.size(); ++i)
     {

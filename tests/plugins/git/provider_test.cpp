@@ -333,6 +333,13 @@ TEST_F(GitProvider, CommitsANameThatChangesOnlyItsLetterCase)
               "R100\tReadme.txt\tREADME.TXT\n");
 }
 
+TEST_F(GitProvider, AddsAFileInAnotherLetterCaseAtFirst)
+{
+    m_git.Write(L"sub/Readme.txt", "1\n");
+    ASSERT_EQ(m_user.Add({m_git.File(L"SUB/README.TXT")}), Success) << testing::PrintToString(m_user.client.lines);
+    EXPECT_EQ(m_git({L"ls-files"}), "sub/Readme.txt\n");
+}
+
 TEST_F(GitProvider, ChecksOutForThisSession)
 {
     const std::wstring file = m_git.Commit(L"a.txt", "1\n");
@@ -482,7 +489,8 @@ TEST_F(GitProvider, EndsACommandThatIsSilentForTooLong)
     AddHook(m_git, L"pre-commit", "sleep 60\n");
     ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
     EXPECT_EQ(m_user.CheckIn({file}, L"Slow"), Failure);
-    EXPECT_TRUE(m_user.client.Shows(L"git commit printed nothing for 2 seconds and was ended"));
+    EXPECT_TRUE(m_user.client.Shows(L"git commit printed nothing for 2 seconds and was ended"))
+        << testing::PrintToString(m_user.client.lines);
     EXPECT_FALSE(m_git.Has(L".git/index.lock"));
     m_git({L"config", L"--unset", L"core.hooksPath"});
     EXPECT_EQ(m_user.CheckIn({file}, L"Now"), Success);
