@@ -456,48 +456,67 @@ void GitRepository::CheckOut(const Paths& paths)
         }
         m_locks.Refresh(m_runner);
     }
+    std::vector<DWORD> attributes;
+    m_runner.Work(L"Looking at the files", [&] {
+        for (const std::string& file : files)
+        {
+            attributes.push_back(GetFileAttributesW(LongForm(Full(file)).c_str()));
+        }
+    });
     Lines failures;
-    for (const std::string& file : files)
+    std::vector<std::size_t> ready;
+    for (std::size_t i = 0; i < files.size() && !m_runner.IsCancelled(); ++i)
     {
-        const GitSnapshot::Entry* entry = m_snapshot->Find(file);
-        const std::wstring full = LongForm(Full(file));
-        const DWORD attributes = GetFileAttributesW(full.c_str());
-        if (entry == nullptr || !entry->second.isTracked)
-        {
-            failures.push_back(Full(file) + NotControlled);
-            continue;
-        }
-        if (attributes == INVALID_FILE_ATTRIBUTES)
-        {
-            failures.push_back(Full(file) + L" is not on the disk");
-            continue;
-        }
         try
         {
-            if (lockable.contains(file))
-            {
-                m_locks.Take(m_runner, file);
-            }
+            PrepareCheckOut(files[i], attributes[i], lockable.contains(files[i]));
+            ready.push_back(i);
         }
         catch (const GitFailure& failure)
         {
             failures.insert(failures.end(), failure.lines.begin(), failure.lines.end());
-            if (m_runner.IsCancelled())
-            {
-                break;
-            }
-            continue;
         }
-        if (!SetFileAttributesW(full.c_str(), attributes & ~static_cast<DWORD>(FILE_ATTRIBUTE_READONLY)))
-        {
-            failures.push_back(Full(file) + L" cannot be made writable: " + GitText::SystemMessage(GetLastError()));
-            continue;
-        }
-        m_checkedOut.insert(file);
     }
+    if (failures.empty() && ready.size() < files.size())
+    {
+        failures.emplace_back(GitRunner::Cancelled);
+    }
+    m_runner.Work(L"Making the files writable", [&] {
+        for (const std::size_t i : ready)
+        {
+            const std::wstring full = Full(files[i]);
+            if (SetFileAttributesW(LongForm(full).c_str(),
+                                   attributes[i] & ~static_cast<DWORD>(FILE_ATTRIBUTE_READONLY)))
+            {
+                m_checkedOut.insert(files[i]);
+            }
+            else
+            {
+                failures.push_back(full + L" cannot be made writable: " + GitText::SystemMessage(GetLastError()));
+            }
+        }
+    });
     if (!failures.empty())
     {
         throw GitFailure(std::move(failures));
+    }
+}
+
+/// Takes the lock of a file when it is lockable. Throws when the file cannot be checked out.
+void GitRepository::PrepareCheckOut(const std::string& file, unsigned long attributes, bool isLockable)
+{
+    const GitSnapshot::Entry* entry = m_snapshot->Find(file);
+    if (entry == nullptr || !entry->second.isTracked)
+    {
+        throw GitFailure(Full(file) + NotControlled);
+    }
+    if (attributes == INVALID_FILE_ATTRIBUTES)
+    {
+        throw GitFailure(Full(file) + L" is not on the disk");
+    }
+    if (isLockable)
+    {
+        m_locks.Take(m_runner, file);
     }
 }
 
@@ -675,6 +694,8 @@ void GitRepository::RunClient() const
     {
         throw GitFailure(L"The setting orvix.client of Git does not name a program by its full path: " + program);
     }
-    Process::StartAlone(program, isGui ? std::vector<std::wstring>{L"gui"} : std::vector<std::wstring>{},
-                        m_top + L'\\');
+    m_runner.Work(L"Starting " + program, [&] {
+        Process::StartAlone(program, isGui ? std::vector<std::wstring>{L"gui"} : std::vector<std::wstring>{},
+                            m_top + L'\\');
+    });
 }

@@ -71,6 +71,7 @@ private:
     bool AddMany(const std::vector<std::string>& files) const;
     Lines Push() const;
     std::unordered_set<std::string> Lockable(const std::vector<std::string>& paths) const;
+    void PrepareCheckOut(const std::string& file, unsigned long attributes, bool isLockable);
     Lines GiveLocksBack(const std::vector<std::string>& paths);
     bool HasUpstreamCommit() const;
 

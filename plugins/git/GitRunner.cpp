@@ -13,8 +13,6 @@
 namespace
 {
 
-constexpr wchar_t Cancelled[] = L"cancelled";
-
 /// What differs from the host's environment. Git asks nothing on a terminal, uses no pager, and speaks English.
 std::vector<ProcessCommand::Variable> Environment(const GitCommand& command, bool unattended)
 {
@@ -162,7 +160,9 @@ std::vector<ProcessResult> GitRunner::RunAll(std::span<const GitCommand> command
     {
         throw GitFailure(Cancelled);
     }
-    ShowTask(commands);
+    const auto named =
+        std::find_if(commands.begin(), commands.end(), [](const GitCommand& command) { return !command.task.empty(); });
+    ShowTask(named != commands.end() ? named->task : std::wstring());
     std::vector<ProcessResult> results(commands.size());
     std::vector<std::exception_ptr> failures(commands.size());
     std::vector<OwnedHandle> ended;
@@ -205,14 +205,38 @@ std::vector<ProcessResult> GitRunner::RunAll(std::span<const GitCommand> command
     return results;
 }
 
-/// Shows what runs: the first task that the commands name.
-void GitRunner::ShowTask(std::span<const GitCommand> commands) const
+void GitRunner::Work(const std::wstring& task, const std::function<void()>& work) const
+{
+    ShowTask(task);
+    std::exception_ptr failure;
+    const OwnedHandle end = MakeEvent();
+    const OwnedHandle cancel = MakeEvent(); // nothing looks at it
+    {
+        const std::jthread thread([&] {
+            try
+            {
+                work();
+            }
+            catch (...)
+            {
+                failure = std::current_exception();
+            }
+            SetEvent(end.get());
+        });
+        WaitFor(end.get(), cancel.get());
+    }
+    if (failure)
+    {
+        std::rethrow_exception(failure);
+    }
+}
+
+/// Shows what runs.
+void GitRunner::ShowTask(const std::wstring& task) const
 {
     if (m_window != nullptr)
     {
-        const auto named = std::find_if(commands.begin(), commands.end(),
-                                        [](const GitCommand& command) { return !command.task.empty(); });
-        m_window->SetTask(named != commands.end() ? named->task.c_str() : L"");
+        m_window->SetTask(task.c_str());
         m_window->SetProgress(L"", -1);
     }
 }

@@ -5,6 +5,7 @@
 #include <windows.h>
 
 #include <chrono>
+#include <functional>
 #include <span>
 #include <string>
 #include <string_view>
@@ -36,6 +37,9 @@ public:
     /// How long a command may print nothing, unless the configuration says otherwise.
     static constexpr std::chrono::seconds DefaultSilence{300};
 
+    /// What a failure says when the user has cancelled.
+    static constexpr wchar_t Cancelled[] = L"cancelled";
+
     /// Prepares to run `program`.
     void SetUp(std::wstring program);
 
@@ -63,6 +67,10 @@ public:
     /// Runs commands side by side; the results in their order.
     std::vector<ProcessResult> RunAll(std::span<const GitCommand> commands) const;
 
+    /// Runs work that is no command and may take a while, such as calls for files of a network. It runs to its end,
+    /// also when the user cancels. Its exception is thrown here.
+    void Work(const std::wstring& task, const std::function<void()>& work) const;
+
     /// How a command is started.
     ProcessCommand MakeProcess(const GitCommand& command) const;
 
@@ -70,7 +78,7 @@ public:
     static std::vector<std::wstring> Words(const ProcessResult& result);
 
 private:
-    void ShowTask(std::span<const GitCommand> commands) const;
+    void ShowTask(const std::wstring& task) const;
     void WaitFor(HANDLE end, HANDLE cancel) const;
     void RequireEnd(const GitCommand& command, const ProcessResult& result) const;
 
