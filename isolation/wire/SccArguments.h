@@ -23,7 +23,8 @@ struct HostSide
     std::vector<std::string> addedTexts;
     std::vector<LPCSTR> added;
 
-    LONG count = 0; ///< of files in the running call
+    LONG count = 0;     ///< of files in the running call
+    LONG sentCount = 0; ///< the same, as the host has given it to SccAddFromScc
 };
 
 /// What they need to know in the library's process.
@@ -455,6 +456,7 @@ public:
     {
         NumberPlace<LONG>::Send(request, side, count);
         side.count = count != nullptr ? *count : 0;
+        side.sentCount = side.count;
     }
     AddedCount(MessageReader& request, LibrarySide& side) : m_side(&side)
     {
@@ -522,6 +524,7 @@ public:
         side.added.clear();
         const auto state = reply.Number<std::uint32_t>();
         MessageReader::Check(state <= NewNames);
+        MessageReader::Check(state == NewNames || side.count <= side.sentCount); // the host's own array has no more
         const std::size_t count = state == NewNames ? Elements(side.count) : 0;
         MessageReader::Check(count <= reply.Rest() / sizeof(std::uint32_t)); // each has at least that
         std::vector<bool> isPresent;

@@ -276,6 +276,38 @@ TEST_F(Wire, CarriesTheFilesOfTheVersionControlSystem)
     EXPECT_EQ(names, &folder);
 }
 
+TEST_F(Wire, RefusesMoreAddedFilesThanTheHostsOwnArrayHas)
+{
+    constexpr std::uint32_t SameNames = 1;
+
+    LONG count = 1;
+    LPCSTR folder = "folder";
+    LPCSTR* names = &folder;
+    for (const std::int32_t answered : {1, 2})
+    {
+        count = 1;
+        MessageWriter request(m_request.All(), Request);
+        SendArguments(SccCalls::AddFromScc, request, m_host, nullptr, nullptr, &count, &names);
+        MessageWriter reply(m_reply.All(), Reply);
+        reply.Number(answered);
+        reply.Number(SameNames);
+        reply.Finish();
+        MessageReader answer(m_reply.All());
+        const auto receive = [&] {
+            ReceiveArguments(SccCalls::AddFromScc, answer, m_host, nullptr, nullptr, &count, &names);
+        };
+        if (answered == 1)
+        {
+            EXPECT_NO_THROW(receive());
+        }
+        else
+        {
+            EXPECT_THROW(receive(), MessageError);
+        }
+        EXPECT_EQ(names, &folder);
+    }
+}
+
 // Hostile messages
 
 namespace
