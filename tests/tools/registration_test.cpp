@@ -5,6 +5,7 @@
 
 #include <gmock/gmock.h>
 
+#include <array>
 #include <fstream>
 
 namespace
@@ -291,6 +292,59 @@ TEST_F(Registration, OfAnIsolatedLibraryRemovesWhatLiesInItsFolder)
     EXPECT_EQ(Register(ORVIX_TALKING_MSSCCI, L"Talking").output,
               "replaced Talking: " + Library() + " instead of " + (folder / L"scc_proxy.dll").string() + "\n");
     EXPECT_FALSE(std::filesystem::exists(folder)) << "it is not isolated any more";
+}
+
+TEST_F(Registration, OfTheProxyOfAnIsolatedLibraryIsRefused)
+{
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"}).code, Success);
+    const std::filesystem::path proxy = IsolatedPath(L"TALKING") / L"scc_proxy.dll";
+    for (const wchar_t* name : {L"Talking", L"Other"})
+    {
+        for (const auto& result : {Register(proxy, name), RunExactly({L"register", proxy, name, L"--isolated"})})
+        {
+            EXPECT_EQ(result.code, BadUsage);
+            EXPECT_EQ(result.errors, "orvix: this is the proxy of an isolated library; give the path of the library "
+                                     "itself: " +
+                                         Library() + "\n");
+        }
+    }
+    EXPECT_TRUE(std::filesystem::exists(proxy));
+    EXPECT_EQ(Path(L"Talking"), proxy.wstring());
+    EXPECT_EQ(Path(L"Other"), std::nullopt);
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryThatAHostUsesIsTakenOutInTwoSteps)
+{
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"}).code, Success);
+    const std::filesystem::path folder = IsolatedPath(L"TALKING");
+    {
+        const std::ifstream used(folder / L"scc_proxy.dll");
+        EXPECT_EQ(Unregister(L"Talking").code, Failed);
+        EXPECT_EQ(Path(L"Talking"), std::nullopt);
+        EXPECT_TRUE(std::filesystem::exists(folder));
+    }
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
+    EXPECT_FALSE(std::filesystem::exists(folder));
+    EXPECT_EQ(Unregister(L"Talking").code, NotFound);
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryThatFailsKeepsTheOneThatWasThere)
+{
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated", L"--patience", L"77"}).code,
+              Success);
+    const std::filesystem::path copy = Scratch() / L"copy.dll";
+    std::filesystem::copy_file(ORVIX_TALKING_MSSCCI, copy);
+    SetAccess(std::wstring(OwnKeys) + L"Talking", ReadAndDelete);
+    EXPECT_EQ(RunExactly({L"register", copy, L"Talking", L"--isolated"}).code, Failed);
+    const std::filesystem::path settings = IsolatedPath(L"TALKING") / L"scc_proxy.ini";
+    std::array<wchar_t, 1024> library = {};
+    GetPrivateProfileStringW(L"Isolation", L"Library", L"", library.data(), static_cast<DWORD>(library.size()),
+                             settings.c_str());
+    EXPECT_EQ(std::filesystem::path(library.data()).string(), Library());
+    EXPECT_EQ(GetPrivateProfileIntW(L"Isolation", L"SecondsWithoutAnswer", 0, settings.c_str()), 77u);
+    EXPECT_TRUE(std::filesystem::exists(IsolatedPath(L"TALKING") / L"scc_proxy.dll"));
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
 }
 
 TEST_F(Registration, OfAnIsolatedLibraryIsRefusedAsAnyOther)

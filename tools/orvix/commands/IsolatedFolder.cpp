@@ -136,9 +136,23 @@ void Empty(const std::filesystem::path& folder, const std::wstring& failure)
     }
 }
 
+/// The file beside this program that the folder gets a copy of.
+std::filesystem::path SourceOf(const wchar_t* file)
+{
+    return std::filesystem::path(ModulePath(nullptr)).replace_filename(file);
+}
+
+void CheckSource(const wchar_t* file)
+{
+    if (!PathExists(SourceOf(file).wstring()))
+    {
+        Fail(L"the library cannot be isolated", SourceOf(file), ERROR_FILE_NOT_FOUND);
+    }
+}
+
 void CopyHere(const wchar_t* file, const std::filesystem::path& folder)
 {
-    const std::filesystem::path source = std::filesystem::path(ModulePath(nullptr)).replace_filename(file);
+    const std::filesystem::path source = SourceOf(file);
     if (!CopyFileW(source.c_str(), (folder / file).c_str(), FALSE))
     {
         Fail(L"the library cannot be isolated, since " + source.wstring() + L" cannot be copied", folder / file,
@@ -155,6 +169,9 @@ IsolatedFolder::IsolatedFolder(const std::wstring& name)
 
 std::wstring IsolatedFolder::Make(const std::wstring& library, int bits, std::chrono::seconds patience) const
 {
+    const wchar_t* const program = bits == 32 ? Program32 : Program64;
+    CheckSource(Proxy); // before the files that work are removed
+    CheckSource(program);
     MakeFolder(m_path.parent_path());
     MakeFolder(m_path);
     // Whoever made the folder before may have put libraries there, or files that he may still change.
@@ -165,12 +182,17 @@ std::wstring IsolatedFolder::Make(const std::wstring& library, int bits, std::ch
     settings.bits = bits;
     settings.patience = patience;
     CopyHere(Proxy, m_path);
-    CopyHere(bits == 32 ? Program32 : Program64, m_path);
+    CopyHere(program, m_path);
     if (!settings.Write(m_path))
     {
         Fail(L"the library cannot be isolated", m_path / IsolationSettings::FileName, ERROR_WRITE_FAULT);
     }
     return m_path / Proxy;
+}
+
+IsolationSettings IsolatedFolder::Settings() const
+{
+    return IsolationSettings::Read(m_path);
 }
 
 bool IsolatedFolder::Exists() const

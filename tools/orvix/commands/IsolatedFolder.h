@@ -1,5 +1,7 @@
 #pragma once
 
+#include "IsolationSettings.h"
+
 #include <chrono>
 #include <filesystem>
 #include <string>
@@ -18,6 +20,9 @@ public:
     std::wstring Make(const std::wstring& library, int bits, std::chrono::seconds patience) const;
 
     bool Exists() const;
+
+    /// What the folder says about its library; without a folder, its `library` is empty.
+    IsolationSettings Settings() const;
 
     /// Removes the folder, if there is one. Throws `ToolError` with `ExitCode::Failed` when a file is in use.
     void Remove() const;

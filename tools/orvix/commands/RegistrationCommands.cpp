@@ -2,11 +2,13 @@
 
 #include "FilePath.h"
 #include "IsolatedFolder.h"
+#include "IsolationSettings.h"
 #include "LibraryImage.h"
 #include "Registration.h"
 #include "SccFunctions.h"
 
 #include <chrono>
+#include <filesystem>
 #include <iostream>
 #include <optional>
 #include <string>
@@ -19,6 +21,18 @@ int BitsOf(const std::wstring& library)
 {
     const std::optional<LibraryImage> image = LibraryImage::Read(library);
     return image && image->machine == IMAGE_FILE_MACHINE_I386 ? 32 : 64;
+}
+
+/// Refuses the proxy of an isolated library, which would have to run itself.
+void RefuseProxy(const std::wstring& library)
+{
+    const IsolationSettings settings = IsolationSettings::Read(std::filesystem::path(library).parent_path());
+    if (!settings.library.empty())
+    {
+        throw ToolError(ExitCode::BadUsage,
+                        L"this is the proxy of an isolated library; give the path of the library itself: " +
+                            settings.library.wstring());
+    }
 }
 
 /// Registers the proxy of an isolated library. Returns the path that it replaces, if any.
@@ -34,15 +48,25 @@ std::optional<std::wstring> SetIsolated(Registration& registration, const Isolat
         throw ToolError(ExitCode::NotFound, L"no MSSCCI library, it has no SccGetVersion: " + library);
     }
     const bool isNew = !folder.Exists();
+    const IsolationSettings before = folder.Settings();
+    bool isMade = false;
     try
     {
-        return registration.Set([&] { return folder.Make(library, bits, patience); });
+        return registration.Set([&] {
+            std::wstring proxy = folder.Make(library, bits, patience);
+            isMade = true;
+            return proxy;
+        });
     }
     catch (const ToolError&)
     {
         if (isNew)
         {
             folder.Remove();
+        }
+        else if (isMade && !before.library.empty()) // the registration that stays is for the library before
+        {
+            folder.Make(before.library.wstring(), before.bits, before.patience);
         }
         throw;
     }
@@ -53,6 +77,7 @@ std::optional<std::wstring> SetIsolated(Registration& registration, const Isolat
 ExitCode RegistrationCommands::Register(const CommandLine& commandLine)
 {
     const std::wstring library = FullPath(commandLine.paths.front());
+    RefuseProxy(library);
     Registration registration(commandLine.name);
     const IsolatedFolder folder(commandLine.name);
     const int bits = BitsOf(library);
@@ -79,8 +104,21 @@ ExitCode RegistrationCommands::Register(const CommandLine& commandLine)
 
 ExitCode RegistrationCommands::Unregister(const CommandLine& commandLine)
 {
-    Registration(commandLine.name).Remove();
-    IsolatedFolder(commandLine.name).Remove();
+    Registration registration(commandLine.name);
+    const IsolatedFolder folder(commandLine.name);
+    try
+    {
+        registration.Remove();
+    }
+    catch (const ToolError& error)
+    {
+        // The last run may have found the files in use.
+        if (error.Code() != ExitCode::NotFound || !folder.Exists())
+        {
+            throw;
+        }
+    }
+    folder.Remove();
     std::cout << "unregistered " << Printable(commandLine.name) << '\n';
     return ExitCode::Success;
 }
