@@ -1,6 +1,7 @@
 #include "LibraryHost.h"
 
 #include "CrashReport.h"
+#include "CurrentFolderPath.h"
 #include "DllDirectoryScope.h"
 #include "SccCalls.h"
 
@@ -12,10 +13,6 @@
 
 namespace
 {
-
-// Their first argument is a structure of the library's process.
-constexpr LONG FirstBackgroundKind = 8;
-constexpr LONG LastBackgroundKind = 11;
 
 // A longer text is cut. The rest of the area is for the message's numbers.
 constexpr std::size_t LongestText = Wire::BackgroundBytes - 1024;
@@ -102,10 +99,11 @@ bool LibraryHost::Run()
 /// Performs one request. False when it was the last one.
 bool LibraryHost::Perform()
 {
+    ReportCrashTo(m_memory.GetState().crash); // the library may have replaced the handler
     MessageReader request(m_memory.Request());
     const MessageHeader& header = request.Header();
     MessageWriter reply(m_memory.Reply(), {0, MessageKind::Reply, header.number, header.function});
-    if (const std::wstring folder = request.WideText(); !folder.empty())
+    if (const std::wstring folder = request.WideText(); !folder.empty() && folder != CurrentFolderPath())
     {
         SetCurrentDirectoryW(folder.c_str());
     }
@@ -212,7 +210,7 @@ LONG LibraryHost::Ask(MessageKind kind, LONG fallback, const std::function<void(
 
 LONG LibraryHost::Output(LPCSTR text, LONG kind)
 {
-    if (kind >= FirstBackgroundKind && kind <= LastBackgroundKind)
+    if (IsBackgroundKind(kind))
     {
         return SCC_MSG_RTN_OK;
     }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "IsolatedLibrary.h"
+#include "SystemLock.h"
 
 #include <memory>
 #include <mutex>
@@ -36,18 +37,7 @@ private:
     std::shared_ptr<IsolatedLibrary>& WithoutContext();
     std::vector<std::shared_ptr<IsolatedLibrary>>::iterator FindStarted(LPVOID context);
 
-    /// The system's lock, which needs no handle: GCC's std::mutex leaves handles open when a library is unloaded.
-    class Lock
-    {
-    public:
-        void lock() noexcept { AcquireSRWLockExclusive(&m_lock); }   // NOLINT(readability-identifier-naming)
-        void unlock() noexcept { ReleaseSRWLockExclusive(&m_lock); } // NOLINT(readability-identifier-naming)
-
-    private:
-        SRWLOCK m_lock = SRWLOCK_INIT;
-    };
-
-    Lock m_lock;
+    SystemLock m_lock;
     std::shared_ptr<IsolatedLibrary> (*m_make)();
     std::shared_ptr<IsolatedLibrary> m_withoutContext;
     std::vector<std::shared_ptr<IsolatedLibrary>> m_started; ///< a context is the address of its library

@@ -1,7 +1,10 @@
 #include "IsolatedLibrary.h"
 
+#include "CurrentFolderPath.h"
+
 #include <objbase.h>
 
+#include <shared_mutex>
 #include <utility>
 #include <vector>
 
@@ -11,14 +14,6 @@ namespace
 using namespace std::chrono_literals;
 
 constexpr auto EndPatience = 5s;
-
-std::wstring CurrentFolder()
-{
-    std::wstring folder(MAX_PATH, L'\0');
-    const DWORD size = GetCurrentDirectoryW(static_cast<DWORD>(folder.size()), folder.data());
-    folder.resize(size < folder.size() ? size : 0);
-    return folder;
-}
 
 std::wstring Wide(const char* ascii)
 {
@@ -42,41 +37,11 @@ bool IsApartment()
     return CoGetApartmentType(&type, &qualifier) == S_OK && (type == APTTYPE_STA || type == APTTYPE_MAINSTA);
 }
 
-/// The host's window that a library's dialog disables, for a scope: when the library is lost, it gets input again.
-class ParentWindow
-{
-public:
-    explicit ParentWindow(HWND window)
-        : m_window(window != nullptr ? GetAncestor(window, GA_ROOT) : nullptr),
-          m_isEnabled(m_window != nullptr && IsWindowEnabled(m_window))
-    {
-    }
-
-    /// Null for a window of another thread.
-    HWND OfThisThread() const
-    {
-        return GetWindowThreadProcessId(m_window, nullptr) == GetCurrentThreadId() ? m_window : nullptr;
-    }
-
-    void Restore() const
-    {
-        if (m_isEnabled && !IsWindowEnabled(m_window))
-        {
-            EnableWindow(m_window, TRUE);
-            SetForegroundWindow(m_window);
-        }
-    }
-
-private:
-    HWND m_window;
-    bool m_isEnabled;
-};
-
 /// Lets other threads send messages to the windows of this one for at most so long.
 void WaitHandlingMessages(HANDLE handle, DWORD milliseconds)
 {
-    if (MsgWaitForMultipleObjects(handle != nullptr ? 1 : 0, &handle, FALSE, milliseconds, QS_SENDMESSAGE) !=
-        WAIT_OBJECT_0)
+    const DWORD count = handle != nullptr ? 1 : 0;
+    if (MsgWaitForMultipleObjects(count, &handle, FALSE, milliseconds, QS_SENDMESSAGE) != WAIT_OBJECT_0 || count == 0)
     {
         MSG message;
         PeekMessageW(&message, nullptr, 0, 0, PM_NOREMOVE | PM_QS_SENDMESSAGE);
@@ -116,9 +81,26 @@ IsolatedLibrary::Turn::~Turn()
     m_library.m_caller = 0;
 }
 
+IsolatedLibrary::Listing::Listing(IsolatedLibrary& library) : m_library(library)
+{
+    library.m_populateData = library.m_side.populateData;
+    library.m_populate = library.m_side.populate;
+}
+
+IsolatedLibrary::Listing::~Listing()
+{
+    constexpr DWORD Period = 10; // milliseconds
+
+    m_library.m_populate = nullptr;
+    while (!m_library.m_listing.try_lock()) // another thread is in the callback
+    {
+        WaitHandlingMessages(nullptr, Period);
+    }
+    m_library.m_listing.unlock();
+}
+
 void IsolatedLibrary::Start()
 {
-    m_folder = CurrentFolder();
     m_process = LibraryProcess::Start(m_settings.program);
     if (!m_process)
     {
@@ -151,9 +133,7 @@ MessageWriter IsolatedLibrary::Begin(MessageKind kind, std::uint32_t function)
 {
     m_functionNumber = function;
     MessageWriter request(m_process->Memory().Request(), {0, kind, ++m_number, function});
-    const std::wstring folder = CurrentFolder();
-    request.Text(folder == m_folder ? std::wstring_view() : std::wstring_view(folder));
-    m_folder = folder;
+    request.Text(std::wstring_view(CurrentFolderPath()));
     return request;
 }
 
@@ -161,9 +141,9 @@ MessageReader IsolatedLibrary::Exchange(MessageWriter& request)
 {
     request.Finish();
     m_isSent = true;
-    const ParentWindow parent(m_side.window);
+    m_parent = ParentWindow(m_side.window);
     AllowSetForegroundWindow(m_process->Id());
-    CallWait wait(*m_process, parent.OfThisThread(), m_settings.patience, {m_settings.name, Wide(m_function)});
+    CallWait wait(*m_process, m_parent.OfThisThread(), m_settings.patience, {m_settings.name, Wide(m_function)});
     SetEvent(m_process->Requested());
     CallWait::Result result = CallWait::Result::Signalled;
     while ((result = wait.For(m_process->Replied())) == CallWait::Result::Signalled)
@@ -184,7 +164,6 @@ MessageReader IsolatedLibrary::Exchange(MessageWriter& request)
          : result == CallWait::Result::Hangs
              ? L"hangs in " + function + L" and was ended: no answer and no window for " + seconds + L" seconds"
              : L"was ended by the user, " + seconds + L" seconds after the start of " + function);
-    parent.Restore();
     throw Failure{SCC_E_NONSPECIFICERROR};
 }
 
@@ -193,6 +172,7 @@ LONG IsolatedLibrary::Answer(MessageReader& message)
     const auto kindOrAdd = message.Number<std::int32_t>();
     const bool isPopulate = message.Header().kind == MessageKind::Populate;
     MessageReader::Check(isPopulate || message.Header().kind == MessageKind::Output);
+    MessageReader::Check(isPopulate || !IsBackgroundKind(kindOrAdd));
     const LONG status = isPopulate ? message.Number<std::int32_t>() : 0;
     std::string text;
     const bool hasText = message.CopyText(text);
@@ -201,10 +181,10 @@ LONG IsolatedLibrary::Answer(MessageReader& message)
     {
         if (isPopulate)
         {
-            const POPLISTFUNC populate = m_side.populate;
-            return populate != nullptr
-                       ? populate(m_side.populateData, kindOrAdd, status, hasText ? text.data() : nullptr)
-                       : FALSE;
+            const std::shared_lock lock(m_listing);
+            const POPLISTFUNC populate = m_populate;
+            return populate != nullptr ? populate(m_populateData, kindOrAdd, status, hasText ? text.data() : nullptr)
+                                       : FALSE;
         }
         const LPTEXTOUTPROC output = m_side.output;
         return output != nullptr ? output(hasText ? text.c_str() : nullptr, kindOrAdd) : SCC_MSG_RTN_OK;
@@ -231,18 +211,23 @@ void IsolatedLibrary::Abandon()
 {
     if (m_isSent)
     {
-        m_process->End();
-        m_state = State::Lost;
+        EndLost();
     }
 }
 
 void IsolatedLibrary::Lose(const std::wstring& why)
 {
-    m_process->End();
-    m_state = State::Lost;
+    EndLost();
     Report(m_settings.name + L' ' + why + L". The operation failed; this program goes on. To use " + m_settings.name +
            L" again, start source control again. If it happens again, report this line to the maker of " +
            m_settings.library.wstring());
+}
+
+void IsolatedLibrary::EndLost()
+{
+    m_process->End();
+    m_state = State::Lost;
+    m_parent.Restore();
 }
 
 void IsolatedLibrary::Report(const std::wstring& text)

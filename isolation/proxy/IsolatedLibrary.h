@@ -3,7 +3,9 @@
 #include "CallWait.h"
 #include "IsolationSettings.h"
 #include "LibraryProcess.h"
+#include "ParentWindow.h"
 #include "SccCalls.h"
+#include "SystemLock.h"
 
 #include <atomic>
 #include <memory>
@@ -73,6 +75,19 @@ private:
         bool m_isGiven = false;
     };
 
+    /// The time in which the host's callback of SccPopulateList may be called: until the function returns.
+    class Listing
+    {
+    public:
+        explicit Listing(IsolatedLibrary& library);
+        Listing(const Listing&) = delete;
+        Listing& operator=(const Listing&) = delete;
+        ~Listing();
+
+    private:
+        IsolatedLibrary& m_library;
+    };
+
     /// Runs the exchange of one call, when it is its turn. Starts the process when it does not run yet.
     template <typename Exchange>
     SCCRTN InTurn(const char* function, const Exchange& exchange)
@@ -116,7 +131,9 @@ private:
     SCCRTN ExchangeCall(const SccCall<Kinds...>& call, std::type_identity_t<typename Kinds::Type>... arguments)
     {
         MessageWriter request = Begin(MessageKind::Call, call.number);
+        m_side.populate = nullptr;
         SendArguments(call, request, m_side, arguments...);
+        const Listing listing(*this);
         MessageReader reply = Exchange(request);
         const SCCRTN result = reply.Number<std::int32_t>();
         ReceiveArguments(call, reply, m_side, arguments...);
@@ -142,6 +159,9 @@ private:
     /// The request was too large, or the reply breaks the rules.
     void FailMessage();
 
+    /// Ends the process, and gives the host's window its input back.
+    void EndLost();
+
     /// Memory ran out in a call. The library may still be at work on it.
     void Abandon();
 
@@ -154,10 +174,12 @@ private:
 
     IsolationSettings m_settings;
     std::wstring m_searchFolder;
-    std::wstring m_folder; ///< the host's current folder, as the process knows it
     std::shared_ptr<LibraryProcess> m_process;
     std::atomic<State> m_state = State::NotStarted;
     HostSide m_side;
+    std::atomic<POPLISTFUNC> m_populate = nullptr; ///< null when no SccPopulateList runs
+    LPVOID m_populateData = nullptr;               ///< written only while `m_populate` is null and nobody is in it
+    SystemLock m_listing;                          ///< shared by the threads that are in it
     std::wstring m_lastReport;
     UniqueKernelHandle m_listener;
     DWORD m_listenerId = 0;
@@ -169,4 +191,5 @@ private:
     std::uint32_t m_functionNumber = 0;
     const char* m_function = "";
     bool m_isSent = false;
+    ParentWindow m_parent{nullptr};
 };

@@ -10,12 +10,18 @@
 #include <string>
 #include <vector>
 
+/// True for the kinds of text output whose first argument is a structure of the library's process. They do not cross.
+constexpr bool IsBackgroundKind(LONG kind)
+{
+    return kind >= 8 && kind <= 11;
+}
+
 /// What the arguments of a function need to know in the host's process.
 struct HostSide
 {
     std::atomic<LPTEXTOUTPROC> output = nullptr; ///< of the last SccOpenProject
-    std::atomic<POPLISTFUNC> populate = nullptr; ///< of the last SccPopulateList
-    std::atomic<LPVOID> populateData = nullptr;
+    POPLISTFUNC populate = nullptr;              ///< of the running SccPopulateList
+    LPVOID populateData = nullptr;
     HWND window = nullptr; ///< of the last call that has one among its arguments; it may be null there
     CommandBlocks blocks;
 

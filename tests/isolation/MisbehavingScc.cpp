@@ -28,6 +28,8 @@ std::vector<std::string> waiting; // lines that there was no printer for
 HWND parent = nullptr;
 int session = 0;
 int optionBlock = 0;
+POPLISTFUNC lister = nullptr; // of the last SccPopulateList
+LPVOID listerData = nullptr;
 std::array<LPCSTR, 2> found = {"C:\\project\\one.txt", "C:\\project\\two.txt"};
 
 void Print(const std::string& line)
@@ -139,6 +141,14 @@ void PrintForLong()
     }
 }
 
+/// Uses a callback that was valid in an earlier call only.
+void ListLate()
+{
+    std::array<char, 5> name = {"late"};
+    lister(listerData, TRUE, 0, name.data());
+    std::thread([&name] { lister(listerData, TRUE, 0, name.data()); }).join();
+}
+
 /// Leaves the process in another state than before.
 void ChangeProcess()
 {
@@ -199,6 +209,10 @@ void Misbehave(const char* function, HWND window)
     if (is(L"murmur"))
     {
         std::thread(PrintForLong).join();
+    }
+    if (is(L"list") && lister != nullptr)
+    {
+        ListLate();
     }
     if (is(L"window"))
     {
@@ -383,6 +397,8 @@ SCCRTN SccPopulateList(LPVOID context, SCCCOMMAND command, LONG count, LPCSTR* n
 {
     Call(__func__, nullptr, Context(context), Show(command), Show(count), List(count, names), List(count, status),
          Show(options));
+    lister = callback;
+    listerData = callerData;
     if (callback == nullptr)
     {
         return SCC_E_NONSPECIFICERROR;

@@ -270,6 +270,42 @@ TEST_F(MisbehaviourTest, OtherCrashesHaveTheirNames)
     ExpectWorks();
 }
 
+TEST_F(MisbehaviourTest, ACrashIsSeenThoughTheLibraryHasRemovedTheHandler)
+{
+    Misbehave(L"change-SccGet crash-SccCheckout");
+    Session session(m_library);
+    session.Open();
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_EQ(m_library.checkout(session.context, nullptr, 1, &file, "", 0, nullptr), SCC_E_NONSPECIFICERROR);
+    EXPECT_THAT(Text(), HasSubstr(" at offset "));
+}
+
+TEST_F(MisbehaviourTest, TheHostsListIsNotCalledAfterSccPopulateList)
+{
+    Misbehave(L"list-SccGet");
+    Session session(m_library);
+    session.Open();
+    int calls = 0;
+    const auto count = [](LPVOID data, BOOL, LONG, LPSTR) -> BOOL {
+        ++*static_cast<int*>(data);
+        return TRUE;
+    };
+    EXPECT_EQ(m_library.populateList(session.context, SCC_COMMAND_GET, 1, &file, count, &calls, &word, 0), SCC_OK);
+    EXPECT_EQ(calls, 1);
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_EQ(calls, 1);
+}
+
+TEST_F(MisbehaviourTest, EveryCallHasTheHostsFolder)
+{
+    Misbehave(L"change-SccGet state-SccCheckout");
+    Session session(m_library);
+    session.Open();
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_EQ(m_library.checkout(session.context, nullptr, 1, &file, "", 0, nullptr), SCC_OK);
+    EXPECT_THAT(Text(), HasSubstr("folder " + std::filesystem::current_path().string() + ','));
+}
+
 TEST_F(MisbehaviourTest, AnExceptionIsTheFailureThatOrvixCoreMakesOfIt)
 {
     Misbehave(L"throw-SccGet");
