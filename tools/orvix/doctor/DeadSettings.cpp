@@ -1,5 +1,6 @@
 #include "DeadSettings.h"
 
+#include "BareFileName.h"
 #include "FilePath.h"
 
 #include <algorithm>
@@ -102,7 +103,7 @@ private:
         }
         for (const XmlElement* name : m_provider.Find(L"MSSCCProjectFile"))
         {
-            if (name->text.find_first_of(L"<>:\"/\\|?*") != std::wstring::npos)
+            if (!name->text.empty() && !IsBareFileName(name->text))
             {
                 Add("bad-file-name", *name, m_where,
                     L"MSSCCProjectFile " + Quoted(name->text) + L" is not the name of a file");

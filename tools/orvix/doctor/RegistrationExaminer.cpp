@@ -1,7 +1,6 @@
 #include "RegistrationExaminer.h"
 
 #include "ActivationContext.h"
-#include "BareFileName.h"
 #include "DllDirectoryScope.h"
 #include "FilePath.h"
 #include "IsolatedLoad.h"
@@ -106,19 +105,6 @@ void AddSettings(DoctorReport::Subject& subject, const InstalledProviders::Candi
     {
         subject.AddProblem("no-search-folder",
                            L"there is no folder " + Quoted(judged.searchPath) + L", which MSSCCDllSearchPath names");
-    }
-    if (judged.config != nullptr && !judged.config->m_msSccProjectFile.empty() &&
-        !IsBareFileName(judged.config->m_msSccProjectFile))
-    {
-        subject.AddProblem("bad-file-name", L"MSSCCProjectFile " + Quoted(judged.config->m_msSccProjectFile) +
-                                                L" is not the name of a file alone, so no settings file is used");
-    }
-    const bool isReplaced = judged.config != nullptr && !judged.config->m_msSccDllFullPath.empty();
-    if (!isReplaced && judged.serverPath.find_first_of(L"\\/") == std::wstring::npos)
-    {
-        subject.AddProblem("no-path-folder",
-                           L"the path " + Quoted(judged.serverPath) +
-                               L" names no folder, so each host searches for it in folders of its own");
     }
 }
 
