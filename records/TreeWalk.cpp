@@ -19,32 +19,23 @@ void TreeWalk::Detach(OrvixFileEntry* root, const OrvixFileEntry* target)
     Push(root);
     while (!m_path.empty())
     {
-        const std::size_t depth = m_path.size();
-        OrvixFileEntry* entry = m_path.back().entry;
-        const unsigned int position = m_path.back().nextChild;
-        const bool hasNext = position < entry->NumChildren();
-        if (m_path.size() < depth)
+        OrvixFileEntry* entry = nullptr;
+        OrvixFileEntry* child = nullptr;
+        const Found found = Advance(entry, child);
+        if (found == Found::Child && child == target)
         {
-            continue;
+            const std::size_t depth = m_path.size();
+            entry->RemoveChild(m_path.back().nextChild - 1);
+            if (m_path.size() == depth)
+            {
+                Pop();
+            }
         }
-        if (!hasNext)
-        {
-            Pop();
-            continue;
-        }
-        m_path.back().nextChild = position + 1;
-        OrvixFileEntry* child = entry->GetChild(position);
-        if (child == nullptr || m_path.size() < depth)
-        {
-            continue;
-        }
-        if (child != target)
+        else if (found == Found::Child)
         {
             Push(child);
-            continue;
         }
-        entry->RemoveChild(position);
-        if (m_path.size() == depth)
+        else if (found == Found::End)
         {
             Pop();
         }

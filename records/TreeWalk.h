@@ -54,6 +54,16 @@ private:
     // The mark of an entry is the number of the last walk that reached it, plus this bit while it is on the path.
     static constexpr unsigned long long OnPath = 1;
 
+    enum class Found
+    {
+        Nothing, ///< a null child, or the path has become shorter: its last entry is an ancestor of `entry` then
+        Child,
+        End
+    };
+
+    /// Looks at the next child of the path's last entry. The path is not empty.
+    Found Advance(OrvixFileEntry*& entry, OrvixFileEntry*& child);
+
     void Push(OrvixFileEntry* entry)
     {
         const unsigned long long mark = entry->m_walkMark;
@@ -96,40 +106,51 @@ private:
     bool m_repetition = false;
 };
 
+inline TreeWalk::Found TreeWalk::Advance(OrvixFileEntry*& entry, OrvixFileEntry*& child)
+{
+    const std::size_t depth = m_path.size();
+    entry = m_path.back().entry;
+    const unsigned int position = m_path.back().nextChild;
+    const bool hasNext = position < entry->NumChildren();
+    if (m_path.size() < depth)
+    {
+        return Found::Nothing;
+    }
+    if (!hasNext)
+    {
+        return Found::End;
+    }
+    m_path.back().nextChild = position + 1;
+    child = entry->GetChild(position);
+    return child != nullptr && m_path.size() == depth ? Found::Child : Found::Nothing;
+}
+
 template <typename Select, typename Take>
 void TreeWalk::PostOrder(OrvixFileEntry* root, const Select& select, const Take& take)
 {
     Push(root);
     while (!m_path.empty())
     {
-        // After each call the path may be shorter: then its last entry is an ancestor of this one.
-        const std::size_t depth = m_path.size();
-        OrvixFileEntry* entry = m_path.back().entry;
-        const unsigned int position = m_path.back().nextChild;
-        const bool hasNext = position < entry->NumChildren();
-        if (m_path.size() < depth)
+        OrvixFileEntry* entry = nullptr;
+        OrvixFileEntry* child = nullptr;
+        const Found found = Advance(entry, child);
+        if (found == Found::Child)
         {
-            continue;
+            Push(child);
         }
-        if (hasNext)
+        else if (found == Found::End)
         {
-            m_path.back().nextChild = position + 1;
-            OrvixFileEntry* child = entry->GetChild(position);
-            if (child != nullptr && m_path.size() == depth)
+            const std::size_t depth = m_path.size();
+            const bool selected = select(entry);
+            if (m_path.size() < depth)
             {
-                Push(child);
+                continue;
             }
-            continue;
+            if (selected)
+            {
+                take(entry);
+            }
+            Pop();
         }
-        const bool selected = select(entry);
-        if (m_path.size() < depth)
-        {
-            continue;
-        }
-        if (selected)
-        {
-            take(entry);
-        }
-        Pop();
     }
 }
