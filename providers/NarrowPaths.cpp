@@ -26,6 +26,16 @@ bool CopyAscii(const wchar_t* __restrict path, std::size_t size, char* __restric
 
 } // namespace
 
+bool IsExact(std::wstring_view text, const char* narrow)
+{
+    const WStr back(narrow);
+    if (back.Get() == nullptr)
+    {
+        throw std::bad_alloc();
+    }
+    return back.Get() == text;
+}
+
 bool NarrowPaths::Add(const wchar_t* path)
 {
     if (path == nullptr)
@@ -41,12 +51,7 @@ bool NarrowPaths::Add(const wchar_t* path)
         {
             throw std::bad_alloc();
         }
-        const WStr back(text.Get());
-        if (back.Get() == nullptr)
-        {
-            throw std::bad_alloc();
-        }
-        if (back.Get() != std::wstring_view(path))
+        if (!IsExact(path, text.Get()))
         {
             return false;
         }

@@ -134,16 +134,8 @@ public:
                      .c_str());
         }
         const std::wstring_view wide = comment != nullptr ? comment : L"";
-        if (std::all_of(wide.begin(), wide.end(), [](wchar_t c) { return c < 0x80; }))
-        {
-            return;
-        }
-        const WStr back(Get());
-        if (back.Get() == nullptr)
-        {
-            throw std::bad_alloc();
-        }
-        if (back.Get() != wide)
+        const bool isAscii = std::all_of(wide.begin(), wide.end(), [](wchar_t c) { return c < 0x80; });
+        if (!isAscii && !IsExact(wide, Get()))
         {
             Tell(L"The comment has characters that the code page of this system does not have. They are replaced.");
         }
