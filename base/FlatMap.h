@@ -7,14 +7,12 @@
 #include <utility>
 #include <vector>
 
-/// A map from numbers or pointers to values that keeps its buckets in one piece of memory: an index over something that
-/// is kept elsewhere. Nothing is ever taken out except all at once.
+/// A map from numbers to values that keeps its buckets in one piece of memory: an index over something that is kept
+/// elsewhere. Nothing is ever taken out except all at once.
 template <typename Key, typename Value>
 class FlatMap
 {
 public:
-    bool IsEmpty() const { return m_count == 0; }
-
     void Clear()
     {
         m_buckets.clear();
@@ -79,7 +77,7 @@ private:
     {
         // Fibonacci hashing: the fraction of the golden ratio as a 64-bit number spreads neighbouring keys.
         constexpr std::uint64_t GoldenRatio = 0x9E3779B97F4A7C15;
-        const std::uint64_t hash = static_cast<std::uint64_t>(Number(key)) * GoldenRatio;
+        const std::uint64_t hash = static_cast<std::uint64_t>(key) * GoldenRatio;
         std::size_t place = static_cast<std::size_t>(hash >> (64 - std::countr_zero(buckets.size())));
         while (buckets[place].used && buckets[place].key != key)
         {
@@ -87,9 +85,6 @@ private:
         }
         return buckets[place];
     }
-
-    static std::uintptr_t Number(const void* key) { return reinterpret_cast<std::uintptr_t>(key); }
-    static std::uint32_t Number(int key) { return static_cast<std::uint32_t>(key); }
 
     std::vector<Bucket> m_buckets; // a power of two, at least half of them free
     std::size_t m_count = 0;

@@ -47,14 +47,14 @@ private:
     ULONGLONG m_end = GetTickCount64() + LongestWait;
 };
 
+bool SaysMissing(DWORD error)
+{
+    return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND;
+}
+
 bool IsMissing(const wchar_t* path)
 {
-    if (GetFileAttributesW(path) != INVALID_FILE_ATTRIBUTES)
-    {
-        return false;
-    }
-    const DWORD error = GetLastError();
-    return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND;
+    return GetFileAttributesW(path) == INVALID_FILE_ATTRIBUTES && SaysMissing(GetLastError());
 }
 
 /// A full path; what begins with `\\?\` is one already.
@@ -169,8 +169,7 @@ FileBytes::Found FileBytes::Read(const wchar_t* path, std::size_t limit, std::st
         CreateFileW(path, GENERIC_READ, AllSharing, nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr));
     if (!file)
     {
-        const DWORD error = GetLastError();
-        return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND ? Found::Missing : Found::Unreadable;
+        return SaysMissing(GetLastError()) ? Found::Missing : Found::Unreadable;
     }
     LARGE_INTEGER size = {};
     if (GetFileSizeEx(file.Get(), &size) == FALSE)
@@ -221,7 +220,7 @@ bool FileBytes::Replace(const wchar_t* path, const std::string& bytes, Previous 
     }
     const bool written = WriteAll(file.Get(), bytes);
     file.Reset();
-    if (exists)
+    if (written && exists)
     {
         CopyRights(target.c_str(), attributes, beside.c_str());
     }
