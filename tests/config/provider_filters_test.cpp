@@ -127,12 +127,12 @@ TEST(ProviderFiltersExcludes, FolderMustStandAtTheStartOfThePath)
 
 TEST(ProviderFiltersExcludes, FolderIsAPrefixOfCharactersNotOfPathParts)
 {
-    const Filter filter(Exclude, {L"C:\\WORK"}, {});
-    EXPECT_TRUE(filter.Excludes(L"C:\\Work\\x.txt"));
-    EXPECT_TRUE(filter.Excludes(L"C:\\WORKSHOP\\X.txt"));
-    EXPECT_TRUE(filter.Excludes(L"C:\\WORK"));
-    EXPECT_FALSE(filter.Excludes(L"C:/WORK/x.txt"));
-    EXPECT_FALSE(filter.Excludes(L"C:\\WOR"));
+    const Filter filter(Exclude, {L"C:\\SONG"}, {});
+    EXPECT_TRUE(filter.Excludes(L"C:\\Song\\x.txt"));
+    EXPECT_TRUE(filter.Excludes(L"C:\\SONGBOOK\\X.txt"));
+    EXPECT_TRUE(filter.Excludes(L"C:\\SONG"));
+    EXPECT_FALSE(filter.Excludes(L"C:/SONG/x.txt"));
+    EXPECT_FALSE(filter.Excludes(L"C:\\SON"));
 }
 
 TEST(ProviderFiltersExcludes, AnEmptyFolderEntryCoversEveryPath)

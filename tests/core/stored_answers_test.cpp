@@ -256,7 +256,7 @@ TEST_F(StoredAnswersFile, StaysAsItIsWhileThereAreNoAnswersToSave)
     EXPECT_EQ(ReadBytes(m_path), "bad");
     AddRow(Save, OrvixPromptAction::Yes);
     EXPECT_TRUE(SaveFile());
-    EXPECT_EQ(ReadBytes(m_kept), "bad") << "kept by the first save that replaces the file";
+    EXPECT_EQ(ReadBytes(m_kept), "bad") << "the first save that replaces the file makes the copy";
 }
 
 TEST_F(StoredAnswersFile, ThatWasNeverLoadedIsKept)

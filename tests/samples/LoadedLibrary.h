@@ -68,7 +68,7 @@ inline std::size_t BusyHeapBytes()
     return bytes;
 }
 
-/// The heap memory in bytes that a library leaves behind each time that it is loaded and unloaded.
+/// The heap memory in bytes that stays allocated each time that a library is loaded and unloaded.
 inline std::size_t LeftByLoading(const std::filesystem::path& file)
 {
     constexpr std::size_t Times = 20;
