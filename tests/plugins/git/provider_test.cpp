@@ -485,11 +485,11 @@ TEST_F(GitProvider, EndsACommandThatIsSilentForTooLong)
 {
     const std::wstring file = m_git.Commit(L"a.txt", "1\n");
     m_git.Write(L"a.txt", "2\n");
-    m_git({L"config", L"orvix.silentLimit", L"2"});
+    m_git({L"config", L"orvix.silentLimit", L"8"});
     AddHook(m_git, L"pre-commit", "sleep 60\n");
     ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
     EXPECT_EQ(m_user.CheckIn({file}, L"Slow"), Failure);
-    EXPECT_TRUE(m_user.client.Shows(L"git commit printed nothing for 2 seconds and was ended"))
+    EXPECT_TRUE(m_user.client.Shows(L"git commit printed nothing for 8 seconds and was ended"))
         << testing::PrintToString(m_user.client.lines);
     EXPECT_FALSE(m_git.Has(L".git/index.lock"));
     m_git({L"config", L"--unset", L"core.hooksPath"});
