@@ -72,7 +72,7 @@ Arguments ReadArguments(int count, const wchar_t* const* arguments)
         {
             config = value();
         }
-        else if (argument.starts_with(L'-') || !result.project.empty())
+        else if (argument.empty() || argument.starts_with(L'-') || !result.project.empty())
         {
             throw Failure{L"Not understood: " + std::wstring(argument) + L"\n\n" + Usage};
         }

@@ -396,6 +396,7 @@ void MainWindow::Open(const std::wstring& folder, std::uint32_t provider)
     m_project.reset();
     m_frame.Folders().ShowProject(L"");
     m_frame.Files().Show({});
+    EnableCommands();
     m_frame.SetProvider(L"");
     SetWindowTextW(m_window, Title);
 
@@ -420,8 +421,14 @@ void MainWindow::OpenNewWindow() const
 {
     wchar_t program[MAX_PATH] = {};
     GetModuleFileNameW(nullptr, program, MAX_PATH);
+    // The dots keep a separator at the end from escaping the quote.
     std::wstring commandLine = L'"' + std::wstring(program) + L"\" --plugins \"" + m_arguments.plugins +
-                               L".\" --config \"" + m_arguments.config + L'"';
+                               L".\" --config \"" + m_arguments.config + L"\\.\"" +
+                               (m_arguments.unattended ? L" --unattended" : L"");
+    if (!m_arguments.provider.empty())
+    {
+        commandLine += L" --provider \"" + m_arguments.provider + L'"';
+    }
     STARTUPINFOW start{};
     start.cb = sizeof start;
     PROCESS_INFORMATION process{};
@@ -525,10 +532,15 @@ void MainWindow::EnableCommands()
 }
 
 /// The files for a command: of the selected ones, or of all when none is selected, those with a bit in their flags.
+/// The latest version would replace the changes of files that are checked out or modified: they are left out.
 std::vector<const FileRow*> MainWindow::FilesThatAllow(unsigned long permission) const
 {
     std::vector<const FileRow*> files = m_frame.Files().Chosen();
-    std::erase_if(files, [permission](const FileRow* row) { return (row->flags & permission) == 0; });
+    const unsigned long changed =
+        permission == OrvixFilePermission::GetLatest ? OrvixFileState::CheckedOut | OrvixFileState::Modified : 0;
+    std::erase_if(files, [permission, changed](const FileRow* row) {
+        return (row->flags & permission) == 0 || (row->flags & changed) != 0;
+    });
     return files;
 }
 

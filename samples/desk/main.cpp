@@ -9,6 +9,8 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <exception>
+#include <filesystem>
 #include <span>
 #include <string_view>
 
@@ -34,6 +36,17 @@ private:
     HRESULT m_result;
 };
 
+/// Says why, unless nobody is there. The program's exit code.
+int CannotStart(const wchar_t* reason)
+{
+    const std::span<wchar_t*> arguments(__wargv, static_cast<std::size_t>(__argc));
+    if (std::find(arguments.begin(), arguments.end(), std::wstring_view(L"--unattended")) == arguments.end())
+    {
+        MessageBoxW(nullptr, reason, L"Desk cannot start", MB_ICONERROR);
+    }
+    return 2;
+}
+
 } // namespace
 
 int WINAPI wWinMain(HINSTANCE, HINSTANCE, PWSTR, int)
@@ -46,11 +59,10 @@ int WINAPI wWinMain(HINSTANCE, HINSTANCE, PWSTR, int)
     }
     catch (const Failure& failure)
     {
-        const std::span<wchar_t*> arguments(__wargv, static_cast<std::size_t>(__argc));
-        if (std::find(arguments.begin(), arguments.end(), std::wstring_view(L"--unattended")) == arguments.end())
-        {
-            MessageBoxW(nullptr, failure.text.c_str(), L"Desk cannot start", MB_ICONERROR);
-        }
-        return 2;
+        return CannotStart(failure.text.c_str());
+    }
+    catch (const std::exception& failure)
+    {
+        return CannotStart(std::filesystem::path(failure.what()).c_str());
     }
 }

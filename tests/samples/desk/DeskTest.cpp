@@ -71,7 +71,8 @@ DeskTest::DeskTest()
     m_project.Write(L"parts\\three.txt", "3");
     m_arguments.project = m_project.Text();
     m_arguments.config = m_config.Text();
-    m_arguments.plugins = BuiltFile(L"plugins").wstring() + L'\\';
+    std::filesystem::copy_file(BuiltFile(L"plugins") / L"archive.dll", m_plugins.Text() + L"\\archive.dll");
+    m_arguments.plugins = m_plugins.Text() + L'\\';
 }
 
 DeskTest::~DeskTest()

@@ -69,6 +69,7 @@ protected:
 
     PrivateUserKey m_userKey;
     TempFolder m_config;
+    TempFolder m_plugins; ///< has the archive alone
     ArchiveProject m_project;
     Arguments m_arguments;
 };

@@ -110,6 +110,18 @@ TEST_F(DeskCommands, AskNothingWhenNobodyIsThere)
     });
 }
 
+TEST_F(DeskCommands, TheLatestVersionReplacesNoChange)
+{
+    m_arguments.unattended = true;
+    Run([](const Desk& desk) {
+        desk.Command(ID_ADD);
+        EXPECT_TRUE(desk.IsEnabled(ID_GET_LATEST));
+        desk.Command(ID_CHECK_OUT);
+        EXPECT_FALSE(desk.IsEnabled(ID_GET_LATEST));
+        desk.Close();
+    });
+}
+
 TEST_F(DeskCommands, RememberAnAnswerUntilItIsTakenBack)
 {
     Run([](const Desk& desk) {
@@ -172,10 +184,28 @@ TEST_F(DeskCommands, OptionsShowTheProviders)
         });
         desk.Close();
     });
-    const std::wstring reason = L"There is no provider. Tools, Options lists those that can be used.\r\n";
     m_arguments.unattended = true;
     Run(L"Desk", [&](const Desk& desk) {
-        EXPECT_EQ(desk.Output(), reason);
+        EXPECT_EQ(desk.Output(), NoProvider);
+        desk.Close();
+    });
+}
+
+TEST_F(DeskCommands, OptionsWithoutAnyProviderOfferNothing)
+{
+    const TempFolder empty;
+    m_arguments.plugins = empty.Text() + L'\\';
+    m_arguments.unattended = true;
+    Run(L"Desk", [&](const Desk& desk) {
+        EXPECT_EQ(desk.Output(), NoProvider);
+        desk.Command(ID_PROVIDERS, L"Options", [](const DialogWindow& sheet) {
+            const DialogWindow page = sheet.Child(PropSheet_GetCurrentPageHwnd(sheet.Handle()));
+            for (const wchar_t* button : {L"Use", L"Options...", L"Program"})
+            {
+                EXPECT_FALSE(page.IsEnabled(button)) << button;
+            }
+            sheet.Click(L"OK");
+        });
         desk.Close();
     });
 }

@@ -51,6 +51,7 @@ TEST_F(DeskParts, AWrongCommandLineIsRefused)
     EXPECT_THROW(Read({L"--provider"}), Failure);
     EXPECT_THROW(Read({L"--colour"}), Failure);
     EXPECT_THROW(Read({L"one", L"two"}), Failure);
+    EXPECT_THROW(Read({L""}), Failure);
     m_project.Write(L"file", "");
     EXPECT_THROW(Read({L"--config", m_project.File(L"file").c_str()}), Failure);
 }
