@@ -3,23 +3,32 @@
 include(CMakePackageConfigHelpers)
 set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME sdk)
 
-# orvix_install_debug_file(<target> <folder>): installs a module's debug information beside the module in <folder>. Of
-# GCC it is a file that is split off at installation: the installed module is stripped and names it.
-function(orvix_install_debug_file target folder)
+# orvix_install_debug_file(<module> <folder>): installs the debug information of a module, a target or a file, beside the
+# module in <folder>. Of GCC it is a file that is split off at installation: the installed module is stripped and names
+# it.
+function(orvix_install_debug_file module folder)
+  if(IS_ABSOLUTE ${module})
+    set(file ${module})
+    cmake_path(GET file FILENAME name)
+    cmake_path(REPLACE_EXTENSION file LAST_ONLY .pdb OUTPUT_VARIABLE pdb)
+  else()
+    set(file $<TARGET_FILE:${module}>)
+    set(name $<TARGET_FILE_NAME:${module}>)
+    set(pdb $<TARGET_PDB_FILE:${module}>)
+  endif()
   if(MSVC)
-    install(FILES $<TARGET_PDB_FILE:${target}> DESTINATION ${folder} COMPONENT debug OPTIONAL)
+    install(FILES ${pdb} DESTINATION ${folder} COMPONENT debug OPTIONAL)
     return()
   endif()
-  set(name $<TARGET_FILE_NAME:${target}>)
   set(debug_file ${PROJECT_BINARY_DIR}/debug/${name}.debug)
   install(CODE "
     file(MAKE_DIRECTORY \"${PROJECT_BINARY_DIR}/debug\")
     execute_process(COMMAND_ERROR_IS_FATAL ANY
-      COMMAND \"${CMAKE_OBJCOPY}\" --only-keep-debug \"$<TARGET_FILE:${target}>\" \"${debug_file}\")"
+      COMMAND \"${CMAKE_OBJCOPY}\" --only-keep-debug \"${file}\" \"${debug_file}\")"
     ALL_COMPONENTS)
   install(CODE "
     execute_process(COMMAND_ERROR_IS_FATAL ANY
-      COMMAND \"${CMAKE_OBJCOPY}\" --strip-all \"--add-gnu-debuglink=${debug_file}\" \"$<TARGET_FILE:${target}>\"
+      COMMAND \"${CMAKE_OBJCOPY}\" --strip-all \"--add-gnu-debuglink=${debug_file}\" \"${file}\"
         \"\$ENV{DESTDIR}\${CMAKE_INSTALL_PREFIX}/${folder}/${name}\")")
   install(FILES ${debug_file} DESTINATION ${folder} COMPONENT debug)
 endfunction()
@@ -36,6 +45,7 @@ install(FILES $<TARGET_FILE:archive> $<TARGET_FILE:git> DESTINATION bin/plugins)
 foreach(target OrvixCore OrvixCoreUI braeutil orvix desk archive_msscci scc_proxy scc_host64)
   orvix_install_debug_file(${target} bin)
 endforeach()
+orvix_install_debug_file(${CMAKE_BINARY_DIR}/bin/scc_host32.exe bin)
 orvix_install_debug_file(archive bin/plugins)
 orvix_install_debug_file(git bin/plugins)
 
