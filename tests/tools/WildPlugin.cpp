@@ -130,5 +130,9 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, void*)
     {
         Defect::Hang();
     }
+    if (reason == DLL_PROCESS_DETACH && Defect::Is(L"hang-at-unload"))
+    {
+        Defect::Hang();
+    }
     return TRUE;
 }

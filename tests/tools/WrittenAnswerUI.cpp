@@ -31,7 +31,7 @@ public:
         const std::wstring answer = buffer;
         const auto says = [&](const wchar_t* word) { return answer.find(word) != std::wstring::npos; };
 
-        Sleep(says(L"slowly") ? 2500 : 0);
+        Sleep(says(L"slowly") ? 12'000 : 0);
         OrvixFileList* list = params->GetOrvixFileList();
         for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
         {

@@ -410,12 +410,13 @@ TEST_F(DoctorTest, FindsSettingsThatAreReadAndHaveAnotherEffectThanTheySeem)
                   "<f><Name>3</Name><FileType>.tmp</FileType><FileType>*</FileType><FileType>bak</FileType></f>\n"
                   "<f><Name>4</Name><Folder>C:/a/</Folder><Folder>sub\\</Folder><Folder>C:\\a</Folder>"
                   "<Folder>C:\\a\\</Folder></f>\n"
+                  "<f><Name>5</Name><Folder/><Folder>D:</Folder></f>\n"
                   "</Filters></a>");
     const Json place = Place(Report(), "settings file");
     EXPECT_THAT(CodesOf(place),
                 ElementsAre("!repeated", "!no-root-folder", "!no-executable", "!no-search-path", "!bad-file-name",
                             "!empty-filter", "!empty-type", "!file-type", "!file-type", "!folder-slash",
-                            "!folder-relative", "!folder-end", "!matches-nothing"));
+                            "!folder-relative", "!folder-end", "!folder-all", "!folder-all", "!matches-nothing"));
     std::vector<int> lines;
     for (const Json& finding : place["findings"])
     {

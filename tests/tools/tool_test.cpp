@@ -515,7 +515,7 @@ TEST_F(Tool, TheDialogsOptionKeepsTheFilesCheckedOut)
 {
     Take(L"a.txt");
     AnswerDialogs(L"yes keep slowly");
-    const auto result = RunAttended({L"checkin", L"a.txt", L"--timeout", L"2"});
+    const auto result = RunAttended({L"checkin", L"a.txt", L"--timeout", L"10"});
     EXPECT_EQ(result.code, Success) << "only providers have a limit: " << result.errors;
     EXPECT_THAT(result.output, HasSubstr("done    checked out  a.txt\n"));
 }
@@ -606,6 +606,10 @@ TEST_F(Tool, BadUsageIsExplainedAndDoesNothing)
         {L"add", L"a.txt", L"--", L""},
         {L"--", L"add", L"a.txt"},
         {L"add", L"lone surrogate \xD800"},
+        {L"status", L".", L"--project", L""},
+        {L"status", L".", L"--config", L""},
+        {L"status", L".", L"--plugins", L""},
+        {L"status", L".", L"--provider", L""},
     };
     for (const Arguments& arguments : bad)
     {

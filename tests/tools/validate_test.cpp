@@ -180,12 +180,13 @@ INSTANTIATE_TEST_SUITE_P(
                 {L"undoes-nothing", "checks-out", "after UndoCheckOut the file has other bytes"},
                 {L"status-lies", "status-truth", "after making a new file QueryStatus says 0x00000011"},
                 {L"destroys", "failures", "after a failed CheckIn the file has other bytes"},
-                {L"changes-folder", "process", "CheckOut changes the current folder"},
+                {L"prints-late", "process", "CloseProject prints from another thread than that of the call"},
                 {L"leaks", "memory", "10 queries of the state take 20 MiB that are not freed"}},
         Defects{{L"starts", "starts", "Initialize returns -1"}},
         Defects{{L"exception", "reserved", "ReservedC throws an exception"},
                 {L"checkin-fails", "stores", "CheckIn returns -1"},
                 {L"prints-from-thread", "process", "CheckOut prints from another thread than that of the call"}},
+        Defects{{L"changes-folder", "process", "CheckOut changes the current folder"}},
         Defects{{L"crash", "reserved", "ReservedE crashes the process with exception 0xC0000005 in "}},
         Defects{{L"exit", "reserved", "ReservedG ends the process with exit code 7"}}));
 
@@ -257,12 +258,12 @@ TEST_F(Validate, FailsALibraryForAFunctionThatIsNeededAndRemarksOneThatIsNot)
 TEST_F(Validate, EndsAHangingOperationAtTheLimitAndGoesOn)
 {
     const Environment environment(Defect::Variable, L"hang");
-    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--timeout", L"5"});
-    EXPECT_THAT(With("fail", plugin), ElementsAre(Pair("reserved", "ReservedF hangs: ended after 5 s")));
+    const auto plugin = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--timeout", L"10"});
+    EXPECT_THAT(With("fail", plugin), ElementsAre(Pair("reserved", "ReservedF hangs: ended after 10 s")));
     EXPECT_THAT(plugin.output, HasSubstr("\npass  handles "));
-    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", Failed, {L"--timeout", L"5"});
+    const auto library = ValidateLibrary(Libraries / L"defective_scc.dll", Failed, {L"--timeout", L"10"});
     EXPECT_THAT(With("fail", library),
-                ElementsAre(Pair("null-arguments", "SccGetCommandOptions hangs: ended after 5 s")));
+                ElementsAre(Pair("null-arguments", "SccGetCommandOptions hangs: ended after 10 s")));
 }
 
 TEST_F(Validate, NamesTheWindowThatAnOperationWaitsFor)
@@ -272,10 +273,10 @@ TEST_F(Validate, NamesTheWindowThatAnOperationWaitsFor)
         GTEST_SKIP() << "no display";
     }
     const Environment environment(Defect::Variable, L"window");
-    const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--timeout", L"3"});
+    const auto result = ValidatePlugin(Plugins / L"defective.dll", Failed, {L"--timeout", L"10"});
     EXPECT_THAT(With("fail", result),
                 ElementsAre(Pair("reserved", "ReservedF shows the window \"Defective Provider\" (Who are you?) and "
-                                             "waits: ended after 3 s")));
+                                             "waits: ended after 10 s")));
 }
 
 TEST_F(Validate, CopiesAProjectForAProviderThatMakesNone)

@@ -150,9 +150,7 @@ TEST_F(WildProvider, IsAskedAfterAnOperationOnlyAboutItsFiles)
         line.erase(line.find_last_not_of('\r') + 1);
         lines.push_back(line);
     }
-    ASSERT_GE(lines.size(), 2U);
-    EXPECT_EQ(lines[0], "QueryStatus 3");
-    EXPECT_EQ(lines[1], "QueryStatus 1");
+    EXPECT_THAT(lines, testing::ElementsAre("QueryStatus 3", "QueryStatus 1"));
 }
 
 TEST_F(WildProvider, ThatIsSwitchedOffIsNamedWithTheSetting)
@@ -183,6 +181,12 @@ TEST_F(WildProvider, IsNotUsedWhileTheAdministratorsRulesCannotBeRead)
         EXPECT_EQ(locked.code, BrokenSettings);
         EXPECT_THAT(locked.errors, HasSubstr("the file cannot be opened"));
     }
+    WriteSettings("<?xml version=\"1.0\"?>\n<OrvixProviders/>" + std::string(17 << 20, ' '));
+    const auto large = RunWild({L"add", L"."});
+    EXPECT_EQ(large.code, BrokenSettings);
+    EXPECT_THAT(large.errors, HasSubstr("OrvixProviders.xml: "));
+
+    WriteSettings("<?xml version=\"1.0\"?>\n<OrvixProviders/>");
     EXPECT_THAT(RunWild({L"status", L"."}).output, HasSubstr("not controlled  secret.key"));
     EXPECT_EQ(RunWild({L"add", L"."}).code, Success);
 }
@@ -208,9 +212,36 @@ TEST_F(WildProvider, ThatEndsTheProcessIsNamed)
 TEST_F(WildProvider, ThatHangsIsEndedAfterTheTime)
 {
     Write(L"a.txt", "x");
-    const auto result = RunWith(L"hang-in-status", {L"status", L".", L"--timeout", L"2"});
+    const auto result = RunWith(L"hang-in-status", {L"status", L".", L"--timeout", L"10"});
     EXPECT_EQ(result.code, TimedOut);
-    EXPECT_THAT(result.errors, HasSubstr("orvix: QueryStatus of Wild has given no sign of life for 2 s and was ended"));
+    EXPECT_THAT(result.errors,
+                HasSubstr("orvix: QueryStatus of Wild has given no sign of life for 10 s and was ended"));
+}
+
+TEST_F(WildProvider, ThatHangsWhileItIsUnloadedHasDoneItsWork)
+{
+    Write(L"a.txt", "x");
+    const auto result = RunWith(L"hang-at-unload", {L"add", L"."});
+    EXPECT_EQ(result.code, Success) << result.errors;
+    EXPECT_THAT(RunWild({L"status", L"."}).output, HasSubstr("checked in  a.txt"));
+}
+
+TEST_F(WildProvider, ThatShowsAWindowIsNamedToSomebodyWhoAsksForIt)
+{
+    if (!HasDisplay())
+    {
+        GTEST_SKIP() << "no display";
+    }
+    Write(L"a.txt", "x");
+    const Environment environment(Defect::Variable, L"window-in-status");
+    for (const wchar_t* action : {L"report", L"cancel"})
+    {
+        const auto result = RunExactly({L"status", L".", L"--plugins", ORVIX_WILD_PLUGINS, L"--config",
+                                        Config().wstring(), L"--on-window", action, L"--timeout", L"10"});
+        const bool isCancelled = action == std::wstring_view(L"cancel");
+        EXPECT_EQ(result.code, isCancelled ? Failed : TimedOut);
+        EXPECT_THAT(result.errors, HasSubstr("QueryStatus of Wild shows the window \"Wild Provider\""));
+    }
 }
 
 TEST_F(WildProvider, ThatShowsAWindowIsNamed)
@@ -220,12 +251,12 @@ TEST_F(WildProvider, ThatShowsAWindowIsNamed)
         GTEST_SKIP() << "no display";
     }
     Write(L"a.txt", "x");
-    const auto waiting = RunWith(L"window-in-status", {L"status", L".", L"--timeout", L"2"});
+    const auto waiting = RunWith(L"window-in-status", {L"status", L".", L"--timeout", L"10"});
     EXPECT_EQ(waiting.code, TimedOut);
     EXPECT_THAT(waiting.errors,
                 AllOf(HasSubstr("QueryStatus of Wild shows the window \"Wild Provider\": There is no repository. "
                                 "Create one? (--on-window cancel presses Cancel)"),
-                      HasSubstr("for 2 s since it showed the window \"Wild Provider\"")));
+                      HasSubstr("for 10 s since it showed the window \"Wild Provider\"")));
     const auto cancelled = RunWith(L"window-in-status", {L"status", L".", L"--on-window", L"cancel"});
     EXPECT_EQ(cancelled.code, Failed);
     EXPECT_THAT(cancelled.errors, AllOf(HasSubstr("(Cancel is pressed)"),

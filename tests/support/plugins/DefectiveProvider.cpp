@@ -81,6 +81,10 @@ public:
 
     int CloseProject() override
     {
+        if (Defect::Is(L"prints-late"))
+        {
+            std::thread([this] { m_client->OutputText(L"closed", 0); }).join();
+        }
         m_open = false;
         return Success;
     }

@@ -25,7 +25,7 @@ constexpr Command Table[] = {
     },
     {
         .name = "doctor",
-        .description = "Say of every possible provider whether it is listed and why, and what is wrong",
+        .description = "Show for every possible provider whether it is listed and why, and what is wrong",
         .examples = "  orvix doctor\n"
                     "  orvix doctor --sources msscci --json",
         .takes = Argument::Json,
@@ -55,8 +55,8 @@ constexpr Command Table[] = {
     },
     {
         .name = "checkout",
-        .description = "Take files for editing",
-        .examples = "  orvix checkout src\\a.txt -m \"to mend the title\"\n"
+        .description = "Check files out for editing",
+        .examples = "  orvix checkout src\\a.txt -m \"to fix the title\"\n"
                     "  orvix checkout src --unattended --json",
         .takes = Argument::Paths | Argument::Json | Argument::Comment,
         .pathHelp = FilesHelp,
@@ -66,7 +66,7 @@ constexpr Command Table[] = {
     {
         .name = "checkin",
         .description = "Store new versions of checked-out files",
-        .examples = "  orvix checkin . -m \"title mended\"\n"
+        .examples = "  orvix checkin . -m \"title fixed\"\n"
                     "  orvix checkin . --unattended -m nightly --veto *.key",
         .takes = Argument::Paths | Argument::Json | Argument::Comment | Argument::Keep,
         .pathHelp = FilesHelp,
@@ -84,7 +84,7 @@ constexpr Command Table[] = {
     },
     {
         .name = "get",
-        .description = "Bring the latest versions",
+        .description = "Get the latest versions",
         .examples = "  orvix get . --unattended\n"
                     "  orvix get src\\a.txt --force",
         .takes = Argument::Paths | Argument::Json | Argument::Force,
@@ -142,7 +142,7 @@ constexpr Command Table[] = {
     {
         .group = "prompts",
         .name = "reset",
-        .description = "Have a prompt ask again",
+        .description = "Make a prompt ask again",
         .examples = "  orvix prompts reset 7\n"
                     "  orvix prompts reset --all",
         .takes = Argument::PromptOrAll | Argument::Json,

@@ -135,7 +135,7 @@ const char* NearestCommand(const std::string& word)
 constexpr const char* Footer =
     "Examples:\n"
     "  orvix providers\n"
-    "  orvix checkin . -m \"title mended\"\n"
+    "  orvix checkin . -m \"title fixed\"\n"
     "  orvix checkin --help\n"
     "\n"
     "Exit codes: 0 success, 1 something failed, was refused or is wrong, 2 bad usage,\n"
@@ -372,11 +372,20 @@ std::optional<std::chrono::seconds> Parser::Timeout(const Command& command) cons
 
 CommandLine Parser::MakeCommandLine(const Command& command) const
 {
+    for (const char* option : {"--plugins", "--config", "--provider", "--project"})
+    {
+        // An unset variable of a script must not mean another folder or provider.
+        if (m_app.count(option) > 0 && m_app.get_option(option)->as<std::string>().empty())
+        {
+            throw ToolError(ExitCode::BadUsage, Wide(option) + L" needs a value");
+        }
+    }
     CommandLine result = m_values;
     result.command = Wide(command.group != nullptr ? command.group : command.name);
     result.folder = FullPath(L".");
     result.timeout = Timeout(command);
     result.providerTextIsResult = command.providerTextIsResult;
+    result.watchesWindows = !m_texts.onWindow.empty();
     result.cancelsWindows = m_texts.onWindow == "cancel";
     result.prompt = Unmarked(m_texts.prompt);
     result.answer = Unmarked(m_texts.answer);

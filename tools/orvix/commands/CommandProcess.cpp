@@ -38,7 +38,7 @@ class WatchedChild
 public:
     explicit WatchedChild(const CommandLine& commandLine)
         : m_limit(commandLine.timeout), m_isAttended(!commandLine.unattended),
-          m_watchesWindows(commandLine.unattended || commandLine.cancelsWindows),
+          m_watchesWindows(commandLine.unattended || commandLine.watchesWindows),
           m_cancelsWindows(commandLine.cancelsWindows), m_child(TypedArguments(), L"", ChildProcess::Streams::Shared),
           m_windows(m_child)
     {
@@ -111,7 +111,9 @@ private:
         {
             return;
         }
-        for (const WindowWatch::Window& window : m_windows.FindNew())
+        const std::vector<WindowWatch::Window> windows = m_windows.FindNew();
+        TakeLines(m_child.Read()); // the call that shows a window announced itself before
+        for (const WindowWatch::Window& window : windows)
         {
             m_lastSign = Clock::now();
             m_window = L"\"" + window.title + L"\"";
@@ -119,7 +121,7 @@ private:
                       << (window.text.empty() ? "" : ": ") << Printable(window.text)
                       << (m_cancelsWindows ? " (Cancel is pressed)" : " (--on-window cancel presses Cancel)")
                       << std::endl;
-            if (m_cancelsWindows)
+            if (m_cancelsWindows && (!m_isAttended || m_isInCall))
             {
                 WindowWatch::Cancel(window);
             }

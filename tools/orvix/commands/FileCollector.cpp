@@ -1,6 +1,7 @@
 #include "FileCollector.h"
 
 #include "FilePath.h"
+#include "ParentLink.h"
 #include "Text.h"
 #include "UniqueHandle.h"
 
@@ -53,6 +54,7 @@ void FileCollector::AddFile(std::wstring path, bool named)
         m_files.push_back({std::move(path), named});
         if (m_files.size() % FilesBetweenProgress == 0)
         {
+            ParentLink::Send(ParentLink::Alive);
             m_output.Progress(L"looking for files: " + std::to_wstring(m_files.size()));
         }
     }

@@ -33,10 +33,6 @@ void OperationCommand::RunOnFiles()
     RegisterPrompts();
     StoreAnswers();
     Project().Provider().Withhold(m_rule.allowedBy, m_rule.protects);
-    if (!Project().Takes(Arguments().comment))
-    {
-        std::cerr << "orvix: the comment has characters that the provider's code page lacks; they are replaced\n";
-    }
     const bool ran = RunOperation(params);
     RequireStatus();
     const std::vector<std::optional<Result>> results = ResultsOfRun(ran);

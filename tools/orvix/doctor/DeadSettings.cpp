@@ -157,6 +157,12 @@ private:
             Add("folder-slash", folder, where,
                 L"Folder " + Quoted(folder.text) + L" matches no file: paths have backslashes");
         }
+        else if (folder.text.empty() || (folder.text.size() == 2 && folder.text.back() == L':'))
+        {
+            Add("folder-all", folder, where,
+                L"Folder " + Quoted(folder.text) + L" matches every file" +
+                    (folder.text.empty() ? L"" : L" of the drive"));
+        }
         else if (!IsAbsolutePath(folder.text))
         {
             Add("folder-relative", folder, where,

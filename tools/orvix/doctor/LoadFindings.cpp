@@ -74,7 +74,7 @@ void LoadFindings::AddCurrentFolder(DoctorReport::Subject& subject, const std::w
             subject.AddProblem("current-folder", L"it needs " + Wide(import) +
                                                      L", which is found only in the current "
                                                      L"folder of this process: " +
-                                                     current);
+                                                     FullPath(L"."));
         }
     }
 }

@@ -26,6 +26,7 @@ constexpr struct
     {"ends-process", "Remove the library, and tell its author."},
     {"entities", "Replace the entities by their texts."},
     {"file-type", "Write the extension alone, such as tmp."},
+    {"folder-all", "Write the full path of the folder, with a backslash at its end."},
     {"folder-end", "Write a backslash at the end."},
     {"folder-relative", "Write the full path of the folder, with a backslash at its end."},
     {"folder-slash", "Write backslashes instead of slashes, and one at the end."},

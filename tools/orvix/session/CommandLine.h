@@ -24,6 +24,7 @@ struct CommandLine
     bool providerTextIsResult = false; ///< what the provider prints is the result of the command
     bool unattended = false;
     std::optional<std::chrono::seconds> timeout; ///< 1 to 3600; empty for none
+    bool watchesWindows = false;                 ///< names windows of providers also when somebody answers
     bool cancelsWindows = false;                 ///< presses Cancel in windows of providers
     bool noColor = false;
     bool verbose = false;

@@ -176,7 +176,6 @@ ValidationResult ValidationProcess::Check(const ValidationRule& rule)
         if (lines.Take(child->Read()))
         {
             lastLine = Clock::now();
-            window.reset();
         }
         if (const std::vector<WindowWatch::Window> found = windows.FindNew(); !found.empty())
         {
@@ -184,6 +183,7 @@ ValidationResult ValidationProcess::Check(const ValidationRule& rule)
         }
     } while (!ended && !lines.result && Clock::now() - lastLine < m_limit);
     lines.Take(child->Read());
+    const bool isWaiting = window && IsWindowVisible(static_cast<HWND>(window->handle)) != FALSE;
     child->End();
     if (lines.result)
     {
@@ -197,9 +197,9 @@ ValidationResult ValidationProcess::Check(const ValidationRule& rule)
     }
     AddHanging(ValidationSubject::OperationOf(lines.step));
     const std::string after = ": ended after " + std::to_string(m_limit.count()) + " s";
-    return {Verdict::Fail, lines.step + (window ? " shows the window \"" + Printable(window->title) + "\" (" +
-                                                      Printable(window->text) + ") and waits" + after
-                                                : " hangs" + after)};
+    return {Verdict::Fail, lines.step + (isWaiting ? " shows the window \"" + Printable(window->title) + "\" (" +
+                                                         Printable(window->text) + ") and waits" + after
+                                                   : " hangs" + after)};
 }
 
 /// An operation and the function that it calls hang together, however a rule calls them.

@@ -38,30 +38,32 @@ void ProcessRules::State(ValidationSubject& subject)
 {
     const ProcessState state;
     ValidationProvider provider(subject);
+    const auto require = [&](const std::string& operation) {
+        RequireUnchanged(state, operation);
+        Require(!provider.HasPrintedFromOtherThread(), operation + " prints from another thread than that of the call");
+    };
     RequireUnchanged(state, "loading");
     if (provider.Initialize() != Success)
     {
         throw RuleSkipped("Initialize fails");
     }
-    RequireUnchanged(state, "Initialize");
+    require("Initialize");
     if (provider.OpenProject() != Success)
     {
         throw RuleSkipped("OpenProject fails for the scratch project");
     }
-    RequireUnchanged(state, "OpenProject");
+    require("OpenProject");
     const std::vector<std::wstring> paths = ValidationFiles::MakeGood(subject);
     for (const ValidationOperation& operation : ValidationOperation::Scenario(0))
     {
         ActiveFiles files(paths);
         operation.Run(subject, provider, files.List());
-        RequireUnchanged(state, operation.name);
-        Require(!provider.HasPrintedFromOtherThread(),
-                std::string(operation.name) + " prints from another thread than that of the call");
+        require(operation.name);
     }
     provider.CloseProject();
-    RequireUnchanged(state, "CloseProject");
+    require("CloseProject");
     provider.Uninitialize();
-    RequireUnchanged(state, "Uninitialize");
+    require("Uninitialize");
 }
 
 void ProcessRules::Memory(ValidationSubject& subject)
