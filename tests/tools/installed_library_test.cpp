@@ -41,15 +41,16 @@ protected:
 
 TEST_F(InstalledLibrary, IsNotLookedForUnlessAskedFor)
 {
-    EXPECT_EQ(Run({L"providers"}).output, "Index  Provider\n0      Archive\n");
-    EXPECT_EQ(Run({L"providers", L"--sources", L"plugins"}).output, "Index  Provider\n0      Archive\n");
+    EXPECT_EQ(Run({L"providers"}).output, "Index  Provider\n0      Archive\n1      Git\n");
+    EXPECT_EQ(Run({L"providers", L"--sources", L"plugins"}).output, "Index  Provider\n0      Archive\n1      Git\n");
 }
 
 TEST_F(InstalledLibrary, FollowsThePluginsInWhateverOrderTheSourcesAreNamed)
 {
     for (const wchar_t* both : {L"plugins,msscci", L"msscci,plugins"})
     {
-        EXPECT_EQ(Run({L"providers", L"--sources", both}).output, "Index  Provider\n0      Archive\n1      Talking\n");
+        EXPECT_EQ(Run({L"providers", L"--sources", both}).output,
+                  "Index  Provider\n0      Archive\n1      Git\n2      Talking\n");
     }
 }
 

@@ -77,7 +77,7 @@ TEST_F(Tool, ListsTheProvidersWithTheirIndexes)
 {
     const auto result = Run({L"providers"});
     EXPECT_EQ(result.code, Success);
-    EXPECT_EQ(result.output, "Index  Provider\n0      Archive\n");
+    EXPECT_EQ(result.output, "Index  Provider\n0      Archive\n1      Git\n");
 }
 
 TEST_F(Tool, PrintsHelpAndVersionWithSuccess)
@@ -552,7 +552,7 @@ TEST_F(Tool, ChoosesAProviderByNameInAnyCaseOrByIndex)
     Write(L"a.txt", "x");
     EXPECT_EQ(Run({L"status", L"a.txt", L"--provider", L"ARCHIVE"}).code, Success);
     EXPECT_EQ(Run({L"status", L"a.txt", L"--provider", L"0"}).code, Success);
-    for (const wchar_t* unknown : {L"1", L"Arch", L"-1", L"00"})
+    for (const wchar_t* unknown : {L"2", L"Arch", L"-1", L"00"})
     {
         const auto result = Run({L"status", L"a.txt", std::wstring(L"--provider=") + unknown});
         EXPECT_EQ(result.code, NotFound);
