@@ -3,6 +3,8 @@
 #include "GitProvider.h"
 #include "OrvixVersion.h"
 
+#include <windows.h>
+
 #include <cstdint>
 #include <memory>
 
@@ -13,6 +15,17 @@ namespace
 /// deleted by the last release, or when the module is unloaded, since a host need not release it.
 std::unique_ptr<GitProvider> theProvider;
 int requests = 0;
+
+/// Keeps this module in memory until the process ends. GCC's run-time, which is linked into it, keeps two handles for
+/// the threads of a module, and would leave them open at each unload.
+void StayLoaded()
+{
+#if defined(__MINGW32__)
+    HMODULE self = nullptr;
+    GetModuleHandleExW(GET_MODULE_HANDLE_EX_FLAG_PIN | GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS,
+                       reinterpret_cast<const wchar_t*>(&theProvider), &self);
+#endif
+}
 
 } // namespace
 
@@ -31,6 +44,7 @@ extern "C" IOrvixProvider* GetIOrvixProvider()
 {
     if (!theProvider)
     {
+        StayLoaded();
         theProvider.reset(new GitProvider);
     }
     if (theProvider)
