@@ -120,6 +120,16 @@ private:
     std::wstring m_path;
 };
 
+/// Puts a file under control. Where an added file counts as checked out, the check-in completes it.
+void NeedControlled(WorkedFile& file)
+{
+    file.Need(ValidationOperation::Add());
+    if ((file.State() & Out) != 0)
+    {
+        file.Need(ValidationOperation::CheckIn());
+    }
+}
+
 /// Throws `RuleSkipped` when an MSSCCI library lacks a function, which the rule of the exports reports.
 void NeedExports(ValidationSubject& subject, std::initializer_list<const char*> names)
 {
@@ -160,7 +170,7 @@ void WorkRules::Stores(ValidationSubject& subject)
     provider.Begin();
     WorkedFile file(subject, provider, subject.Write(L"stored.txt", OldBytes));
     file.Run(ValidationOperation::Add());
-    file.RequireState(In, Out | OrvixFileState::NotControlled, "Add");
+    file.RequireState(In, OrvixFileState::NotControlled, "Add");
     file.RequireBytes(OldBytes, "Add");
     file.Need(ValidationOperation::CheckOut());
     subject.Write(L"stored.txt", NewBytes);
@@ -179,7 +189,7 @@ void WorkRules::ChecksOut(ValidationSubject& subject)
     ValidationProvider provider(subject);
     provider.Begin();
     WorkedFile file(subject, provider, subject.Write(L"taken.txt", OldBytes));
-    file.Need(ValidationOperation::Add());
+    NeedControlled(file);
     file.Run(ValidationOperation::CheckOut());
     file.RequireState(In | Out, OrvixFileState::NotControlled, "CheckOut");
     Require(IsWritable(file.Path()), "after CheckOut the file is read-only");
