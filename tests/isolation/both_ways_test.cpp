@@ -148,7 +148,7 @@ protected:
         seen << library.uncheckout(session.context, nullptr, 1, names.data(), 0, nullptr);
         query();
         seen << library.checkin(session.context, nullptr, 1, &names[1], "", SCC_KEEP_CHECKEDOUT, nullptr)
-             << library.checkin(session.context, nullptr, 1, names.data(), "", 0, nullptr)
+             << library.checkin(session.context, nullptr, 2, names.data(), "", 0, nullptr)
              << library.getCommandOptions(session.context, nullptr, SCC_COMMAND_GET, nullptr)
              << library.closeProject(session.context) << session.Uninitialize();
         return seen.Text() + Text();

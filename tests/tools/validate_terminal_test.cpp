@@ -49,8 +49,8 @@ TEST_F(ValidateOnATerminal, ShowsTheRuleThatIsChecked)
 {
     const auto result = ValidateText(L"");
     EXPECT_EQ(result.code, Failed);
-    EXPECT_THAT(result.text, AllOf(HasSubstr("checking loads, 1 of 19"), HasSubstr("checking handles, 18 of 19")));
-    EXPECT_THAT(result.text, HasSubstr("\n19 rules, 0 passed, 1 failed, 18 skipped\n"));
+    EXPECT_THAT(result.text, AllOf(HasSubstr("checking loads, 1 of 25"), HasSubstr("checking handles, 24 of 25")));
+    EXPECT_THAT(result.text, HasSubstr("\n25 rules, 0 passed, 1 failed, 24 skipped\n"));
 }
 
 TEST_F(ValidateOnATerminal, HasNoColoursWhereTheUserWantsNone)

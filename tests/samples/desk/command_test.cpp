@@ -20,6 +20,8 @@ protected:
     }
 };
 
+constexpr const wchar_t* NoProvider = L"There is no provider. Tools, Options lists those that can be used.\r\n";
+
 bool Contains(const std::wstring& text, const std::wstring& part)
 {
     return text.find(part) != std::wstring::npos;

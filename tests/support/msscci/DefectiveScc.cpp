@@ -152,15 +152,17 @@ SCCRTN SccUncheckout(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
 
 SCCRTN SccCheckin(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG options, LPCMDOPTS)
 {
-    if (Defect::Is(L"codes-given-back") && options == 0)
+    if (Defect::Is(L"codes-given-back") && options == 0 && count > 1)
     {
         return UnknownResult;
     }
+    const SCCRTN result =
+        Become(count, names, SCC_STATUS_CONTROLLED, [](LPCSTR file) { disk.Store(PathOf(file), false); });
     if (Defect::Is(L"input-names") && count > 0)
     {
         const_cast<LPSTR>(names[0])[0] = '#';
     }
-    return Become(count, names, SCC_STATUS_CONTROLLED, [](LPCSTR file) { disk.Store(PathOf(file), false); });
+    return result;
 }
 
 SCCRTN SccAdd(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG* options, LPCMDOPTS)
@@ -180,7 +182,7 @@ SCCRTN SccQueryInfo(LPVOID, LONG count, LPCSTR* names, LPLONG status)
     }
     for (LONG i = 0; i < count; ++i)
     {
-        if (Defect::Is(L"info-left-out") && i + 1 == count)
+        if (Defect::Is(L"info-left-out") && count > 1 && i + 1 == count)
         {
             break;
         }

@@ -6,8 +6,6 @@
 
 #include <windows.h>
 
-#include <psapi.h>
-
 #include <string>
 #include <vector>
 
@@ -23,13 +21,18 @@ void RequireUnchanged(const ProcessState& state, const std::string& operation)
     Require(changes.empty(), operation + " changes " + (changes.empty() ? "" : changes.front()));
 }
 
-/// Bytes that this process has committed.
+/// Bytes that this process has committed for itself. The system's own counters may leave out what was never written to.
 std::size_t CommittedBytes()
 {
-    PROCESS_MEMORY_COUNTERS counters{};
-    counters.cb = sizeof counters;
-    K32GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters);
-    return counters.PagefileUsage;
+    std::size_t bytes = 0;
+    const char* place = nullptr;
+    MEMORY_BASIC_INFORMATION region{};
+    while (VirtualQuery(place, &region, sizeof region) != 0)
+    {
+        bytes += region.State == MEM_COMMIT && region.Type == MEM_PRIVATE ? region.RegionSize : 0;
+        place = static_cast<const char*>(region.BaseAddress) + region.RegionSize;
+    }
+    return bytes;
 }
 
 } // namespace

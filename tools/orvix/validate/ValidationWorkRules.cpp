@@ -225,10 +225,10 @@ void WorkRules::Failures(ValidationSubject& subject)
     NeedExports(subject, {Scc::QueryInfo.name});
     ValidationProvider provider(subject);
     provider.Begin();
-    WorkedFile file(subject, provider, subject.Write(L"kept.txt", OldBytes));
     for (const ValidationOperation& operation : {ValidationOperation::CheckOut(), ValidationOperation::CheckIn(),
                                                  ValidationOperation::UndoCheckOut(), ValidationOperation::GetLatest()})
     {
+        WorkedFile file(subject, provider, subject.Write(L"kept by " + Wide(operation.name) + L".txt", OldBytes));
         const unsigned long before = file.State();
         const std::string bytes = Bytes(file.Path());
         if (file.TryToRun(operation) != Success)
