@@ -67,7 +67,7 @@ TEST_F(ListingTool, FiltersTellsFolderFromTypeAndNamesTheFilter)
     Write(L"a.tmp", "x");
     Write(L"a.txt", "x");
     Write(L"out\\b.txt", "x");
-    const auto result = Run({L"filters", L"."});
+    const auto result = Run({L"filters", L".", L"--provider", L"archive"});
     EXPECT_EQ(result.code, Success);
     EXPECT_EQ(result.output, "Excluded  Provider  Filter   By      File\n"
                              "yes       Archive   scratch  type    " +
@@ -85,7 +85,7 @@ TEST_F(ListingTool, FiltersTellsFolderFromTypeAndNamesTheFilter)
 TEST_F(ListingTool, FiltersJudgesAFileThatIsNotThereByItsFullPath)
 {
     Filters(Filter("Archive", "<Name>mine</Name><Type>include</Type><Folder>" + Full(L"") + "</Folder>"));
-    const json files = Json({L"filters", L"nowhere.txt", L"C:\\elsewhere.txt"})["files"];
+    const json files = Json({L"filters", L"nowhere.txt", L"C:\\elsewhere.txt", L"--provider", L"archive"})["files"];
     ASSERT_EQ(files.size(), 2U);
     EXPECT_EQ(files[0]["file"], Full(L"nowhere.txt"));
     EXPECT_EQ(files[0]["excluded"], false);
@@ -143,10 +143,11 @@ TEST_F(ListingTool, FiltersOfNobodyIsAnError)
 
 TEST_F(ListingTool, ProvidersAsJson)
 {
-    EXPECT_EQ(Json({L"providers"}), json({{"providers", {{{"index", 0}, {"name", "Archive"}}}},
-                                          {"summary", json::object()},
-                                          {"lines", json::array()},
-                                          {"messages", json::array()}}));
+    EXPECT_EQ(Json({L"providers"}),
+              json({{"providers", {{{"index", 0}, {"name", "Archive"}}, {{"index", 1}, {"name", "Git"}}}},
+                    {"summary", json::object()},
+                    {"lines", json::array()},
+                    {"messages", json::array()}}));
 }
 
 TEST_F(ListingTool, StatusAsJson)
