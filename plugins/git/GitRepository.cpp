@@ -3,6 +3,7 @@
 #include "GitFailure.h"
 #include "GitText.h"
 #include "LockFiles.h"
+#include "WindowsPath.h"
 
 #include <windows.h>
 
@@ -18,36 +19,6 @@ constexpr wchar_t NotControlled[] = L" is not under Git's control";
 
 // From here on "git add" is slow: it compares each path with each file that it finds.
 constexpr std::size_t ManyFiles = 1000;
-
-/// The full path without "." and "..", without a separator at its end; paths longer than 260 characters included. Empty
-/// when it is no path.
-std::wstring FullPath(std::wstring path)
-{
-    constexpr std::wstring_view LongPrefix = L"\\\\?\\";
-    if (path.starts_with(LongPrefix) && !path.starts_with(L"\\\\?\\UNC\\"))
-    {
-        path.erase(0, LongPrefix.size());
-    }
-    std::wstring full;
-    for (DWORD size = MAX_PATH; full.size() < size;)
-    {
-        full.resize(size);
-        size = GetFullPathNameW(path.c_str(), size, full.data(), nullptr);
-        if (size < full.size())
-        {
-            full.resize(size);
-            break;
-        }
-    }
-    full.erase(full.find_last_not_of(L'\\') + 1);
-    return full;
-}
-
-/// The form in which functions of Windows take a path of any length.
-std::wstring LongForm(const std::wstring& full)
-{
-    return full.starts_with(L"\\\\") ? full : L"\\\\?\\" + full;
-}
 
 /// Paths as Git reads them from its input, each with a prefix.
 std::string PathList(const std::vector<std::string>& paths, std::string_view prefix = {})

@@ -10,6 +10,7 @@
 #include "LockFiles.h"
 #include "Process.h"
 #include "TempFolder.h"
+#include "WindowsPath.h"
 
 #include <gtest/gtest.h>
 
@@ -202,6 +203,17 @@ TEST(ChildProcess, ThatCannotBeStartedSaysWhy)
     command.program = L"C:\\no such program.exe";
     EXPECT_NE(FailureOf([&] { Process::Run(command, nullptr); }).find(L"no such program.exe cannot be started"),
               std::wstring::npos);
+}
+
+TEST(WindowsPath, OfAShareHasALongFormToo)
+{
+    const std::wstring share = L"\\\\server\\share\\my town\\a.txt";
+    const std::wstring longShare = L"\\\\?\\UNC\\server\\share\\my town\\a.txt";
+    EXPECT_EQ(FullPath(longShare), share);
+    EXPECT_EQ(FullPath(share), share);
+    EXPECT_EQ(LongForm(share), longShare);
+    EXPECT_EQ(FullPath(L"\\\\?\\C:\\town\\"), L"C:\\town");
+    EXPECT_EQ(LongForm(L"C:\\town"), L"\\\\?\\C:\\town");
 }
 
 TEST(LockFiles, DeletesThoseOfItsOwnCommand)
