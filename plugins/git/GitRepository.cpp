@@ -73,6 +73,22 @@ private:
     std::wstring m_path;
 };
 
+/// A loose reference or the file HEAD, without a line end; empty when there is none.
+std::string ReadReference(const std::wstring& file)
+{
+    const OwnedHandle handle = OwnFile(CreateFileW(LongForm(file).c_str(), GENERIC_READ,
+                                                   FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                                                   OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr));
+    char bytes[1024];
+    DWORD count = 0;
+    if (!handle || !ReadFile(handle.get(), bytes, sizeof bytes, &count, nullptr))
+    {
+        return {};
+    }
+    const std::string_view text(bytes, count);
+    return std::string(text.substr(0, text.find('\n')));
+}
+
 } // namespace
 
 void GitRepository::Open(const std::wstring& folder)
@@ -347,16 +363,11 @@ GitRepository::Lines GitRepository::CheckIn(const Paths& paths, const std::wstri
         throw GitFailure(L"A commit needs a comment");
     }
     const std::vector<std::string> files = SpelledNow(paths);
+    Lines report = Commit(files, comment);
+    if (report.empty() && m_pushes)
     {
-        // Git's folder may be anywhere: the comment is written there. On another drive it has no relative path.
-        const CommentFile file(m_gitFolder, comment);
-        const std::filesystem::path folder(m_gitFolder);
-        const std::filesystem::path relative = folder.lexically_relative(m_top);
-        const std::filesystem::path named = (relative.empty() ? folder : relative) / file.Name();
-        ChangeOrThrow(
-            OnPaths({L"commit", L"--quiet", L"--only", L"-F", named.generic_wstring()}, files, L"Committing files"));
+        report = Push();
     }
-    Lines report = m_pushes ? Push() : Lines();
     if (!report.empty())
     {
         return report; // the locks stay: nobody else has the new version yet
@@ -371,6 +382,62 @@ GitRepository::Lines GitRepository::CheckIn(const Paths& paths, const std::wstri
     }
     m_locks.Refresh(m_runner);
     return report;
+}
+
+/// Commits the files. Returns why what follows the commit was ended, such as a hook, and nothing when all is done: the
+/// commit stays.
+GitRepository::Lines GitRepository::Commit(const std::vector<std::string>& files, const std::wstring& comment) const
+{
+    // Git's folder may be anywhere: the comment is written there. On another drive it has no relative path.
+    const CommentFile file(m_gitFolder, comment);
+    const std::filesystem::path folder(m_gitFolder);
+    const std::filesystem::path relative = folder.lexically_relative(m_top);
+    const std::filesystem::path named = (relative.empty() ? folder : relative) / file.Name();
+    GitCommand command =
+        OnPaths({L"commit", L"--quiet", L"--only", L"-F", named.generic_wstring()}, files, L"Committing files");
+    // Maintenance takes long, says nothing, and can wait for a fetch.
+    command.settings = {L"maintenance.auto=false"};
+    const std::string before = Head();
+    try
+    {
+        const ProcessResult commit = Change(command);
+        if (commit.Succeeded())
+        {
+            return {};
+        }
+        Lines words = GitRunner::Words(commit);
+        if (!GitText::Lines(commit.errors).empty())
+        {
+            // A hook or a warning may have printed them. Git's own reason is in the output.
+            const Lines output = GitText::Lines(commit.output);
+            words.insert(words.end(), output.begin(), output.end());
+        }
+        throw GitFailure(std::move(words));
+    }
+    catch (const GitFailure& failure)
+    {
+        if (Head() == before)
+        {
+            throw;
+        }
+        Lines words{L"The commit is made, but what follows it was ended:"};
+        words.insert(words.end(), failure.lines.begin(), failure.lines.end());
+        return words;
+    }
+}
+
+/// The last commit, read without Git, which does not run after a cancel. A commit always writes a loose reference.
+std::string GitRepository::Head() const
+{
+    constexpr std::string_view Branch = "ref: ";
+    std::string head = ReadReference(m_gitFolder + L"\\HEAD");
+    if (!head.starts_with(Branch))
+    {
+        return head;
+    }
+    std::wstring file = m_commonFolder + L'\\' + GitText::FromUtf8(head.substr(Branch.size()));
+    std::replace(file.begin(), file.end(), L'/', L'\\');
+    return ReadReference(file);
 }
 
 /// Pushes what is committed. Returns why it is not pushed, and nothing when it is: the commit stays.

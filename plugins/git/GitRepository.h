@@ -45,7 +45,7 @@ public:
     void Add(const Paths& paths);
 
     /// Commits the files, whatever else is staged. Returns what the user is to know although it has succeeded, such as
-    /// a rejected push.
+    /// a rejected push or a hook that was ended after the commit.
     Lines CheckIn(const Paths& paths, const std::wstring& comment, bool keepCheckedOut);
 
     /// Checks every file out that can be. Throws at the end when one could not.
@@ -69,6 +69,8 @@ private:
     ProcessResult Change(const GitCommand& command) const;
     void ChangeOrThrow(const GitCommand& command) const;
     bool AddMany(const std::vector<std::string>& files) const;
+    Lines Commit(const std::vector<std::string>& files, const std::wstring& comment) const;
+    std::string Head() const;
     Lines Push() const;
     std::unordered_set<std::string> Lockable(const std::vector<std::string>& paths) const;
     void PrepareCheckOut(const std::string& file, unsigned long attributes, bool isLockable);

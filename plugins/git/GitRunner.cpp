@@ -53,6 +53,10 @@ std::vector<std::wstring> Arguments(const GitCommand& command, bool unattended)
     {
         arguments.insert(arguments.end(), {L"-c", setting});
     }
+    for (const std::wstring& setting : command.settings)
+    {
+        arguments.insert(arguments.end(), {L"-c", setting});
+    }
     if (unattended)
     {
         arguments.insert(arguments.end(), {L"-c", L"core.askPass="});

@@ -26,6 +26,7 @@ struct GitCommand
     std::wstring task{};                   ///< what the waiting window says
     std::size_t linesToCome = 0;           ///< lines of output that it prints on its way; 0: it prints its own progress
     bool keepsIndex = false;               ///< it never writes the index
+    std::vector<std::wstring> settings{};  ///< of Git, for this command alone: "name=value"
 };
 
 /// Runs commands of Git for one operation of the provider: on threads of their own, while the waiting window paints the

@@ -247,6 +247,11 @@ TEST_F(GitProvider, RefusesACommitWithItsReason)
 
     AddHook(m_git, L"pre-commit", "echo 'the hook says no' >&2\nexit 1\n");
     expectRefused(L"Hooked", L"the hook says no");
+
+    m_git.Write(L"a.txt", "1\n");
+    AddHook(m_git, L"pre-commit", "echo 'lint ok' >&2\n");
+    expectRefused(L"Nothing changed", L"lint ok");
+    EXPECT_TRUE(m_user.client.Shows(L"nothing to commit"));
 }
 
 TEST_F(GitProvider, LeavesHooksTheirOwnPatterns)
@@ -494,6 +499,23 @@ TEST_F(GitProvider, EndsACommandThatIsSilentForTooLong)
     EXPECT_FALSE(m_git.Has(L".git/index.lock"));
     m_git({L"config", L"--unset", L"core.hooksPath"});
     EXPECT_EQ(m_user.CheckIn({file}, L"Now"), Success);
+}
+
+TEST_F(GitProvider, SaysThatACommitIsMadeWhenWhatFollowsItIsEnded)
+{
+    const std::wstring file = m_git.Commit(L"a.txt", "1\n");
+    m_git.Write(L"a.txt", "2\n");
+    m_git({L"config", L"orvix.silentLimit", L"8"});
+    AddHook(m_git, L"post-commit", "git config maintenance.auto > .git/seen\nsleep 60\n");
+    ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
+    EXPECT_EQ(m_user.CheckIn({file}, L"Made"), Success);
+    EXPECT_TRUE(m_user.client.Shows(L"The commit is made, but what follows it was ended:"))
+        << testing::PrintToString(m_user.client.lines);
+    EXPECT_TRUE(m_user.client.Shows(L"git commit printed nothing for 8 seconds and was ended"));
+    EXPECT_EQ(m_git.Read(L".git/seen"), "false\n") << "maintenance could take long";
+    EXPECT_EQ(Message(), "Made\n\n");
+    EXPECT_EQ(Porcelain(), "");
+    EXPECT_FALSE(m_git.Has(L".git/index.lock"));
 }
 
 } // namespace
