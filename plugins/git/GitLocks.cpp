@@ -111,7 +111,17 @@ void GitLocks::GiveBack(const GitRunner& runner, const std::string& path)
     const Lock* lock = Find(path);
     if (lock != nullptr && lock->isOurs)
     {
-        runner.RunOrThrow(ForFile(L"unlock", path, L"Unlocking "));
+        const ProcessResult result = runner.Run(ForFile(L"unlock", path, L"Unlocking "));
+        if (!result.Succeeded())
+        {
+            // Git LFS gives back the lock of a file that is not on the disk, and then fails.
+            Refresh(runner);
+            if (const Lock* left = Find(path); left != nullptr && left->isOurs)
+            {
+                throw GitFailure(GitRunner::Words(result));
+            }
+            return;
+        }
         m_locks.erase(path);
         m_question.reset(); // its answer may still have the lock
     }

@@ -552,7 +552,9 @@ void GitRepository::PrepareCheckOut(const std::string& file, unsigned long attri
     {
         throw GitFailure(Full(file) + L" is not on the disk");
     }
-    if (isLockable)
+    // Git LFS does not give back the lock of a file that has no commit.
+    const GitStatus::File* change = entry->second.changed;
+    if (isLockable && (change == nullptr || !change->IsAdded()))
     {
         m_locks.Take(m_runner, file);
     }

@@ -314,6 +314,39 @@ TEST_F(GitLocking, ACheckOutSaysWhoHasTheLock)
     EXPECT_EQ(m_bob.CheckOut({m_river}), Success);
 }
 
+TEST_F(GitLocking, ACheckInOfADeletedAndOfARenamedFileGivesTheirLocksBack)
+{
+    ASSERT_EQ(m_bob.CheckOut({m_river}), Success);
+    const std::wstring renamed = m_bobsGit.File(L"stream.psd");
+    std::filesystem::rename(m_river, renamed);
+    ASSERT_EQ(m_bob.Add({renamed}), Success);
+    ASSERT_EQ(m_bob.CheckIn({m_river, renamed}, L"Renamed"), Success);
+    EXPECT_EQ(m_bob.client.lines, Texts());
+    EXPECT_EQ(Locks(), "");
+
+    ASSERT_EQ(m_bob.CheckOut({renamed}), Success);
+    EXPECT_TRUE(Locks().starts_with("O stream.psd"));
+    std::filesystem::remove(renamed);
+    ASSERT_EQ(m_bob.CheckIn({renamed}, L"Deleted"), Success);
+    EXPECT_EQ(m_bob.client.lines, Texts());
+    EXPECT_EQ(Locks(), "");
+}
+
+TEST_F(GitLocking, AFileWithoutACommitIsNotLocked)
+{
+    const std::wstring lake = m_bobsGit.Write(L"lake.psd", "1\n");
+    ASSERT_EQ(m_bob.Add({lake}), Success);
+    ASSERT_EQ(m_bob.CheckOut({lake}), Success) << testing::PrintToString(m_bob.client.lines);
+    EXPECT_EQ(Locks(), "");
+    EXPECT_EQ(m_bob.Query(lake), Edited);
+    ASSERT_EQ(m_bob.Undo({lake}), Success) << testing::PrintToString(m_bob.client.lines);
+    ASSERT_EQ(m_bob.Add({lake}), Success);
+    ASSERT_EQ(m_bob.CheckIn({lake}, L"A lake"), Success);
+    EXPECT_EQ(m_bob.client.lines, Texts());
+    ASSERT_EQ(m_bob.CheckOut({lake}), Success);
+    EXPECT_TRUE(Locks().starts_with("O lake.psd"));
+}
+
 TEST_F(GitLocking, AnUndoGivesTheLockOfAnUnchangedFileBack)
 {
     ASSERT_EQ(m_bob.CheckOut({m_river}), Success);
