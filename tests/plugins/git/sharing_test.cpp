@@ -1,5 +1,7 @@
 // Two users: a repository between them, and a server for locks.
 
+#include "GitLocks.h"
+#include "GitRunner.h"
 #include "GitTest.h"
 #include "GitText.h"
 #include "Handles.h"
@@ -10,6 +12,7 @@
 #include <algorithm>
 #include <chrono>
 #include <mutex>
+#include <stdexcept>
 #include <string>
 #include <thread>
 
@@ -168,13 +171,13 @@ TEST_F(GitSharing, ACheckInIsPushedWhenTheConfigurationSaysSo)
 TEST_F(GitSharing, APushThatHangsIsReportedAndTheCommitStays)
 {
     m_bobsGit({L"config", L"orvix.push", L"true"});
-    m_bobsGit({L"config", L"orvix.silentLimit", L"2"});
+    m_bobsGit({L"config", L"orvix.silentLimit", L"15"});
     AddHook(m_bobsGit, L"pre-push", "sleep 60\n");
     ASSERT_EQ(m_bob.Open(m_bobsGit.Folder()), Success);
     m_bobsGit.Write(L"town.txt", "2\n");
     EXPECT_EQ(m_bob.CheckIn({m_town}, L"Hangs"), Success) << "the commit is made";
     EXPECT_TRUE(m_bob.client.Shows(L"The commit is made, but it is not pushed:"));
-    EXPECT_TRUE(m_bob.client.Shows(L"git push printed nothing for 2 seconds and was ended"));
+    EXPECT_TRUE(m_bob.client.Shows(L"git push printed nothing for 15 seconds and was ended"));
     EXPECT_EQ(m_bobsGit({L"log", L"-1", L"--format=%s"}), "Hangs\n");
 }
 
@@ -215,7 +218,7 @@ public:
                 m_printed += bytes;
             });
         });
-        for (int i = 0; i < 200 && Lines().empty(); ++i)
+        for (int i = 0; i < 600 && Lines().empty(); ++i)
         {
             std::this_thread::sleep_for(50ms);
         }
@@ -224,7 +227,15 @@ public:
     LockServer& operator=(const LockServer&) = delete;
     ~LockServer() { SetEvent(m_cancel.get()); }
 
-    std::wstring Address(const wchar_t* user) const { return L"http://127.0.0.1:" + Lines().front() + L'/' + user; }
+    std::wstring Address(const wchar_t* user) const
+    {
+        const Texts lines = Lines();
+        if (lines.empty())
+        {
+            throw std::runtime_error("the server of the locks has not started");
+        }
+        return L"http://127.0.0.1:" + lines.front() + L'/' + user;
+    }
 
     /// How many requests a user has made.
     std::ptrdiff_t Requests(const std::wstring& user) const
@@ -403,6 +414,31 @@ TEST_F(GitLocking, QueriesDoNotAskTheServer)
     EXPECT_EQ(m_server.Requests(L"bob"), before);
     ASSERT_EQ(m_bob.Get({m_river}), Success);
     EXPECT_GT(m_server.Requests(L"bob"), before);
+}
+
+TEST_F(GitLocking, TheServerIsAskedInTheBackgroundAtMostOnceAMinute)
+{
+    AdaLocks();
+    GitRunner runner;
+    runner.SetUp(PlainGit::Program());
+    runner.SetFolder(m_bobsGit.Folder() + L'\\');
+    GitLocks locks;
+    locks.Reset(true);
+    const auto before = m_server.Requests(L"bob");
+    for (int i = 0; i < 600 && locks.Find("river.psd") == nullptr; ++i)
+    {
+        locks.RefreshInBackground(runner);
+        std::this_thread::sleep_for(50ms);
+    }
+    ASSERT_NE(locks.Find("river.psd"), nullptr);
+    EXPECT_FALSE(locks.Find("river.psd")->isOurs);
+    EXPECT_EQ(m_server.Requests(L"bob"), before + 1);
+    for (int i = 0; i < 20; ++i)
+    {
+        locks.RefreshInBackground(runner);
+        std::this_thread::sleep_for(50ms);
+    }
+    EXPECT_EQ(m_server.Requests(L"bob"), before + 1);
 }
 
 TEST_F(GitLocking, AServerThatIsGoneIsReportedByACheckOutAndDisturbsNothingElse)
