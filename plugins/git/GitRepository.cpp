@@ -217,21 +217,22 @@ std::vector<std::string> GitRepository::Spelled(const Paths& paths) const
 /// The same for files that were not seen yet, or may have been renamed since: to a name in another letter case.
 std::vector<std::string> GitRepository::SpelledNow(const Paths& paths)
 {
-    if (!m_snapshot)
+    bool isSeen = false;
+    if (m_snapshot)
+    {
+        m_runner.Work(L"Looking at the paths", [&] {
+            isSeen = std::all_of(paths.begin(), paths.end(), [&](const std::wstring& path) {
+                const std::optional<std::string> relative = Relative(path);
+                const GitSnapshot::Entry* known = relative ? m_snapshot->Find(*relative) : nullptr;
+                return known != nullptr && known->first == *relative;
+            });
+        });
+    }
+    if (!isSeen)
     {
         TakeSnapshot();
-        return Spelled(paths);
     }
-    std::vector<std::string> spelled = Spelled(paths);
-    for (std::size_t i = 0; i < paths.size(); ++i)
-    {
-        if (spelled[i] != Relative(paths[i]))
-        {
-            TakeSnapshot();
-            return Spelled(paths);
-        }
-    }
-    return spelled;
+    return Spelled(paths);
 }
 
 std::wstring GitRepository::Full(const std::string& path) const
@@ -665,15 +666,17 @@ void GitRepository::GetLatest(const Paths& paths)
     m_locks.Refresh(m_runner);
 }
 
-GitRepository::Lines GitRepository::History(const Paths& paths) const
+GitRepository::Lines GitRepository::History(const Paths& paths)
 {
+    const std::vector<std::string> files = SpelledNow(paths);
     Lines lines;
-    for (const std::wstring& path : paths)
+    for (std::size_t i = 0; i < paths.size(); ++i)
     {
+        const std::wstring& path = paths[i];
         const std::string printed =
             m_runner.RunOrThrow({.arguments = {L"log", L"--follow", L"--stdin", L"--no-show-signature", L"--date=iso",
                                                L"--format=%h  %ad  %an  %s"},
-                                 .input = "--\n" + std::string(LiteralPath) + Spelled(path) + '\n',
+                                 .input = "--\n" + std::string(LiteralPath) + files[i] + '\n',
                                  .isQuery = true,
                                  .task = L"Reading the history of " + path});
         const Lines versions = GitText::Lines(printed);

@@ -52,7 +52,7 @@ public:
     void CheckOut(const Paths& paths);
     void UndoCheckOut(const Paths& paths);
     void GetLatest(const Paths& paths);
-    Lines History(const Paths& paths) const;
+    Lines History(const Paths& paths);
     Lines Properties(const std::wstring& path);
 
     /// Starts the user's client program.

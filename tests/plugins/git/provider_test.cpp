@@ -343,6 +343,17 @@ TEST_F(GitProvider, AddsAFileInAnotherLetterCaseAtFirst)
     m_git.Write(L"sub/Readme.txt", "1\n");
     ASSERT_EQ(m_user.Add({m_git.File(L"SUB/README.TXT")}), Success) << testing::PrintToString(m_user.client.lines);
     EXPECT_EQ(m_git({L"ls-files"}), "sub/Readme.txt\n");
+    m_git.Write(L"sub/Later.txt", "1\n");
+    ASSERT_EQ(m_user.Add({m_git.File(L"sub/LATER.txt")}), Success) << testing::PrintToString(m_user.client.lines);
+    EXPECT_EQ(m_git({L"ls-files"}), "sub/Later.txt\nsub/Readme.txt\n");
+}
+
+TEST_F(GitProvider, ShowsTheHistoryOfAFileInAnotherLetterCaseAtFirst)
+{
+    m_git.Commit(L"Readme.txt", "1\n");
+    ASSERT_EQ(m_user.History({m_git.File(L"README.TXT")}), Success);
+    ASSERT_EQ(m_user.client.lines.size(), 2u);
+    EXPECT_TRUE(m_user.client.lines[1].ends_with(L"Ada  By hand"));
 }
 
 TEST_F(GitProvider, ChecksOutForThisSession)
