@@ -206,11 +206,13 @@ std::string GitRepository::Spelled(const std::wstring& path) const
 std::vector<std::string> GitRepository::Spelled(const Paths& paths) const
 {
     std::vector<std::string> spelled;
-    spelled.reserve(paths.size());
-    for (const std::wstring& path : paths)
-    {
-        spelled.push_back(Spelled(path));
-    }
+    m_runner.Work(L"Looking at the paths", [&] {
+        spelled.reserve(paths.size());
+        for (const std::wstring& path : paths)
+        {
+            spelled.push_back(Spelled(path));
+        }
+    });
     return spelled;
 }
 
@@ -258,7 +260,8 @@ void GitRepository::TakeSnapshot()
             throw GitFailure(GitRunner::Words(result));
         }
     }
-    m_snapshot = std::make_unique<GitSnapshot>(results[0].output, std::move(results[1].output));
+    m_runner.Work(L"Reading the state of the files",
+                  [&] { m_snapshot = std::make_unique<GitSnapshot>(results[0].output, std::move(results[1].output)); });
     if (m_snapshot->Status().behind > 0)
     {
         ProcessResult changes =
@@ -273,35 +276,40 @@ std::vector<GitFileState> GitRepository::Status(const Paths& paths)
 {
     m_locks.RefreshInBackground(m_runner);
     TakeSnapshot();
-    std::vector<GitFileState> states(paths.size());
-    for (std::size_t i = 0; i < paths.size(); ++i)
-    {
-        const std::optional<std::string> relative = Relative(paths[i]);
-        const GitSnapshot::Entry* entry = relative ? m_snapshot->Find(*relative) : nullptr;
-        if (entry == nullptr)
+    std::vector<GitFileState> states;
+    m_runner.Work(L"Reading the state of the files", [&] {
+        states.reserve(paths.size());
+        for (const std::wstring& path : paths)
         {
-            continue;
+            const std::optional<std::string> relative = Relative(path);
+            const GitSnapshot::Entry* entry = relative ? m_snapshot->Find(*relative) : nullptr;
+            states.push_back(entry != nullptr ? StateOf(*entry) : GitFileState());
         }
-        const auto& [path, item] = *entry;
-        const GitLocks::Lock* lock = m_locks.Find(path);
-        GitFileState& state = states[i];
-        state.isControlled = item.isTracked;
-        state.canAdd = !item.isTracked;
-        if (item.isTracked)
-        {
-            state.isDeleted = item.changed != nullptr && item.changed->IsDeleted();
-            state.isConflicted = item.changed != nullptr && item.changed->kind == GitStatus::File::Kind::Conflicted;
-            // What was added has no committed version that it could differ from.
-            const bool isAsAdded = item.changed != nullptr && !state.isConflicted && item.changed->IsAdded() &&
-                                   item.changed->onDisk != 'M';
-            state.isModified = item.changed != nullptr && !state.isDeleted && !isAsAdded;
-            state.isLockedByOther = lock != nullptr && !lock->isOurs;
-            state.isCheckedOut = item.changed != nullptr || (lock != nullptr && lock->isOurs) ||
-                                 m_checkedOut.contains(std::string(path));
-            state.isOutOfDate = m_snapshot->IsOutOfDate(path);
-        }
-    }
+    });
     return states;
+}
+
+GitFileState GitRepository::StateOf(const GitSnapshot::Entry& entry) const
+{
+    const auto& [path, item] = entry;
+    const GitLocks::Lock* lock = m_locks.Find(path);
+    GitFileState state;
+    state.isControlled = item.isTracked;
+    state.canAdd = !item.isTracked;
+    if (item.isTracked)
+    {
+        state.isDeleted = item.changed != nullptr && item.changed->IsDeleted();
+        state.isConflicted = item.changed != nullptr && item.changed->kind == GitStatus::File::Kind::Conflicted;
+        // What was added has no committed version that it could differ from.
+        const bool isAsAdded =
+            item.changed != nullptr && !state.isConflicted && item.changed->IsAdded() && item.changed->onDisk != 'M';
+        state.isModified = item.changed != nullptr && !state.isDeleted && !isAsAdded;
+        state.isLockedByOther = lock != nullptr && !lock->isOurs;
+        state.isCheckedOut =
+            item.changed != nullptr || (lock != nullptr && lock->isOurs) || m_checkedOut.contains(std::string(path));
+        state.isOutOfDate = m_snapshot->IsOutOfDate(path);
+    }
+    return state;
 }
 
 /// Runs a command that changes the repository. When it is ended in the middle, its lock files go.
@@ -314,7 +322,7 @@ ProcessResult GitRepository::Change(const GitCommand& command) const
     }
     catch (const GitFailure&)
     {
-        locks.DeleteNew();
+        m_runner.Work(command.task, [&] { locks.DeleteNew(); });
         throw;
     }
 }
@@ -525,7 +533,7 @@ void GitRepository::CheckOut(const Paths& paths)
         {
             const std::wstring full = Full(files[i]);
             if (SetFileAttributesW(LongForm(full).c_str(),
-                                   attributes[i] & ~static_cast<DWORD>(FILE_ATTRIBUTE_READONLY)))
+                                   attributes[i] & ~static_cast<DWORD>(FILE_ATTRIBUTE_READONLY)) != FALSE)
             {
                 m_checkedOut.insert(files[i]);
             }
@@ -589,23 +597,25 @@ void GitRepository::UndoCheckOut(const Paths& paths)
     std::vector<std::string> changed;
     std::vector<std::string> added;
     Lines failures;
-    for (const std::wstring& path : paths)
-    {
-        const std::string file = Spelled(path);
-        const GitSnapshot::Entry* entry = m_snapshot->Find(file);
-        if (entry == nullptr || !entry->second.isTracked)
+    m_runner.Work(L"Looking at the paths", [&] {
+        for (const std::wstring& path : paths)
         {
-            failures.push_back(path + NotControlled);
-            continue;
+            const std::string file = Spelled(path);
+            const GitSnapshot::Entry* entry = m_snapshot->Find(file);
+            if (entry == nullptr || !entry->second.isTracked)
+            {
+                failures.push_back(path + NotControlled);
+                continue;
+            }
+            files.push_back(file);
+            const GitStatus::File* change = entry->second.changed;
+            if (change != nullptr)
+            {
+                const bool isNew = change->kind == GitStatus::File::Kind::Changed && change->IsAdded();
+                (isNew ? added : changed).push_back(file);
+            }
         }
-        files.push_back(file);
-        const GitStatus::File* change = entry->second.changed;
-        if (change != nullptr)
-        {
-            const bool isNew = change->kind == GitStatus::File::Kind::Changed && change->IsAdded();
-            (isNew ? added : changed).push_back(file);
-        }
-    }
+    });
     if (!changed.empty())
     {
         ChangeOrThrow(OnPaths({L"restore", L"--progress", L"--source=HEAD", L"--staged", L"--worktree"}, changed,

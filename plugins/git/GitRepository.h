@@ -66,6 +66,7 @@ private:
     std::vector<std::string> SpelledNow(const Paths& paths);
     std::wstring Full(const std::string& path) const;
     void TakeSnapshot();
+    GitFileState StateOf(const GitSnapshot::Entry& entry) const;
     ProcessResult Change(const GitCommand& command) const;
     void ChangeOrThrow(const GitCommand& command) const;
     bool AddMany(const std::vector<std::string>& files) const;
