@@ -24,6 +24,8 @@ void LockFiles::DeleteNew() const noexcept
         DeleteIn(m_gitFolder, false);
         DeleteIn(m_commonFolder, false);
         DeleteIn(m_commonFolder + L"\\refs", true);
+        DeleteIn(m_commonFolder + L"\\objects", false);
+        DeleteIn(m_commonFolder + L"\\objects\\info", false);
     }
     catch (...)
     {

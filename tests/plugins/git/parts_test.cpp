@@ -221,6 +221,7 @@ TEST(LockFiles, DeletesThoseOfItsOwnCommand)
     const TempFolder folder;
     const std::wstring git = folder.Text();
     std::filesystem::create_directories(folder.Path() / L"refs" / L"heads");
+    std::filesystem::create_directories(folder.Path() / L"objects" / L"info");
     const auto write = [&](const wchar_t* file, std::chrono::hours age) {
         WriteBytes(folder.Path() / file, "");
         std::filesystem::last_write_time(folder.Path() / file, std::filesystem::file_time_type::clock::now() - age);
@@ -229,10 +230,14 @@ TEST(LockFiles, DeletesThoseOfItsOwnCommand)
     write(L"config.lock", 1h);
     write(L"index.lock", -1h);
     write(L"refs/heads/main.lock", -1h);
+    write(L"objects/maintenance.lock", -1h);
+    write(L"objects/info/commit-graph.lock", -1h);
     LockFiles(git, git, false).DeleteNew();
     EXPECT_TRUE(has(L"config.lock")) << "it is older";
     EXPECT_TRUE(has(L"index.lock")) << "the command does not write the index";
     EXPECT_FALSE(has(L"refs/heads/main.lock"));
+    EXPECT_FALSE(has(L"objects/maintenance.lock"));
+    EXPECT_FALSE(has(L"objects/info/commit-graph.lock"));
     LockFiles(git, git, true).DeleteNew();
     EXPECT_FALSE(has(L"index.lock"));
 }
