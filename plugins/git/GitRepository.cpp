@@ -128,10 +128,19 @@ void GitRepository::Open(const std::wstring& folder)
     m_runner.SetFolder(top + L'\\');
     const GitCommand commands[] = {
         {.arguments = {L"config", L"-z", L"--get-regexp", L"^orvix\\."}, .isQuery = true, .task = L"Opening " + top},
-        {.arguments = {L"ls-files", L"-z", L"--", L":(attr:lockable)"}, .isQuery = true}};
+        {.arguments = {L"ls-files", L"-z", L"--", L":(attr:lockable)"}, .isQuery = true},
+        {.arguments = {L"rev-parse", L"--show-cdup"}, .isQuery = true}};
     const std::vector<ProcessResult> results = m_runner.RunAll(commands);
+    if (!results[2].Succeeded() || results[2].output.find_first_not_of("\r\n") != std::string::npos)
+    {
+        throw GitFailure(start + L" is a link into a folder of a repository. Open that folder by its own path");
+    }
+    if (!results[1].Succeeded())
+    {
+        throw GitFailure(GitRunner::Words(results[1]));
+    }
     ReadConfiguration(results[0].output);
-    m_locks.Reset(results[1].Succeeded() && !results[1].output.empty());
+    m_locks.Reset(!results[1].output.empty());
     m_top = top;
     m_locks.Refresh(m_runner);
 }

@@ -138,6 +138,25 @@ TEST_F(GitProvider, SaysWhyAFolderCannotBeOpened)
     EXPECT_TRUE(m_user.client.Shows(L"empty or too long"));
 }
 
+TEST_F(GitProvider, RefusesALinkIntoAFolderOfARepository)
+{
+    m_git.Commit(L"sub/a.txt", "1\n");
+    std::filesystem::create_directory(m_git.Folder() + L"\\other");
+    std::filesystem::create_directory(m_folder.Text() + L"\\plain");
+    m_git({L"-c",
+           L"alias.link=!export MSYS=winsymlinks:nativestrict; ln -s ../sub other/link && "
+           L"ln -s '../my town/sub' ../plain/link",
+           L"link"});
+    for (const std::wstring& folder : {m_git.Folder() + L"\\other\\link", m_folder.Text() + L"\\plain\\link"})
+    {
+        m_user.client.lines.clear();
+        EXPECT_EQ(m_user.Open(folder), Failure);
+        EXPECT_FALSE(m_user.Provider().IsProjectOpen());
+        EXPECT_TRUE(m_user.client.Shows(L"is a link into a folder of a repository"))
+            << testing::PrintToString(m_user.client.lines);
+    }
+}
+
 TEST_F(GitProvider, PassesOnWhatGitSaysOfAForeignOwner)
 {
     SetEnvironmentVariableW(L"GIT_TEST_ASSUME_DIFFERENT_OWNER", L"1");
