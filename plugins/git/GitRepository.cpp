@@ -52,13 +52,15 @@ public:
         : m_name(L"ORVIX_COMMENT_" + std::to_wstring(GetCurrentProcessId())), m_path(LongForm(folder + L'\\' + m_name))
     {
         const std::string bytes = GitText::ToUtf8(text);
-        const OwnedHandle file = OwnFile(
+        OwnedHandle file = OwnFile(
             CreateFileW(m_path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
         DWORD written = 0;
         if (!file || !WriteFile(file.get(), bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) ||
             written != bytes.size())
         {
             const DWORD error = GetLastError();
+            file.reset();
+            DeleteFileW(m_path.c_str());
             throw GitFailure(L"The comment cannot be written to " + folder + L": " + GitText::SystemMessage(error));
         }
     }

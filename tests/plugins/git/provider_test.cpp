@@ -5,6 +5,8 @@
 #include <windows.h>
 
 #include <algorithm>
+#include <cstdlib>
+#include <filesystem>
 
 namespace
 {
@@ -514,6 +516,46 @@ TEST_F(GitProvider, OffersNoOptionsAndStartsTheUsersClient)
     m_git({L"config", L"orvix.client", GIT_PROBE});
     ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
     EXPECT_EQ(m_user.Provider().RunProviderClient(), Success);
+}
+
+TEST_F(GitProvider, SaysTheStateOf100000Files)
+{
+    constexpr int Count = 100000;
+    const std::string blob = m_git({L"hash-object", L"-w", L"--stdin"}, "1\n").substr(0, 40);
+    std::string index;
+    Texts files;
+    for (int i = 0; i < Count; ++i)
+    {
+        const std::string name = std::to_string(i / 1000) + "/[" + std::to_string(i) + "].txt";
+        index.append("100644 ").append(blob).append("\t").append(name).append("\n");
+        files.push_back(m_git.File(std::wstring(name.begin(), name.end())));
+    }
+    m_git({L"update-index", L"--index-info"}, index);
+    files.push_back(m_git.Write(L"other.txt", "1\n"));
+    std::vector<unsigned long> expected(Count, Deleted);
+    expected.push_back(CanAdd);
+    EXPECT_EQ(m_user.Query(files), expected);
+}
+
+TEST_F(GitProvider, LeavesNoCommentOnAFullDrive)
+{
+    const wchar_t* drive = _wgetenv(L"ORVIX_SMALL_DRIVE");
+    if (drive == nullptr)
+    {
+        GTEST_SKIP() << "no small drive";
+    }
+    const std::filesystem::path folder = std::filesystem::path(drive) / L"town";
+    const PlainGit parent(drive);
+    parent({L"init", L"--quiet", L"--template=", L"town"});
+    const PlainGit town(folder.wstring());
+    const std::wstring file = town.Write(L"a.txt", "1\n");
+    EXPECT_EQ(m_user.Open(town.Folder()), Success);
+    EXPECT_EQ(m_user.Add({file}), Success);
+    EXPECT_EQ(m_user.CheckIn({file}, std::wstring(200000, L'x').c_str()), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"The comment cannot be written to"))
+        << testing::PrintToString(m_user.client.lines);
+    EXPECT_FALSE(town.Has(L".git/ORVIX_COMMENT_" + std::to_wstring(GetCurrentProcessId())));
+    parent({L"-c", L"alias.clear=!rm -rf town", L"clear"}); // read-only files, too
 }
 
 TEST_F(GitProvider, EndsACommandThatIsSilentForTooLong)
