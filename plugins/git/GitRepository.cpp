@@ -760,6 +760,6 @@ void GitRepository::RunClient() const
     }
     m_runner.Work(L"Starting " + program, [&] {
         Process::StartAlone(program, isGui ? std::vector<std::wstring>{L"gui"} : std::vector<std::wstring>{},
-                            m_top + L'\\');
+                            m_top + L'\\', GitRunner::NoRepository());
     });
 }

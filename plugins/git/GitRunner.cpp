@@ -28,14 +28,8 @@ std::vector<ProcessCommand::Variable> Environment(const GitCommand& command, boo
         // Never the terminal, which nobody sees.
         {L"SSH_ASKPASS_REQUIRE", L"force"},
     };
-    // A host that Git itself has started would otherwise work on that repository.
-    for (const wchar_t* name :
-         {L"GIT_DIR", L"GIT_WORK_TREE", L"GIT_INDEX_FILE", L"GIT_OBJECT_DIRECTORY", L"GIT_ALTERNATE_OBJECT_DIRECTORIES",
-          L"GIT_COMMON_DIR", L"GIT_NAMESPACE", L"GIT_PREFIX", L"GIT_LITERAL_PATHSPECS", L"GIT_GLOB_PATHSPECS",
-          L"GIT_NOGLOB_PATHSPECS", L"GIT_ICASE_PATHSPECS"})
-    {
-        variables.emplace_back(name, std::nullopt);
-    }
+    const std::vector<ProcessCommand::Variable> removed = GitRunner::NoRepository();
+    variables.insert(variables.end(), removed.begin(), removed.end());
     if (unattended)
     {
         variables.emplace_back(L"GIT_ASKPASS", std::nullopt);
@@ -144,6 +138,19 @@ void GitRunner::SetUp(std::wstring program)
     m_program = std::move(program);
     m_silence = DefaultSilence;
     m_folder.clear();
+}
+
+std::vector<ProcessCommand::Variable> GitRunner::NoRepository()
+{
+    std::vector<ProcessCommand::Variable> variables;
+    for (const wchar_t* name :
+         {L"GIT_DIR", L"GIT_WORK_TREE", L"GIT_INDEX_FILE", L"GIT_OBJECT_DIRECTORY", L"GIT_ALTERNATE_OBJECT_DIRECTORIES",
+          L"GIT_COMMON_DIR", L"GIT_NAMESPACE", L"GIT_PREFIX", L"GIT_LITERAL_PATHSPECS", L"GIT_GLOB_PATHSPECS",
+          L"GIT_NOGLOB_PATHSPECS", L"GIT_ICASE_PATHSPECS"})
+    {
+        variables.emplace_back(name, std::nullopt);
+    }
+    return variables;
 }
 
 ProcessCommand GitRunner::MakeProcess(const GitCommand& command) const

@@ -75,6 +75,10 @@ public:
     /// How a command is started.
     ProcessCommand MakeProcess(const GitCommand& command) const;
 
+    /// The variables of the host's environment that name a repository, each without a value. A host that Git itself has
+    /// started has them; a program for another repository must not.
+    static std::vector<ProcessCommand::Variable> NoRepository();
+
     /// Git's words about a command that has failed.
     static std::vector<std::wstring> Words(const ProcessResult& result);
 

@@ -544,14 +544,16 @@ ProcessResult Process::Run(ProcessCommand command, HANDLE cancel, Listener liste
 }
 
 void Process::StartAlone(const std::wstring& program, const std::vector<std::wstring>& arguments,
-                         const std::wstring& folder)
+                         const std::wstring& folder, const std::vector<ProcessCommand::Variable>& environment)
 {
     STARTUPINFOW startup{};
     startup.cb = sizeof startup;
     std::wstring line = MakeCommandLine(program, arguments);
+    std::vector<wchar_t> variables = MakeEnvironment(environment);
     PROCESS_INFORMATION information{};
-    if (!CreateProcessW(program.c_str(), line.data(), nullptr, nullptr, FALSE, CREATE_NO_WINDOW, nullptr,
-                        folder.c_str(), &startup, &information))
+    if (!CreateProcessW(program.c_str(), line.data(), nullptr, nullptr, FALSE,
+                        CREATE_NO_WINDOW | CREATE_UNICODE_ENVIRONMENT, variables.data(), folder.c_str(), &startup,
+                        &information))
     {
         ThrowLastError(program + L" cannot be started");
     }

@@ -76,9 +76,9 @@ public:
     static ProcessResult Run(ProcessCommand command, HANDLE cancel, Listener listener = {});
 
     /// Starts a program that lives on by itself, with windows of its own. Throws `GitFailure` when it cannot be started
-    /// and when it fails at once.
+    /// and when it fails at once. `environment` is what differs from the environment of this process.
     static void StartAlone(const std::wstring& program, const std::vector<std::wstring>& arguments,
-                           const std::wstring& folder);
+                           const std::wstring& folder, const std::vector<ProcessCommand::Variable>& environment);
 
 private:
     class Running;

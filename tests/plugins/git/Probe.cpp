@@ -37,6 +37,23 @@ void Flood()
     }
 }
 
+std::wstring ValueOf(const wchar_t* variable)
+{
+    wchar_t value[256] = L"";
+    GetEnvironmentVariableW(variable, value, 256);
+    return value;
+}
+
+/// Writes the value of a variable to a file.
+void Save(const wchar_t* variable, const wchar_t* file)
+{
+    if (std::FILE* stream = _wfopen(file, L"wb"))
+    {
+        Print(stream, ValueOf(variable));
+        std::fclose(stream);
+    }
+}
+
 /// Starts this program anew and waits for it.
 void Nest(const wchar_t* program)
 {
@@ -67,9 +84,11 @@ int wmain(int count, wchar_t** arguments)
     }
     else if (task == L"variable")
     {
-        wchar_t value[256] = L"";
-        GetEnvironmentVariableW(arguments[2], value, 256);
-        Print(stdout, value);
+        Print(stdout, ValueOf(arguments[2]));
+    }
+    else if (task == L"save")
+    {
+        Save(arguments[2], arguments[3]);
     }
     else if (task == L"flood")
     {

@@ -18,10 +18,14 @@
 
 #include <shellapi.h>
 
+#include <algorithm>
 #include <chrono>
 #include <cstdlib>
 #include <filesystem>
+#include <iterator>
+#include <optional>
 #include <string>
+#include <thread>
 #include <vector>
 
 namespace
@@ -153,6 +157,69 @@ TEST(ChildProcess, HasTheEnvironmentWithTheChanges)
     EXPECT_EQ(valueOf(L"ORVIX_TEST_KEPT"), "kept\0"s);
     EXPECT_EQ(valueOf(L"ORVIX_TEST_REMOVED"), "\0"s);
     EXPECT_EQ(valueOf(L"ORVIX_TEST_SET"), "\xC3\xA9=1\0"s);
+}
+
+TEST(ChildProcess, ThatLivesOnHasTheEnvironmentWithTheChanges)
+{
+    SetEnvironmentVariableW(L"GIT_DIR", L"C:\\elsewhere");
+    SetEnvironmentVariableW(L"ORVIX_TEST_KEPT", L"kept");
+    const TempFolder folder;
+    const auto valueOf = [&](const wchar_t* name) {
+        const std::filesystem::path file = folder.Path() / name;
+        Process::StartAlone(GIT_PROBE, {L"save", name, file.wstring()}, folder.Text(), GitRunner::NoRepository());
+        for (int i = 0; i < 600 && ReadBytes(file).empty(); ++i)
+        {
+            std::this_thread::sleep_for(50ms);
+        }
+        return ReadBytes(file);
+    };
+    EXPECT_EQ(valueOf(L"ORVIX_TEST_KEPT"), "kept\0"s);
+    EXPECT_EQ(valueOf(L"GIT_DIR"), "\0"s);
+    SetEnvironmentVariableW(L"GIT_DIR", nullptr);
+}
+
+TEST(GitRunner, FixesWhatGitReadsFromTheEnvironmentAndTheConfiguration)
+{
+    using Variable = ProcessCommand::Variable;
+    GitRunner runner;
+    const auto has = [](const ProcessCommand& process, const Variable& variable) {
+        return std::count(process.environment.begin(), process.environment.end(), variable) == 1;
+    };
+    const auto sets = [](const ProcessCommand& process, const wchar_t* setting) {
+        const auto found = std::find(process.arguments.begin(), process.arguments.end(), setting);
+        return found != process.arguments.end() && found != process.arguments.begin() && *std::prev(found) == L"-c";
+    };
+    const Variable always[] = {{L"LC_ALL", L"C"},
+                               {L"GIT_TERMINAL_PROMPT", L"0"},
+                               {L"GIT_PAGER", L"cat"},
+                               {L"GIT_EDITOR", L":"},
+                               {L"SSH_ASKPASS_REQUIRE", L"force"},
+                               {L"GIT_DIR", std::nullopt},
+                               {L"GIT_LITERAL_PATHSPECS", std::nullopt}};
+    const Variable alone[] = {
+        {L"GIT_ASKPASS", std::nullopt}, {L"SSH_ASKPASS", std::nullopt}, {L"GCM_INTERACTIVE", L"never"}};
+    for (const bool unattended : {false, true})
+    {
+        runner.SetWindow(nullptr, unattended);
+        const ProcessCommand process =
+            runner.MakeProcess({.arguments = {L"status"}, .isQuery = true, .settings = {L"a.b=c"}});
+        for (const Variable& variable : always)
+        {
+            EXPECT_TRUE(has(process, variable)) << GitText::ToUtf8(variable.first);
+        }
+        for (const Variable& variable : alone)
+        {
+            EXPECT_EQ(has(process, variable), unattended) << GitText::ToUtf8(variable.first);
+        }
+        EXPECT_TRUE(has(process, {L"GIT_OPTIONAL_LOCKS", L"0"}));
+        EXPECT_TRUE(has(runner.MakeProcess({.arguments = {L"add"}}), {L"GIT_OPTIONAL_LOCKS", L"1"}));
+        EXPECT_TRUE(sets(process, L"color.ui=false"));
+        EXPECT_TRUE(sets(process, L"core.longpaths=true"));
+        EXPECT_TRUE(sets(process, L"core.quotePath=false"));
+        EXPECT_TRUE(sets(process, L"a.b=c"));
+        EXPECT_EQ(sets(process, L"core.askPass="), unattended);
+        EXPECT_EQ(process.arguments.back(), L"status");
+    }
 }
 
 TEST(ChildProcess, TellsTheListenerWhatComesWhileItComes)
