@@ -2,6 +2,7 @@
 
 #include "GitFailure.h"
 #include "GitProgram.h"
+#include "GitText.h"
 #include "IOrvixClientAccess.h"
 #include "OrvixClientInfo.h"
 #include "OrvixFileEntry.h"
@@ -11,7 +12,7 @@
 #include "OrvixProviderSettings.h"
 #include "OrvixWaitingWindow.h"
 
-#include <algorithm>
+#include <exception>
 #include <filesystem>
 
 namespace
@@ -75,6 +76,10 @@ int GitProvider::Run(Work work)
         catch (const GitFailure& failure)
         {
             lines = failure.lines;
+        }
+        catch (const std::exception& e)
+        {
+            lines = {GitText::FromUtf8(e.what())};
         }
         catch (...)
         {
