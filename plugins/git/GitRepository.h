@@ -38,9 +38,6 @@ public:
     void Close();
     bool IsOpen() const { return !m_top.empty(); }
 
-    /// The top folder of the working folder.
-    const std::wstring& Top() const { return m_top; }
-
     std::vector<GitFileState> Status(const Paths& paths);
     void Add(const Paths& paths);
 

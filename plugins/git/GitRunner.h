@@ -13,7 +13,7 @@
 
 class OrvixWaitingWindow;
 
-/// Stands before a path in Git's input: the path is a name, not a pattern. The variable GIT_LITERAL_PATHSPECS says the
+/// Comes before a path in Git's input: the path is a name, not a pattern. The variable GIT_LITERAL_PATHSPECS says the
 /// same of all paths, but hooks inherit it, and their own patterns would find nothing.
 inline constexpr std::string_view LiteralPath = ":(literal)";
 

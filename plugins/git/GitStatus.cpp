@@ -38,11 +38,7 @@ int Number(std::string_view text)
 
 void ReadHeader(std::string_view header, GitStatus& status)
 {
-    if (Take(header, "oid "))
-    {
-        status.hasCommits = header != "(initial)";
-    }
-    else if (Take(header, "head "))
+    if (Take(header, "head "))
     {
         status.branch = GitText::FromUtf8(header);
     }

@@ -28,7 +28,6 @@ struct GitStatus
 
     std::wstring branch;   ///< "(detached)" when there is none
     std::wstring upstream; ///< such as "origin/main"; empty when there is none
-    bool hasCommits = false;
     int ahead = 0;
     int behind = 0;
     std::vector<File> files;

@@ -7,7 +7,9 @@
 
 #include <windows.h>
 
+#include <algorithm>
 #include <chrono>
+#include <stdexcept>
 
 namespace
 {
