@@ -110,6 +110,19 @@ struct Shown
         const std::vector<HWND> labels = Children(WC_STATICW);
         return std::any_of(labels.begin(), labels.end(), [&](HWND label) { return TextOf(label) == text; });
     }
+    /// The time that has passed, such as "0:01".
+    std::wstring Time() const
+    {
+        for (HWND label : Children(WC_STATICW))
+        {
+            const std::wstring text = TextOf(label);
+            if (text.size() >= 4 && text[text.size() - 3] == L':')
+            {
+                return text;
+            }
+        }
+        return {};
+    }
     HWND Button() const { return FindWindowExW(window, nullptr, WC_BUTTONW, nullptr); }
     HWND Bar() const { return FindWindowExW(window, nullptr, PROGRESS_CLASSW, nullptr); }
 };
@@ -128,6 +141,12 @@ Shown Find(const wchar_t* title, milliseconds patience = milliseconds(5000))
         std::this_thread::sleep_for(milliseconds(10));
     } while (std::chrono::steady_clock::now() < end);
     return {};
+}
+
+/// Whether a wait that has begun then shows no window yet. On a busy machine a look may come too late.
+bool IsEarly(std::chrono::steady_clock::time_point begin)
+{
+    return std::chrono::steady_clock::now() - begin < milliseconds(450);
 }
 
 /// A host that waits for work on another thread.
@@ -184,12 +203,26 @@ protected:
 TEST_F(Waiting, ShowsNoWindowInTheFirstHalfSecond)
 {
     const HostWindow host;
-    EXPECT_EQ(Wait(host.Get(),
-                   [&](OrvixWaitingWindow&) {
-                       EXPECT_EQ(Find(Title, milliseconds(250)).window, nullptr);
-                       EXPECT_TRUE(IsWindowEnabled(host.Get()));
-                   }),
-              Result::Done);
+    bool isInTime = false;
+    for (int attempt = 0; attempt < 10 && !isInTime; ++attempt)
+    {
+        const auto begin = std::chrono::steady_clock::now();
+        bool isShown = true;
+        bool isEnabled = false;
+        EXPECT_EQ(Wait(host.Get(),
+                       [&](OrvixWaitingWindow&) {
+                           isShown = Find(Title, milliseconds(250)).window != nullptr;
+                           isEnabled = IsWindowEnabled(host.Get()) != FALSE;
+                           isInTime = IsEarly(begin);
+                       }),
+                  Result::Done);
+        if (isInTime)
+        {
+            EXPECT_FALSE(isShown);
+            EXPECT_TRUE(isEnabled);
+        }
+    }
+    EXPECT_TRUE(isInTime);
 }
 
 TEST_F(Waiting, ThenShowsTaskProgressAndTimeAndDisablesTheHost)
@@ -214,7 +247,8 @@ TEST_F(Waiting, ThenShowsTaskProgressAndTimeAndDisablesTheHost)
         window.SetProgress(L"Resolving", -1);
         std::this_thread::sleep_for(milliseconds(1200));
         EXPECT_TRUE(shown.Says(L"Resolving"));
-        EXPECT_TRUE(shown.Says(L"0:01") || shown.Says(L"0:02"));
+        const std::wstring time = shown.Time();
+        EXPECT_TRUE(!time.empty() && time != L"0:00") << "more than a second has passed";
     });
     EXPECT_EQ(FindWindowW(nullptr, Title), nullptr);
     EXPECT_TRUE(IsWindowEnabled(host.Get()));
@@ -330,17 +364,26 @@ TEST_F(Waiting, DropsWhatTheUserTypesWhileTheWindowIsShown)
         SendInput(2, keys, sizeof keys[0]);
         std::this_thread::sleep_for(milliseconds(100));
     };
-    Wait(host.Get(), [&](OrvixWaitingWindow&) { type(); });
-    EXPECT_EQ(host.keys, 0);
-    HostWindow::Handle();
-    EXPECT_EQ(host.keys, 1) << "typed in the first half second";
+    bool isInTime = false;
+    for (int attempt = 0; attempt < 10 && !isInTime; ++attempt)
+    {
+        const auto begin = std::chrono::steady_clock::now();
+        host.keys = 0;
+        Wait(host.Get(), [&](OrvixWaitingWindow&) { type(); });
+        isInTime = IsEarly(begin);
+        EXPECT_EQ(host.keys, 0);
+        HostWindow::Handle();
+        EXPECT_TRUE(host.keys == 1 || !isInTime) << "typed in the first half second";
+    }
+    EXPECT_TRUE(isInTime);
 
+    host.keys = 0;
     Wait(host.Get(), [&](OrvixWaitingWindow&) {
         Find(Title);
         type();
     });
     HostWindow::Handle();
-    EXPECT_EQ(host.keys, 1);
+    EXPECT_EQ(host.keys, 0);
     EXPECT_EQ(GetFocus(), host.Get());
 }
 

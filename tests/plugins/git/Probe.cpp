@@ -104,7 +104,7 @@ int wmain(int count, wchar_t** arguments)
     }
     else if (task == L"talk")
     {
-        for (int i = 0; i < 8; ++i)
+        for (int i = 0; i < 20; ++i)
         {
             Sleep(250);
             std::printf(".");

@@ -23,7 +23,6 @@ namespace
 {
 
 using namespace std::chrono_literals;
-using Clock = std::chrono::steady_clock;
 
 constexpr UINT CallProvider = WM_APP + 1;
 constexpr int ManyFiles = 20000;
@@ -215,17 +214,32 @@ protected:
 
 TEST_F(GitWindow, PaintsTheHostAndShowsProgressWhileManyFilesAreAdded)
 {
-    const Texts files = MakeManyFiles();
-    Watcher watcher(m_host, Never);
-    const int result = m_user.Add(files);
-    watcher.Stop();
-    EXPECT_EQ(result, Success) << testing::PrintToString(m_user.client.lines);
-    EXPECT_TRUE(watcher.sawWindow);
-    EXPECT_TRUE(watcher.hostWasDisabled);
-    EXPECT_TRUE(IsWindowEnabled(m_host.Get()));
-    EXPECT_EQ(FindWaitingWindow(), nullptr);
-    EXPECT_GT(watcher.progress.size(), 2u);
-    EXPECT_GT(m_host.painting.Count(), 10u);
+    OrvixFileList list;
+    for (const std::wstring& file : MakeManyFiles())
+    {
+        list.AddActiveEntry(list.CreateEntry(file.c_str(), nullptr, 0, 0));
+    }
+    long long shortest = std::numeric_limits<long long>::max();
+    for (int attempt = 0; attempt < 5 && shortest > 100; ++attempt) // a busy machine may stop every program for a while
+    {
+        if (attempt > 0)
+        {
+            m_git({L"reset", L"--quiet"});
+        }
+        m_host.painting.Restart();
+        Watcher watcher(m_host, Never);
+        const int result = m_user.Provider().Add(&list, L"", 0);
+        watcher.Stop();
+        EXPECT_EQ(result, Success) << testing::PrintToString(m_user.client.lines);
+        EXPECT_TRUE(watcher.sawWindow);
+        EXPECT_TRUE(watcher.hostWasDisabled);
+        EXPECT_TRUE(IsWindowEnabled(m_host.Get()));
+        EXPECT_EQ(FindWaitingWindow(), nullptr);
+        EXPECT_GT(watcher.progress.size(), 2u);
+        EXPECT_GT(m_host.painting.Count(), 10u);
+        shortest = std::min(shortest, m_host.painting.LongestMilliseconds());
+    }
+    EXPECT_LE(shortest, 100);
 }
 
 TEST_F(GitWindow, PaintsTheHostWithoutAGap)
@@ -265,12 +279,12 @@ TEST_F(GitWindow, CancelsInTheMiddleOfAdding)
 TEST_F(GitWindow, CancelsASlowHookTogetherWithWhatItHasStarted)
 {
     const std::wstring file = m_git.Write(L"first.txt", "2\n");
-    AddHook(m_git, L"pre-commit", "sleep 30\necho late > late.txt\n");
-    Watcher watcher(m_host, [](HWND) { return true; });
-    const auto begin = Clock::now();
+    AddHook(m_git, L"pre-commit", "echo on > .git/started\nsleep 8\necho late > .git/late\n");
+    Watcher watcher(m_host, [&](HWND) { return m_git.Has(L".git/started"); });
     EXPECT_EQ(m_user.CheckIn({file}, L"Never"), Failure);
-    EXPECT_LT(Clock::now() - begin, 25s);
     watcher.Stop();
+    std::this_thread::sleep_for(10s); // longer than the hook, were it alive
+    EXPECT_FALSE(m_git.Has(L".git/late"));
     EXPECT_EQ(m_user.client.lines, Texts{L"cancelled"});
     EXPECT_FALSE(HasLockFiles());
     EXPECT_EQ(m_git({L"log", L"--format=%s"}), "By hand\n");
