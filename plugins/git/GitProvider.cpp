@@ -254,6 +254,21 @@ int GitProvider::QueryStatus(OrvixFileList* list, unsigned long)
     });
 }
 
+int GitProvider::NameKnownFiles(const wchar_t* folder, OrvixKnownFileCallback callback, void* callerData)
+{
+    if (folder == nullptr || callback == nullptr || !IsProjectOpen())
+    {
+        return Failure;
+    }
+    return Run([&] {
+        for (const std::wstring& file : m_repository.Files(folder))
+        {
+            callback(callerData, file.c_str());
+        }
+        return Lines();
+    });
+}
+
 int GitProvider::RunProviderClient()
 {
     if (!IsProjectOpen())

@@ -2,6 +2,7 @@
 
 #include "GitRepository.h"
 #include "GitRunner.h"
+#include "OrvixKnownFiles.h"
 #include "OrvixProviderBase.h"
 
 #include <string>
@@ -44,6 +45,9 @@ public:
     int ShowProperties(OrvixFileList* list) override;
     int QueryStatus(OrvixFileList* list, unsigned long options) override;
     int RunProviderClient() override;
+
+    /// Names the files of a folder, see `OrvixKnownFilesFunction`.
+    int NameKnownFiles(const wchar_t* folder, OrvixKnownFileCallback callback, void* callerData);
 
 private:
     using Paths = GitRepository::Paths;

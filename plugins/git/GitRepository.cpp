@@ -323,6 +323,38 @@ GitFileState GitRepository::StateOf(const GitSnapshot::Entry& entry) const
     return state;
 }
 
+GitRepository::Paths GitRepository::Files(const std::wstring& folder) const
+{
+    const std::optional<std::string> relative = Relative(folder);
+    if (!relative && GitText::Fold(FullPath(folder)) != GitText::Fold(m_top))
+    {
+        throw GitFailure(folder + L" is not in the folder of the repository, " + m_top);
+    }
+    const std::wstring inside = relative ? GitText::Fold(GitText::FromUtf8(*relative + '/')) : L"";
+    const std::wstring above = folder.substr(0, folder.find_last_not_of(L"\\/") + 1) + L'\\';
+    const std::string listed = m_runner.RunOrThrow(
+        {.arguments = {L"ls-files", L"-z", L"-t", L"--stage"}, .isQuery = true, .task = L"Listing the files"});
+    Paths files;
+    std::string_view last;
+    for (const std::string_view entry : GitText::Split(listed, '\0')) // "TAG MODE OBJECT STAGE<tab>PATH"
+    {
+        constexpr std::string_view LeftOutTag = "S "; // by a sparse checkout
+        constexpr std::string_view SubmoduleMode = "160000 ";
+        const std::string_view path = entry.substr(entry.find('\t') + 1);
+        std::wstring name = GitText::FromUtf8(path);
+        const bool isFile =
+            !entry.starts_with(LeftOutTag) && !entry.substr(LeftOutTag.size()).starts_with(SubmoduleMode);
+        const bool isAgain = path == last; // a conflicted file has several stages
+        last = path;
+        if (isFile && !isAgain && GitText::Fold(name).starts_with(inside))
+        {
+            std::replace(name.begin(), name.end(), L'/', L'\\');
+            files.push_back(above + name.substr(inside.size()));
+        }
+    }
+    return files;
+}
+
 /// Runs a command that changes the repository. When it is ended in the middle, its lock files go.
 ProcessResult GitRepository::Change(const GitCommand& command) const
 {

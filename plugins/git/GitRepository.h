@@ -39,6 +39,11 @@ public:
     bool IsOpen() const { return !m_top.empty(); }
 
     std::vector<GitFileState> Status(const Paths& paths);
+
+    /// The controlled files in a folder and below, on the disk or not, with the folder's path as it is given. Without
+    /// submodules, and without the files that a sparse checkout leaves out of the working folder.
+    Paths Files(const std::wstring& folder) const;
+
     void Add(const Paths& paths);
 
     /// Commits the files, whatever else is staged. Returns what the user is to know although it has succeeded, such as

@@ -199,6 +199,23 @@ int ArchiveProvider::QueryStatus(OrvixFileList* list, unsigned long)
     });
 }
 
+int ArchiveProvider::NameKnownFiles(const wchar_t* folder, OrvixKnownFileCallback callback, void* callerData)
+{
+    return Guarded(Failure, [&] {
+        if (folder == nullptr || callback == nullptr)
+        {
+            return Failure;
+        }
+        Paths files;
+        const int result = Report(m_store.List(folder, true, files));
+        for (const std::wstring& file : files)
+        {
+            callback(callerData, file.c_str());
+        }
+        return result;
+    });
+}
+
 /// Shows the failures and returns the result of the operation.
 int ArchiveProvider::Report(const ArchiveFailures& failures)
 {

@@ -2,6 +2,7 @@
 
 #include "ArchiveReport.h"
 #include "ArchiveStore.h"
+#include "OrvixKnownFiles.h"
 #include "OrvixProviderBase.h"
 
 #include <string>
@@ -41,6 +42,9 @@ public:
 
     /// The archive's own files are not controlled and, unlike others, cannot be added.
     int QueryStatus(OrvixFileList* list, unsigned long options) override;
+
+    /// Names the files of a folder, see `OrvixKnownFilesFunction`.
+    int NameKnownFiles(const wchar_t* folder, OrvixKnownFileCallback callback, void* callerData);
 
 private:
     using Paths = std::vector<std::wstring>;

@@ -1,6 +1,7 @@
-// The four functions of the plug-in contract; archive.def exports them under their plain names.
+// The functions of the plug-in contract; archive.def exports them under their plain names.
 
 #include "ArchiveProvider.h"
+#include "OrvixKnownFiles.h"
 #include "OrvixVersion.h"
 
 #include <cstdint>
@@ -46,4 +47,12 @@ extern "C" void ReleaseIOrvixProvider(IOrvixProvider* provider)
     {
         theProvider.reset();
     }
+}
+
+/// As `OrvixKnownFilesFunction` describes.
+extern "C" int GetOrvixKnownFiles(IOrvixProvider* provider, const wchar_t* folder, OrvixKnownFileCallback callback,
+                                  void* callerData)
+{
+    const bool isOurs = provider != nullptr && provider == theProvider.get();
+    return isOurs ? theProvider->NameKnownFiles(folder, callback, callerData) : OrvixProviderResult::Failure;
 }

@@ -9,6 +9,7 @@
 #include "OrvixFileEntry.h"
 #include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
+#include "OrvixKnownFiles.h"
 #include "OrvixProviderOption.h"
 #include "OrvixProviderResult.h"
 #include "OrvixVersion.h"
@@ -17,6 +18,7 @@
 
 #include <windows.h>
 
+#include <algorithm>
 #include <cstring>
 #include <memory>
 #include <string>
@@ -45,6 +47,7 @@ struct Plugin
     IOrvixProvider* (*get)() = library.Export<IOrvixProvider*()>("GetIOrvixProvider");
     void (*release)(IOrvixProvider*) = library.Export<void(IOrvixProvider*)>("ReleaseIOrvixProvider");
     const wchar_t* (*name)() = library.Export<const wchar_t*()>("GetOrvixProviderName");
+    OrvixKnownFilesFunction* knownFiles = library.Export<OrvixKnownFilesFunction>("GetOrvixKnownFiles");
 };
 
 /// A host that records the lines of output.
@@ -125,6 +128,20 @@ public:
         return files.Flags(0);
     }
 
+    /// The files that the provider names in a folder, sorted.
+    int Names(const std::wstring& folder, std::vector<std::wstring>& files) const
+    {
+        files.clear();
+        constexpr auto add = [](void* data, const wchar_t* path) {
+            static_cast<std::vector<std::wstring>*>(data)->emplace_back(path);
+        };
+        const int result = m_plugin.knownFiles(provider, folder.c_str(), add, &files);
+        std::sort(files.begin(), files.end());
+        return result;
+    }
+
+    const Plugin& Library() const { return m_plugin; }
+
     Client client;
     IOrvixProvider* provider = nullptr;
 
@@ -178,13 +195,14 @@ protected:
 
 // The contract
 
-TEST(ArchivePluginContract, ExportsItsFourFunctionsAndNothingElse)
+TEST(ArchivePluginContract, ExportsItsFunctionsAndNothingElse)
 {
     const Plugin plugin(BuiltFile(L"plugins/archive.dll").c_str());
     ASSERT_TRUE(plugin.IsLoaded());
 
-    EXPECT_EQ(plugin.library.ExportedNames(), (std::vector<std::string>{"GetIOrvixProvider", "GetOrvixProviderName",
-                                                                        "GetOrvixVersion", "ReleaseIOrvixProvider"}));
+    EXPECT_EQ(plugin.library.ExportedNames(),
+              (std::vector<std::string>{"GetIOrvixProvider", "GetOrvixKnownFiles", "GetOrvixProviderName",
+                                        "GetOrvixVersion", "ReleaseIOrvixProvider"}));
     EXPECT_EQ(plugin.version(), ORVIX_PLUGIN_CONTRACT_VERSION);
     EXPECT_STREQ(plugin.name(), L"Archive");
 }
@@ -610,4 +628,39 @@ TEST_F(ArchivePlugin, ShowsThePropertiesOfTheFirstActiveFileOnly)
     EXPECT_TRUE(m_ben->client.Shows(L"anna"));
     EXPECT_FALSE(m_ben->client.Shows(L"second.txt"));
     EXPECT_FALSE(m_ben->client.Shows(L"missing.txt"));
+}
+
+// The optional export
+
+TEST_F(ArchivePlugin, NamesTheFilesThatItKnowsOnTheDiskOrNot)
+{
+    const std::wstring a = Added(L"a.txt", "x");
+    const std::wstring gone = Added(L"sub\\gone.txt", "x");
+    m_project.Write(L"new.txt", "x");
+    SetFileAttributesW(gone.c_str(), FILE_ATTRIBUTE_NORMAL);
+    std::filesystem::remove_all(m_project.Path(L"sub"));
+    std::vector<std::wstring> files;
+
+    EXPECT_EQ(m_anna->Names(m_project.Text(), files), Success);
+    EXPECT_EQ(files, (std::vector<std::wstring>{a, gone}));
+    EXPECT_EQ(m_anna->Names(m_project.Text() + L"\\sub\\", files), Success);
+    EXPECT_EQ(files, (std::vector<std::wstring>{gone}));
+    EXPECT_EQ(m_anna->Names(m_project.Text() + L"\\su", files), Success);
+    EXPECT_EQ(files, std::vector<std::wstring>());
+}
+
+TEST_F(ArchivePlugin, NamesNoFilesOutsideOfTheProjectOrWithoutOne)
+{
+    Added(L"a.txt", "x");
+    std::vector<std::wstring> files;
+    constexpr auto ignore = [](void*, const wchar_t*) {};
+
+    EXPECT_EQ(m_anna->Names(L"C:\\elsewhere", files), Failure);
+    EXPECT_TRUE(m_anna->client.Shows(L"C:\\elsewhere"));
+    EXPECT_EQ(m_anna->Library().knownFiles(m_anna->provider, nullptr, ignore, nullptr), Failure);
+    EXPECT_EQ(m_anna->Library().knownFiles(m_anna->provider, m_project.Text().c_str(), nullptr, nullptr), Failure);
+    EXPECT_EQ(m_anna->Library().knownFiles(m_ben->provider, m_project.Text().c_str(), ignore, nullptr), Failure);
+    ASSERT_EQ(m_anna->provider->CloseProject(), Success);
+    EXPECT_EQ(m_anna->Names(m_project.Text(), files), Failure);
+    EXPECT_EQ(files, std::vector<std::wstring>());
 }

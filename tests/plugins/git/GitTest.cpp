@@ -2,6 +2,7 @@
 
 #include "GitProgram.h"
 #include "GitText.h"
+#include "OrvixKnownFiles.h"
 #include "OrvixProviderSource.h"
 #include "Process.h"
 
@@ -199,6 +200,14 @@ int GitUser::History(const Texts& files)
 int GitUser::Properties(const Texts& files)
 {
     return m_provider->ShowProperties(&List(files));
+}
+
+int GitUser::Names(const std::wstring& folder, Texts& files) const
+{
+    auto* const function = reinterpret_cast<OrvixKnownFilesFunction*>(
+        reinterpret_cast<void (*)()>(GetProcAddress(GetModuleHandleW(GIT_PLUGIN), "GetOrvixKnownFiles")));
+    constexpr auto add = [](void* data, const wchar_t* path) { static_cast<Texts*>(data)->emplace_back(path); };
+    return function != nullptr ? function(m_provider, folder.c_str(), add, &files) : NotOffered;
 }
 
 std::vector<unsigned long> GitUser::Query(const Texts& files)

@@ -126,6 +126,9 @@ public:
     std::vector<unsigned long> Query(const Texts& files);
     unsigned long Query(const std::wstring& file);
 
+    /// Appends the files that the plug-in names in a folder.
+    int Names(const std::wstring& folder, Texts& files) const;
+
     RecordingClient client;
 
 private:

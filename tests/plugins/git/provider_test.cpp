@@ -90,6 +90,57 @@ TEST_F(GitProvider, SaysTheStateOfEveryKindOfFile)
     EXPECT_EQ(m_user.client.lines, Texts());
 }
 
+TEST_F(GitProvider, NamesTheFilesThatItKnowsOnTheDiskOrNot)
+{
+    const std::wstring a = m_git.Commit(L"a.txt", "1\n");
+    const std::wstring gone = m_git.Commit(L"Sub f\u00FCr/gone.txt", "1\n");
+    m_git.Commit(L"removed.txt", "1\n");
+    m_git({L"rm", L"--quiet", L"removed.txt"});
+    const std::wstring added = m_git.Write(L"Sub f\u00FCr/added.txt", "1\n");
+    m_git({L"add", L"."});
+    m_git.Write(L"new.txt", "1\n");
+    std::filesystem::remove(gone);
+
+    const auto names = [&](const std::wstring& folder) {
+        Texts files;
+        EXPECT_EQ(m_user.Names(folder, files), Success);
+        std::sort(files.begin(), files.end());
+        return files;
+    };
+    EXPECT_EQ(names(m_git.Folder()), (Texts{added, gone, a}));
+    EXPECT_EQ(names(m_git.File(L"Sub f\u00FCr")), (Texts{added, gone}));
+    EXPECT_EQ(names(m_git.File(L"SUB F\u00DCR") + L'\\'),
+              (Texts{m_git.File(L"SUB F\u00DCR\\added.txt"), m_git.File(L"SUB F\u00DCR\\gone.txt")}));
+    EXPECT_EQ(names(m_git.File(L"Sub")), Texts());
+    EXPECT_EQ(m_user.client.lines, Texts());
+
+    Texts files;
+    EXPECT_EQ(m_user.Names(L"C:\\elsewhere", files), Failure);
+    EXPECT_TRUE(m_user.client.Shows(L"is not in the folder of the repository"));
+    ASSERT_EQ(m_user.Provider().CloseProject(), Success);
+    EXPECT_EQ(m_user.Names(m_git.Folder(), files), Failure);
+    EXPECT_EQ(files, Texts());
+}
+
+TEST_F(GitProvider, NamesNoSubmodulesAndNoFilesOfASparseCheckoutAndAConflictedOneOnce)
+{
+    m_git.Commit(L"both.txt", "1\n");
+    const std::wstring kept = m_git.Commit(L"kept/a.txt", "1\n");
+    m_git.Commit(L"left out/b.txt", "1\n");
+    m_git({L"update-index", L"--add", L"--cacheinfo", L"160000,0123456789012345678901234567890123456789,module"});
+    m_git({L"commit", L"--quiet", L"-m", L"module"});
+    m_git({L"checkout", L"--quiet", L"-b", L"other"});
+    m_git.Commit(L"both.txt", "2\n");
+    m_git({L"checkout", L"--quiet", L"-"});
+    const std::wstring both = m_git.Commit(L"both.txt", "3\n");
+    m_git({L"sparse-checkout", L"set", L"kept"});
+    m_git({L"-c", L"alias.m=!git merge --quiet other || true", L"m"});
+
+    Texts files;
+    EXPECT_EQ(m_user.Names(m_git.Folder(), files), Success);
+    EXPECT_EQ(files, (Texts{both, kept}));
+}
+
 TEST_F(GitProvider, TakesPathsInEveryFormOfWindows)
 {
     m_git.Commit(L"sub/File.txt", "1\n");
