@@ -29,6 +29,12 @@ bool IsAnsi(const std::wstring& text)
     return ArchiveText::FromAnsi(ArchiveText::ToAnsi(text)) == text;
 }
 
+/// The failure for the name of a file that the ANSI code page does not have.
+ArchiveFailure NotAnsi(const std::wstring& file)
+{
+    return {ArchiveError::InvalidPath, L"The name has a character that is not in the ANSI code page", file};
+}
+
 void Put(LPSTR buffer, const std::string& bytes)
 {
     std::memcpy(buffer, bytes.c_str(), bytes.size() + 1);
@@ -392,13 +398,14 @@ SCCRTN ArchiveScc::QueryInfo(LONG count, LPCSTR* names, LPLONG status)
 SCCRTN ArchiveScc::PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback, LPVOID callerData,
                                 LPLONG status, LONG options)
 {
-    if (callback == nullptr)
+    if (callback == nullptr || status == nullptr)
     {
         return BadArgument;
     }
     if ((options & SCC_PL_DIR) != 0)
     {
-        return SCC_E_OPNOTSUPPORTED;
+        std::fill_n(status, std::max(count, 0L), SCC_STATUS_INVALID);
+        return PopulateFromFolders(command, count, names, callback, callerData);
     }
     const SCCRTN result = QueryInfo(count, names, status);
     if (result != SCC_OK)
@@ -414,6 +421,36 @@ SCCRTN ArchiveScc::PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, P
         }
     }
     return SCC_OK;
+}
+
+/// Adds the controlled files in and below folders to the list of the host.
+SCCRTN ArchiveScc::PopulateFromFolders(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback,
+                                       LPVOID callerData)
+{
+    return FileOperation(count, names, [&](Paths& paths) {
+        ArchiveFailures failures = Expand(paths, SCC_GET_ALL | SCC_GET_RECURSIVE);
+        std::vector<ArchiveStatus> statuses;
+        Append(failures, m_store.Status(paths, statuses));
+        for (std::size_t i = 0; i < statuses.size(); ++i)
+        {
+            const LONG status = StatusOf(statuses[i]);
+            if (!IsFor(command, status))
+            {
+                continue;
+            }
+            if (!IsAnsi(paths[i]))
+            {
+                failures.push_back(NotAnsi(paths[i]));
+                continue;
+            }
+            std::string name = ArchiveText::ToAnsi(paths[i]);
+            if (!callback(callerData, TRUE, status, name.data()))
+            {
+                return SCC_I_OPERATIONCANCELED;
+            }
+        }
+        return Report(failures);
+    });
 }
 
 SCCRTN ArchiveScc::RunScc()
@@ -492,8 +529,7 @@ ArchiveScc::Paths ArchiveScc::FindMissing(const std::wstring& folder, ArchiveFai
         }
         else
         {
-            failures.push_back(
-                {ArchiveError::InvalidPath, L"The name has a character that is not in the ANSI code page", files[i]});
+            failures.push_back(NotAnsi(files[i]));
         }
     }
     return missing;

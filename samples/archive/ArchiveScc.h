@@ -60,8 +60,10 @@ public:
     /// All or nothing: after a failure every status is SCC_STATUS_INVALID.
     SCCRTN QueryInfo(LONG count, LPCSTR* names, LPLONG status);
 
-    /// Calls `QueryInfo`, then tells the host to remove the files from its list that the command is not for. Ends with
-    /// SCC_I_OPERATIONCANCELED when the host returns FALSE. Names of folders are not supported.
+    /// Calls `QueryInfo`, then tells the host to remove the files from its list that the command is not for. With
+    /// SCC_PL_DIR it adds the controlled files in and below the folders that the command is for, on the disk or not; a
+    /// folder has no status, so `status` is then SCC_STATUS_INVALID. Ends with SCC_I_OPERATIONCANCELED when the host
+    /// returns FALSE.
     SCCRTN PopulateList(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback, LPVOID callerData,
                         LPLONG status, LONG options);
 
@@ -84,6 +86,7 @@ private:
 
     template <typename Work>
     SCCRTN FileOperation(LONG count, LPCSTR* names, Work work);
+    SCCRTN PopulateFromFolders(SCCCOMMAND command, LONG count, LPCSTR* names, POPLISTFUNC callback, LPVOID callerData);
     ArchiveFailures Expand(Paths& paths, LONG options) const;
     Paths FindMissing(const std::wstring& folder, ArchiveFailures& failures) const;
     ArchiveFailures GetAndName(const Paths& files);

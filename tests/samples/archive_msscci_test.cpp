@@ -689,6 +689,9 @@ TEST_F(ArchiveScc, RefusesAListThatIsEmptyOrHasANull)
     EXPECT_EQ(m_library.queryInfo(m_anna.context, 1, names, nullptr), SCC_E_NONSPECIFICERROR);
     EXPECT_EQ(m_library.populateList(m_anna.context, SCC_COMMAND_GET, 1, names, nullptr, nullptr, words, 0),
               SCC_E_NONSPECIFICERROR);
+    EXPECT_EQ(
+        m_library.populateList(m_anna.context, SCC_COMMAND_GET, 1, names, KeepGoing, nullptr, nullptr, SCC_PL_DIR),
+        SCC_E_NONSPECIFICERROR);
     EXPECT_EQ(m_library.properties(m_anna.context, nullptr, nullptr), SCC_E_NONSPECIFICERROR);
     EXPECT_EQ(m_anna.Status(m_project.File(L"a.txt")), SCC_STATUS_CONTROLLED);
 }
@@ -924,7 +927,37 @@ TEST_F(ArchiveScc, RemovesFilesFromTheListThatACommandIsNotFor)
               (Removed{{unknown, SCC_STATUS_NOTCONTROLLED}, {held, Mine}, {plain, SCC_STATUS_CONTROLLED}}));
 }
 
-TEST_F(ArchiveScc, StopsListingWhenTheHostSaysSoAndListsNoFolders)
+TEST_F(ArchiveScc, AddsTheFilesOfFoldersToTheList)
+{
+    const std::string held = Ansi(CheckedOut(L"sub\\held.txt", "x"));
+    const std::string gone = Ansi(Added(L"sub\\deep\\gone.txt", "x"));
+    Added(L"outside.txt", "x");
+    m_project.Write(L"sub\\unknown.txt", "x");
+    SetFileAttributesA(gone.c_str(), FILE_ATTRIBUTE_NORMAL);
+    ASSERT_TRUE(std::filesystem::remove(gone));
+    using Added = std::map<std::string, LONG>;
+    const auto addedFor = [&](SCCCOMMAND command) {
+        constexpr auto add = [](LPVOID data, BOOL isAdded, LONG status, LPSTR name) -> BOOL {
+            EXPECT_TRUE(isAdded);
+            static_cast<Added*>(data)->emplace(name, status);
+            return TRUE;
+        };
+        Names names{m_project.File(L"sub")};
+        LONG status = 0;
+        Added added;
+        EXPECT_EQ(m_library.populateList(m_anna.context, command, 1, names.Get(), add, &added, &status, SCC_PL_DIR),
+                  SCC_OK);
+        EXPECT_EQ(status, SCC_STATUS_INVALID);
+        return added;
+    };
+
+    constexpr LONG Missing = SCC_STATUS_CONTROLLED | SCC_STATUS_OUTOFDATE;
+    EXPECT_EQ(addedFor(SCC_COMMAND_GET), (Added{{held, Mine}, {gone, Missing}}));
+    EXPECT_EQ(addedFor(SCC_COMMAND_CHECKIN), (Added{{held, Mine}}));
+    EXPECT_EQ(addedFor(SCC_COMMAND_ADD), Added());
+}
+
+TEST_F(ArchiveScc, StopsListingWhenTheHostSaysSo)
 {
     Names names{m_project.Write(L"a.txt", "x"), m_project.Write(L"b.txt", "x")};
     LONG status[2] = {};
@@ -933,9 +966,19 @@ TEST_F(ArchiveScc, StopsListingWhenTheHostSaysSoAndListsNoFolders)
     EXPECT_EQ(m_library.populateList(m_anna.context, SCC_COMMAND_GET, 2, names.Get(), StopAtOnce, &removed, status, 0),
               SCC_I_OPERATIONCANCELED);
     EXPECT_EQ(removed.size(), 1u);
-    EXPECT_EQ(m_library.populateList(m_anna.context, SCC_COMMAND_GET, 2, names.Get(), KeepGoing, &removed, status,
-                                     SCC_PL_DIR),
-              SCC_E_OPNOTSUPPORTED);
+
+    Added(L"sub\\a.txt", "x");
+    Added(L"sub\\b.txt", "x");
+    Names folder{m_project.File(L"sub")};
+    int added = 0;
+    constexpr auto stop = [](LPVOID count, BOOL, LONG, LPSTR) -> BOOL {
+        ++*static_cast<int*>(count);
+        return FALSE;
+    };
+    EXPECT_EQ(
+        m_library.populateList(m_anna.context, SCC_COMMAND_GET, 1, folder.Get(), stop, &added, status, SCC_PL_DIR),
+        SCC_I_OPERATIONCANCELED);
+    EXPECT_EQ(added, 1);
 }
 
 // Texts
