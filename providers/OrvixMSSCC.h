@@ -45,6 +45,9 @@ public:
         m_settingsFileName = IsBareFileName(name) ? name : std::wstring();
     }
 
+    /// The library's `SCC_CAP_*` bits; 0 while it is not initialised.
+    LONG Capabilities() const { return m_capabilities; }
+
     /// How many bytes a comment may have, as the library said when it was initialised; 0 when it did not say.
     LONG CommentLength() const { return m_commentLength; }
     LONG CheckoutCommentLength() const { return m_checkoutCommentLength; }

@@ -4,6 +4,7 @@
 #include "DiskProvider.h"
 #include "IOrvixClientAccess.h"
 #include "OrvixClientInfo.h"
+#include "OrvixKnownFiles.h"
 #include "OrvixVersion.h"
 
 #include <windows.h>
@@ -13,6 +14,8 @@
 #include <cfloat>
 #include <clocale>
 #include <cstdint>
+#include <stdexcept>
+#include <string>
 
 namespace
 {
@@ -97,6 +100,38 @@ private:
 
 WildProvider provider;
 
+/// Names gone.txt twice, a file that is not controlled, and what is no path of a file below the folder.
+void NameNonsense(const std::wstring& folder, OrvixKnownFileCallback callback, void* callerData)
+{
+    callback(callerData, nullptr);
+    for (const std::wstring& path : {
+             folder + L"\\gone.txt",
+             folder + L"\\GONE.TXT",
+             folder + L"\\never.txt",
+             folder + L"\\here.txt",
+             folder + L"\\.hidden\\gone.txt",
+             std::wstring(),
+             std::wstring(L"gone.txt"),
+             std::wstring(L"C:\\elsewhere\\gone.txt"),
+             folder,
+             folder + L"\\",
+             folder + L"2\\gone.txt",
+             folder + L"\\..\\gone.txt",
+             folder + L"\\a\\..\\gone.txt",
+             folder + L"\\a\\\\gone.txt",
+             folder + L"\\a/gone.txt",
+             folder + L"\\a\\gone.txt\\",
+             folder + L"\\gone.txt ",
+             folder + L"\\gone.txt:stream",
+             folder + L"\\a\n\\gone.txt",
+             folder + L"\\*\\gone.txt",
+             folder + L'\\' + std::wstring(40000, L'a') + L"\\gone.txt",
+         })
+    {
+        callback(callerData, path.c_str());
+    }
+}
+
 } // namespace
 
 extern "C" {
@@ -117,6 +152,29 @@ __declspec(dllexport) void ReleaseIOrvixProvider(IOrvixProvider*)
 __declspec(dllexport) const wchar_t* GetOrvixProviderName()
 {
     return Name;
+}
+
+__declspec(dllexport) int GetOrvixKnownFiles(IOrvixProvider*, const wchar_t* folder, OrvixKnownFileCallback callback,
+                                             void* callerData)
+{
+    if (Defect::Is(L"changes-process"))
+    {
+        ChangeProcess();
+    }
+    if (Defect::Is(L"names-nonsense"))
+    {
+        NameNonsense(folder, callback, callerData);
+    }
+    if (Defect::Is(L"throws-names"))
+    {
+        callback(callerData, (std::wstring(folder) + L"\\gone.txt").c_str());
+        throw std::runtime_error("thrown by the export");
+    }
+    while (Defect::Is(L"names-endlessly"))
+    {
+        callback(callerData, (std::wstring(folder) + L"\\gone.txt").c_str());
+    }
+    return OrvixProviderResult::Success;
 }
 } // extern "C"
 

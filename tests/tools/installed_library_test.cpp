@@ -121,3 +121,38 @@ TEST_F(InstalledLibrary, TakesNamesAndCommentsOfTheAnsiCodePageAndIsNotSpoiledBy
     EXPECT_EQ(result.errors, "The comment has characters that the code page of this system does not have. They are "
                              "replaced.\n");
 }
+
+TEST_F(InstalledLibrary, ListsTheFilesThatAreMissingOnTheDisk)
+{
+    ASSERT_EQ(Register(BuiltFile(L"archive_msscci.dll").make_preferred().wstring(), L"Files").code, Success);
+    const auto run = [this](Arguments arguments) {
+        arguments.insert(arguments.end(), {L"--provider", L"Files"});
+        return RunInstalled(std::move(arguments));
+    };
+    const auto lose = [this] {
+        SetFileAttributesW(File(L"sub\\gone.txt").c_str(), FILE_ATTRIBUTE_NORMAL);
+        EXPECT_TRUE(std::filesystem::remove(File(L"sub\\gone.txt")));
+    };
+    Write(L"here.txt", "x");
+    Write(L"sub\\gone.txt", "x");
+    ASSERT_EQ(run({L"add", L"."}).code, Success);
+
+    lose();
+    const auto status = run({L"status", L"."});
+    EXPECT_EQ(status.code, Success) << status.errors;
+    EXPECT_THAT(status.output, HasSubstr("missing on disk  sub\\gone.txt\n2 files"));
+    EXPECT_THAT(run({L"status", L".", L"--json"}).output, HasSubstr("\"missing\""));
+    for (const wchar_t* command : {L"undo", L"get"})
+    {
+        const auto result = run({command, L"."});
+        EXPECT_EQ(result.code, Success) << result.errors;
+        EXPECT_THAT(result.output, HasSubstr("done    checked in  sub\\gone.txt\n"));
+        EXPECT_EQ(ReadBytes(File(L"sub\\gone.txt")), "x");
+        lose();
+    }
+}
+
+TEST_F(InstalledLibrary, ThatListsNoFilesIsNotOpenedAgain)
+{
+    EXPECT_EQ(RunInstalled({L"status", L"."}).errors, "the project is closed\n");
+}

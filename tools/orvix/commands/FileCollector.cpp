@@ -25,10 +25,25 @@ void FileCollector::Add(const std::wstring& named)
     if (IsFolder(path))
     {
         AddFolder(path);
+        m_namedFolders.push_back(std::move(path));
     }
     else
     {
         AddFile(std::move(path), true);
+    }
+}
+
+void FileCollector::AddMissing(const std::wstring& folder, const std::wstring& path)
+{
+    const std::wstring below = PathBelow(folder, path);
+    const std::wstring folders = L'\\' + below.substr(0, below.find_last_of(L'\\') + 1);
+    const bool isInDotFolder = folders.find(L"\\.") != std::wstring::npos;
+    const bool isSkipped =
+        std::any_of(m_skippedFolders.begin(), m_skippedFolders.end(),
+                    [&path](const std::wstring& skipped) { return PathBelow(skipped, path).size() < path.size(); });
+    if (!isInDotFolder && !isSkipped)
+    {
+        AddFile(PathAsOnDisk(path), false);
     }
 }
 

@@ -25,7 +25,14 @@ public:
     /// Adds a file or the files of a folder, by its full path. It need not exist. Letter case becomes that of the disk.
     void Add(const std::wstring& named);
 
+    /// Adds a file that is missing on the disk, unless it is in a folder that is skipped. `folder` is the named folder
+    /// that the full path begins with.
+    void AddMissing(const std::wstring& folder, const std::wstring& path);
+
     const std::vector<File>& Files() const { return m_files; }
+
+    /// The full paths of the folders that the user names.
+    const std::vector<std::wstring>& NamedFolders() const { return m_namedFolders; }
 
     /// The paths of the skipped folders.
     const std::vector<std::wstring>& SkippedFolders() const { return m_skippedFolders; }
@@ -52,6 +59,7 @@ private:
 
     Output& m_output;
     std::vector<File> m_files;
+    std::vector<std::wstring> m_namedFolders;
     std::vector<std::wstring> m_skippedFolders;
     std::vector<std::wstring> m_unreadableFolders;
     std::unordered_set<std::wstring> m_keys; // of the files found so far, see `PathKey`

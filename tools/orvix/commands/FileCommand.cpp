@@ -3,9 +3,11 @@
 #include "FileMark.h"
 #include "FilePath.h"
 #include "FileStateText.h"
+#include "MissingFiles.h"
 #include "OrvixFileFlags.h"
 #include "OrvixProviderResult.h"
 
+#include <iostream>
 #include <new>
 #include <numeric>
 
@@ -31,10 +33,16 @@ Listing::State StateOf(OrvixFileEntry& entry)
     return {{words.begin(), words.end()}, FileStateText::InWords(entry.GetFlagsOut(), exists)};
 }
 
+/// Whether a folder is another one or is below it.
+bool IsInFolder(const std::wstring& outer, const std::wstring& folder)
+{
+    return PathKey(folder) == PathKey(outer) || PathBelow(outer, folder).size() < folder.size();
+}
+
 } // namespace
 
 FileCommand::FileCommand(ProjectSession& project, const CommandLine& commandLine, Output& output,
-                         ResultColumn resultColumn)
+                         ResultColumn resultColumn, Missing missing)
     : m_project(project), m_commandLine(commandLine), m_output(output), m_collector(output),
       m_listing{.key = "files", .columns = {{"state", "State"}, {"file", "File"}}, .rows = {}, .summary = {}},
       m_showsResults(resultColumn == ResultColumn::Shown)
@@ -47,9 +55,34 @@ FileCommand::FileCommand(ProjectSession& project, const CommandLine& commandLine
     {
         m_collector.Add(path);
     }
+    for (const std::wstring& folder : m_collector.NamedFolders())
+    {
+        if (missing == Missing::Listed && IsInFolder(project.Folder(), folder))
+        {
+            AddMissingFiles(folder);
+        }
+    }
     for (std::size_t i = 0; i < m_collector.Files().size(); ++i)
     {
         AddFile(i);
+    }
+}
+
+void FileCommand::AddMissingFiles(const std::wstring& folder)
+{
+    m_output.Progress(L"looking for missing files");
+    MissingFiles files(folder);
+    const int result = m_project.NameKnownFiles(folder, MissingFiles::Take, &files);
+    if (result != OrvixProviderResult::Success && result != OrvixProviderResult::NotOffered)
+    {
+        m_namesAllFiles = false;
+        m_output.Progress({});
+        std::cerr << "orvix: the provider does not name all its files in " << Printable(folder)
+                  << ", so a missing one may be left out\n";
+    }
+    for (const auto& [key, path] : files.Paths())
+    {
+        m_collector.AddMissing(folder, path);
     }
 }
 
@@ -90,7 +123,7 @@ ExitCode FileCommand::Run()
     m_output.Show(m_listing);
 
     const unsigned int bad = m_counts[Refused] + m_counts[Cancelled] + m_counts[Failed];
-    return m_collector.ReportUnreadableFolders() || bad > 0 ? ExitCode::Failed : ExitCode::Success;
+    return m_collector.ReportUnreadableFolders() || !m_namesAllFiles || bad > 0 ? ExitCode::Failed : ExitCode::Success;
 }
 
 void FileCommand::QueryStatus(unsigned long mark)

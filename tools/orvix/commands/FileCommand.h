@@ -17,8 +17,9 @@ public:
     FileCommand& operator=(const FileCommand&) = delete;
     virtual ~FileCommand() = default;
 
-    /// Runs the command and shows the result. `ExitCode::Failed` when a folder could not be read, and when a file was
-    /// refused or cancelled or did not reach the expected state. Throws `ToolError`.
+    /// Runs the command and shows the result. `ExitCode::Failed` when a folder could not be read, when the provider
+    /// failed to name its files, and when a file was refused or cancelled or did not reach the expected state. Throws
+    /// `ToolError`.
     ExitCode Run();
 
 protected:
@@ -39,8 +40,16 @@ protected:
         Hidden
     };
 
+    /// Whether a named folder also means the files that the provider knows there and the disk lacks.
+    enum class Missing
+    {
+        Listed,
+        LeftOut
+    };
+
     /// Collects the files, without those that the provider's filters exclude. The arguments must outlive this object.
-    FileCommand(ProjectSession& project, const CommandLine& commandLine, Output& output, ResultColumn resultColumn);
+    FileCommand(ProjectSession& project, const CommandLine& commandLine, Output& output, ResultColumn resultColumn,
+                Missing missing);
 
     /// Runs on the entries of the list, of which there is at least one, and reports each result.
     virtual void RunOnFiles() = 0;
@@ -72,6 +81,7 @@ protected:
     OrvixFileList& List() { return m_list; }
 
 private:
+    void AddMissingFiles(const std::wstring& folder);
     void AddFile(std::size_t index);
     void Report(Result result, const Listing::State& state, const std::wstring& path);
     std::vector<Listing::Count> Summary() const;
@@ -87,6 +97,7 @@ private:
     OrvixFileList m_list;
     Listing m_listing;
     bool m_showsResults;
+    bool m_namesAllFiles = true; // the provider did, when it was asked for its files
     std::array<unsigned int, NumResults> m_counts{};
     unsigned int m_excluded = 0;
     unsigned int m_otherState = 0;

@@ -8,7 +8,7 @@ class HistoryCommand final : public FileCommand
 public:
     /// The arguments must outlive this object.
     HistoryCommand(ProjectSession& project, const CommandLine& commandLine, Output& output)
-        : FileCommand(project, commandLine, output, ResultColumn::Shown)
+        : FileCommand(project, commandLine, output, ResultColumn::Shown, Missing::LeftOut)
     {
     }
 

@@ -15,7 +15,9 @@ class OperationCommand final : public FileCommand
 public:
     /// The arguments must outlive this object.
     OperationCommand(ProjectSession& project, const CommandLine& commandLine, Output& output, const OperationRule& rule)
-        : FileCommand(project, commandLine, output, ResultColumn::Shown), m_rule(rule)
+        : FileCommand(project, commandLine, output, ResultColumn::Shown,
+                      rule.bringsBack ? Missing::Listed : Missing::LeftOut),
+          m_rule(rule)
     {
         if (commandLine.force)
         {

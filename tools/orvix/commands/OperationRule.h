@@ -27,6 +27,8 @@ struct OperationRule
     unsigned long ends = 0;
     unsigned long endsUnlessCheckedOut = 0; ///< a file that this user has checked out may keep these
 
+    bool bringsBack = false; ///< the command brings files back that are missing on the disk
+
     std::uint32_t dialogPrompt = 0;                 ///< ID of the stored answer to the file-list dialog
     std::uint32_t keepPrompt = OrvixPromptID::None; ///< ID of the stored answer to "keep checked out", if offered
 
@@ -92,6 +94,7 @@ inline constexpr OperationRule UndoCheckOut = {
     .concerns = OrvixFileState::CheckedOut,
     .leadsTo = OrvixFileState::Controlled,
     .ends = OrvixFileState::CheckedOut | OrvixFileState::Modified,
+    .bringsBack = true,
     .dialogPrompt = FirstPrompt + 5,
 };
 
@@ -105,6 +108,7 @@ inline constexpr OperationRule GetLatest = {
     .leadsTo = OrvixFileState::Controlled,
     .ends = OrvixFileState::OutOfDate,
     .endsUnlessCheckedOut = OrvixFileState::Modified,
+    .bringsBack = true,
     .dialogPrompt = FirstPrompt + 6,
 };
 

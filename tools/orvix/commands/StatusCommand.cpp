@@ -10,6 +10,13 @@ void StatusCommand::RunOnFiles()
     {
         OrvixFileEntry* entry = List().GetFileEntry(i);
         const bool known = (entry->GetFlagsOut() & OrvixFileState::Controlled) != 0 || PathExists(entry->GetFile());
-        Report(known ? Done : Refused, *entry);
+        if (known || IsNamed(*entry))
+        {
+            Report(known ? Done : Refused, *entry);
+        }
+        else
+        {
+            CountOtherState();
+        }
     }
 }

@@ -1,10 +1,32 @@
 #include "GuardedProvider.h"
 
+#include "ExceptionBarrier.h"
+#include "FileMark.h"
 #include "FilePath.h"
 #include "OrvixFileFlags.h"
 #include "OrvixFileList.h"
 #include "OrvixProviderOption.h"
 #include "OrvixProviderResult.h"
+
+int GuardedProvider::NameKnownFiles(const wchar_t* folder, OrvixKnownFileCallback callback, void* callerData)
+{
+    // The export has no other way to be found: the services object tells nobody which module a provider is from.
+    const void* const virtualTable = *reinterpret_cast<void**>(&m_provider);
+    HMODULE module = nullptr;
+    GetModuleHandleExW(GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT,
+                       static_cast<const wchar_t*>(virtualTable), &module);
+    const auto function =
+        reinterpret_cast<void (*)()>(module != nullptr ? GetProcAddress(module, "GetOrvixKnownFiles") : nullptr);
+    if (function == nullptr)
+    {
+        return OrvixProviderResult::NotOffered;
+    }
+    return Guarded("GetOrvixKnownFiles", [&] {
+        return WithBarrier(OrvixProviderResult::Failure, [&] {
+            return reinterpret_cast<OrvixKnownFilesFunction*>(function)(&m_provider, folder, callback, callerData);
+        });
+    });
+}
 
 const wchar_t* GuardedProvider::GetName()
 {
@@ -69,7 +91,29 @@ int GuardedProvider::CheckOut(OrvixFileList* list, const wchar_t* comment, unsig
 
 int GuardedProvider::UndoCheckOut(OrvixFileList* list, unsigned long options)
 {
-    return Guarded("UndoCheckOut", [&] { return m_provider.UndoCheckOut(list, options); });
+    OrvixFileList toUndo;
+    OrvixFileList toGet;
+    for (unsigned int i = 0; i < list->NumActiveEntries(); ++i)
+    {
+        OrvixFileEntry& entry = *list->GetActiveFileEntry(i);
+        const bool isCheckedOut = (entry.GetFlagsOut() & OrvixFileState::CheckedOut) != 0;
+        OrvixFileList& target = isCheckedOut || !IsMissing(entry.GetFile()) ? toUndo : toGet;
+        if (target.CreateEntry(entry) == nullptr)
+        {
+            return OrvixProviderResult::Failure;
+        }
+    }
+    if (toGet.BuildActiveList(FileMark::Chosen, false) == 0)
+    {
+        return Guarded("UndoCheckOut", [&] { return m_provider.UndoCheckOut(list, options); });
+    }
+    int result = OrvixProviderResult::Success;
+    if (toUndo.BuildActiveList(FileMark::Chosen, false) > 0)
+    {
+        result = Guarded("UndoCheckOut", [&] { return m_provider.UndoCheckOut(&toUndo, options); });
+    }
+    const int got = Guarded("GetLatest", [&] { return m_provider.GetLatest(&toGet, options); });
+    return result == OrvixProviderResult::Success ? got : result;
 }
 
 int GuardedProvider::GetLatest(OrvixFileList* list, unsigned long options)

@@ -3,6 +3,7 @@
 #include "GuardedCall.h"
 #include "IOrvixProvider.h"
 #include "OrvixFileEntry.h"
+#include "OrvixKnownFiles.h"
 #include "Text.h"
 
 #include <string>
@@ -29,6 +30,9 @@ public:
     /// Whether the last `QueryStatus` succeeded.
     bool KnowsStatus() const { return m_knowsStatus; }
 
+    /// Calls the plug-in's optional export, see `OrvixKnownFilesFunction`. `NotOffered` without the export.
+    int NameKnownFiles(const wchar_t* folder, OrvixKnownFileCallback callback, void* callerData);
+
     const wchar_t* GetName() override;
     int ReservedA() override;
     bool IsInitialized() override;
@@ -41,6 +45,9 @@ public:
     int ReservedC() override;
     int CheckIn(OrvixFileList* list, const wchar_t* comment, unsigned long options) override;
     int CheckOut(OrvixFileList* list, const wchar_t* comment, unsigned long options) override;
+
+    /// As the provider, except that a file that is missing on the disk and not checked out is got: it has no check-out
+    /// to undo.
     int UndoCheckOut(OrvixFileList* list, unsigned long options) override;
     int GetLatest(OrvixFileList* list, unsigned long options) override;
     int ReservedD(void* argument, unsigned long* first, unsigned long* second) override;

@@ -2,7 +2,6 @@
 
 #include "FilePath.h"
 #include "GuardedCall.h"
-#include "InstalledProviders.h"
 #include "ModulePath.h"
 #include "OrvixProviderConfig.h"
 #include "OrvixProviderSource.h"
@@ -12,9 +11,11 @@
 
 #include <comdef.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <iostream>
 #include <new>
+#include <utility>
 
 namespace
 {
@@ -69,11 +70,12 @@ HostSession::HostSession(const CommandLine& commandLine, Output& output) : m_acc
     GuardedCall("the search for providers", [&] { m_services->Initialize(&m_client, commandLine.sources); });
     m_configs.LoadConfig((ConfigFolder(commandLine) + L'\\' + OrvixProviderConfigManager::FileName).c_str(),
                          &m_settings);
-    m_firstInstalled = m_services->GetProviderCount();
     if ((commandLine.sources & OrvixProviderSource::InstalledMSSCCI) != 0)
     {
-        FindFirstInstalled();
+        FindInstalled();
     }
+    const std::uint32_t count = m_services->GetProviderCount();
+    m_firstInstalled = count - std::min(count, static_cast<std::uint32_t>(m_installed.size()));
 }
 
 HostSession::~HostSession()
@@ -89,7 +91,7 @@ HostSession::~HostSession()
 }
 
 /// Plug-ins come first, and the libraries of the registry's list follow.
-void HostSession::FindFirstInstalled()
+void HostSession::FindInstalled()
 {
     const UniqueRegistryKey list = InstalledProviders::OpenList();
     std::wstring keyPath;
@@ -100,10 +102,15 @@ void HostSession::FindFirstInstalled()
         {
             return;
         }
-        const bool listed =
-            step == InstalledProviders::Step::Found &&
-            InstalledProviders::Judge(keyPath, m_configs).verdict == InstalledProviders::Verdict::Listed;
-        m_firstInstalled -= listed && m_firstInstalled > 0 ? 1 : 0;
+        InstalledProviders::Candidate library;
+        if (step == InstalledProviders::Step::Found)
+        {
+            library = InstalledProviders::Judge(keyPath, m_configs);
+        }
+        if (library.verdict == InstalledProviders::Verdict::Listed)
+        {
+            m_installed.push_back(std::move(library));
+        }
     }
 }
 

@@ -3,11 +3,13 @@
 #include "ClientAccess.h"
 #include "CommandLine.h"
 #include "FileDiagnostics.h"
+#include "InstalledProviders.h"
 #include "OrvixClientInfo.h"
 #include "OrvixProviderConfigManager.h"
 #include "OrvixServicesPointer.h"
 
 #include <string>
+#include <vector>
 
 /// The services object of one run, initialised from the command line. At the end it is shut down, which saves the
 /// stored answers, and released.
@@ -38,8 +40,14 @@ public:
     /// Whether the provider is an installed MSSCCI library, which takes names and comments in the ANSI code page only.
     bool IsInstalled(std::uint32_t provider) const { return provider >= m_firstInstalled; }
 
+    /// The library of an installed provider; null for a plug-in. Valid as long as this object.
+    const InstalledProviders::Candidate* InstalledLibrary(std::uint32_t provider) const
+    {
+        return IsInstalled(provider) ? &m_installed[provider - m_firstInstalled] : nullptr;
+    }
+
 private:
-    void FindFirstInstalled();
+    void FindInstalled();
     std::wstring SwitchedOff() const;
     void UsePlugins(const CommandLine& commandLine);
     void UseConfiguration(const CommandLine& commandLine);
@@ -49,6 +57,7 @@ private:
     std::wstring m_searched;              // where providers were searched, for messages
     OrvixProviderConfigManager m_configs; // as the services object reads it
     FileDiagnostics m_settings;           // of OrvixProviders.xml
-    std::uint32_t m_firstInstalled = 0;   // index; the number of providers when there is none
+    std::vector<InstalledProviders::Candidate> m_installed;
+    std::uint32_t m_firstInstalled = 0; // index; the number of providers when there is none
     OrvixServicesPointer m_services;
 };

@@ -1,6 +1,7 @@
 #include "ProjectSession.h"
 
 #include "FilePath.h"
+#include "LibraryFiles.h"
 #include "OrvixProviderResult.h"
 #include "ToolError.h"
 
@@ -53,6 +54,16 @@ ProjectSession::~ProjectSession()
 bool ProjectSession::IsExcluded(const std::wstring& path, std::wstring& filter)
 {
     return Services().IsFileExcludedByProvider(m_index, path.c_str(), &filter);
+}
+
+int ProjectSession::NameKnownFiles(const std::wstring& folder, OrvixKnownFileCallback callback, void* callerData)
+{
+    if (const InstalledProviders::Candidate* const library = m_host.InstalledLibrary(m_index))
+    {
+        LibraryFiles::Name(*library, Client(), {.project = m_folder, .folder = folder}, callback, callerData);
+        return OrvixProviderResult::Success;
+    }
+    return m_provider->NameKnownFiles(folder.c_str(), callback, callerData);
 }
 
 bool ProjectSession::Takes(const std::wstring& text) const

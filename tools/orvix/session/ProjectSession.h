@@ -30,6 +30,11 @@ public:
     /// takes those of the ANSI code page.
     bool Takes(const std::wstring& text) const;
 
+    /// Names the controlled files in a folder of the project and below, on the disk or not, as
+    /// `OrvixKnownFilesFunction` does. `NotOffered` when a plug-in has no such function. An MSSCCI library that does
+    /// not list its files names none, and that is no failure.
+    int NameKnownFiles(const std::wstring& folder, OrvixKnownFileCallback callback, void* callerData);
+
     /// Whether the administrator's filters exclude a file from the provider. `filter` receives the name of the filter.
     bool IsExcluded(const std::wstring& path, std::wstring& filter);
 

@@ -25,5 +25,8 @@ std::wstring LongPath(const std::wstring& full);
 /// Whether a file or a folder has this path.
 bool PathExists(const std::wstring& path);
 
+/// Whether the disk has neither a file nor a folder of this path; false also when that cannot be found out.
+bool IsMissing(const std::wstring& path);
+
 /// Whether a folder has this path.
 bool IsFolder(const std::wstring& path);
