@@ -46,7 +46,12 @@ public:
     /// the end.
     Result Wait(void* handle) noexcept;
 
-    /// True when the user has ended the work in any of the waits.
+    /// One turn of a wait, without waiting: shows the window when it is time and handles the messages that `Wait`
+    /// handles. For code that waits for several things by itself; call it every 50 milliseconds, and when a message of
+    /// the kinds QS_PAINT or QS_SENDMESSAGE is there. `Cancelled` when the user has just ended the work.
+    Result Update() noexcept;
+
+    /// True when the user has ended the work in any of the waits or turns.
     bool IsCancelled() const noexcept { return m_cancelled; }
 
 private:

@@ -79,12 +79,14 @@ struct OrvixWaitingWindow::State
 
     ULONGLONG Age() const { return GetTickCount64() - start; }
     bool IsShown() const { return window != nullptr; }
+    bool MayShow() const { return parent != nullptr && !failed; }
     bool IsOurs(HWND handle) const
     {
         return window != nullptr && (handle == window || IsChild(window, handle) != FALSE);
     }
 
     void Open();
+    void Show();
     void Close();
     void AddControls();
     HWND AddControl(const wchar_t* windowClass, const wchar_t* text, DWORD style, int id, RECT place);
@@ -93,6 +95,7 @@ struct OrvixWaitingWindow::State
     bool NextMessage(MSG& message, HWND filter, UINT kinds);
     void DropInput();
     void Pump();
+    void PostQuitAgain();
 
     static INT_PTR CALLBACK Procedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) noexcept;
 
@@ -210,6 +213,19 @@ void OrvixWaitingWindow::State::DisableOthers()
         std::bit_cast<LPARAM>(this));
 }
 
+/// Opens the window when it is time, and shows what is new.
+void OrvixWaitingWindow::State::Show()
+{
+    if (MayShow() && !IsShown() && Age() >= Delay)
+    {
+        Open();
+    }
+    if (IsShown())
+    {
+        Refresh();
+    }
+}
+
 void OrvixWaitingWindow::State::Close()
 {
     if (window == nullptr)
@@ -318,6 +334,14 @@ void OrvixWaitingWindow::State::Pump()
     }
 }
 
+void OrvixWaitingWindow::State::PostQuitAgain()
+{
+    if (quit)
+    {
+        PostQuitMessage(static_cast<int>(*std::exchange(quit, std::nullopt)));
+    }
+}
+
 INT_PTR CALLBACK OrvixWaitingWindow::State::Procedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) noexcept
 {
     if (message == WM_INITDIALOG)
@@ -417,20 +441,15 @@ OrvixWaitingWindow::Result OrvixWaitingWindow::Wait(void* handle) noexcept
     Result result = Result::Done;
     for (;;)
     {
-        const bool mayShow = state.parent != nullptr && !state.failed;
-        if (mayShow && !state.IsShown() && state.Age() >= Delay)
-        {
-            state.Open();
-        }
+        state.Show();
         DWORD timeout = SignOfLife;
         DWORD wakeMask = QS_PAINT | QS_SENDMESSAGE;
         if (state.IsShown())
         {
-            state.Refresh();
             timeout = RefreshEvery;
             wakeMask |= QS_INPUT;
         }
-        else if (mayShow)
+        else if (state.MayShow())
         {
             timeout = Delay - static_cast<DWORD>(std::min<ULONGLONG>(state.Age(), Delay));
         }
@@ -449,9 +468,27 @@ OrvixWaitingWindow::Result OrvixWaitingWindow::Wait(void* handle) noexcept
         }
     }
     state.canPress = false;
-    if (state.quit)
-    {
-        PostQuitMessage(static_cast<int>(*std::exchange(state.quit, std::nullopt)));
-    }
+    state.PostQuitAgain();
     return result;
+}
+
+OrvixWaitingWindow::Result OrvixWaitingWindow::Update() noexcept
+{
+    if (m_state == nullptr)
+    {
+        return Result::Done;
+    }
+    State& state = *m_state;
+    state.Show();
+    state.canPress = !m_cancelled;
+    state.Pump();
+    state.canPress = false;
+    state.PostQuitAgain();
+    if (!state.pressed || m_cancelled)
+    {
+        return Result::Done;
+    }
+    m_cancelled = true;
+    state.Refresh();
+    return Result::Cancelled;
 }

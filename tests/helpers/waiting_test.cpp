@@ -397,4 +397,35 @@ TEST_F(Waiting, KeepsTheEndOfTheHost)
     EXPECT_EQ(message.wParam, 7u);
 }
 
+TEST_F(Waiting, TakesTurnsOfALoopThatWaitsByItself)
+{
+    HostWindow host;
+    OrvixWaitingWindow window(host.Get(), Title, L"Cancel");
+    window.SetTask(L"Waiting for two things");
+    EXPECT_EQ(window.Update(), Result::Done);
+    EXPECT_EQ(FindWindowW(nullptr, Title), nullptr) << "it is too early";
+    PostMessageW(host.Get(), Posted, 0, 0);
+    PostQuitMessage(7);
+    host.painting.Ask(host.Get());
+    std::jthread user([] {
+        const Shown shown = Find(Title);
+        EXPECT_TRUE(shown.Says(L"Waiting for two things"));
+        SendMessageW(shown.Button(), BM_CLICK, 0, 0);
+    });
+    Result result = Result::Done;
+    for (int i = 0; i < 1000 && result == Result::Done; ++i)
+    {
+        std::this_thread::sleep_for(milliseconds(10));
+        result = window.Update();
+    }
+    EXPECT_EQ(result, Result::Cancelled);
+    EXPECT_TRUE(window.IsCancelled());
+    EXPECT_EQ(window.Update(), Result::Done) << "it is said once";
+    EXPECT_GT(host.painting.Count(), 0u);
+    EXPECT_EQ(host.posted, 0);
+    MSG message;
+    ASSERT_TRUE(PeekMessageW(&message, nullptr, WM_QUIT, WM_QUIT, PM_REMOVE));
+    EXPECT_EQ(message.wParam, 7u);
+}
+
 } // namespace
