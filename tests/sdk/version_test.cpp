@@ -93,7 +93,8 @@ TEST_P(VersionResource, NamesTheFileItsKindAndTheVersion)
 
 INSTANTIATE_TEST_SUITE_P(Files, VersionResource,
                          testing::Values(L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll", L"orvix.exe",
-                                         L"archive_msscci.dll", L"plugins/archive.dll"),
+                                         L"archive_msscci.dll", L"plugins/archive.dll", L"scc_proxy.dll",
+                                         L"scc_host64.exe", L"scc_host32.exe"),
                          [](const auto& file) { return std::filesystem::path(file.param).stem().string(); });
 
 TEST(Version, IsWhatTheToolPrints)
