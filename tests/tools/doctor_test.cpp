@@ -830,6 +830,14 @@ TEST_F(DoctorOnRegistrations, AskAnIsolatedLibraryWhetherItLoads)
 
     WriteBytes(settings, section + "C:\\gone.dll");
     EXPECT_EQ(CodesOf(Candidate(Report(), "value")), (Codes{"isolated", "!isolated-library-fails"}));
+
+    // What it needs is found where the settings say.
+    WriteBytes(settings, section + std::filesystem::path(Library(L"recording_dependent.dll")).string());
+    EXPECT_THAT(TextOf(Candidate(Report(), "value"), "isolated-library-fails"), HasSubstr("does not load: error 126 "));
+    WriteSettings("<a><Name>Isolated</Name><MSSCCDllSearchPath>" + std::filesystem::path(Library(L"needed")).string() +
+                  "</MSSCCDllSearchPath></a>");
+    EXPECT_THAT(TextOf(Candidate(Report(), "value"), "isolated-library-fails"), Not(HasSubstr("error 126")))
+        << "it is found and does not start";
 }
 
 TEST_F(DoctorOnRegistrations, FindWhatIsOnlyInThe32BitView)

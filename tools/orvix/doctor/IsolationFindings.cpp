@@ -5,7 +5,7 @@
 #include <filesystem>
 #include <system_error>
 
-void IsolationFindings::Add(DoctorReport::Subject& subject, const std::wstring& path)
+void IsolationFindings::Add(DoctorReport::Subject& subject, const std::wstring& path, const std::wstring& searchPath)
 {
     const std::filesystem::path folder = std::filesystem::path(path).parent_path();
     std::error_code ignored;
@@ -16,7 +16,7 @@ void IsolationFindings::Add(DoctorReport::Subject& subject, const std::wstring& 
     const IsolationSettings settings = IsolationSettings::Read(folder);
     subject.AddNote("isolated", L"it is isolated: " + settings.library.wstring() + L" (" +
                                     std::to_wstring(settings.bits) + L"-bit) runs in a process of its own");
-    const auto library = std::make_shared<IsolatedLibrary>(settings, L"");
+    const auto library = std::make_shared<IsolatedLibrary>(settings, searchPath);
     if (library->Call(SccCalls::GetVersion) <= SCC_OK)
     {
         subject.AddProblem("isolated-library-fails",

@@ -295,7 +295,7 @@ CandidateExams::About RegistrationExaminer::ExamineLibrary(const std::wstring& s
     else
     {
         AddMissingExports(findings, module.Get());
-        IsolationFindings::Add(findings, ModulePath(module.Get()));
+        IsolationFindings::Add(findings, ModulePath(module.Get()), searchPath);
     }
     if (module || error != ERROR_MOD_NOT_FOUND)
     {
