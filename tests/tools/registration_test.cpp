@@ -5,6 +5,8 @@
 
 #include <gmock/gmock.h>
 
+#include <aclapi.h>
+
 #include <array>
 #include <fstream>
 
@@ -125,6 +127,10 @@ TEST_F(Registration, RefusesAPathThatWouldNotFitIntoTheLibrarysBuffer)
     EXPECT_EQ(tooLong.errors, "orvix: the path of the library is longer than 1022 characters\n");
     EXPECT_THAT(Register(root + std::wstring(1022 - root.size(), L'x'), L"Talking").errors,
                 HasSubstr("orvix: no such library: "));
+    EXPECT_THAT(
+        RunExactly({L"register", root + std::wstring(1023 - root.size(), L'x'), L"Talking", L"--isolated"}).errors,
+        HasSubstr("orvix: no such library: "))
+        << "the short path of the proxy is registered";
 }
 
 TEST_F(Registration, RefusesWhatIsNoMSSCCILibrary)
@@ -244,10 +250,78 @@ TEST_F(Registration, ThatFailsKeepsThePathThatWasThere)
 namespace
 {
 
+/// Who may change a file or folder.
+struct Access
+{
+    explicit Access(const std::filesystem::path& path)
+    {
+        UniqueLocalMemory descriptor;
+        PACL list = nullptr;
+        EXPECT_EQ(GetNamedSecurityInfoW(path.c_str(), SE_FILE_OBJECT, DACL_SECURITY_INFORMATION, nullptr, nullptr,
+                                        &list, nullptr, descriptor.Out()),
+                  static_cast<DWORD>(ERROR_SUCCESS));
+        SECURITY_DESCRIPTOR_CONTROL control = 0;
+        DWORD revision = 0;
+        GetSecurityDescriptorControl(descriptor.Get(), &control, &revision);
+        isProtected = (control & SE_DACL_PROTECTED) != 0;
+        for (DWORD i = 0; list != nullptr && i < list->AceCount; ++i)
+        {
+            LPVOID entry = nullptr;
+            GetAce(list, i, &entry);
+            auto& allowed = *static_cast<ACCESS_ALLOWED_ACE*>(entry);
+            if (allowed.Header.AceType == ACCESS_ALLOWED_ACE_TYPE && IsEverybody(&allowed.SidStart))
+            {
+                everybodysRights |= allowed.Mask;
+            }
+        }
+    }
+
+    static bool IsEverybody(PSID group)
+    {
+        return IsWellKnownSid(group, WinWorldSid) || IsWellKnownSid(group, WinBuiltinUsersSid) ||
+               IsWellKnownSid(group, WinAuthenticatedUserSid);
+    }
+
+    bool EverybodyMayWrite() const
+    {
+        constexpr ACCESS_MASK Write = FILE_WRITE_DATA | FILE_APPEND_DATA | FILE_WRITE_EA | FILE_DELETE_CHILD |
+                                      FILE_WRITE_ATTRIBUTES | DELETE | WRITE_DAC | WRITE_OWNER | GENERIC_WRITE |
+                                      GENERIC_ALL;
+        return (everybodysRights & Write) != 0;
+    }
+
+    bool isProtected = false; ///< nothing is inherited from the folder above
+    ACCESS_MASK everybodysRights = 0;
+};
+
+/// Nothing is inherited from the folder above.
+void LetEverybodyWrite(const std::filesystem::path& folder)
+{
+    UniqueLocalMemory descriptor;
+    ASSERT_TRUE(ConvertStringSecurityDescriptorToSecurityDescriptorW(L"D:P(A;OICI;FA;;;WD)", SDDL_REVISION_1,
+                                                                     descriptor.Out(), nullptr));
+    ASSERT_TRUE(SetFileSecurityW(folder.c_str(), DACL_SECURITY_INFORMATION | PROTECTED_DACL_SECURITY_INFORMATION,
+                                 descriptor.Get()));
+}
+
 /// The folder of an isolated library.
 std::filesystem::path IsolatedPath(const wchar_t* name)
 {
     return std::filesystem::path(L"C:\\ProgramData\\OrvixCore Isolation") / name;
+}
+
+/// The folder of the talking library is complete, with a patience of 77 seconds.
+void ExpectTalkingIsIsolated()
+{
+    const std::filesystem::path folder = IsolatedPath(L"TALKING");
+    const std::filesystem::path settings = folder / L"scc_proxy.ini";
+    std::array<wchar_t, 1024> library = {};
+    GetPrivateProfileStringW(L"Isolation", L"Library", L"", library.data(), static_cast<DWORD>(library.size()),
+                             settings.c_str());
+    EXPECT_EQ(std::filesystem::path(library.data()).string(), Library());
+    EXPECT_EQ(GetPrivateProfileIntW(L"Isolation", L"SecondsWithoutAnswer", 0, settings.c_str()), 77u);
+    EXPECT_TRUE(std::filesystem::exists(folder / L"scc_proxy.dll"));
+    EXPECT_TRUE(std::filesystem::exists(folder / L"scc_host64.exe"));
 }
 
 } // namespace
@@ -269,6 +343,55 @@ TEST_F(Registration, OfAnIsolatedLibraryMakesAFolderWithItsProxy)
     EXPECT_EQ(Unregister(L"talk/ing").code, Success);
     EXPECT_FALSE(std::filesystem::exists(folder));
     EXPECT_EQ(Path(L"Talk/ing"), std::nullopt);
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryLetsOnlyAdministratorsWrite)
+{
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"}).code, Success);
+    const std::filesystem::path folder = IsolatedPath(L"TALKING");
+    for (const std::filesystem::path& path : {folder.parent_path(), folder, folder / L"scc_proxy.ini",
+                                              folder / L"scc_proxy.dll", folder / L"scc_host64.exe"})
+    {
+        const Access access(path);
+        EXPECT_FALSE(access.EverybodyMayWrite()) << path;
+        EXPECT_NE(access.everybodysRights, 0u) << "they may read " << path;
+    }
+    LetEverybodyWrite(Scratch());
+    if (Access(Scratch()).isProtected) // Wine does not keep that
+    {
+        EXPECT_TRUE(Access(folder.parent_path()).isProtected);
+        EXPECT_TRUE(Access(folder).isProtected);
+    }
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryTakesTheRightsFromWhoMadeTheFolderBefore)
+{
+    const std::filesystem::path folder = IsolatedPath(L"TALKING");
+    for (const std::filesystem::path& path : {folder.parent_path(), folder})
+    {
+        std::filesystem::create_directory(path);
+        LetEverybodyWrite(path);
+        ASSERT_TRUE(Access(path).EverybodyMayWrite());
+    }
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated"}).code, Success);
+    EXPECT_FALSE(Access(folder.parent_path()).EverybodyMayWrite());
+    EXPECT_FALSE(Access(folder).EverybodyMayWrite());
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
+}
+
+TEST_F(Registration, OfAnIsolatedLibraryThatCannotBeCopiedKeepsTheOneThatWasThere)
+{
+    const std::filesystem::path tools =
+        UseCopy({L"OrvixCore.dll", L"OrvixCoreUI.dll", L"braeutil.dll", L"scc_proxy.dll", L"scc_host64.exe"});
+    std::filesystem::create_directory(tools / L"scc_host32.exe"); // which cannot be copied as a file
+    ASSERT_EQ(RunExactly({L"register", ORVIX_TALKING_MSSCCI, L"Talking", L"--isolated", L"--patience", L"77"}).code,
+              Success);
+    const auto result = Register(ORVIX_ARCHIVE_32, L"Talking");
+    EXPECT_EQ(result.code, Failed);
+    EXPECT_THAT(result.errors, HasSubstr("scc_host32.exe cannot be copied"));
+    ExpectTalkingIsIsolated();
+    EXPECT_EQ(Unregister(L"Talking").code, Success);
 }
 
 TEST_F(Registration, OfAnIsolatedLibraryRemovesWhatLiesInItsFolder)
@@ -337,13 +460,7 @@ TEST_F(Registration, OfAnIsolatedLibraryThatFailsKeepsTheOneThatWasThere)
     std::filesystem::copy_file(ORVIX_TALKING_MSSCCI, copy);
     SetAccess(std::wstring(OwnKeys) + L"Talking", ReadAndDelete);
     EXPECT_EQ(RunExactly({L"register", copy, L"Talking", L"--isolated"}).code, Failed);
-    const std::filesystem::path settings = IsolatedPath(L"TALKING") / L"scc_proxy.ini";
-    std::array<wchar_t, 1024> library = {};
-    GetPrivateProfileStringW(L"Isolation", L"Library", L"", library.data(), static_cast<DWORD>(library.size()),
-                             settings.c_str());
-    EXPECT_EQ(std::filesystem::path(library.data()).string(), Library());
-    EXPECT_EQ(GetPrivateProfileIntW(L"Isolation", L"SecondsWithoutAnswer", 0, settings.c_str()), 77u);
-    EXPECT_TRUE(std::filesystem::exists(IsolatedPath(L"TALKING") / L"scc_proxy.dll"));
+    ExpectTalkingIsIsolated();
     EXPECT_EQ(Unregister(L"Talking").code, Success);
 }
 

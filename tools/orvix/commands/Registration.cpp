@@ -71,11 +71,6 @@ Registration::Registration(const std::wstring& name) : m_name(name), m_keyPath(O
 
 void Registration::CheckLibrary(const std::wstring& path)
 {
-    if (path.size() > MaxPath)
-    {
-        throw ToolError(ExitCode::BadUsage,
-                        L"the path of the library is longer than " + std::to_wstring(MaxPath) + L" characters");
-    }
     if (!PathExists(path) || IsFolder(path))
     {
         throw ToolError(ExitCode::NotFound, L"no such library: " + path);
@@ -94,6 +89,11 @@ void Registration::CheckLibrary(const std::wstring& path)
 
 std::optional<std::wstring> Registration::Set(const std::wstring& library)
 {
+    if (library.size() > MaxPath)
+    {
+        throw ToolError(ExitCode::BadUsage,
+                        L"the path of the library is longer than " + std::to_wstring(MaxPath) + L" characters");
+    }
     CheckLibrary(library);
     return Set([&library] { return library; });
 }

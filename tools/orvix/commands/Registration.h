@@ -17,15 +17,15 @@ public:
     explicit Registration(const std::wstring& name);
 
     /// Registers the library of this full path. Returns the path that it replaces, if any. Throws `ToolError` and
-    /// leaves the registry as it was: with `ExitCode::NotFound` when there is no such library, with `ExitCode::Failed`
-    /// when the name belongs to another program.
+    /// leaves the registry as it was: with `ExitCode::BadUsage` when the path is too long, with `ExitCode::NotFound`
+    /// when there is no such library, with `ExitCode::Failed` when the name belongs to another program.
     std::optional<std::wstring> Set(const std::wstring& library);
 
     /// The same for a library that `make` makes once nothing else speaks against the registration.
     std::optional<std::wstring> Set(const std::function<std::wstring()>& make);
 
-    /// Throws `ToolError` with `ExitCode::NotFound` when a 64-bit host cannot use the library, with
-    /// `ExitCode::BadUsage` when its path is too long. None of the library's code runs.
+    /// Throws `ToolError` with `ExitCode::NotFound` when a 64-bit host cannot use the library. None of the library's
+    /// code runs.
     static void CheckLibrary(const std::wstring& path);
 
     /// Removes the registration. Throws `ToolError`: with `ExitCode::NotFound` when there is none, with

@@ -35,6 +35,26 @@ void RefuseProxy(const std::wstring& library)
     }
 }
 
+/// Restores the folder as it was before a registration that failed. A failure here says less than that one.
+void UndoMake(const IsolatedFolder& folder, bool isNew, const IsolationSettings& before)
+{
+    try
+    {
+        if (isNew)
+        {
+            folder.Remove();
+        }
+        else if (!before.library.empty()) // the registration that stays is for this library
+        {
+            folder.Make(before.library.wstring(), before.bits, before.patience);
+        }
+    }
+    catch (const ToolError&)
+    {
+        return;
+    }
+}
+
 /// Registers the proxy of an isolated library. Returns the path that it replaces, if any.
 std::optional<std::wstring> SetIsolated(Registration& registration, const IsolatedFolder& folder,
                                         const std::wstring& library, int bits, std::chrono::seconds patience)
@@ -49,25 +69,13 @@ std::optional<std::wstring> SetIsolated(Registration& registration, const Isolat
     }
     const bool isNew = !folder.Exists();
     const IsolationSettings before = folder.Settings();
-    bool isMade = false;
     try
     {
-        return registration.Set([&] {
-            std::wstring proxy = folder.Make(library, bits, patience);
-            isMade = true;
-            return proxy;
-        });
+        return registration.Set([&] { return folder.Make(library, bits, patience); });
     }
     catch (const ToolError&)
     {
-        if (isNew)
-        {
-            folder.Remove();
-        }
-        else if (isMade && !before.library.empty()) // the registration that stays is for the library before
-        {
-            folder.Make(before.library.wstring(), before.bits, before.patience);
-        }
+        UndoMake(folder, isNew, before);
         throw;
     }
 }
