@@ -34,8 +34,8 @@ struct State
 static_assert(sizeof(State) == 152 && offsetof(State, callAnswer) == 144 && offsetof(State, backgroundAnswer) == 148);
 
 constexpr std::size_t StateBytes = 4096;
-constexpr std::size_t RequestBytes = std::size_t{48} << 20;    ///< 100,000 paths of the greatest length fit
-constexpr std::size_t ReplyBytes = std::size_t{15} << 20;      ///< replies, and callbacks of the running call
+constexpr std::size_t RequestBytes = std::size_t{32} << 20; ///< 100,000 paths of the greatest length fit
+constexpr std::size_t ReplyBytes = std::size_t{31} << 20;   ///< replies, callbacks of the running call; as many paths
 constexpr std::size_t BackgroundBytes = std::size_t{64} << 10; ///< callbacks from other threads or between calls
 constexpr std::size_t TotalBytes = StateBytes + RequestBytes + ReplyBytes + BackgroundBytes;
 
