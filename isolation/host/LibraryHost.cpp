@@ -79,13 +79,13 @@ bool LibraryHost::Run()
     {
         for (bool more = true; more;)
         {
-            if (MsgWaitForMultipleObjects(1, &requested, FALSE, INFINITE, QS_ALLINPUT) == WAIT_OBJECT_0)
+            if (MsgWaitForMultipleObjectsEx(1, &requested, INFINITE, QS_ALLINPUT, MWMO_INPUTAVAILABLE) == WAIT_OBJECT_0)
             {
                 more = Perform();
             }
             else
             {
-                DispatchMessages();
+                DispatchOneMessage();
             }
         }
         return true;
@@ -151,10 +151,11 @@ void LibraryHost::Load(MessageReader& request, MessageWriter& reply)
     ReportCrashTo(m_memory.GetState().crash);
 }
 
-void LibraryHost::DispatchMessages()
+/// Only one: a window may ask for painting without an end.
+void LibraryHost::DispatchOneMessage()
 {
     MSG message;
-    while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE))
+    if (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE))
     {
         TranslateMessage(&message);
         DispatchMessageW(&message);

@@ -36,7 +36,7 @@ private:
 
     bool Perform();
     void Load(MessageReader& request, MessageWriter& reply);
-    void DispatchMessages();
+    static void DispatchOneMessage();
 
     /// Asks the host, from any thread, and returns its answer. `fallback` when the question does not fit.
     LONG Ask(MessageKind kind, LONG fallback, const std::function<void(MessageWriter&)>& write);

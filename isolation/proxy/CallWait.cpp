@@ -14,11 +14,14 @@ constexpr auto ShortCall = 200ms;
 // Without a window of the library, until the small window appears.
 constexpr auto UntilWindow = 5s;
 
-// Between two looks at the library while the small window is shown.
-constexpr std::chrono::microseconds Moment = 100ms;
+// Between two turns of the small window.
+constexpr std::chrono::milliseconds WindowPeriod = 50ms;
 
 // How often the library's windows are looked for in a long call.
 constexpr auto LookPeriod = 250ms;
+
+// Without a look for so long, this thread did not run either: the machine slept, or a dialog of the host ran.
+constexpr auto LongPause = 20 * LookPeriod;
 
 bool IsInput(UINT message)
 {
@@ -39,12 +42,22 @@ CallWait::Result CallWait::For(HANDLE event)
     for (;;)
     {
         const bool isLong = Clock::now() - m_start >= ShortCall;
+        // Before the wait, which a library that calls back all the time ends at once.
+        if (isLong && Look() == Result::Hangs)
+        {
+            return WaitForSingleObject(event, 0) == WAIT_OBJECT_0 ? Result::Signalled : Result::Hangs;
+        }
+        if (m_isWindowDue && m_window->IsCancelled())
+        {
+            return Result::UserEnds;
+        }
         const auto timeout = static_cast<DWORD>(std::chrono::milliseconds(isLong ? LookPeriod : ShortCall).count());
         const bool takesAll = isLong && !m_isQuitting && !m_isWindowDue;
-        const DWORD result = m_isWindowDue  ? WaitWithWindow(handles)
-                             : m_hasWindows ? MsgWaitForMultipleObjects(2, handles, FALSE, timeout,
-                                                                        takesAll ? QS_ALLINPUT : QS_SENDMESSAGE)
-                                            : WaitForMultipleObjects(2, handles, FALSE, timeout);
+        const DWORD result =
+            m_isWindowDue  ? WaitWithWindow(handles)
+            : m_hasWindows ? MsgWaitForMultipleObjectsEx(2, handles, timeout, takesAll ? QS_ALLINPUT : QS_SENDMESSAGE,
+                                                         MWMO_INPUTAVAILABLE)
+                           : WaitForMultipleObjects(2, handles, FALSE, timeout);
         switch (result)
         {
         case WAIT_OBJECT_0:
@@ -57,17 +70,9 @@ CallWait::Result CallWait::For(HANDLE event)
         default:
             return Result::Ended;
         }
-        if (m_isWindowDue && m_window->IsCancelled())
-        {
-            return Result::UserEnds;
-        }
         if (m_hasWindows && !m_isWindowDue)
         {
             Dispatch(takesAll);
-        }
-        if (const Result look = isLong ? Look() : Result::Signalled; look != Result::Signalled)
-        {
-            return look;
         }
     }
 }
@@ -79,26 +84,25 @@ std::chrono::seconds CallWait::Elapsed() const
 
 DWORD CallWait::WaitWithWindow(const HANDLE* handles)
 {
-    LARGE_INTEGER moment{};
-    moment.QuadPart = -Moment.count() * 10; // from now, in units of 100 nanoseconds
-    SetWaitableTimer(m_moment.Get(), &moment, 0, nullptr, nullptr, FALSE);
-    m_window->Wait(m_moment.Get());
-    return WaitForMultipleObjects(2, handles, FALSE, 0);
+    const DWORD woken = MsgWaitForMultipleObjectsEx(2, handles, static_cast<DWORD>(WindowPeriod.count()),
+                                                    QS_PAINT | QS_SENDMESSAGE, MWMO_INPUTAVAILABLE);
+    if (woken >= WAIT_OBJECT_0 + 2 || Clock::now() - m_lastUpdate >= WindowPeriod)
+    {
+        m_window->Update();
+        m_lastUpdate = Clock::now();
+    }
+    return woken;
 }
 
 /// Its time runs from now on.
 void CallWait::MakeWindow()
 {
-    m_moment.Reset(CreateWaitableTimerW(nullptr, TRUE, nullptr));
-    if (!m_moment)
-    {
-        return; // the call goes on without the window
-    }
     m_window = std::make_unique<OrvixWaitingWindow>(m_parent, m_texts.library.c_str(), L"End it");
     m_window->SetTask((m_texts.library + L" is working on " + m_texts.function + L'.').c_str());
     m_window->SetProgress(L"Ending it loses what it has not finished.", -1);
 }
 
+/// Dispatches one message: a window may ask for painting without an end.
 void CallWait::Dispatch(bool takesAll)
 {
     MSG message;
@@ -107,18 +111,18 @@ void CallWait::Dispatch(bool takesAll)
         PeekMessageW(&message, nullptr, 0, 0, PM_NOREMOVE | PM_QS_SENDMESSAGE);
         return;
     }
-    while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE))
+    if (!PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE))
     {
-        if (message.message == WM_QUIT)
-        {
-            PostQuitMessage(static_cast<int>(message.wParam)); // for the host's own loop
-            m_isQuitting = true;
-            return;
-        }
-        if (!IsInput(message.message))
-        {
-            DispatchMessageW(&message);
-        }
+        return;
+    }
+    if (message.message == WM_QUIT)
+    {
+        PostQuitMessage(static_cast<int>(message.wParam)); // for the host's own loop
+        m_isQuitting = true;
+    }
+    else if (!IsInput(message.message))
+    {
+        DispatchMessageW(&message);
     }
 }
 
@@ -129,6 +133,10 @@ CallWait::Result CallWait::Look()
     if (now - m_lastLook < LookPeriod)
     {
         return Result::Signalled;
+    }
+    if (now - m_lastLook >= LongPause)
+    {
+        Restart();
     }
     m_lastLook = now;
     if (m_process.ShowsWindow())
@@ -147,5 +155,13 @@ CallWait::Result CallWait::Look()
         m_signs = signs;
         Restart();
     }
-    return now - m_lastSign >= m_patience ? Result::Hangs : Result::Signalled;
+    if (now - m_lastSign >= m_patience)
+    {
+        return Result::Hangs;
+    }
+    if (m_hasWindows && !m_isWindowDue)
+    {
+        Dispatch(!m_isQuitting); // which a library that calls back all the time leaves no other time for
+    }
+    return Result::Signalled;
 }

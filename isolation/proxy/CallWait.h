@@ -2,7 +2,6 @@
 
 #include "LibraryProcess.h"
 #include "OrvixWaitingWindow.h"
-#include "UniqueHandle.h"
 
 #include <chrono>
 #include <memory>
@@ -44,7 +43,7 @@ public:
 private:
     using Clock = std::chrono::steady_clock;
 
-    /// As WaitForMultipleObjects, for a moment, while the small window is shown.
+    /// As WaitForMultipleObjects, for a moment, while the small window is shown, which has its turns meanwhile.
     DWORD WaitWithWindow(const HANDLE* handles);
     void MakeWindow();
     void Dispatch(bool takesAll);
@@ -56,11 +55,11 @@ private:
     Texts m_texts;
     std::unique_ptr<OrvixWaitingWindow> m_window; ///< null in a short call, and while the library shows a window
     bool m_isWindowDue = false;                   ///< it is shown
-    UniqueKernelHandle m_moment;                  ///< a timer
     Clock::time_point m_start = Clock::now();
     Clock::time_point m_lastSign = m_start;
     Clock::time_point m_lastLook = m_start;
     Clock::time_point m_lastWindow = m_start; ///< of the library
+    Clock::time_point m_lastUpdate = m_start; ///< of the small window
     unsigned int m_signs = m_process.Signs();
     bool m_isQuitting = false;
     bool m_hasWindows = IsGUIThread(FALSE) != FALSE;
