@@ -37,14 +37,36 @@ bool IsApartment()
     return CoGetApartmentType(&type, &qualifier) == S_OK && (type == APTTYPE_STA || type == APTTYPE_MAINSTA);
 }
 
-/// Lets other threads send messages to the windows of this one for at most so long.
+// A thread handles painting in a wait, one at a time: its window may call the library before it validates what it
+// paints, and then waits itself. Not thread_local, which costs handles in a DLL that is loaded and unloaded.
+std::atomic<bool> isPainting = false;
+
+/// Waits for at most so long. Meanwhile the windows of this thread are painted, and other threads send messages to
+/// them.
 void WaitHandlingMessages(HANDLE handle, DWORD milliseconds)
 {
     const DWORD count = handle != nullptr ? 1 : 0;
-    if (MsgWaitForMultipleObjects(count, &handle, FALSE, milliseconds, QS_SENDMESSAGE) != WAIT_OBJECT_0 || count == 0)
+    const DWORD wakeMask = isPainting ? QS_SENDMESSAGE : QS_PAINT | QS_SENDMESSAGE;
+    if (MsgWaitForMultipleObjectsEx(count, &handle, milliseconds, wakeMask, MWMO_INPUTAVAILABLE) == WAIT_OBJECT_0 &&
+        count != 0)
     {
-        MSG message;
-        PeekMessageW(&message, nullptr, 0, 0, PM_NOREMOVE | PM_QS_SENDMESSAGE);
+        return;
+    }
+    const bool mayPaint = !isPainting.exchange(true);
+    MSG message;
+    const bool isThere =
+        PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE | PM_QS_SENDMESSAGE | (mayPaint ? PM_QS_PAINT : 0)) != FALSE;
+    if (isThere && message.message == WM_QUIT)
+    {
+        PostQuitMessage(static_cast<int>(message.wParam)); // for the host's own loop
+    }
+    else if (isThere)
+    {
+        DispatchMessageW(&message);
+    }
+    if (mayPaint)
+    {
+        isPainting = false;
     }
 }
 
@@ -124,6 +146,7 @@ void IsolatedLibrary::Start()
                                       : m_settings.name + L" has the code page " + std::to_wstring(codePage) +
                                             L" in its own process, not " + std::to_wstring(GetACP()));
         m_process.reset();
+        m_isSent = false; // nothing is left that a later failure would have to end
         m_state = State::NotStarted;
         throw Failure{SCC_E_INITIALIZEFAILED};
     }
@@ -159,11 +182,12 @@ MessageReader IsolatedLibrary::Exchange(MessageWriter& request)
         SetEvent(m_process->Requested());
     }
     const std::wstring function = Wide(m_function);
-    const std::wstring seconds = std::to_wstring(wait.Elapsed().count());
     Lose(result == CallWait::Result::Ended ? m_process->WhyEnded(function)
          : result == CallWait::Result::Hangs
-             ? L"hangs in " + function + L" and was ended: no answer and no window for " + seconds + L" seconds"
-             : L"was ended by the user, " + seconds + L" seconds after the start of " + function);
+             ? L"hangs in " + function + L" and was ended: no answer and no window for " +
+                   std::to_wstring(m_settings.patience.count()) + L" seconds"
+             : L"was ended by the user, " + std::to_wstring(wait.Elapsed().count()) + L" seconds after the start of " +
+                   function);
     throw Failure{SCC_E_NONSPECIFICERROR};
 }
 
@@ -323,7 +347,7 @@ SCCRTN IsolatedLibrary::End()
     }
     const SCCRTN result =
         Try(SccCalls::Uninitialize.name, [this] { return ExchangeCall(SccCalls::Uninitialize, nullptr); });
-    if (IsLost())
+    if (m_state != State::Running)
     {
         return result;
     }

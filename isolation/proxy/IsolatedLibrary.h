@@ -104,7 +104,7 @@ private:
         {
             if (m_state == State::NotStarted)
             {
-                m_function = "SccGetVersion";
+                m_function = "its start";
                 Start();
             }
             m_function = function;
@@ -140,7 +140,8 @@ private:
         return result;
     }
 
-    /// Calls SccUninitialize, unloads the library and ends its process, in the turn of this thread.
+    /// Calls SccUninitialize, unloads the library and ends its process, in the turn of this thread. Unloading may take
+    /// five seconds, whatever the patience: the host may be about to end.
     SCCRTN End();
 
     /// Starts the process, which loads the library. Throws `Failure`.

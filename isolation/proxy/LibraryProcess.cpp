@@ -81,7 +81,7 @@ constexpr ExceptionName ExceptionNames[] = {
     {EXCEPTION_PRIV_INSTRUCTION, L"privileged instruction"},
     {EXCEPTION_IN_PAGE_ERROR, L"a page of memory could not be read"},
     {0xC0000374, L"damaged heap"},
-    {0xC0000409, L"damaged stack"},
+    {0xC0000409, L"abort, or a failed security check"},
     {0xE06D7363, L"C++ exception"},
     {0x20474343, L"C++ exception"},
 };

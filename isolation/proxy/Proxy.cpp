@@ -106,7 +106,7 @@ SCCRTN SccUninitialize(LPVOID context)
     return Guarded([&] {
         if (context == nullptr)
         {
-            return Forward(SccCalls::Uninitialize, context);
+            return contexts.Take()->Uninitialize();
         }
         const std::shared_ptr<IsolatedLibrary> library = contexts.Remove(context);
         return library ? library->Uninitialize() : SCC_E_INITIALIZEFAILED;
