@@ -17,8 +17,15 @@
 class IsolationTest : public testing::Test
 {
 public:
-    /// What a host loads to use the misbehaving library isolated, with a patience of two seconds.
+    /// What a host loads to use the misbehaving library isolated, with a patience that a busy machine does not reach.
     static std::filesystem::path Proxy()
+    {
+        static const IsolatedCopy isolated(ORVIX_MISBEHAVING_SCC, std::chrono::seconds(60));
+        return isolated.Proxy();
+    }
+
+    /// The same with a patience of two seconds.
+    static std::filesystem::path ImpatientProxy()
     {
         static const IsolatedCopy isolated(ORVIX_MISBEHAVING_SCC, std::chrono::seconds(2));
         return isolated.Proxy();
@@ -80,7 +87,7 @@ protected:
 
         SCCRTN Open(LPTEXTOUTPROC output = Output)
         {
-            return m_library.openProject(context, m_window, user.data(), project.data(), "C:\\project", auxPath.data(),
+            return m_library.openProject(context, m_window, user.data(), project.data(), folder.data(), auxPath.data(),
                                          "comment", output, SCC_OP_CREATEIFNEW);
         }
         SCCRTN Get(LPCMDOPTS block = nullptr)
@@ -98,6 +105,7 @@ protected:
         std::array<char, 512> label{"Aux"};
         std::array<char, 512> user{"Ben"};
         std::array<char, 512> project{"project"};
+        std::array<char, 512> folder{"C:\\project"}; // a library writes to it
         std::array<char, 512> auxPath{"path"};
         LONG capabilities = 0;
         LONG checkoutLength = 0;

@@ -4,6 +4,7 @@
 #include "Defect.h"
 #include "MSSCCI.h"
 #include "ModulePath.h"
+#include "UniqueHandle.h"
 
 #include <objbase.h>
 
@@ -18,6 +19,7 @@
 #include <string>
 #include <string_view>
 #include <thread>
+#include <utility>
 #include <vector>
 
 namespace
@@ -26,11 +28,12 @@ namespace
 LPTEXTOUTPROC printer = nullptr;
 std::vector<std::string> waiting; // lines that there was no printer for
 HWND parent = nullptr;
+HWND painting = nullptr;
 int session = 0;
 int optionBlock = 0;
 POPLISTFUNC lister = nullptr; // of the last SccPopulateList
 LPVOID listerData = nullptr;
-std::array<LPCSTR, 2> found = {"C:\\project\\one.txt", "C:\\project\\two.txt"};
+std::vector<LPCSTR> found = {"C:\\project\\one.txt", "C:\\project\\two.txt"};
 
 void Print(const std::string& line)
 {
@@ -141,6 +144,43 @@ void PrintForLong()
     }
 }
 
+/// Works on until the host sets an event, and a little longer.
+void WorkUntilTheHostSays()
+{
+    const UniqueKernelHandle event(OpenEventW(SYNCHRONIZE, FALSE, L"OrvixTestGoOn"));
+    WaitForSingleObject(event.Get(), 30000);
+    Sleep(500);
+}
+
+LRESULT CALLBACK PaintForEver(HWND window, UINT message, WPARAM first, LPARAM second)
+{
+    const LRESULT result = DefWindowProcW(window, message, first, second);
+    if (message == WM_PAINT)
+    {
+        InvalidateRect(window, nullptr, FALSE);
+    }
+    return result;
+}
+
+/// Shows a window until SccUninitialize.
+void ShowWindowThatPaintsForEver()
+{
+    painting =
+        CreateWindowExW(0, L"STATIC", L"", WS_POPUP | WS_VISIBLE, 0, 0, 50, 50, nullptr, nullptr, nullptr, nullptr);
+    SetWindowLongPtrW(painting, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(&PaintForEver));
+    InvalidateRect(painting, nullptr, FALSE);
+}
+
+/// Until the process is ended, or for a minute.
+void PrintWithoutPause()
+{
+    const ULONGLONG end = GetTickCount64() + 60000;
+    while (GetTickCount64() < end)
+    {
+        Print("chatter");
+    }
+}
+
 /// Uses a callback that was valid in an earlier call only.
 void ListLate()
 {
@@ -194,10 +234,6 @@ void Misbehave(const char* function, HWND window)
     {
         std::thread(Defect::Crash).join();
     }
-    if (is(L"hang"))
-    {
-        Defect::Hang();
-    }
     if (is(L"slow"))
     {
         Sleep(1500);
@@ -209,6 +245,22 @@ void Misbehave(const char* function, HWND window)
     if (is(L"murmur"))
     {
         std::thread(PrintForLong).join();
+    }
+    if (is(L"work"))
+    {
+        WorkUntilTheHostSays();
+    }
+    if (is(L"paint"))
+    {
+        ShowWindowThatPaintsForEver();
+    }
+    if (is(L"chatter"))
+    {
+        PrintWithoutPause();
+    }
+    if (is(L"hang")) // after what else there is
+    {
+        Defect::Hang();
     }
     if (is(L"list") && lister != nullptr)
     {
@@ -290,6 +342,10 @@ SCCRTN SccInitialize(LPVOID* context, HWND window, LPCSTR caller, LPSTR sccName,
 
 SCCRTN SccUninitialize(LPVOID context)
 {
+    if (painting != nullptr)
+    {
+        DestroyWindow(std::exchange(painting, nullptr));
+    }
     return Call(__func__, nullptr, Context(context));
 }
 
@@ -436,6 +492,11 @@ SCCRTN SccAddFromScc(LPVOID context, HWND window, LPLONG count, LPCSTR** names)
 {
     Call(__func__, window, Context(context), Show(window), count != nullptr ? Show(*count) : "null",
          count != nullptr && *count == 1 && names != nullptr ? Show(**names) : "none");
+    if (Defect::Is(L"many-SccAddFromScc"))
+    {
+        static const std::string longest = "C:\\project\\" + std::string(MAX_PATH - 12, 'x');
+        found.assign(100000, longest.c_str());
+    }
     if (count != nullptr)
     {
         *count = static_cast<LONG>(found.size());
@@ -457,6 +518,14 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, LPVOID)
     if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"crash-load"))
     {
         Defect::Crash();
+    }
+    if (reason == DLL_PROCESS_ATTACH && Defect::Is(L"kill-load"))
+    {
+        TerminateProcess(GetCurrentProcess(), 9);
+    }
+    if (reason == DLL_PROCESS_DETACH && Defect::Is(L"hang-unload"))
+    {
+        Defect::Hang();
     }
     return reason != DLL_PROCESS_ATTACH || !Defect::Is(L"refuse-load");
 }

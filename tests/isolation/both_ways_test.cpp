@@ -4,6 +4,7 @@
 
 #include <gmock/gmock.h>
 
+#include <algorithm>
 #include <set>
 #include <sstream>
 
@@ -212,16 +213,23 @@ TEST_F(BothWaysTest, TextArrivesFromThreadsAndBetweenCalls)
         Session session(library);
         ASSERT_EQ(session.Open(), SCC_OK);
         ASSERT_EQ(session.Get(), SCC_OK);
-        EXPECT_THAT(Lines(), testing::Contains("from a thread"));
-        Sleep(1500);
-        EXPECT_THAT(Lines(), testing::ElementsAre("between calls"));
+        std::vector<std::string> lines = Lines();
+        EXPECT_THAT(lines, testing::Contains("from a thread"));
+        const ULONGLONG end = GetTickCount64() + 10000;
+        while (std::find(lines.begin(), lines.end(), "between calls") == lines.end() && GetTickCount64() < end)
+        {
+            Sleep(10);
+            const std::vector<std::string> more = Lines();
+            lines.insert(lines.end(), more.begin(), more.end());
+        }
+        EXPECT_EQ(std::count(lines.begin(), lines.end(), "between calls"), 1);
     }
 }
 
 TEST_F(BothWaysTest, ACallTakesAHundredThousandFiles)
 {
     constexpr LONG Count = 100000;
-    const std::string text = "C:\\project\\" + std::string(200, 'x') + ".txt";
+    const std::string text = "C:\\project\\" + std::string(MAX_PATH - 12, 'x');
     std::vector<LPCSTR> names(Count, text.c_str());
     for (const std::filesystem::path& file : BothWays())
     {
@@ -231,6 +239,38 @@ TEST_F(BothWaysTest, ACallTakesAHundredThousandFiles)
         ASSERT_EQ(library.queryInfo(session.context, Count, names.data(), status.data()), SCC_OK);
         EXPECT_EQ(status, std::vector<LONG>(Count, static_cast<LONG>(text.size())));
     }
+}
+
+TEST_F(BothWaysTest, AnAnswerTakesAHundredThousandFiles)
+{
+    Misbehave(L"many-SccAddFromScc");
+    for (const std::filesystem::path& file : BothWays())
+    {
+        const SccLibrary library(file);
+        Session session(library);
+        LONG count = 0;
+        LPCSTR* names = nullptr;
+        ASSERT_EQ(library.addFromScc(session.context, nullptr, &count, &names), SCC_OK);
+        ASSERT_EQ(count, 100000);
+        EXPECT_EQ(std::string(names[0]).size(), MAX_PATH - 1u);
+        EXPECT_STREQ(names[count - 1], names[0]);
+    }
+}
+
+TEST_F(BothWaysTest, TheEndWithoutAContextLeavesNoProcess)
+{
+    std::vector<SCCRTN> results;
+    for (const std::filesystem::path& file : BothWays())
+    {
+        const SccLibrary library(file);
+        results.push_back(library.uninitialize(nullptr));
+        EXPECT_EQ(Processes(), 0u);
+    }
+    EXPECT_EQ(results[1], results[0]);
+    Misbehave(L"refuse-load");
+    const SccLibrary library(Proxy());
+    EXPECT_LT(library.uninitialize(nullptr), SCC_OK);
+    EXPECT_EQ(Processes(), 0u);
 }
 
 TEST_F(BothWaysTest, TheLibraryHasTheHostsFolderAndCodePage)

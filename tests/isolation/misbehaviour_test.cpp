@@ -1,15 +1,19 @@
 #include "Display.h"
+#include "IsolatedLibrary.h"
 #include "IsolationTest.h"
 #include "TempFolder.h"
 
 #include <gmock/gmock.h>
 
+#include <atomic>
 #include <cfloat>
 #include <chrono>
 #include <clocale>
 #include <cstdlib>
 #include <filesystem>
 #include <functional>
+#include <memory>
+#include <string_view>
 #include <tuple>
 
 using testing::AnyOf;
@@ -86,7 +90,7 @@ constexpr Function Batch[] = {{"SccBeginBatch", [](const SccLibrary& library, LP
 /// A way to die, and what the host's user reads about it.
 struct Death
 {
-    const char* defect;
+    std::string_view defect;
     const char* said;
 };
 
@@ -121,7 +125,14 @@ protected:
         EXPECT_EQ(Processes(), 0u);
     }
 
+    /// The library for a way to die: hangs are waited for.
+    const SccLibrary& LibraryFor(const Death& death) const
+    {
+        return death.defect == Hang.defect ? m_impatient : m_library;
+    }
+
     const SccLibrary m_library{Proxy()};
+    const SccLibrary m_impatient{ImpatientProxy()};
 };
 
 class EveryFunction : public MisbehaviourTest, public testing::WithParamInterface<std::tuple<Function, Death>>
@@ -130,7 +141,7 @@ class EveryFunction : public MisbehaviourTest, public testing::WithParamInterfac
 
 std::string NameOf(const testing::TestParamInfo<std::tuple<Function, Death>>& info)
 {
-    return std::string(std::get<Function>(info.param).name) + '_' + std::get<Death>(info.param).defect;
+    return std::string(std::get<Function>(info.param).name) + '_' + std::string(std::get<Death>(info.param).defect);
 }
 
 } // namespace
@@ -139,15 +150,16 @@ TEST_P(EveryFunction, MayEndTheProcessAndTheHostGoesOn)
 {
     const auto& [function, death] = GetParam();
     Misbehave(Wide(std::string(death.defect) + '-' + function.name));
+    const SccLibrary& library = LibraryFor(death);
     {
-        Session session(m_library);
+        Session session(library);
         ASSERT_EQ(session.Open(), SCC_OK);
         const Clock::time_point start = Clock::now();
-        EXPECT_EQ(function.call(m_library, session.context), SCC_E_NONSPECIFICERROR);
+        EXPECT_EQ(function.call(library, session.context), SCC_E_NONSPECIFICERROR);
         EXPECT_LT(Clock::now() - start, 20s);
         EXPECT_THAT(Text(), HasSubstr("error: Isolated " + Replace(death.said, "FUNCTION", function.name)));
         EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
-        EXPECT_EQ(function.call(m_library, session.context), SCC_E_NONSPECIFICERROR);
+        EXPECT_EQ(function.call(library, session.context), SCC_E_NONSPECIFICERROR);
         EXPECT_EQ(session.Open(), SCC_E_NONSPECIFICERROR);
         EXPECT_EQ(session.Uninitialize(), SCC_E_NONSPECIFICERROR);
         EXPECT_EQ(Text(), "") << "it is said once";
@@ -169,14 +181,14 @@ TEST_F(MisbehaviourTest, EveryFunctionMayHang)
     for (const Function& function : Functions)
     {
         Misbehave(L"hang-" + Wide(function.name));
-        sessions.push_back(std::make_unique<Session>(m_library));
+        sessions.push_back(std::make_unique<Session>(m_impatient));
         ASSERT_EQ(sessions.back()->Open(), SCC_OK);
     }
     std::array<SCCRTN, std::size(Functions)> results = {};
     std::vector<std::thread> callers;
     for (std::size_t i = 0; i < results.size(); ++i)
     {
-        callers.emplace_back([&, i] { results[i] = Functions[i].call(m_library, sessions[i]->context); });
+        callers.emplace_back([&, i] { results[i] = Functions[i].call(m_impatient, sessions[i]->context); });
     }
     for (std::thread& caller : callers)
     {
@@ -192,6 +204,27 @@ TEST_F(MisbehaviourTest, EveryFunctionMayHang)
     ExpectWorks();
 }
 
+TEST_F(MisbehaviourTest, AHangAfterSignsOfLifeIsSaidToLastAsLongAsThePatience)
+{
+    Misbehave(L"talk-SccGet hang-SccGet");
+    Session session(m_impatient);
+    ASSERT_EQ(session.Open(), SCC_OK);
+    EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
+    EXPECT_THAT(Text(), HasSubstr("hangs in SccGet and was ended: no answer and no window for 2 seconds"));
+}
+
+TEST_F(MisbehaviourTest, AHangAfterTheEndIsEndedSoonWhateverThePatience)
+{
+    Misbehave(L"hang-unload");
+    Session session(m_library);
+    ASSERT_EQ(session.Open(), SCC_OK);
+    const Clock::time_point start = Clock::now();
+    EXPECT_EQ(session.Uninitialize(), SCC_OK);
+    EXPECT_LT(Clock::now() - start, 40s);
+    EXPECT_THAT(Text(), HasSubstr("hangs in SccUninitialize and was ended: no answer and no window for 5 seconds"));
+    ExpectWorks();
+}
+
 namespace
 {
 
@@ -199,6 +232,8 @@ class EveryDeath : public MisbehaviourTest, public testing::WithParamInterface<D
 {
 protected:
     void MisbehaveIn(const char* function) const { Misbehave(Wide(std::string(GetParam().defect) + '-' + function)); }
+
+    const SccLibrary& m_dying = LibraryFor(GetParam());
 };
 
 } // namespace
@@ -206,16 +241,16 @@ protected:
 TEST_P(EveryDeath, MayComeBeforeTheStart)
 {
     MisbehaveIn("SccGetVersion");
-    EXPECT_EQ(m_library.getVersion(), 0);
+    EXPECT_EQ(m_dying.getVersion(), 0);
     MisbehaveIn("SccInitialize");
-    EXPECT_EQ(Session(m_library).result, SCC_E_NONSPECIFICERROR);
+    EXPECT_EQ(Session(m_dying).result, SCC_E_NONSPECIFICERROR);
     ExpectWorks();
 }
 
 TEST_P(EveryDeath, MayComeWhenTheProjectIsOpened)
 {
     MisbehaveIn("SccOpenProject");
-    Session session(m_library);
+    Session session(m_dying);
     EXPECT_EQ(session.Open(), SCC_E_NONSPECIFICERROR);
     EXPECT_THAT(Text(), HasSubstr(Replace(GetParam().said, "FUNCTION", "SccOpenProject")));
     EXPECT_EQ(session.Uninitialize(), SCC_E_NONSPECIFICERROR);
@@ -225,7 +260,7 @@ TEST_P(EveryDeath, MayComeWhenTheProjectIsOpened)
 TEST_P(EveryDeath, MayComeAtTheEnd)
 {
     MisbehaveIn("SccUninitialize");
-    Session session(m_library);
+    Session session(m_dying);
     ASSERT_EQ(session.Open(), SCC_OK);
     EXPECT_EQ(session.Uninitialize(), SCC_E_NONSPECIFICERROR);
     EXPECT_THAT(Text(), HasSubstr(Replace(GetParam().said, "FUNCTION", "SccUninitialize")));
@@ -326,6 +361,18 @@ TEST_F(MisbehaviourTest, ALibraryMayCrashOrRefuseWhenItIsLoaded)
     ExpectWorks();
 }
 
+TEST_F(MisbehaviourTest, ALibraryMayEndItsProcessWhenItIsLoaded)
+{
+    Misbehave(L"kill-load");
+    EXPECT_EQ(m_library.getVersion(), 0);
+    EXPECT_EQ(Session(m_library).result, SCC_E_NONSPECIFICERROR);
+    const auto library =
+        std::make_shared<IsolatedLibrary>(IsolationSettings::Read(Proxy().parent_path()), std::wstring());
+    EXPECT_EQ(library->Call(SccCalls::GetVersion), SCC_E_NONSPECIFICERROR);
+    EXPECT_THAT(library->LastReport(), StartsWith(L"Isolated ended its process in its start, with exit code 9"));
+    ExpectWorks();
+}
+
 TEST_F(MisbehaviourTest, ACrashInOneContextSparesTheOthers)
 {
     Session good(m_library);
@@ -342,7 +389,7 @@ TEST_F(MisbehaviourTest, ALibraryThatTalksIsNotEnded)
     for (const wchar_t* how : {L"talk-SccGet", L"murmur-SccGet"}) // on its own thread, and on another one
     {
         Misbehave(how);
-        Session session(m_library);
+        Session session(m_impatient);
         session.Open();
         const Clock::time_point start = Clock::now();
         EXPECT_EQ(session.Get(), SCC_OK);
@@ -450,6 +497,9 @@ namespace
 
 constexpr UINT Question = WM_APP;
 
+/// What the library waits for that works until the host says.
+const wchar_t* const GoOnEvent = L"OrvixTestGoOn";
+
 /// A window of the host, which counts its messages and calls the library when a timer fires.
 class HostWindow
 {
@@ -475,6 +525,9 @@ public:
     int clicks = 0;
     SCCRTN inner = SCC_OK; ///< the result of a call of the library within another one
     LPVOID context = nullptr;
+    std::function<void()> beforePaint = [] {};
+    std::function<void()> afterPaint = [] {};
+    std::function<void()> atTimer = [] {};
 
 private:
     static LRESULT CALLBACK Procedure(HWND window, UINT message, WPARAM first, LPARAM second)
@@ -490,8 +543,18 @@ private:
         if (message == WM_TIMER)
         {
             self->inner = self->m_library.closeProject(self->context);
+            self->atTimer();
         }
-        return message == Question ? 42 : DefWindowProcW(window, message, first, second);
+        if (message == WM_PAINT)
+        {
+            self->beforePaint();
+        }
+        const LRESULT result = message == Question ? 42 : DefWindowProcW(window, message, first, second);
+        if (message == WM_PAINT)
+        {
+            self->afterPaint();
+        }
+        return result;
     }
 
     const SccLibrary& m_library;
@@ -505,6 +568,27 @@ BOOL CALLBACK AddText(HWND window, LPARAM list)
     shown.resize(static_cast<std::size_t>(GetWindowTextW(window, shown.data(), static_cast<int>(shown.size()))));
     *reinterpret_cast<std::wstring*>(list) += L'|' + shown + L'|';
     return TRUE;
+}
+
+/// The small window of a slow call; null when it does not come.
+HWND WaitForSmallWindow()
+{
+    HWND small = nullptr;
+    for (int i = 0; small == nullptr && i < 300; ++i)
+    {
+        Sleep(100);
+        small = FindWindowW(L"#32770", L"Isolated");
+    }
+    return small;
+}
+
+std::atomic<int> printedLines = 0;
+
+/// The host's text output. Keeps errors alone.
+LONG CountLines(LPCSTR line, LONG kind)
+{
+    ++printedLines;
+    return kind == SCC_MSG_ERROR ? IsolationTest::Output(line, kind) : SCC_MSG_RTN_OK;
 }
 
 class MisbehaviourInWindows : public MisbehaviourTest
@@ -537,6 +621,81 @@ TEST_F(MisbehaviourInWindows, TheHostsWindowsLiveDuringASlowCallAndDoNotReenterT
     EXPECT_EQ(window.clicks, 0);
     EXPECT_EQ(window.inner, SCC_E_NONSPECIFICERROR);
     EXPECT_EQ(session.Get(), SCC_OK);
+}
+
+TEST_F(MisbehaviourInWindows, AWindowThatPaintsForEverDoesNotHoldUpACall)
+{
+    Misbehave(L"slow-SccGet");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    int paints = 0;
+    window.afterPaint = [&] {
+        ++paints;
+        InvalidateRect(window.Get(), nullptr, FALSE);
+    };
+    InvalidateRect(window.Get(), nullptr, FALSE);
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_GT(paints, 3);
+}
+
+TEST_F(MisbehaviourInWindows, AWindowOfTheLibraryThatPaintsForEverDoesNotHoldUpTheNextCall)
+{
+    Misbehave(L"paint-SccGet");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    EXPECT_EQ(session.Get(), SCC_OK);
+    for (int i = 0; i < 20; ++i)
+    {
+        Sleep(10); // the library's process handles its messages
+        EXPECT_EQ(m_library.queryInfo(session.context, 1, &file, &word), SCC_OK);
+    }
+    EXPECT_EQ(session.Uninitialize(), SCC_OK);
+}
+
+TEST_F(MisbehaviourInWindows, AWindowIsPaintedWhileItsThreadWaitsForAnothersCall)
+{
+    Misbehave(L"work-SccGet");
+    const UniqueKernelHandle goOn(CreateEventW(nullptr, TRUE, FALSE, GoOnEvent));
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open();
+    Lines();
+    std::thread other([&] { EXPECT_EQ(session.Get(), SCC_OK); });
+    for (int i = 0; i < 1000 && Text().find("SccGet(") == std::string::npos; ++i)
+    {
+        Sleep(10);
+    }
+    int paints = 0;
+    window.beforePaint = [&] {
+        ++paints;
+        SetEvent(goOn.Get());
+        // Within the paint, which is still due, this waits as well.
+        EXPECT_EQ(m_library.closeProject(session.context), SCC_OK);
+    };
+    InvalidateRect(window.Get(), nullptr, FALSE);
+    EXPECT_EQ(m_library.closeProject(session.context), SCC_OK);
+    EXPECT_EQ(paints, 1);
+    other.join();
+}
+
+TEST_F(MisbehaviourInWindows, ACallThatWorksOutlivesALongPauseOfTheHost)
+{
+    Misbehave(L"work-SccGet");
+    const UniqueKernelHandle goOn(CreateEventW(nullptr, TRUE, FALSE, GoOnEvent));
+    HostWindow window(m_impatient);
+    Session session(m_impatient, window.Get());
+    session.Open();
+    window.context = session.context;
+    window.atTimer = [&] {
+        KillTimer(window.Get(), 1);
+        Sleep(5500); // as a dialog of the host does
+        SetEvent(goOn.Get());
+    };
+    SetTimer(window.Get(), 1, 50, nullptr);
+    EXPECT_EQ(session.Get(), SCC_OK);
+    EXPECT_EQ(window.timers, 1);
 }
 
 TEST_F(MisbehaviourTest, ThreadsWaitForEachOther)
@@ -575,27 +734,24 @@ TEST_F(MisbehaviourInWindows, AWindowThatACrashedDialogDisabledGetsInputAgain)
 TEST_F(MisbehaviourInWindows, TheUserMayEndASlowCall)
 {
     // SccQueryInfo has no window among its arguments: the small window belongs to the one that the host gave last.
-    const IsolatedCopy patient(ORVIX_MISBEHAVING_SCC, std::chrono::seconds(60));
-    const SccLibrary library(patient.Proxy());
     Misbehave(L"hang-SccQueryInfo");
-    HostWindow window(library);
-    Session session(library, window.Get());
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
     session.Open();
     Lines();
     std::wstring shown;
     std::thread user([&shown] {
-        HWND small = nullptr;
-        for (int i = 0; small == nullptr && i < 300; ++i)
+        const HWND small = WaitForSmallWindow();
+        for (int i = 0; i < 300 && shown.find(L'.') == std::wstring::npos; ++i) // until it is complete
         {
             Sleep(100);
-            small = FindWindowW(L"#32770", L"Isolated");
+            shown.clear();
+            EnumChildWindows(small, AddText, reinterpret_cast<LPARAM>(&shown));
         }
-        Sleep(300); // until it is complete
-        EnumChildWindows(small, AddText, reinterpret_cast<LPARAM>(&shown));
         PostMessageW(small, WM_COMMAND, IDCANCEL, 0);
     });
     const Clock::time_point start = Clock::now();
-    EXPECT_EQ(library.queryInfo(session.context, 1, &file, &word), SCC_E_NONSPECIFICERROR);
+    EXPECT_EQ(m_library.queryInfo(session.context, 1, &file, &word), SCC_E_NONSPECIFICERROR);
     user.join();
     EXPECT_GE(Clock::now() - start, 4900ms);
     EXPECT_LT(Clock::now() - start, 40s);
@@ -604,6 +760,32 @@ TEST_F(MisbehaviourInWindows, TheUserMayEndASlowCall)
     EXPECT_EQ(shown.find(L"|0:00|"), std::wstring::npos) << "its time began with the call";
     EXPECT_THAT(Text(), HasSubstr("was ended by the user, "));
     EXPECT_TRUE(IsWindowEnabled(window.Get()));
+}
+
+TEST_F(MisbehaviourInWindows, TheUserMayEndALibraryThatPrintsWithoutAPause)
+{
+    constexpr int Many = 1000;
+
+    Misbehave(L"chatter-SccGet");
+    HostWindow window(m_library);
+    Session session(m_library, window.Get());
+    session.Open(CountLines);
+    int printed = 0; // while the small window was shown
+    std::thread user([&] {
+        const HWND small = WaitForSmallWindow();
+        const int before = printedLines;
+        const Clock::time_point start = Clock::now();
+        while (printed < Many && Clock::now() - start < 20s)
+        {
+            Sleep(10);
+            printed = printedLines - before;
+        }
+        PostMessageW(small, WM_COMMAND, IDCANCEL, 0);
+    });
+    EXPECT_EQ(session.Get(), SCC_E_NONSPECIFICERROR);
+    user.join();
+    EXPECT_GE(printed, Many);
+    EXPECT_THAT(Text(), HasSubstr("was ended by the user, "));
 }
 
 TEST_F(MisbehaviourInWindows, TheQuitMessageReachesTheHostsLoop)
@@ -625,8 +807,8 @@ TEST_F(MisbehaviourInWindows, TheQuitMessageReachesTheHostsLoop)
 TEST_F(MisbehaviourInWindows, ALibraryThatShowsAWindowIsNotEnded)
 {
     Misbehave(L"window-SccGet");
-    HostWindow window(m_library);
-    Session session(m_library, window.Get());
+    HostWindow window(m_impatient);
+    Session session(m_impatient, window.Get());
     session.Open();
     const Clock::time_point start = Clock::now();
     EXPECT_EQ(session.Get(), SCC_OK);
