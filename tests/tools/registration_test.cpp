@@ -7,6 +7,7 @@
 
 #include <aclapi.h>
 
+#include <algorithm>
 #include <array>
 #include <fstream>
 
@@ -278,8 +279,9 @@ struct Access
 
     static bool IsEverybody(PSID group)
     {
-        return IsWellKnownSid(group, WinWorldSid) || IsWellKnownSid(group, WinBuiltinUsersSid) ||
-               IsWellKnownSid(group, WinAuthenticatedUserSid);
+        constexpr WELL_KNOWN_SID_TYPE Groups[] = {WinWorldSid, WinBuiltinUsersSid, WinAuthenticatedUserSid};
+        return std::any_of(std::begin(Groups), std::end(Groups),
+                           [group](auto one) { return IsWellKnownSid(group, one) != FALSE; });
     }
 
     bool EverybodyMayWrite() const
