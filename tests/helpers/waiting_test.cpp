@@ -400,10 +400,11 @@ TEST_F(Waiting, KeepsTheEndOfTheHost)
 TEST_F(Waiting, TakesTurnsOfALoopThatWaitsByItself)
 {
     HostWindow host;
+    const auto begin = std::chrono::steady_clock::now();
     OrvixWaitingWindow window(host.Get(), Title, L"Cancel");
     window.SetTask(L"Waiting for two things");
     EXPECT_EQ(window.Update(), Result::Done);
-    EXPECT_EQ(FindWindowW(nullptr, Title), nullptr) << "it is too early";
+    EXPECT_TRUE(FindWindowW(nullptr, Title) == nullptr || !IsEarly(begin));
     PostMessageW(host.Get(), Posted, 0, 0);
     PostQuitMessage(7);
     host.painting.Ask(host.Get());
