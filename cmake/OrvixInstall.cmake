@@ -3,9 +3,9 @@
 include(CMakePackageConfigHelpers)
 set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME sdk)
 
-# orvix_install_debug_file(<module> <folder>): installs the debug information of a module, a target or a file, beside the
-# module in <folder>. Of GCC it is a file that is split off at installation: the installed module is stripped and names
-# it.
+# orvix_install_debug_file(<module> <folder>): installs the debug information of a module, a target or a file, beside
+# the module in <folder>. Of GCC it is a file that is split off at installation: the installed module is stripped and
+# names it.
 function(orvix_install_debug_file module folder)
   if(IS_ABSOLUTE ${module})
     set(file ${module})

@@ -1,4 +1,5 @@
 #include "Display.h"
+#include "IdleWindow.h"
 #include "OrvixWaitingWindow.h"
 #include "PaintDelay.h"
 #include "UniqueHandle.h"
@@ -264,15 +265,17 @@ TEST_F(Waiting, PaintsTheHostAllTheTime)
     for (int attempt = 0; attempt < 5 && shortest > 100; ++attempt) // a busy machine may stop every program for a while
     {
         HostWindow host;
+        IdleWindow idle;
         Wait(host.Get(), [&](OrvixWaitingWindow&) {
             for (int i = 0; i < 150; ++i)
             {
                 host.painting.Ask(host.Get());
+                idle.Ask();
                 std::this_thread::sleep_for(milliseconds(10));
             }
         });
         EXPECT_GT(host.painting.Count(), 20u);
-        shortest = std::min(shortest, host.painting.LongestMilliseconds());
+        shortest = std::min(shortest, host.painting.LongestMilliseconds() - idle.LongestMilliseconds());
     }
     EXPECT_LE(shortest, 100);
 }

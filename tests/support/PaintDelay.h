@@ -25,7 +25,7 @@ public:
         ++m_count;
         if (const Clock::rep asked = m_asked.exchange(0); asked != 0)
         {
-            m_longest = std::max(m_longest, Clock::duration(Now() - asked));
+            m_longest = std::max<Clock::rep>(m_longest, Now() - asked);
         }
     }
 
@@ -34,13 +34,13 @@ public:
     {
         m_asked = 0;
         m_count = 0;
-        m_longest = {};
+        m_longest = 0;
     }
 
     unsigned int Count() const { return m_count; }
     long long LongestMilliseconds() const
     {
-        return std::chrono::duration_cast<std::chrono::milliseconds>(m_longest).count();
+        return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::duration(m_longest)).count();
     }
 
 private:
@@ -49,6 +49,6 @@ private:
     static Clock::rep Now() { return Clock::now().time_since_epoch().count(); }
 
     std::atomic<Clock::rep> m_asked = 0; ///< 0: painted since
-    unsigned int m_count = 0;
-    Clock::duration m_longest{};
+    std::atomic<unsigned int> m_count = 0;
+    std::atomic<Clock::rep> m_longest = 0;
 };

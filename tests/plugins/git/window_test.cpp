@@ -2,6 +2,7 @@
 
 #include "Display.h"
 #include "GitTest.h"
+#include "IdleWindow.h"
 #include "PaintDelay.h"
 
 #include <windows.h>
@@ -115,6 +116,12 @@ public:
         }
     }
 
+    /// How much longer than an idle window the host's window waited to be painted. Read after `Stop`.
+    long long LongestGap(const HostWindow& host) const
+    {
+        return host.painting.LongestMilliseconds() - m_idle.LongestMilliseconds();
+    }
+
     std::atomic<bool> sawWindow = false;
     std::atomic<bool> hostWasDisabled = false;
     Texts progress; ///< every text that was shown; read after `Stop`
@@ -126,6 +133,7 @@ private:
         while (!m_stop)
         {
             host.painting.Ask(host.Get());
+            m_idle.Ask();
             if (HWND window = FindWaitingWindow())
             {
                 sawWindow = true;
@@ -146,6 +154,7 @@ private:
     }
 
     std::atomic<bool> m_stop = false;
+    IdleWindow m_idle;
     std::thread m_thread;
 };
 
@@ -237,7 +246,7 @@ TEST_F(GitWindow, PaintsTheHostAndShowsProgressWhileManyFilesAreAdded)
         EXPECT_EQ(FindWaitingWindow(), nullptr);
         EXPECT_GT(watcher.progress.size(), 2u);
         EXPECT_GT(m_host.painting.Count(), 10u);
-        shortest = std::min(shortest, m_host.painting.LongestMilliseconds());
+        shortest = std::min(shortest, watcher.LongestGap(m_host));
     }
     EXPECT_LE(shortest, 100);
 }
@@ -255,7 +264,7 @@ TEST_F(GitWindow, PaintsTheHostWithoutAGap)
         watcher.Stop();
         EXPECT_TRUE(watcher.sawWindow);
         EXPECT_GT(m_host.painting.Count(), 20u);
-        shortest = std::min(shortest, m_host.painting.LongestMilliseconds());
+        shortest = std::min(shortest, watcher.LongestGap(m_host));
     }
     EXPECT_LE(shortest, 100);
 }
