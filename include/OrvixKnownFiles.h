@@ -15,6 +15,10 @@ using OrvixKnownFileCallback = void (*)(void* callerData, const wchar_t* path);
 /// are files that are no longer under control, and those that the version-control system itself keeps out of the
 /// working folder, as a sparse checkout does.
 ///
+/// A host finds the export in the module that contains the provider's virtual table: `GetModuleHandleExW` with
+/// `GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS` and the first pointer of the provider object. Providers of the library
+/// itself, for MSSCCI libraries, have none.
+///
 /// `provider`: what `GetIOrvixProvider` of the same module returned; its project is open.
 /// `folder`: full path of the project's folder or of one below it, with or without a backslash at its end. It lives for
 /// the call. Each path that is named begins with it, in any letter case, and has backslashes only.
