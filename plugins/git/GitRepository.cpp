@@ -335,23 +335,25 @@ GitRepository::Paths GitRepository::Files(const std::wstring& folder) const
     const std::string listed = m_runner.RunOrThrow(
         {.arguments = {L"ls-files", L"-z", L"-t", L"--stage"}, .isQuery = true, .task = L"Listing the files"});
     Paths files;
-    std::string_view last;
-    for (const std::string_view entry : GitText::Split(listed, '\0')) // "TAG MODE OBJECT STAGE<tab>PATH"
-    {
-        constexpr std::string_view LeftOutTag = "S "; // by a sparse checkout
-        constexpr std::string_view SubmoduleMode = "160000 ";
-        const std::string_view path = entry.substr(entry.find('\t') + 1);
-        std::wstring name = GitText::FromUtf8(path);
-        const bool isFile =
-            !entry.starts_with(LeftOutTag) && !entry.substr(LeftOutTag.size()).starts_with(SubmoduleMode);
-        const bool isAgain = path == last; // a conflicted file has several stages
-        last = path;
-        if (isFile && !isAgain && GitText::Fold(name).starts_with(inside))
+    m_runner.Work(L"Listing the files", [&] {
+        std::string_view last;
+        for (const std::string_view entry : GitText::Split(listed, '\0')) // "TAG MODE OBJECT STAGE<tab>PATH"
         {
-            std::replace(name.begin(), name.end(), L'/', L'\\');
-            files.push_back(above + name.substr(inside.size()));
+            constexpr std::string_view LeftOutTag = "S "; // by a sparse checkout
+            constexpr std::string_view SubmoduleMode = "160000 ";
+            const std::string_view path = entry.substr(entry.find('\t') + 1);
+            std::wstring name = GitText::FromUtf8(path);
+            const bool isFile =
+                !entry.starts_with(LeftOutTag) && !entry.substr(LeftOutTag.size()).starts_with(SubmoduleMode);
+            const bool isAgain = path == last; // a conflicted file has several stages
+            last = path;
+            if (isFile && !isAgain && GitText::Fold(name).starts_with(inside))
+            {
+                std::replace(name.begin(), name.end(), L'/', L'\\');
+                files.push_back(above + name.substr(inside.size()));
+            }
         }
-    }
+    });
     return files;
 }
 
