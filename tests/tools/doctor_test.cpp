@@ -424,7 +424,7 @@ TEST_F(DoctorTest, FindsSettingsThatAreReadAndHaveAnotherEffectThanTheySeem)
         EXPECT_GT(finding["column"], 0);
         EXPECT_NE(finding["remedy"], "") << finding;
     }
-    EXPECT_THAT(lines, ElementsAre(2, 3, 4, 6, 5, 8, 9, 10, 10, 11, 11, 11, 2));
+    EXPECT_THAT(lines, ElementsAre(2, 3, 4, 6, 5, 8, 9, 10, 10, 11, 11, 11, 12, 12, 2));
     EXPECT_EQ(TextOf(place, "folder-end"), "provider element 1 (\"depot\"), filter 4: Folder \"C:\\a\" also matches "
                                            "neighbours whose names begin like it, such as \"C:\\a2\"");
 }
