@@ -99,6 +99,7 @@ void GitLocks::Take(const GitRunner& runner, const std::string& path)
     {
         throw GitFailure(GitText::FromUtf8(path) + L" is locked by " + lock->owner);
     }
+    m_inUse = true; // the first lockable file may be new in this session
     if (lock == nullptr)
     {
         runner.RunOrThrow(ForFile(L"lock", path, L"Locking "));

@@ -480,7 +480,8 @@ GitRepository::Lines GitRepository::Commit(const std::vector<std::string>& files
     }
 }
 
-/// The last commit, read without Git, which does not run after a cancel. A commit always writes a loose reference.
+/// The last commit, read without Git, which does not run after a cancel. A commit writes a loose reference, except in a
+/// repository of the reftable format, of which this knows nothing.
 std::string GitRepository::Head() const
 {
     constexpr std::string_view Branch = "ref: ";
