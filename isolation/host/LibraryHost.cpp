@@ -151,7 +151,7 @@ void LibraryHost::Load(MessageReader& request, MessageWriter& reply)
     ReportCrashTo(m_memory.GetState().crash);
 }
 
-/// Only one: a window may ask for painting without an end.
+/// Only one, because a window may ask for painting without an end.
 void LibraryHost::DispatchOneMessage()
 {
     MSG message;

@@ -42,14 +42,14 @@ CallWait::Result CallWait::For(HANDLE event)
     for (;;)
     {
         const bool isLong = Clock::now() - m_start >= ShortCall;
-        // Before the wait, which a library that calls back all the time ends at once.
-        if (isLong && Look() == Result::Hangs)
-        {
-            return WaitForSingleObject(event, 0) == WAIT_OBJECT_0 ? Result::Signalled : Result::Hangs;
-        }
+        // A library that calls back all the time ends each wait at once, so these come first.
         if (m_isWindowDue && m_window->IsCancelled())
         {
             return Result::UserEnds;
+        }
+        if (isLong && Look() == Result::Hangs)
+        {
+            return WaitForSingleObject(event, 0) == WAIT_OBJECT_0 ? Result::Signalled : Result::Hangs;
         }
         const auto timeout = static_cast<DWORD>(std::chrono::milliseconds(isLong ? LookPeriod : ShortCall).count());
         const bool takesAll = isLong && !m_isQuitting && !m_isWindowDue;
@@ -161,7 +161,7 @@ CallWait::Result CallWait::Look()
     }
     if (m_hasWindows && !m_isWindowDue)
     {
-        Dispatch(!m_isQuitting); // which a library that calls back all the time leaves no other time for
+        Dispatch(!m_isQuitting); // a library that calls back all the time leaves no other time for messages
     }
     return Result::Signalled;
 }

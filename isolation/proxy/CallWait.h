@@ -43,7 +43,7 @@ public:
 private:
     using Clock = std::chrono::steady_clock;
 
-    /// As WaitForMultipleObjects, for a moment, while the small window is shown, which has its turns meanwhile.
+    /// Waits for a moment as WaitForMultipleObjects does, and lets the small window handle its messages.
     DWORD WaitWithWindow(const HANDLE* handles);
     void MakeWindow();
     void Dispatch(bool takesAll);

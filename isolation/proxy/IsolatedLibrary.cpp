@@ -37,8 +37,8 @@ bool IsApartment()
     return CoGetApartmentType(&type, &qualifier) == S_OK && (type == APTTYPE_STA || type == APTTYPE_MAINSTA);
 }
 
-// A thread handles painting in a wait, one at a time: its window may call the library before it validates what it
-// paints, and then waits itself. Not thread_local, which costs handles in a DLL that is loaded and unloaded.
+// Only one thread at a time paints while it waits: a window that is painting may call the library, and then waits too.
+// A thread_local variable would cost handles in a DLL that is loaded and unloaded.
 std::atomic<bool> isPainting = false;
 
 /// Waits for at most so long. Meanwhile the windows of this thread are painted, and other threads send messages to
