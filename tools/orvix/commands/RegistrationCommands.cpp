@@ -69,13 +69,20 @@ std::optional<std::wstring> SetIsolated(Registration& registration, const Isolat
     }
     const bool isNew = !folder.Exists();
     const IsolationSettings before = folder.Settings();
+    bool isBegun = false;
     try
     {
-        return registration.Set([&] { return folder.Make(library, bits, patience); });
+        return registration.Set([&] {
+            isBegun = true;
+            return folder.Make(library, bits, patience);
+        });
     }
     catch (const ToolError&)
     {
-        UndoMake(folder, isNew, before);
+        if (isBegun)
+        {
+            UndoMake(folder, isNew, before);
+        }
         throw;
     }
 }
