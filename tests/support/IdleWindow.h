@@ -7,6 +7,7 @@
 #include <bit>
 #include <future>
 #include <thread>
+#include <utility>
 
 /// A window whose thread does nothing but paint it. What it waits for, the machine was too busy for: the measure for
 /// other windows.
@@ -16,19 +17,20 @@ public:
     IdleWindow()
     {
         std::promise<HWND> made;
-        m_thread = std::thread([this, &made] {
-            const HWND window = CreateWindowExW(WS_EX_NOACTIVATE, L"Static", L"Idle", WS_POPUP | WS_VISIBLE, 700, 0, 50,
-                                                50, nullptr, nullptr, nullptr, nullptr);
-            SetWindowLongPtrW(window, GWLP_USERDATA, std::bit_cast<LONG_PTR>(this));
-            SetWindowLongPtrW(window, GWLP_WNDPROC, std::bit_cast<LONG_PTR>(&Procedure));
-            made.set_value(window);
+        std::future<HWND> window = made.get_future();
+        m_thread = std::thread([this, made = std::move(made)]() mutable {
+            const HWND own = CreateWindowExW(WS_EX_NOACTIVATE, L"Static", L"Idle", WS_POPUP | WS_VISIBLE, 700, 0, 50,
+                                             50, nullptr, nullptr, nullptr, nullptr);
+            SetWindowLongPtrW(own, GWLP_USERDATA, std::bit_cast<LONG_PTR>(this));
+            SetWindowLongPtrW(own, GWLP_WNDPROC, std::bit_cast<LONG_PTR>(&Procedure));
+            made.set_value(own);
             MSG message;
             while (GetMessageW(&message, nullptr, 0, 0) > 0)
             {
                 DispatchMessageW(&message);
             }
         });
-        m_window = made.get_future().get();
+        m_window = window.get();
     }
     IdleWindow(const IdleWindow&) = delete;
     IdleWindow& operator=(const IdleWindow&) = delete;

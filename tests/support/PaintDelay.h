@@ -38,9 +38,15 @@ public:
     }
 
     unsigned int Count() const { return m_count; }
+    /// Counts a request, too, that waits still.
     long long LongestMilliseconds() const
     {
-        return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::duration(m_longest)).count();
+        Clock::rep longest = m_longest;
+        if (const Clock::rep asked = m_asked; asked != 0)
+        {
+            longest = std::max<Clock::rep>(longest, Now() - asked);
+        }
+        return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::duration(longest)).count();
     }
 
 private:
