@@ -177,7 +177,7 @@ TEST_F(FilesOfWildProvider, AreAnnouncedAsIncompleteWhenTheExportThrows)
 
 TEST_F(FilesOfWildProvider, EndWithTheTimeLimitWhenTheExportDoesNot)
 {
-    const auto result = RunWith(L"names-endlessly", {L"status", L".", L"--timeout", L"3"});
+    const auto result = RunWith(L"names-endlessly", {L"status", L".", L"--timeout", L"10"});
     EXPECT_EQ(result.code, TimedOut);
     EXPECT_THAT(result.errors, HasSubstr("GetOrvixKnownFiles of Wild"));
 }

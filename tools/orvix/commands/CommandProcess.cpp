@@ -113,6 +113,10 @@ private:
         }
         const std::vector<WindowWatch::Window> windows = m_windows.FindNew();
         TakeLines(m_child.Read()); // the call that shows a window announced itself before
+        if (m_isAttended && !m_isInCall)
+        {
+            return;
+        }
         for (const WindowWatch::Window& window : windows)
         {
             m_lastSign = Clock::now();
@@ -121,7 +125,7 @@ private:
                       << (window.text.empty() ? "" : ": ") << Printable(window.text)
                       << (m_cancelsWindows ? " (Cancel is pressed)" : " (--on-window cancel presses Cancel)")
                       << std::endl;
-            if (m_cancelsWindows && (!m_isAttended || m_isInCall))
+            if (m_cancelsWindows)
             {
                 WindowWatch::Cancel(window);
             }

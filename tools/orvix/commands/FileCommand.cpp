@@ -3,9 +3,10 @@
 #include "FileMark.h"
 #include "FilePath.h"
 #include "FileStateText.h"
-#include "MissingFiles.h"
+#include "KnownFiles.h"
 #include "OrvixFileFlags.h"
 #include "OrvixProviderResult.h"
+#include "ParentLink.h"
 
 #include <iostream>
 #include <new>
@@ -71,8 +72,8 @@ FileCommand::FileCommand(ProjectSession& project, const CommandLine& commandLine
 void FileCommand::AddMissingFiles(const std::wstring& folder)
 {
     m_output.Progress(L"looking for missing files");
-    MissingFiles files(folder);
-    const int result = m_project.NameKnownFiles(folder, MissingFiles::Take, &files);
+    KnownFiles files(folder);
+    const int result = m_project.NameKnownFiles(folder, KnownFiles::Take, &files);
     if (result != OrvixProviderResult::Success && result != OrvixProviderResult::NotOffered)
     {
         m_namesAllFiles = false;
@@ -80,9 +81,17 @@ void FileCommand::AddMissingFiles(const std::wstring& folder)
         std::cerr << "orvix: the provider does not name all its files in " << Printable(folder)
                   << ", so a missing one may be left out\n";
     }
+    std::size_t looked = 0;
     for (const auto& [key, path] : files.Paths())
     {
-        m_collector.AddMissing(folder, path);
+        if (looked++ % 256 == 0) // a look at the disk may take long on a share
+        {
+            ParentLink::Send(ParentLink::Alive);
+        }
+        if (IsMissing(path))
+        {
+            m_collector.AddMissing(folder, path);
+        }
     }
 }
 

@@ -26,7 +26,7 @@ public:
         const WStr wide(text);
         if (wide.Get() != nullptr && s_access != nullptr)
         {
-            s_access->OutputText(wide.Get(), 0);
+            Completes([&] { s_access->OutputText(wide.Get(), 0); });
         }
         return SCC_MSG_RTN_OK;
     }

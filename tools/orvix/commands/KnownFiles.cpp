@@ -1,4 +1,4 @@
-#include "MissingFiles.h"
+#include "KnownFiles.h"
 
 #include "ExceptionBarrier.h"
 #include "FilePath.h"
@@ -14,7 +14,7 @@ namespace
 constexpr std::size_t LongestPath = 32760; // characters, less than Windows takes
 constexpr std::size_t MostFiles = 1'000'000;
 
-/// Whether a file of the disk can have this character in its path.
+/// Whether a path may have this character. Windows takes the controls from 0x7F to 0x9F, which terminals obey.
 bool IsOfPath(wchar_t c)
 {
     constexpr std::wstring_view Special = L"<>:\"/|?*";
@@ -24,16 +24,16 @@ bool IsOfPath(wchar_t c)
 
 } // namespace
 
-void MissingFiles::Take(void* self, const wchar_t* path)
+void KnownFiles::Take(void* self, const wchar_t* path)
 {
-    MissingFiles& files = *static_cast<MissingFiles*>(self);
+    KnownFiles& files = *static_cast<KnownFiles*>(self);
     if (!Completes([&] { files.Add(path); }))
     {
         files.m_isComplete = false;
     }
 }
 
-void MissingFiles::Add(const wchar_t* path)
+void KnownFiles::Add(const wchar_t* path)
 {
     if (path == nullptr || wcsnlen(path, LongestPath + 1) > LongestPath)
     {
@@ -43,7 +43,7 @@ void MissingFiles::Add(const wchar_t* path)
     const std::wstring below = PathBelow(m_folder, path);
     const std::wstring full = m_prefix + below;
     if (below.empty() || below.size() == named.size() || !std::all_of(below.begin(), below.end(), IsOfPath) ||
-        FullPath(full) != full || !IsMissing(full))
+        FullPath(full) != full)
     {
         return;
     }
@@ -55,12 +55,12 @@ void MissingFiles::Add(const wchar_t* path)
     m_paths.emplace(PathKey(full), full);
 }
 
-const std::map<std::wstring, std::wstring>& MissingFiles::Paths() const
+const std::map<std::wstring, std::wstring>& KnownFiles::Paths() const
 {
     if (!m_isComplete)
     {
         throw ToolError(ExitCode::Failed,
-                        L"the provider names too many missing files in " + m_folder + L"; name a folder below it");
+                        L"the provider names too many files in " + m_folder + L"; name a folder below it");
     }
     return m_paths;
 }

@@ -3,13 +3,13 @@
 #include <map>
 #include <string>
 
-/// The files of a folder that a provider knows and the disk lacks. What a provider names is not trusted: it is ignored
+/// The files of a folder that a provider knows, on the disk or not. What a provider names is not trusted: it is ignored
 /// unless it is the full path of a file below the folder.
-class MissingFiles
+class KnownFiles
 {
 public:
     /// `folder`: full path.
-    explicit MissingFiles(const std::wstring& folder)
+    explicit KnownFiles(const std::wstring& folder)
         : m_folder(folder), m_prefix(folder.back() == L'\\' ? folder : folder + L'\\')
     {
     }
