@@ -154,6 +154,8 @@ void GitRepository::Close()
     m_client.clear();
     m_locks.Reset(false);
     m_checkedOut.clear();
+    m_indexStamp.reset();
+    m_tracked.reset();
     m_snapshot.reset();
 }
 
@@ -255,14 +257,35 @@ std::wstring GitRepository::Full(const std::string& path) const
     return full;
 }
 
+/// None when there is no index yet.
+std::optional<GitRepository::IndexStamp> GitRepository::StampOfIndex() const
+{
+    const OwnedHandle file = OwnFile(CreateFileW(LongForm(m_gitFolder + L"\\index").c_str(), FILE_READ_ATTRIBUTES,
+                                                 FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                                                 OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr));
+    BY_HANDLE_FILE_INFORMATION found{};
+    if (!file || !GetFileInformationByHandle(file.get(), &found))
+    {
+        return std::nullopt;
+    }
+    const auto join = [](DWORD high, DWORD low) { return (static_cast<unsigned long long>(high) << 32) | low; };
+    return IndexStamp{join(found.nFileIndexHigh, found.nFileIndexLow), join(found.nFileSizeHigh, found.nFileSizeLow),
+                      join(found.ftLastWriteTime.dwHighDateTime, found.ftLastWriteTime.dwLowDateTime)};
+}
+
 void GitRepository::TakeSnapshot()
 {
-    const GitCommand commands[] = {
+    const std::optional<IndexStamp> stamp = StampOfIndex(); // before the paths are read
+    const bool isKnown = stamp && stamp == m_indexStamp;
+    std::vector<GitCommand> commands = {
         {.arguments = {L"status", L"--porcelain=v2", L"-z", L"--branch", L"--untracked-files=all", L"--no-renames",
                        L"--ignore-submodules=dirty"},
          .isQuery = true,
-         .task = L"Reading the state of the files"},
-        {.arguments = {L"ls-files", L"-z"}, .isQuery = true}};
+         .task = L"Reading the state of the files"}};
+    if (!isKnown)
+    {
+        commands.push_back({.arguments = {L"ls-files", L"-z"}, .isQuery = true});
+    }
     std::vector<ProcessResult> results = m_runner.RunAll(commands);
     for (const ProcessResult& result : results)
     {
@@ -271,8 +294,13 @@ void GitRepository::TakeSnapshot()
             throw GitFailure(GitRunner::Words(result));
         }
     }
+    if (!isKnown)
+    {
+        m_tracked = std::make_shared<const std::string>(std::move(results[1].output));
+        m_indexStamp = stamp;
+    }
     m_runner.Work(L"Reading the state of the files",
-                  [&] { m_snapshot = std::make_unique<GitSnapshot>(results[0].output, std::move(results[1].output)); });
+                  [&] { m_snapshot = std::make_unique<GitSnapshot>(results[0].output, m_tracked); });
     if (m_snapshot->Status().behind > 0)
     {
         ProcessResult changes =

@@ -80,6 +80,18 @@ private:
     Lines GiveLocksBack(const std::vector<std::string>& paths);
     bool HasUpstreamCommit() const;
 
+    /// What tells one file of the index from the next: Git writes a new file for each change.
+    struct IndexStamp
+    {
+        bool operator==(const IndexStamp&) const = default;
+
+        unsigned long long id = 0;
+        unsigned long long size = 0;
+        unsigned long long written = 0;
+    };
+
+    std::optional<IndexStamp> StampOfIndex() const;
+
     GitRunner& m_runner;
     std::wstring m_top;          ///< without a separator at its end
     std::wstring m_gitFolder;    ///< of this working folder
@@ -88,5 +100,7 @@ private:
     std::wstring m_client;
     GitLocks m_locks;
     std::unordered_set<std::string> m_checkedOut; ///< in this session
+    std::optional<IndexStamp> m_indexStamp;       ///< of the index that `m_tracked` is from
+    std::shared_ptr<const std::string> m_tracked; ///< the paths of the index, as Git prints them
     std::unique_ptr<GitSnapshot> m_snapshot;      ///< the last one; has Git's spelling of paths
 };

@@ -2,10 +2,10 @@
 
 #include "GitText.h"
 
-GitSnapshot::GitSnapshot(std::string_view status, std::string tracked)
+GitSnapshot::GitSnapshot(std::string_view status, std::shared_ptr<const std::string> tracked)
     : m_status(GitStatus::Read(status)), m_tracked(std::move(tracked))
 {
-    const std::vector<std::string_view> paths = GitText::Split(m_tracked, '\0');
+    const std::vector<std::string_view> paths = GitText::Split(*m_tracked, '\0');
     m_items.reserve(paths.size() + m_status.files.size());
     for (const std::string_view path : paths)
     {

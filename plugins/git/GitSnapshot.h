@@ -2,6 +2,7 @@
 
 #include "GitStatus.h"
 
+#include <memory>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -19,8 +20,8 @@ public:
     };
     using Entry = std::pair<const std::string_view, Item>;
 
-    /// `status` is the output of "git status", and `tracked` that of "git ls-files -z".
-    GitSnapshot(std::string_view status, std::string tracked);
+    /// `status` is the output of "git status", and `tracked` that of "git ls-files -z", not null.
+    GitSnapshot(std::string_view status, std::shared_ptr<const std::string> tracked);
     GitSnapshot(const GitSnapshot&) = delete;
     GitSnapshot& operator=(const GitSnapshot&) = delete;
     ~GitSnapshot() = default;
@@ -37,7 +38,7 @@ public:
 
 private:
     GitStatus m_status;
-    std::string m_tracked;
+    std::shared_ptr<const std::string> m_tracked;
     std::string m_upstreamChanges;
     std::unordered_map<std::string_view, Item> m_items; ///< the keys are in the members above
     std::unordered_set<std::string_view> m_outOfDate;

@@ -23,6 +23,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <iterator>
+#include <memory>
 #include <optional>
 #include <string>
 #include <thread>
@@ -391,7 +392,8 @@ TEST(GitStatus, OfDamagedTextIsReadAsFarAsItGoes)
 
 TEST(GitSnapshot, FindsAFileInAnyLetterCase)
 {
-    const GitSnapshot snapshot("? Readme.TXT\0"s, "src/Main.cpp\0src/\xC3\x84.txt\0"s);
+    const GitSnapshot snapshot("? Readme.TXT\0"s,
+                               std::make_shared<const std::string>("src/Main.cpp\0src/\xC3\x84.txt\0"s));
     EXPECT_EQ(snapshot.Find("src/Main.cpp")->first, "src/Main.cpp");
     EXPECT_EQ(snapshot.Find("SRC/MAIN.CPP")->first, "src/Main.cpp");
     EXPECT_TRUE(snapshot.Find("src/\xC3\xA4.TXT")->second.isTracked);

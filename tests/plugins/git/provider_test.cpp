@@ -609,6 +609,22 @@ TEST_F(GitProvider, LeavesNoCommentOnAFullDrive)
     parent({L"-c", L"alias.clear=!rm -rf town", L"clear"}); // read-only files, too
 }
 
+TEST_F(GitProvider, SeesWhatAnotherProgramHasAddedOrRemoved)
+{
+    const std::wstring one = m_git.Commit(L"one.txt", "1\n");
+    const std::wstring two = m_git.Write(L"two.txt", "2\n");
+    ASSERT_EQ(m_user.Open(m_git.Folder()), Success);
+    EXPECT_EQ(m_user.Query(two) & OrvixFileState::Controlled, 0u);
+    m_git({L"add", L"two.txt"});
+    EXPECT_NE(m_user.Query(two) & OrvixFileState::Controlled, 0u);
+    m_git({L"commit", L"--quiet", L"-m", L"Two"});
+    EXPECT_NE(m_user.Query(two) & OrvixFileState::Controlled, 0u);
+    m_git({L"rm", L"--quiet", L"--cached", L"one.txt"});
+    m_git({L"commit", L"--quiet", L"-m", L"One less"});
+    EXPECT_EQ(m_user.Query(one) & OrvixFileState::Controlled, 0u);
+    EXPECT_NE(m_user.Query(two) & OrvixFileState::Controlled, 0u);
+}
+
 TEST_F(GitProvider, EndsACommandThatIsSilentForTooLong)
 {
     const std::wstring file = m_git.Commit(L"a.txt", "1\n");
