@@ -12,7 +12,7 @@ void Note(const EXCEPTION_RECORD& exception)
 {
     static wchar_t path[MAX_PATH];
     HMODULE module = nullptr;
-    const auto address = static_cast<LPCWSTR>(exception.ExceptionAddress);
+    const auto* const address = static_cast<LPCWSTR>(exception.ExceptionAddress);
     if (GetModuleHandleExW(GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT,
                            address, &module))
     {

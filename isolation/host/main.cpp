@@ -3,6 +3,8 @@
 
 #include "LibraryHost.h"
 
+#include <bit>
+#include <cstdint>
 #include <cstdlib>
 
 namespace
@@ -13,8 +15,8 @@ constexpr int BadMessage = 3;
 
 UniqueKernelHandle Argument(int index)
 {
-    const auto value = std::strtoull(__argv[index], nullptr, 10);
-    UniqueKernelHandle handle(reinterpret_cast<HANDLE>(static_cast<std::uintptr_t>(value)));
+    const auto value = static_cast<std::uintptr_t>(std::strtoull(__argv[index], nullptr, 10));
+    UniqueKernelHandle handle(std::bit_cast<HANDLE>(value));
     SetHandleInformation(handle.Get(), HANDLE_FLAG_INHERIT, 0); // programs that the library starts must not have it
     return handle;
 }

@@ -50,9 +50,9 @@ public:
         SIZE_T size = 0;
         InitializeProcThreadAttributeList(nullptr, 1, 0, &size);
         m_memory.resize(size);
-        m_isReady = InitializeProcThreadAttributeList(List(), 1, 0, &size) &&
+        m_isReady = InitializeProcThreadAttributeList(List(), 1, 0, &size) != FALSE &&
                     UpdateProcThreadAttribute(List(), 0, PROC_THREAD_ATTRIBUTE_HANDLE_LIST, m_handles.data(),
-                                              m_handles.size() * sizeof(HANDLE), nullptr, nullptr);
+                                              m_handles.size() * sizeof(HANDLE), nullptr, nullptr) != FALSE;
     }
     InheritOnly(const InheritOnly&) = delete;
     InheritOnly& operator=(const InheritOnly&) = delete;
@@ -151,7 +151,7 @@ bool LibraryProcess::Run(const std::filesystem::path& program)
     {
         SetHandleInformation(handle, HANDLE_FLAG_INHERIT, 0); // the host may start other programs
     }
-    return AssignProcessToJobObject(m_job.Get(), m_process.Get()) &&
+    return AssignProcessToJobObject(m_job.Get(), m_process.Get()) != FALSE &&
            ResumeThread(thread.Get()) != static_cast<DWORD>(-1);
 }
 
@@ -190,7 +190,8 @@ bool LibraryProcess::ShowsWindow() const
     const auto look = [](HWND window, LPARAM id) -> BOOL {
         DWORD owner = 0;
         GetWindowThreadProcessId(window, &owner);
-        return owner != static_cast<DWORD>(id) || !IsWindowVisible(window); // false stops the search
+        const bool isFound = owner == static_cast<DWORD>(id) && IsWindowVisible(window) != FALSE;
+        return isFound ? FALSE : TRUE; // FALSE stops the search
     };
-    return !EnumWindows(look, static_cast<LPARAM>(m_id));
+    return EnumWindows(look, static_cast<LPARAM>(m_id)) == FALSE;
 }

@@ -9,7 +9,7 @@ class ParentWindow
 public:
     explicit ParentWindow(HWND window)
         : m_window(window != nullptr ? GetAncestor(window, GA_ROOT) : nullptr),
-          m_isEnabled(m_window != nullptr && IsWindowEnabled(m_window))
+          m_isEnabled(m_window != nullptr && IsWindowEnabled(m_window) != FALSE)
     {
     }
 
@@ -21,7 +21,7 @@ public:
 
     void Restore() const
     {
-        if (m_isEnabled && !IsWindowEnabled(m_window))
+        if (m_isEnabled && IsWindowEnabled(m_window) == FALSE)
         {
             EnableWindow(m_window, TRUE);
             SetForegroundWindow(m_window);

@@ -6,6 +6,8 @@
 
 #include <algorithm>
 #include <atomic>
+#include <bit>
+#include <cstdint>
 #include <cstring>
 #include <string>
 #include <vector>
@@ -67,6 +69,13 @@ constexpr std::size_t SlackBytes = 4096;
 inline std::size_t Elements(LONG count)
 {
     return static_cast<std::size_t>(std::max<LONG>(count, 0));
+}
+
+/// A pointer as a number of the request.
+template <typename Pointer>
+Pointer PointerOf(MessageReader& request)
+{
+    return std::bit_cast<Pointer>(static_cast<std::uintptr_t>(request.Number<std::uint64_t>()));
 }
 
 /// An argument that the library only reads.
@@ -139,10 +148,7 @@ public:
         side.window = window;
         request.Number(std::uint64_t{reinterpret_cast<std::uintptr_t>(window)});
     }
-    Window(MessageReader& request, LibrarySide&)
-        : m_window(reinterpret_cast<HWND>(static_cast<std::uintptr_t>(request.Number<std::uint64_t>())))
-    {
-    }
+    Window(MessageReader& request, LibrarySide&) : m_window(PointerOf<HWND>(request)) {}
     HWND Get() const { return m_window; }
 
 private:
@@ -158,10 +164,7 @@ public:
         side.populateData = data;
         request.Number(std::uint64_t{reinterpret_cast<std::uintptr_t>(data)});
     }
-    CallerData(MessageReader& request, LibrarySide&)
-        : m_data(reinterpret_cast<LPVOID>(static_cast<std::uintptr_t>(request.Number<std::uint64_t>())))
-    {
-    }
+    CallerData(MessageReader& request, LibrarySide&) : m_data(PointerOf<LPVOID>(request)) {}
     LPVOID Get() const { return m_data; }
 
 private:
@@ -407,10 +410,7 @@ public:
     {
         request.Number(side.blocks.Address(block));
     }
-    Block(MessageReader& request, LibrarySide&)
-        : m_block(reinterpret_cast<LPCMDOPTS>(static_cast<std::uintptr_t>(request.Number<std::uint64_t>())))
-    {
-    }
+    Block(MessageReader& request, LibrarySide&) : m_block(PointerOf<LPCMDOPTS>(request)) {}
     LPCMDOPTS Get() const { return m_block; }
 
 protected:
@@ -429,8 +429,7 @@ public:
         request.Number(place != nullptr ? side.blocks.Address(*place) : 0);
     }
     BlockPlace(MessageReader& request, LibrarySide&)
-        : m_isPresent(request.Flag()),
-          m_block(reinterpret_cast<LPCMDOPTS>(static_cast<std::uintptr_t>(request.Number<std::uint64_t>())))
+        : m_isPresent(request.Flag()), m_block(PointerOf<LPCMDOPTS>(request))
     {
     }
     LPCMDOPTS* Get() { return m_isPresent ? &m_block : nullptr; }
@@ -534,6 +533,7 @@ public:
         const std::size_t count = state == NewNames ? Elements(side.count) : 0;
         MessageReader::Check(count <= reply.Rest() / sizeof(std::uint32_t)); // each has at least that
         std::vector<bool> isPresent;
+        isPresent.reserve(count);
         side.addedTexts.resize(count);
         for (std::string& text : side.addedTexts)
         {

@@ -19,7 +19,7 @@ struct SccCall
 namespace SccCalls
 {
 
-using namespace SccArguments;
+using namespace SccArguments; // NOLINT(google-build-using-namespace): each call reads as its signature
 
 inline constexpr SccCall<> GetVersion = {0, "SccGetVersion"};
 inline constexpr SccCall<NewContext, Window, Text, Buffer<SCC_NAME_SIZE>, NumberPlace<LONG>, Buffer<SCC_AUXLABEL_SIZE>,

@@ -378,7 +378,7 @@ SCCRTN SccGetProjPath(LPVOID context, HWND window, LPSTR user, LPSTR projectName
          Show(auxPath), Show(allowChangePath), Show(*isNew));
     Write(projectName, "Project");
     Write(localPath, "C:\\chosen");
-    *isNew = !*isNew;
+    *isNew = *isNew == FALSE ? TRUE : FALSE;
     return SCC_OK;
 }
 
@@ -461,7 +461,7 @@ SCCRTN SccPopulateList(LPVOID context, SCCCOMMAND command, LONG count, LPCSTR* n
     }
     for (LONG i = 0; i < count; ++i)
     {
-        const BOOL more = callback(callerData, i % 2 == 0, i, const_cast<LPSTR>(names[i]));
+        const BOOL more = callback(callerData, i % 2 == 0 ? TRUE : FALSE, i, const_cast<LPSTR>(names[i]));
         Print("the host says " + Show(more));
         if (!more)
         {
@@ -527,5 +527,5 @@ BOOL WINAPI DllMain(HINSTANCE, DWORD reason, LPVOID)
     {
         Defect::Hang();
     }
-    return reason != DLL_PROCESS_ATTACH || !Defect::Is(L"refuse-load");
+    return reason == DLL_PROCESS_ATTACH && Defect::Is(L"refuse-load") ? FALSE : TRUE;
 }

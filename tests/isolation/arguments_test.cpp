@@ -103,7 +103,7 @@ TEST_F(Wire, KeepsTheContextOnTheLibrarysSide)
 
 TEST_F(Wire, CarriesATextThatFillsItsBufferAndTerminatesWhatTheHostGets)
 {
-    std::array<char, SCC_USER_SIZE> user;
+    std::array<char, SCC_USER_SIZE> user{};
     user.fill('u');
     std::array<char, SCC_PRJPATH_SIZE> auxPath{"old and longer"};
     const auto open = [&](auto function) {
@@ -132,7 +132,7 @@ TEST_F(Wire, CarriesATextThatFillsItsBufferAndTerminatesWhatTheHostGets)
 
 TEST_F(Wire, DoesNotWriteATextThatTheLibraryLeavesAlone)
 {
-    const auto literal = const_cast<LPSTR>("in memory that cannot be written");
+    auto* const literal = const_cast<LPSTR>("in memory that cannot be written");
     BOOL isNew = FALSE;
     const auto leave = [](LPVOID, HWND, LPSTR, LPSTR, LPSTR, LPSTR, BOOL allow, LPBOOL place) {
         *place = allow;
@@ -456,6 +456,14 @@ private:
 
 class Fuzz : public Wire
 {
+public:
+    /// A call of the function with this index.
+    template <std::size_t Index>
+    void Run()
+    {
+        RunCall(std::get<Index>(SccCalls::All));
+    }
+
 protected:
     /// Moves a message to the end of its area, so that nobody can read beyond it, and changes some of its bytes, or its
     /// size, if `isDamaged`.
@@ -478,12 +486,6 @@ protected:
     }
 
     unsigned Random(unsigned limit) { return static_cast<unsigned>(m_random() % limit); }
-
-    template <std::size_t Index>
-    void Run()
-    {
-        RunCall(std::get<Index>(SccCalls::All));
-    }
 
     template <typename... Kinds>
     void RunCall(const SccCall<Kinds...>& call)

@@ -5,6 +5,8 @@
 #include <gmock/gmock.h>
 
 #include <algorithm>
+#include <bit>
+#include <cstdint>
 #include <set>
 #include <sstream>
 
@@ -39,7 +41,7 @@ BOOL List(LPVOID data, BOOL add, LONG status, LPSTR name)
 {
     auto& transcript = *static_cast<Transcript*>(data);
     transcript << "listed" << add << status << (name != nullptr ? name : "(null)");
-    return status < 1;
+    return status < 1 ? TRUE : FALSE;
 }
 
 /// Runs without the lines that name a process.
@@ -68,7 +70,7 @@ protected:
     {
         Transcript seen;
         const SccLibrary library(file);
-        const auto window = reinterpret_cast<HWND>(0x1234);
+        HWND window = std::bit_cast<HWND>(std::uintptr_t{0x1234});
         seen << library.getVersion();
         {
             Session session(library, window);

@@ -537,9 +537,9 @@ private:
         {
             return DefWindowProcW(window, message, first, second);
         }
-        self->timers += message == WM_TIMER;
-        self->questions += message == Question;
-        self->clicks += message == WM_LBUTTONDOWN;
+        self->timers += message == WM_TIMER ? 1 : 0;
+        self->questions += message == Question ? 1 : 0;
+        self->clicks += message == WM_LBUTTONDOWN ? 1 : 0;
         if (message == WM_TIMER)
         {
             self->inner = self->m_library.closeProject(self->context);

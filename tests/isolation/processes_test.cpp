@@ -96,14 +96,14 @@ TEST_F(TwoProcesses, AHostileLibrarysOneDoesNoHarm)
         LPCSTR name = "C:\\project\\a.txt";
         for (int call = 0; session.context != nullptr && call < 20; ++call)
         {
-            answered += session.Get() == SCC_OK;
+            answered += session.Get() == SCC_OK ? 1 : 0;
             library.queryInfo(session.context, 1, &name, &status);
             library.populateList(session.context, SCC_COMMAND_GET, 1, &name, nullptr, nullptr, &status, 0);
             LONG count = 0;
             LPCSTR* added = nullptr;
             library.addFromScc(session.context, nullptr, &count, &added);
         }
-        refused += Text().find("sent an answer that cannot be read") != std::string::npos;
+        refused += Text().find("sent an answer that cannot be read") != std::string::npos ? 1 : 0;
     }
     EXPECT_GT(answered, 0);
     EXPECT_GT(refused, Programs / 4);
@@ -143,7 +143,7 @@ TEST_F(TwoProcesses, AHostileHostOnlyEndsTheLibrarysOne)
         GetExitCodeProcess(process.Process(), &code);
         EXPECT_TRUE(code == STILL_ACTIVE || code == 0 || code == BadMessage) << code;
         EXPECT_EQ(process.Memory().GetState().crash.code, 0u);
-        refused += code == BadMessage;
+        refused += code == BadMessage ? 1 : 0;
     }
     EXPECT_GT(refused, static_cast<int>(Programs / 4));
 }
