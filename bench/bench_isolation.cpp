@@ -85,6 +85,7 @@ void BenchIsolation(MeasureTable& table)
     {
         std::vector<std::string> texts;
         std::vector<LPCSTR> names;
+        names.reserve(count);
         for (unsigned int i = 0; i < count; ++i)
         {
             texts.push_back(std::filesystem::path(FileName(i)).string());

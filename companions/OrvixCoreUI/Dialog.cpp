@@ -207,7 +207,7 @@ void Dialog::WatchControls()
 LRESULT CALLBACK Dialog::ControlProcedure(HWND control, UINT message, WPARAM wParam, LPARAM lParam, UINT_PTR,
                                           DWORD_PTR dialog) noexcept
 {
-    auto& self = *reinterpret_cast<Dialog*>(dialog);
+    auto& self = *std::bit_cast<Dialog*>(dialog);
     if (message == WM_KEYDOWN)
     {
         self.m_usedKey = false;

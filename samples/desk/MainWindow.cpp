@@ -206,10 +206,7 @@ LRESULT MainWindow::Handle(UINT message, WPARAM wParam, LPARAM lParam)
         m_frame.UseTheme(m_theme);
         return 0;
     case WM_ACTIVATE:
-        if (LOWORD(wParam) == WA_INACTIVE)
-        {
-            m_focus = GetFocus();
-        }
+        m_focus = LOWORD(wParam) == WA_INACTIVE ? GetFocus() : m_focus;
         break;
     case WM_SETFOCUS:
         SetFocus(IsChild(m_window, m_focus) != FALSE ? m_focus : m_frame.Files().Window());

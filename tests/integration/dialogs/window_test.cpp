@@ -334,7 +334,7 @@ TEST_F(DialogWindows, DrawButtonsHeadingsAndSelectedRowsInTheHostsColours)
         EXPECT_GT(NumPixels(button, inside(button), Face), mostOf(inside(button)));
 
         const HWND list = dialog.Control(L"Files:");
-        const auto headings = std::bit_cast<HWND>(SendMessageW(list, LVM_GETHEADER, 0, 0));
+        auto* const headings = std::bit_cast<HWND>(SendMessageW(list, LVM_GETHEADER, 0, 0));
         EXPECT_GT(NumPixels(headings, inside(headings), Face), mostOf(inside(headings)));
 
         RECT row{};

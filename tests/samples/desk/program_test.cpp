@@ -26,7 +26,7 @@ BOOL CALLBACK Compare(HWND window, LPARAM parameter)
     wchar_t name[64] = {};
     GetWindowTextW(window, title, 512);
     GetClassNameW(window, name, 64);
-    if (IsWindowVisible(window) && name == std::wstring(L"OrvixDesk") && title == search.title &&
+    if (IsWindowVisible(window) != FALSE && name == std::wstring(L"OrvixDesk") && title == search.title &&
         !search.known.contains(window))
     {
         search.found = window;

@@ -70,7 +70,8 @@ private:
     static bool Replace(const std::filesystem::path& from, const std::filesystem::path& to)
     {
         SetFileAttributesW(to.c_str(), FILE_ATTRIBUTE_NORMAL);
-        return CopyFileW(from.c_str(), to.c_str(), FALSE) && SetFileAttributesW(to.c_str(), FILE_ATTRIBUTE_NORMAL);
+        return CopyFileW(from.c_str(), to.c_str(), FALSE) != FALSE &&
+               SetFileAttributesW(to.c_str(), FILE_ATTRIBUTE_NORMAL) != FALSE;
     }
 
     std::filesystem::path m_project;

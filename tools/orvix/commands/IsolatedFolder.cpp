@@ -153,7 +153,7 @@ void CheckSource(const wchar_t* file)
 void CopyHere(const wchar_t* file, const std::filesystem::path& folder)
 {
     const std::filesystem::path source = SourceOf(file);
-    if (!CopyFileW(source.c_str(), (folder / file).c_str(), FALSE))
+    if (CopyFileW(source.c_str(), (folder / file).c_str(), FALSE) == FALSE)
     {
         Fail(L"the library cannot be isolated, since " + source.wstring() + L" cannot be copied", folder / file,
              GetLastError());

@@ -84,8 +84,8 @@ UniqueKernelHandle Start(std::wstring commandLine, const std::wstring& folder, C
         startup.hStdInput = startup.hStdOutput = startup.hStdError = nullDevice.Get();
     }
     PROCESS_INFORMATION started{};
-    if (!CreateProcessW(ModulePath(nullptr).c_str(), commandLine.data(), nullptr, nullptr, TRUE, CREATE_SUSPENDED,
-                        nullptr, folder.empty() ? nullptr : folder.c_str(), &startup, &started))
+    if (CreateProcessW(ModulePath(nullptr).c_str(), commandLine.data(), nullptr, nullptr, TRUE, CREATE_SUSPENDED,
+                       nullptr, folder.empty() ? nullptr : folder.c_str(), &startup, &started) == FALSE)
     {
         FailToStart(L"a process");
     }
@@ -159,7 +159,7 @@ bool ChildProcess::Contains(unsigned long processID) const
 {
     const UniqueKernelHandle process(OpenProcess(PROCESS_QUERY_INFORMATION, FALSE, processID));
     BOOL contains = FALSE;
-    return process && IsProcessInJob(process.Get(), m_job.Get(), &contains) && contains != FALSE;
+    return process && IsProcessInJob(process.Get(), m_job.Get(), &contains) != FALSE && contains != FALSE;
 }
 
 std::wstring QuotedArgument(std::wstring_view argument)

@@ -33,7 +33,7 @@ private:
     UINT m_codePage;
     unsigned int m_floatingPoint; // control word
     UINT m_errorMode;
-    HANDLE m_handles[3];
+    HANDLE m_handles[3] = {};
 };
 
 /// Restores the state of the process at the end of a scope in which code of others runs.

@@ -3,6 +3,7 @@
 #include "ChildProcess.h"
 
 #include <array>
+#include <bit>
 
 namespace
 {
@@ -29,7 +30,7 @@ bool HasClass(HWND window, const wchar_t* name)
 
 BOOL CALLBACK AddLabel(HWND control, LPARAM argument)
 {
-    std::wstring& text = *reinterpret_cast<std::wstring*>(argument);
+    std::wstring& text = *std::bit_cast<std::wstring*>(argument);
     const std::wstring label = IsWindowVisible(control) && HasClass(control, L"Static") ? TextOf(control) : L"";
     text += text.empty() || label.empty() ? label : L' ' + label;
     return TRUE;
@@ -39,7 +40,7 @@ BOOL CALLBACK AddVisible(HWND window, LPARAM argument)
 {
     if (IsWindowVisible(window))
     {
-        reinterpret_cast<std::vector<HWND>*>(argument)->push_back(window);
+        std::bit_cast<std::vector<HWND>*>(argument)->push_back(window);
     }
     return TRUE;
 }
