@@ -137,7 +137,7 @@ SCCRTN SccGet(LPVOID, HWND, LONG count, LPCSTR* names, LONG, LPCMDOPTS)
     {
         Print(Defect::Is(L"text-output") ? "got\r\n" : "got", SCC_MSG_INFO);
     }
-    return Defect::Is(L"codes") ? UnknownResult : SCC_OK;
+    return Defect::Is(L"codes") && count > 1 ? UnknownResult : SCC_OK;
 }
 
 SCCRTN SccCheckout(LPVOID, HWND, LONG count, LPCSTR* names, LPCSTR, LONG, LPCMDOPTS)
