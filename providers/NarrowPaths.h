@@ -6,7 +6,7 @@
 #include <string_view>
 #include <vector>
 
-/// Whether `narrow`, in the ANSI code page, stands for the whole text. Throws std::bad_alloc.
+/// Whether `narrow`, in the ANSI code page, has the same characters as the text. Throws std::bad_alloc.
 bool IsExact(std::wstring_view text, const char* narrow);
 
 /// Paths in the ANSI code page, as an MSSCCI library takes them.

@@ -143,7 +143,7 @@ CallWait::Result CallWait::Look()
     {
         Restart();
         m_lastWindow = now;
-        m_window.reset(); // the library's own window must not lie behind it
+        m_window.reset(); // it must not cover the library's own window
     }
     else if (!m_window && m_parent != nullptr)
     {
