@@ -67,9 +67,9 @@ void FileCollector::AddFile(std::wstring path, bool named)
     if (m_keys.insert(PathKey(path)).second)
     {
         m_files.push_back({std::move(path), named});
+        ParentLink::SendAliveAt(m_files.size());
         if (m_files.size() % FilesBetweenProgress == 0)
         {
-            ParentLink::Send(ParentLink::Alive);
             m_output.Progress(L"looking for files: " + std::to_wstring(m_files.size()));
         }
     }

@@ -84,10 +84,7 @@ void FileCommand::AddMissingFiles(const std::wstring& folder)
     std::size_t looked = 0;
     for (const auto& [key, path] : files.Paths())
     {
-        if (looked++ % 256 == 0) // a look at the disk may take long on a share
-        {
-            ParentLink::Send(ParentLink::Alive);
-        }
+        ParentLink::SendAliveAt(looked++);
         if (IsMissing(path))
         {
             m_collector.AddMissing(folder, path);

@@ -5,7 +5,7 @@
 namespace
 {
 
-/// Builds the elements. They hang below one that stands for the document.
+/// Builds the elements, as descendants of a root element that represents the document.
 class OutlineBuilder final : public SaxHandler
 {
 public:

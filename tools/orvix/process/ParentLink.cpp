@@ -78,3 +78,13 @@ void ParentLink::Send(std::string_view word, const std::string& text)
         Write(line.data(), line.size());
     }
 }
+
+void ParentLink::SendAliveAt(std::size_t step)
+{
+    constexpr std::size_t Period = 256;
+
+    if (step % Period == 0)
+    {
+        Send(Alive);
+    }
+}

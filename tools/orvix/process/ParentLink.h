@@ -2,6 +2,7 @@
 
 #include <windows.h>
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 
@@ -26,5 +27,9 @@ bool Attach(int& count, wchar_t**& arguments);
 
 /// Sends a line. Does nothing in a process that is no child. Control characters of the text are replaced.
 void Send(std::string_view word, const std::string& text = {});
+
+/// Sends `Alive` with the first and every 256th step of work of this process that may take long, such as a look at each
+/// file of a slow share. `step` counts from 0.
+void SendAliveAt(std::size_t step);
 
 } // namespace ParentLink

@@ -155,10 +155,7 @@ int GuardedProvider::QueryStatus(OrvixFileList* list, unsigned long options)
     {
         OrvixFileEntry* const entry = list->GetActiveFileEntry(i);
         entry->SetFlagsOut(CorrectedFlags(*entry));
-        if (i % 256 == 0) // a look at the disk may take long on a share
-        {
-            ParentLink::Send(ParentLink::Alive);
-        }
+        ParentLink::SendAliveAt(i);
     }
     return result;
 }
